@@ -1,0 +1,77 @@
+#include "binding/Call.h"
+
+#include <algorithm>
+#include <array>
+#include <cstdarg>
+#include <cstdio>
+#include <cstdlib>
+#include <limits>
+#include <string>
+
+namespace Ip {
+
+namespace {
+
+constexpr int kWordsBeforeArguments = 2;  // the handle and the method name
+
+}  // namespace
+
+bool Call::HasArguments(int arguments, const char* method) const {
+  if (objc_ == arguments + kWordsBeforeArguments) return true;
+  const std::string message = std::string(method) + ": Invalid number of arguments.";
+  Tcl::SetResult(interp_, message.c_str());
+  return false;
+}
+
+VorkelImp* Call::Object(const VorkelPtrHandle& handle, int arguments, const char* method,
+                        const char* missing) const {
+  if (!HasArguments(arguments, method)) return nullptr;
+  void* value = nullptr;
+  if (handle.GetValue(&value) == TCL_OK) return static_cast<VorkelImp*>(value);
+  if (missing != nullptr) {
+    Tcl::SetResult(interp_, missing);
+  } else {
+    const std::string message =
+        std::string("Unable to obtain Implementation object for VorkelPtrHandle::") + method;
+    Tcl::SetResult(interp_, message.c_str());
+  }
+  return nullptr;
+}
+
+const char* Call::Text(int argument) const {
+  return Tcl::GetString(objv_[argument + kWordsBeforeArguments]->GetTclObj());
+}
+
+double Call::Number(int argument) const { return std::atof(Text(argument)); }
+
+int Call::Count(int argument) const {
+  // As atoi, which leaves open what becomes of text that no int can hold.
+  const long value = std::strtol(Text(argument), nullptr, 10);
+  return static_cast<int>(std::clamp<long>(value, std::numeric_limits<int>::min(),
+                                           std::numeric_limits<int>::max()));
+}
+
+bool Call::Flag(int argument) const {
+  return String(argument).Compare("true", Port::CompareType::kExact) == 0;
+}
+
+int Call::AnswerText(const char* text) const {
+  Tcl::SetResult(interp_, text);
+  return TCL_OK;
+}
+
+int Call::Answer(const char* format, ...) const {
+  std::array<char, 512> text;  // the longest double takes 309 digits before the point
+  std::va_list arguments;
+  va_start(arguments, format);
+  std::vsnprintf(text.data(), text.size(), format, arguments);
+  va_end(arguments);
+  return AnswerText(text.data());
+}
+
+int Call::Fail(const char* message) const {
+  Tcl::SetResult(interp_, message);
+  return TCL_ERROR;
+}
+
+}  // namespace Ip

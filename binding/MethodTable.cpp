@@ -1,0 +1,73 @@
+#include "binding/MethodTable.h"
+
+#include "host/Initialisers.h"
+
+namespace Ip {
+
+namespace {
+
+// Static initialisation brings the host's services up in this order, then builds the table;
+// they go down the other way round. All of it stands in this file so that the order is that
+// of the lines.
+const Port::FileInit fileInit;
+const Port::PathListInit pathListInit;
+const CitP::InstanceTableInit instanceTableInit;
+const CitP::FactoryInit factoryInit;
+const Port_MsgManInit msgManInit;
+
+// The search goes from the first entry to the last. KRU and Kru stand as scripts know them.
+const std::array<Method, kMethods> methods = {{
+    {"GetSpdKeyValue", &VorkelPtrHandle::GetSpdKeyValue},
+    {"SetDevice", &VorkelPtrHandle::SetDevice},
+    {"SetLowBandwidth", &VorkelPtrHandle::SetLowBandwidth},
+    {"SetVcoMinThreshold", &VorkelPtrHandle::SetVcoMinThreshold},
+    {"GetVcoFreq", &VorkelPtrHandle::GetVcoFreq},
+    {"GetPLLPkToPkJitter", &VorkelPtrHandle::GetPLLPkToPkJitter},
+    {"GetKRUPkToPkJitter", &VorkelPtrHandle::GetKRUPkToPkJitter},
+    {"GetKRU_CLKGENPkToPkJitter", &VorkelPtrHandle::GetKRU_CLKGENPkToPkJitter},
+    {"GetPLLPhaseError", &VorkelPtrHandle::GetPLLPhaseError},
+    {"GetKRUPhaseError", &VorkelPtrHandle::GetKRUPhaseError},
+    {"GetKRUPeriodPhaseDutyCycle", &VorkelPtrHandle::GetKRUPeriodPhaseDutyCycle},
+    {"GetPLLPeriodPhaseDutyCycle", &VorkelPtrHandle::GetPLLPeriodPhaseDutyCycle},
+    {"GetLatestPhase", &VorkelPtrHandle::GetLatestPhase},
+    {"GetLatestDutyCycle", &VorkelPtrHandle::GetLatestDutyCycle},
+    {"TSYNCalculateActualOutFreqs", &VorkelPtrHandle::TSYNCalculateActualOutFreqs},
+    {"PLLCalculateActualOutFreqs", &VorkelPtrHandle::PLLCalculateActualOutFreqs},
+    {"KruCalculateActuals", &VorkelPtrHandle::KruCalculateActuals},
+    {"KruClkgenCalculateActuals", &VorkelPtrHandle::KruClkgenCalculateActuals},
+    {"GetClosestSolution", &VorkelPtrHandle::GetClosestSolution},
+    {"GetChosenM", &VorkelPtrHandle::GetChosenM},
+    {"GetChosenMInt", &VorkelPtrHandle::GetChosenMInt},
+    {"GetChosenD", &VorkelPtrHandle::GetChosenD},
+    {"GetChosenDiv0", &VorkelPtrHandle::GetChosenDiv0},
+    {"GetChosenDiv0Int", &VorkelPtrHandle::GetChosenDiv0Int},
+    {"GetChosenDivN", &VorkelPtrHandle::GetChosenDivN},
+    {"GetChosenVCO", &VorkelPtrHandle::GetChosenVCO},
+    {"GetChosenOutFreqN", &VorkelPtrHandle::GetChosenOutFreqN},
+    {"GetChosenPhaseN", &VorkelPtrHandle::GetChosenPhaseN},
+    {"GetChosenDutyCycleN", &VorkelPtrHandle::GetChosenDutyCycleN},
+    {"GetKruChosenM", &VorkelPtrHandle::GetKruChosenM},
+    {"GetKruChosenD", &VorkelPtrHandle::GetKruChosenD},
+    {"GetKruChosenPhaseShift", &VorkelPtrHandle::GetKruChosenPhaseShift},
+    {"GetKruChosenPhaseOffset", &VorkelPtrHandle::GetKruChosenPhaseOffset},
+    {"GetKruChosenClkdv", &VorkelPtrHandle::GetKruChosenClkdv},
+    {"GetKruChosenClkfxdv", &VorkelPtrHandle::GetKruChosenClkfxdv},
+    {"GetKruChosenDivBy2", &VorkelPtrHandle::GetKruChosenDivBy2},
+    {"GetKruChosenPinname", &VorkelPtrHandle::GetKruChosenPinname},
+    {"GetKruChosenOutFreqN", &VorkelPtrHandle::GetKruChosenOutFreqN},
+    {"TSYNCalculateActualPhase", &VorkelPtrHandle::TSYNCalculateActualPhase},
+    {"TSYNCalculateActualDutyCycle", &VorkelPtrHandle::TSYNCalculateActualDutyCycle},
+}};
+
+}  // namespace
+
+const std::array<Method, kMethods>& MethodTable() { return methods; }
+
+const Method* FindMethod(std::string_view name) {
+  for (const Method& method : methods) {
+    if (method.name.View() == name) return &method;
+  }
+  return nullptr;
+}
+
+}  // namespace Ip

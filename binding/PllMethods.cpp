@@ -1,0 +1,143 @@
+// The methods that run the PLL/TSYN solver and read what it has chosen.
+
+#include "binding/Call.h"
+#include "engine/Numbers.h"
+#include "engine/pll/Stages.h"
+
+namespace Ip {
+
+namespace {
+
+// The sentences for a run without a solution, for one requested output and for several.
+struct NoSolutionTexts {
+  const char* one;
+  const char* several;
+};
+
+constexpr NoSolutionTexts kTsynTexts = {
+    "Could not obtain valid VCO, M and D values with the requested frequency.",
+    "Could not obtain valid VCO, M and D values with these requested frequencies."};
+constexpr NoSolutionTexts kPllTexts = {
+    "Could not obtain valid VCO, M and D values with the given input freqs and the requested "
+    "frequency.",
+    "Could not obtain valid VCO, M and D values with the given input freqs and the requested "
+    "frequencies."};
+// The closest-solution method does not count its outputs.
+constexpr NoSolutionTexts kClosestTexts = {kPllTexts.several, kPllTexts.several};
+
+const char* ResultText(int code, int count, const NoSolutionTexts& texts) {
+  switch (code) {
+    case Pll::kSolved: return "1";
+    case Pll::kNoSpeedData: return "Could not get data from speedsfile.";
+    case Pll::kEmptyRange:
+      return "Could not obtain a valid VCO because the 2 input clock freqs are too far apart in "
+             "range.";
+    default: return count > 1 ? texts.several : texts.one;
+  }
+}
+
+// The two minimum-power methods: frequency list, both input frequencies, count, the two
+// option flags and the trace flag.
+int CalculateOutFreqs(const Call& call, VorkelImp& imp, int prim, const NoSolutionTexts& texts) {
+  const int count = call.Count(3);
+  const int code =
+      imp.CalculateMinPowerOutFreqs(call.String(0), call.Number(1), call.Number(2), count,
+                                    call.Flag(4), call.Flag(5), prim, call.Flag(6));
+  return call.AnswerText(ResultText(code, count, texts));
+}
+
+}  // namespace
+
+int VorkelPtrHandle::TSYNCalculateActualOutFreqs(int objc, Words objv, Tcl_Interp* interp) {
+  const Call call(objc, objv, interp);
+  VorkelImp* imp = call.Object(
+      *this, 7, "TSYNCalculateActualOutFreqs",
+      "Unable to obtain Implementation object for VorkelPtrHandle::TSYNCalculateActualOutFreq");
+  if (imp == nullptr) return TCL_ERROR;
+  return CalculateOutFreqs(call, *imp, Pll::kTsyn, kTsynTexts);
+}
+
+int VorkelPtrHandle::PLLCalculateActualOutFreqs(int objc, Words objv, Tcl_Interp* interp) {
+  const Call call(objc, objv, interp);
+  VorkelImp* imp = call.Object(
+      *this, 7, "PLLCalculateActualOutFreqs",
+      "Unable to obtain Implementation object for VorkelPtrHandle::PLLCalculateActualOutFreq");
+  if (imp == nullptr) return TCL_ERROR;
+  return CalculateOutFreqs(call, *imp, Pll::kPll, kPllTexts);
+}
+
+// Frequency, phase and duty-cycle lists, both input frequencies, count, the two option flags,
+// the PLL flag and the trace flag.
+int VorkelPtrHandle::GetClosestSolution(int objc, Words objv, Tcl_Interp* interp) {
+  const Call call(objc, objv, interp);
+  VorkelImp* imp = call.Object(*this, 10, "GetClosestSolution");
+  if (imp == nullptr) return TCL_ERROR;
+  const int count = call.Count(5);
+  const int prim = call.Flag(8) ? Pll::kPll : Pll::kTsyn;
+  const int code = imp->GetClosestSolution(call.String(0), call.String(1), call.String(2),
+                                           call.Number(3), call.Number(4), count, call.Flag(6),
+                                           call.Flag(7), prim, call.Flag(9));
+  return call.AnswerText(ResultText(code, count, kClosestTexts));
+}
+
+int VorkelPtrHandle::GetChosenM(int objc, Words objv, Tcl_Interp* interp) {
+  const Call call(objc, objv, interp);
+  const VorkelImp* imp = call.Object(*this, 0, "GetChosenM");
+  return imp == nullptr ? TCL_ERROR : call.Answer("%3.3f", imp->GetChosenM());
+}
+
+int VorkelPtrHandle::GetChosenMInt(int objc, Words objv, Tcl_Interp* interp) {
+  const Call call(objc, objv, interp);
+  const VorkelImp* imp = call.Object(*this, 0, "GetChosenMInt");
+  return imp == nullptr ? TCL_ERROR : call.Answer("%d", TruncateToInt(imp->GetChosenM()));
+}
+
+int VorkelPtrHandle::GetChosenD(int objc, Words objv, Tcl_Interp* interp) {
+  const Call call(objc, objv, interp);
+  const VorkelImp* imp = call.Object(*this, 0, "GetChosenD");
+  return imp == nullptr ? TCL_ERROR : call.Answer("%d", imp->GetChosenD());
+}
+
+int VorkelPtrHandle::GetChosenDiv0(int objc, Words objv, Tcl_Interp* interp) {
+  const Call call(objc, objv, interp);
+  const VorkelImp* imp = call.Object(*this, 0, "GetChosenDiv0");
+  return imp == nullptr ? TCL_ERROR : call.Answer("%3.3f", imp->GetChosenDiv0());
+}
+
+int VorkelPtrHandle::GetChosenDiv0Int(int objc, Words objv, Tcl_Interp* interp) {
+  const Call call(objc, objv, interp);
+  const VorkelImp* imp = call.Object(*this, 0, "GetChosenDiv0Int");
+  return imp == nullptr ? TCL_ERROR : call.Answer("%d", TruncateToInt(imp->GetChosenDiv0()));
+}
+
+int VorkelPtrHandle::GetChosenDivN(int objc, Words objv, Tcl_Interp* interp) {
+  const Call call(objc, objv, interp);
+  const VorkelImp* imp = call.Object(*this, 1, "GetChosenDivN");
+  return imp == nullptr ? TCL_ERROR : call.Answer("%d", imp->GetChosenDivN(call.Count(0)));
+}
+
+int VorkelPtrHandle::GetChosenVCO(int objc, Words objv, Tcl_Interp* interp) {
+  const Call call(objc, objv, interp);
+  const VorkelImp* imp = call.Object(*this, 0, "GetChosenVCO");
+  return imp == nullptr ? TCL_ERROR : call.Answer("%4.3f", imp->GetChosenVCO());
+}
+
+int VorkelPtrHandle::GetChosenOutFreqN(int objc, Words objv, Tcl_Interp* interp) {
+  const Call call(objc, objv, interp);
+  const VorkelImp* imp = call.Object(*this, 1, "GetChosenOutFreqN");
+  return imp == nullptr ? TCL_ERROR : call.Answer("%4.3f", imp->GetChosenOutFreqN(call.Count(0)));
+}
+
+int VorkelPtrHandle::GetChosenPhaseN(int objc, Words objv, Tcl_Interp* interp) {
+  const Call call(objc, objv, interp);
+  const VorkelImp* imp = call.Object(*this, 1, "GetChosenPhaseN");
+  return imp == nullptr ? TCL_ERROR : call.Answer("%4.3f", imp->GetChosenPhaseN(call.Count(0)));
+}
+
+int VorkelPtrHandle::GetChosenDutyCycleN(int objc, Words objv, Tcl_Interp* interp) {
+  const Call call(objc, objv, interp);
+  const VorkelImp* imp = call.Object(*this, 1, "GetChosenDutyCycleN");
+  return imp == nullptr ? TCL_ERROR : call.Answer("%4.3f", imp->GetChosenDutyCycleN(call.Count(0)));
+}
+
+}  // namespace Ip

@@ -1,0 +1,126 @@
+// The implementation object: one for each script handle.
+//
+// It holds the device and its limits, the requests, the state of every solver and the host
+// objects through which speed data and timing figures are reached. Each file of the engine
+// adds the operations of one technique: SpeedData.cpp and LimitLoaders.cpp the device data,
+// ListParsers.cpp the requests, pll/ the PLL and TSYN search. The state is open to them and
+// to their tests; callers outside the engine use the operations.
+//
+// The engine reports failure by result codes and false returns and throws nothing of its own.
+// All calls come from the interpreter's thread.
+#ifndef VORKEL_ENGINE_IP_VORKELIMP_H_
+#define VORKEL_ENGINE_IP_VORKELIMP_H_
+
+#include <cstdint>
+
+#include "engine/DeviceLimits.h"
+#include "engine/Requests.h"
+#include "engine/pll/PllState.h"
+#include "host/Port_StringBase.h"
+
+class Dly_SpeedController;
+class PM_PIC;
+class Tw_BmCMBCalculator;
+struct Tcl_Interp;
+
+namespace Ip {
+
+class VorkelImp {
+ public:
+  // `interp` is the interpreter for which the object is made; it is only kept.
+  explicit VorkelImp(Tcl_Interp* interp);
+  virtual ~VorkelImp();
+  VorkelImp(const VorkelImp&) = delete;
+  VorkelImp& operator=(const VorkelImp&) = delete;
+
+  // --- Device and mode ---------------------------------------------------------------
+
+  // Selects the device by part name. An empty name is ignored. The speed data stay those of
+  // the device that was selected when they were first read.
+  void SetDevice(const Port::StringBase& name);
+
+  // Low-bandwidth mode limits the PFD frequency by `_maxPfdLowB`.
+  void SetLowBandwidth(bool on) { lowBandwidth = on; }
+
+  // --- Requests: engine/ListParsers.cpp ----------------------------------------------
+
+  // Each reads the first `count` numbers of a list separated by blanks into its request list;
+  // text that is no number reads as 0. False, with nothing stored, when the text is empty or
+  // `count` is outside 1 to MAX_OUTPUTS; false, with the numbers before the end stored, when
+  // the list is short. Numbers beyond `count` are ignored.
+  bool ParseOutFreqs(int count, const Port::StringBase& text);   // MHz
+  bool ParsePhases(int count, const Port::StringBase& text);     // degrees
+  bool ParseDutyCycles(int count, const Port::StringBase& text);  // percent
+
+  // --- Speed data: engine/SpeedData.cpp, engine/LimitLoaders.cpp ----------------------
+
+  // True when a speed controller is there, made on first need from the device selected then.
+  bool EnsureSpeedController();
+
+  // One value of the device's speed data: MHz, ns or a count, by keyword. False, with the
+  // reason issued as a message and `value` untouched, when it cannot be read.
+  bool GetSpdKeyValue(Port::StringBase keyword, double* value);
+
+  // Fill the limits from the speed data. Each stops at the first keyword that cannot be read
+  // and returns false; the fields read before it keep their new values.
+  bool LoadPllLimits(int prim);  // 1 PLL, 0 TSYN; false for any other
+  bool LoadKruLimits();
+  bool LoadKruClkgenLimits();
+
+  // --- PLL and TSYN: engine/pll/Driver.cpp --------------------------------------------
+
+  // Finds the configuration with the smallest VCO for `count` output frequencies from the
+  // input clocks `inFreq` and `inFreq2` (MHz; 0: no second input). `prim` is 1 for PLL, 0 for
+  // TSYN. A result code of Pll::ResultCode; nothing is chosen unless it is kSolved.
+  int CalculateMinPowerOutFreqs(const Port::StringBase& outFreqs, double inFreq, double inFreq2,
+                                int count, bool preferMaxVco, bool intDiv0Only, int prim,
+                                bool verbose);
+
+  // The same for frequencies, phases (degrees) and duty cycles (percent); among several
+  // configurations it takes the one whose phases and duty cycles come closest.
+  int GetClosestSolution(const Port::StringBase& outFreqs, const Port::StringBase& phases,
+                         const Port::StringBase& dutyCycles, double inFreq, double inFreq2,
+                         int count, bool preferMaxVco, bool intDiv0Only, int prim, bool verbose);
+
+  // The chosen configuration: engine/pll/ChosenValues.cpp. All answer 0 when none is chosen
+  // and for an output n that they do not have.
+  double GetChosenVCO() const;  // MHz
+  double GetChosenM() const;
+  std::int32_t GetChosenD() const;
+  double GetChosenDiv0() const;
+  std::int32_t GetChosenDivN(int n) const;        // outputs 1 to 6
+  double GetChosenOutFreqN(int n) const;          // MHz
+  double GetChosenPhaseN(int n) const;            // degrees
+  double GetChosenDutyCycleN(int n) const;        // a fraction
+
+  // --- Timing ------------------------------------------------------------------------
+
+  // What the last period query has found: phase in degrees, and duty cycle. 0 before one.
+  double GetLatestPhase() const { return latestPhase; }
+  double GetLatestDutyCycle() const { return latestDutyCycle; }
+
+  // --- State --------------------------------------------------------------------------
+
+  Tw_BmCMBCalculator* cmbCalculator = nullptr;   // owned; replaced by every timing query
+  Dly_SpeedController* speedController = nullptr;  // of the shared-object registry; not owned
+  PM_PIC* pic = nullptr;                         // owned
+  Tcl_Interp* interp;
+  Port::StringBase partName;
+  double latestPhase = 0.0;
+  double latestDutyCycle = 0.0;
+
+  PllLimits pllLimits;
+  KruLimits kruLimits;
+  Requests requests;
+  bool lowBandwidth = false;
+
+  Pll::PllState pll;
+
+  // The primitive of the current PLL/TSYN run: 1 PLL, 0 TSYN, -1 before the first. One value
+  // for the whole process, not for each object; every solver pass sets it.
+  static std::int32_t _prim;
+};
+
+}  // namespace Ip
+
+#endif  // VORKEL_ENGINE_IP_VORKELIMP_H_

@@ -1,0 +1,28 @@
+// The fudge: when the requested output-0 frequency has no solution, the search shifts it, up
+// and down, by 0.001 MHz more in every pass until one is found.
+//
+// Tested by fudge_loop_test.cpp.
+
+#include "engine/pll/Stages.h"
+
+namespace Ip::Pll {
+
+namespace {
+
+constexpr double kFudgeStep = 0.001;       // MHz
+constexpr double kLargestFudge = 10.999;   // MHz; by repeated addition 11000 passes
+
+}  // namespace
+
+bool FudgeLoop(VorkelImp& imp, const Run& run) {
+  double fudge = 0.0;
+  do {
+    if (SolverPass(imp, fudge, run)) return true;
+    fudge += kFudgeStep;
+    TRACE(run.trace, "DLL- NO VALID VCOs found, so upping div0 fudge to %1.3f!\n", fudge);
+  } while (!(fudge > kLargestFudge));
+  TRACE(run.trace, "DLL- NO VALID VCOs found for all possible div0 fudges!\n");
+  return false;
+}
+
+}  // namespace Ip::Pll

@@ -1,0 +1,86 @@
+// The feedback multiplier M and the input divider D of each candidate: the smallest M for
+// which a whole D gives the candidate's VCO and the phase-frequency detector is in its range.
+//
+// Tested by multiplier_search_test.cpp.
+
+#include <cmath>
+
+#include "engine/Numbers.h"
+#include "engine/pll/Stages.h"
+
+namespace Ip::Pll {
+
+namespace {
+
+constexpr int kTrials = 498;  // fractional steps from 1 to 64: 1, 2 and then 62 x 8
+constexpr double kIntegerStep = 1.0;
+constexpr double kFractionalStep = 0.125;
+constexpr double kLargestM = 64.0;
+
+// A TSYN multiplies by 1 or by 5 and more.
+constexpr double kTsynGapBegin = 2.0;
+constexpr double kTsynGapEnd = 5.0;
+
+// D before rounding lies strictly between these; D is at most 80.
+constexpr double kDAbove = 0.5;
+constexpr double kDBelow = 80.5;
+constexpr double kLargestRemainder = 0.0005;  // of D; exclusive
+
+}  // namespace
+
+bool SearchMAndD(VcoCandidate& candidate, double inFreq, double pfdMin, double pfdMax,
+                 bool integerStep, const Trace& trace) {
+  TRACE(trace, "DLL - RK --> _prim = %d \n", VorkelImp::_prim);
+  double m = 1.0;
+  for (int trial = 0; trial < kTrials; ++trial) {
+    if (trial == 1) m = 2.0;
+    if (trial > 1) m += integerStep ? kIntegerStep : kFractionalStep;
+    if (VorkelImp::_prim == kTsyn && m >= kTsynGapBegin && m < kTsynGapEnd) {
+      m = kTsynGapEnd;
+    } else if (m > kLargestM) {
+      return false;
+    }
+    const double realD = inFreq * m / candidate.vco;
+    if (!(realD > kDAbove && realD < kDBelow)) continue;
+    const double pfd = inFreq / realD;
+    if (!(pfd >= pfdMin && pfd <= pfdMax)) continue;
+    const int d = RoundToInt(realD);
+    const double remainder = std::fabs(d - realD);
+    if (!(remainder < kLargestRemainder)) continue;
+
+    candidate.m = m;
+    candidate.d = static_cast<std::uint32_t>(d);
+    if (remainder == 0.0) {
+      TRACE(trace, "DLL-- For VCO = %f: M = %f, D = (float) %f, (int) %d\n", candidate.vco, m,
+            realD, d);
+    } else {
+      TRACE(trace, "DLL-- For VCO = %f: M = %f, D = (float) %f, (int) %d; remainder = %f\n",
+            candidate.vco, m, realD, d, remainder);
+    }
+    return true;
+  }
+  return false;
+}
+
+bool CalculateMAndD(VorkelImp& imp, double inFreq, bool integerStep, const Trace& trace) {
+  VcoCandidateTable& candidates = imp.pll._vcoCandidates;
+  TRACE(trace, "DLL------- Calculating M and D\n");
+  double pfdMax = imp.pllLimits.pfdMax;
+  if (imp.lowBandwidth) {
+    pfdMax = imp.pllLimits._maxPfdLowB;
+    TRACE(trace, "DLL  --- Using _maxPfdLowB (%f) for PFD max\n", pfdMax);
+  }
+  for (const int slot : candidates.Occupied()) {
+    if (!SearchMAndD(candidates[slot], inFreq, imp.pllLimits.pfdMin, pfdMax, integerStep,
+                     trace)) {
+      candidates.Empty(slot);
+    }
+  }
+  if (candidates.Occupied().IsEmpty()) {
+    TRACE(trace, "DLL------------ No valid M and D was found!\n");
+    return false;
+  }
+  return true;
+}
+
+}  // namespace Ip::Pll

@@ -1,0 +1,48 @@
+#include "engine/timing/OutputSteps.h"
+
+#include <cmath>
+
+namespace Ip {
+
+double PhaseStep(double divider) { return 1.0 / (divider * 8.0) * 360.0; }
+
+// The two directions compare differently: upward the best so far against the request,
+// downward the best so far against the new step. Both are meant exactly so.
+double NearestPhaseStep(double phase, double step, bool positive) {
+  if (phase == 0.0 || step == 0.0) return 0.0;
+  double best = 0.0;
+  for (int k = 0; k * step <= 360.0; ++k) {
+    const double candidate = positive ? k * step : k * step - 360.0;
+    if (candidate == phase) return candidate;
+    if (k == 0) best = candidate;
+    const double bestDistance =
+        positive ? std::fabs(best - phase) : std::fabs(candidate - best);
+    if (bestDistance >= std::fabs(candidate - phase)) best = candidate;
+  }
+  return best;
+}
+
+// The steps add up one by one, and their rounding errors with them, as the comparisons with
+// the request and with the upper end expect.
+double NearestDutyCycle(double percent, double divider, double maxHighLowCount) {
+  if (percent == 0.0 || divider == 0.0) return 0.0;
+  if (divider == 1.0) return 0.5;
+  const double requested = percent / 100.0;
+  double lowest = 1.0 / divider;
+  double highest = (divider - 0.5) / divider;
+  if (divider > maxHighLowCount) {
+    lowest = (divider - maxHighLowCount) / divider;
+    highest = (maxHighLowCount + 0.5) / divider;
+  }
+  if (highest > 1.0) highest = 1.0;
+  const double step = 0.5 / divider;
+  if (highest < lowest) return 0.0;
+  double best = lowest;
+  for (double duty = lowest; duty <= highest; duty += step) {
+    if (duty == requested) return duty;
+    if (std::fabs(best - requested) >= std::fabs(duty - requested)) best = duty;
+  }
+  return best;
+}
+
+}  // namespace Ip
