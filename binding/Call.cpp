@@ -74,4 +74,8 @@ int Call::Fail(const char* message) const {
   return TCL_ERROR;
 }
 
+int Call::AnswerQuery(bool answered, double figure, const Port::StringBase& error) const {
+  return answered ? Answer("%3.3f", figure) : Fail(error.CStr());
+}
+
 }  // namespace Ip

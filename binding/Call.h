@@ -40,6 +40,9 @@ class Call {
   // Sets the result of a method that has failed and returns TCL_ERROR.
   int Fail(const char* message) const;
 
+  // The answer of a calculator query: its figure in the usual format, or its error text.
+  int AnswerQuery(bool answered, double figure, const Port::StringBase& error) const;
+
  private:
   int objc_;
   Words objv_;

@@ -1,73 +1,115 @@
-// The methods that run the KRU solvers and read what they have chosen.
+// The methods that run the KRU_SP and KRU_CLKGEN solvers and read what they have chosen.
 
 #include "binding/Call.h"
+#include "engine/kru/Stages.h"
 
 namespace Ip {
 
-int VorkelPtrHandle::KruCalculateActuals(int objc, Words objv, Tcl_Interp* interp) {
-  const Call call(objc, objv, interp);
-  if (call.Object(*this, 6, "KruCalculateActuals") == nullptr) return TCL_ERROR;
-  return call.Fail("KruCalculateActuals: not available.");
+namespace {
+
+// The sentences for a run without a configuration, for one requested output and for any other
+// number of them.
+struct NoConfigurationTexts {
+  const char* one;
+  const char* several;
+};
+
+constexpr NoConfigurationTexts kKruTexts = {
+    "The KRU_SP cannot support the requested output frequency and phase.",
+    "The KRU_SP cannot support the requested output frequencies and phases."};
+constexpr NoConfigurationTexts kKruClkgenTexts = {
+    "The KRU_CLKGEN cannot support the requested output frequency and phase.",
+    "The KRU_CLKGEN cannot support the requested output frequencies and phases."};
+
+const char* ResultText(int code, int numOut, const NoConfigurationTexts& texts) {
+  switch (code) {
+    case Kru::kSolved: return "1";
+    case Kru::kNoSpeedData: return "Could not get data from speedsfile.";
+    case Kru::kNoConfiguration: return numOut == 1 ? texts.one : texts.several;
+    default: return "";
+  }
 }
 
+}  // namespace
+
+// Frequency and phase lists, input frequency, number of outputs, feedback and trace flags.
+int VorkelPtrHandle::KruCalculateActuals(int objc, Words objv, Tcl_Interp* interp) {
+  const Call call(objc, objv, interp);
+  VorkelImp* imp = call.Object(*this, 6, "KruCalculateActuals");
+  if (imp == nullptr) return TCL_ERROR;
+  const int numOut = call.Count(3);
+  const int code = imp->KruCalculateActuals(call.String(0), call.String(1), call.Number(2),
+                                            numOut, call.Flag(4), call.Flag(5));
+  return call.AnswerText(ResultText(code, numOut, kKruTexts));
+}
+
+// Frequency and phase lists, input frequency, number of outputs and trace flag.
 int VorkelPtrHandle::KruClkgenCalculateActuals(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
-  if (call.Object(*this, 5, "KruClkgenCalculateActuals") == nullptr) return TCL_ERROR;
-  return call.Fail("KruClkgenCalculateActuals: not available.");
+  VorkelImp* imp = call.Object(*this, 5, "KruClkgenCalculateActuals");
+  if (imp == nullptr) return TCL_ERROR;
+  const int numOut = call.Count(3);
+  const int code = imp->KruClkgenCalculateActuals(call.String(0), call.String(1),
+                                                  call.Number(2), numOut, call.Flag(4));
+  return call.AnswerText(ResultText(code, numOut, kKruClkgenTexts));
 }
 
 int VorkelPtrHandle::GetKruChosenM(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
-  if (call.Object(*this, 0, "GetKruChosenM") == nullptr) return TCL_ERROR;
-  return call.Fail("GetKruChosenM: not available.");
+  const VorkelImp* imp = call.Object(*this, 0, "GetKruChosenM");
+  return imp == nullptr ? TCL_ERROR : call.Answer("%d", imp->GetKruChosenM());
 }
 
 int VorkelPtrHandle::GetKruChosenD(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
-  if (call.Object(*this, 0, "GetKruChosenD") == nullptr) return TCL_ERROR;
-  return call.Fail("GetKruChosenD: not available.");
+  const VorkelImp* imp = call.Object(*this, 0, "GetKruChosenD");
+  return imp == nullptr ? TCL_ERROR : call.Answer("%d", imp->GetKruChosenD());
 }
 
 int VorkelPtrHandle::GetKruChosenPhaseShift(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
-  if (call.Object(*this, 0, "GetKruChosenPhaseShift") == nullptr) return TCL_ERROR;
-  return call.Fail("GetKruChosenPhaseShift: not available.");
+  const VorkelImp* imp = call.Object(*this, 0, "GetKruChosenPhaseShift");
+  return imp == nullptr ? TCL_ERROR : call.Answer("%d", imp->GetKruChosenPhaseShift());
 }
 
 int VorkelPtrHandle::GetKruChosenPhaseOffset(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
-  if (call.Object(*this, 0, "GetKruChosenPhaseOffset") == nullptr) return TCL_ERROR;
-  return call.Fail("GetKruChosenPhaseOffset: not available.");
+  const VorkelImp* imp = call.Object(*this, 0, "GetKruChosenPhaseOffset");
+  return imp == nullptr ? TCL_ERROR : call.Answer("%3.3f", imp->GetKruChosenPhaseOffset());
 }
 
+// CLKDV and CLKFXDV are one value, which the two methods write differently.
 int VorkelPtrHandle::GetKruChosenClkdv(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
-  if (call.Object(*this, 0, "GetKruChosenClkdv") == nullptr) return TCL_ERROR;
-  return call.Fail("GetKruChosenClkdv: not available.");
+  const VorkelImp* imp = call.Object(*this, 0, "GetKruChosenClkdv");
+  return imp == nullptr ? TCL_ERROR : call.Answer("%2.1f", imp->GetKruChosenClkdv());
 }
 
 int VorkelPtrHandle::GetKruChosenClkfxdv(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
-  if (call.Object(*this, 0, "GetKruChosenClkfxdv") == nullptr) return TCL_ERROR;
-  return call.Fail("GetKruChosenClkfxdv: not available.");
+  const VorkelImp* imp = call.Object(*this, 0, "GetKruChosenClkfxdv");
+  return imp == nullptr ? TCL_ERROR : call.Answer("%2.0f", imp->GetKruChosenClkfxdv());
 }
 
 int VorkelPtrHandle::GetKruChosenDivBy2(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
-  if (call.Object(*this, 0, "GetKruChosenDivBy2") == nullptr) return TCL_ERROR;
-  return call.Fail("GetKruChosenDivBy2: not available.");
+  const VorkelImp* imp = call.Object(*this, 0, "GetKruChosenDivBy2");
+  if (imp == nullptr) return TCL_ERROR;
+  return call.AnswerText(imp->GetKruChosenDivBy2() ? "true" : "false");
 }
 
 int VorkelPtrHandle::GetKruChosenPinname(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
-  if (call.Object(*this, 1, "GetKruChosenPinname") == nullptr) return TCL_ERROR;
-  return call.Fail("GetKruChosenPinname: not available.");
+  const VorkelImp* imp = call.Object(*this, 1, "GetKruChosenPinname");
+  if (imp == nullptr) return TCL_ERROR;
+  return call.AnswerText(imp->GetKruChosenPinname(call.Count(0)).CStr());
 }
 
 int VorkelPtrHandle::GetKruChosenOutFreqN(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
-  if (call.Object(*this, 2, "GetKruChosenOutFreqN") == nullptr) return TCL_ERROR;
-  return call.Fail("GetKruChosenOutFreqN: not available.");
+  const VorkelImp* imp = call.Object(*this, 2, "GetKruChosenOutFreqN");
+  if (imp == nullptr) return TCL_ERROR;
+  return call.Answer("%4.3f", imp->GetKruChosenOutFreqN(call.Number(0), call.Count(1)));
 }
 
 }  // namespace Ip

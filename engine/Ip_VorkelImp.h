@@ -3,7 +3,7 @@
 // It holds the device and its limits, the requests, the state of every solver and the host
 // objects through which speed data and timing figures are reached. Each file of the engine
 // adds the operations of one technique: SpeedData.cpp and LimitLoaders.cpp the device data,
-// ListParsers.cpp the requests, pll/ the PLL and TSYN search. The state is open to them and
+// ListParsers.cpp the requests, pll/ the PLL and TSYN search, kru/ and kru_clkgen/ the KRUs. The state is open to them and
 // to their tests; callers outside the engine use the operations.
 //
 // The engine reports failure by result codes and false returns and throws nothing of its own.
@@ -15,6 +15,7 @@
 
 #include "engine/DeviceLimits.h"
 #include "engine/Requests.h"
+#include "engine/kru/KruState.h"
 #include "engine/pll/PllState.h"
 #include "host/Port_StringBase.h"
 
@@ -53,6 +54,10 @@ class VorkelImp {
   bool ParseDutyCycles(int count, const Port::StringBase& text);  // percent
 
   // --- Speed data: engine/SpeedData.cpp, engine/LimitLoaders.cpp ----------------------
+
+  // Asks the host for the calculator of the device. False, with a message issued, when there
+  // is none. engine/timing/Calculator.cpp.
+  bool ObtainCalculator();
 
   // True when a speed controller is there, made on first need from the device selected then.
   bool EnsureSpeedController();
@@ -93,11 +98,68 @@ class VorkelImp {
   double GetChosenPhaseN(int n) const;            // degrees
   double GetChosenDutyCycleN(int n) const;        // a fraction
 
-  // --- Timing ------------------------------------------------------------------------
+  // --- KRU_SP and KRU_CLKGEN: engine/kru/Driver.cpp, engine/kru_clkgen/Driver.cpp -------
 
-  // What the last period query has found: phase in degrees, and duty cycle. 0 before one.
+  // Finds pins and settings of a KRU_SP for `numOut` output frequencies and phases (degrees)
+  // from `inFreq` (MHz). A result code of Kru::ResultCode.
+  int KruCalculateActuals(const Port::StringBase& outFreqs, const Port::StringBase& phases,
+                          double inFreq, int numOut, bool feedbackUsed, bool verbose);
+
+  // The same for a KRU_CLKGEN. It works with the CLKFX and CLKFXDV limits as they stand, and so
+  // never answers kNoSpeedData.
+  int KruClkgenCalculateActuals(const Port::StringBase& outFreqs, const Port::StringBase& phases,
+                                double inFreq, int numOut, bool verbose);
+
+  // The chosen configuration: engine/kru/ChosenValues.cpp.
+  std::int32_t GetKruChosenM() const { return kru._kruChosenM; }
+  std::int32_t GetKruChosenD() const { return kru._kruChosenD; }
+  bool GetKruChosenDivBy2() const { return kru._kruChosenDivBy2; }
+  double GetKruChosenPhaseOffset() const { return kru._kruPhaseOffset; }  // degrees
+  int GetKruChosenPhaseShift() const;
+  double GetKruChosenClkdv() const { return kru._kruChosenClkdv; }    // CLKDV divide; 0: none
+  double GetKruChosenClkfxdv() const { return kru._kruChosenClkdv; }  // DV; the same value
+  // The pin of output n; "NONE" outside 0 to 6. Index 6 is the first entry of
+  // _kruPinsDivBy2T: scripts read it so.
+  Port::StringBase GetKruChosenPinname(int n) const;
+  // The frequency of output n (MHz, index 6 as above) from an input frequency in MHz; 0 where
+  // there is none.
+  double GetKruChosenOutFreqN(double inputFreq, int n) const;
+
+  // --- Timing: engine/timing/ ----------------------------------------------------------
+
+  // Queries of the host's calculator. It is asked for anew by each; without one, a message is
+  // issued, the error text stays empty and the answer is false. The arguments go to it unread,
+  // and its answer, error text and figure come back as they are.
+  bool GetVcoFreq(double a1, double a2, double a3, double a4, Port::StringBase* error,
+                  double* frequency);
+  bool GetPLLPkToPkJitter(double a1, double a2, double a3, const Port::StringBase& t4, double a5,
+                          double a6, Port::StringBase* error, double* jitter);
+  bool GetKruPkToPkJitter(double a1, const Port::StringBase& pin, bool isKruClkgen, bool f1,
+                          bool f2, bool f3, double a2, double a3, Port::StringBase* error,
+                          double* jitter);
+  bool GetKRUPhaseError(Port::StringBase* error, double* phaseError);
+  bool GetPLLPhaseError(double a1, double a2, const Port::StringBase& t3,
+                        Port::StringBase* error, double* phaseError);
+
+  // The period queries keep phase and duty cycle for the accessors below. The phase comes back
+  // in degrees: that of a KRU is turned from a fraction of a cycle, and kept truncated to whole
+  // degrees; that of a PLL or TSYN stays as the calculator gives it.
+  bool GetKRUPeriodPhaseDutyCycle(double a1, const Port::StringBase& pin, bool f1, double a2,
+                                  double a3, double a4, Port::StringBase* error, double* period,
+                                  double* phase, double* dutyCycle);
+  bool GetPLLPeriodPhaseDutyCycle(double a1, double a2, double a3, double a4, double a5,
+                                  double a6, double a7, Port::StringBase* error, double* period,
+                                  double* phase, double* dutyCycle);
+
+  // What the last successful period query has kept. 0 before one.
   double GetLatestPhase() const { return latestPhase; }
   double GetLatestDutyCycle() const { return latestDutyCycle; }
+
+  // The phase (degrees) or duty cycle (a fraction) that a TSYN output divider makes of a
+  // requested phase (degrees) or duty cycle (percent); 0 where there is none. The flag of the
+  // phase has no effect.
+  double TSYNCalculateActualPhase(const double* phase, const double* divider, bool flag) const;
+  double TSYNCalculateActualDutyCycle(const double* dutyCycle, const double* divider) const;
 
   // --- State --------------------------------------------------------------------------
 
@@ -115,6 +177,7 @@ class VorkelImp {
   bool lowBandwidth = false;
 
   Pll::PllState pll;
+  KruState kru;
 
   // The primitive of the current PLL/TSYN run: 1 PLL, 0 TSYN, -1 before the first. One value
   // for the whole process, not for each object; every solver pass sets it.

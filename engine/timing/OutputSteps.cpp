@@ -7,7 +7,7 @@ namespace Ip {
 double PhaseStep(double divider) { return 1.0 / (divider * 8.0) * 360.0; }
 
 // The two directions compare differently: upward the best so far against the request,
-// downward the best so far against the new step. Both are meant exactly so.
+// downward the best so far against the multiple at hand. Both are meant exactly so.
 double NearestPhaseStep(double phase, double step, bool positive) {
   if (phase == 0.0 || step == 0.0) return 0.0;
   double best = 0.0;
@@ -22,12 +22,7 @@ double NearestPhaseStep(double phase, double step, bool positive) {
   return best;
 }
 
-// The steps add up one by one, and their rounding errors with them, as the comparisons with
-// the request and with the upper end expect.
-double NearestDutyCycle(double percent, double divider, double maxHighLowCount) {
-  if (percent == 0.0 || divider == 0.0) return 0.0;
-  if (divider == 1.0) return 0.5;
-  const double requested = percent / 100.0;
+DutyRange DutyRangeOf(double divider, double maxHighLowCount) {
   double lowest = 1.0 / divider;
   double highest = (divider - 0.5) / divider;
   if (divider > maxHighLowCount) {
@@ -35,14 +30,25 @@ double NearestDutyCycle(double percent, double divider, double maxHighLowCount) 
     highest = (maxHighLowCount + 0.5) / divider;
   }
   if (highest > 1.0) highest = 1.0;
-  const double step = 0.5 / divider;
-  if (highest < lowest) return 0.0;
-  double best = lowest;
-  for (double duty = lowest; duty <= highest; duty += step) {
+  return {lowest, highest, 0.5 / divider};
+}
+
+// The rounding errors of the additions add up, too, as the comparisons with the request and
+// with the upper end expect.
+double NearestDutyStep(double requested, const DutyRange& range) {
+  if (range.highest < range.lowest) return 0.0;
+  double best = range.lowest;
+  for (double duty = range.lowest; duty <= range.highest; duty += range.step) {
     if (duty == requested) return duty;
     if (std::fabs(best - requested) >= std::fabs(duty - requested)) best = duty;
   }
   return best;
+}
+
+double NearestDutyCycle(double percent, double divider, double maxHighLowCount) {
+  if (percent == 0.0 || divider == 0.0) return 0.0;
+  if (divider == 1.0) return 0.5;
+  return NearestDutyStep(percent / 100.0, DutyRangeOf(divider, maxHighLowCount));
 }
 
 }  // namespace Ip

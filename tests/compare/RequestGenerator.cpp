@@ -1,8 +1,8 @@
 #include "tests/compare/RequestGenerator.h"
 
-#include <array>
 #include <cmath>
-#include <cstdio>
+#include <cstdlib>
+#include <vector>
 
 namespace compare {
 
@@ -17,12 +17,6 @@ const std::vector<double> kOutputs = {4,     5,     6.25,   8,      10,    12,  
                                       65,    66,    66.667, 74.25,  75,    80,    99.5,   100,
                                       108,   125,   133.333, 148.5, 150,   155.52, 156.25, 175,
                                       200,   222.2, 250,    297,    300,   312.5, 333,    400};
-
-std::string Number(const char* format, double value) {
-  std::array<char, 400> text;
-  std::snprintf(text.data(), text.size(), format, value);
-  return text.data();
-}
 
 // A frequency as people or programs write it.
 std::string Frequency(double value, Random& random) {
