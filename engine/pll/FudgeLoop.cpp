@@ -3,6 +3,9 @@
 //
 // Tested by fudge_loop_test.cpp.
 
+#include <optional>
+
+#include "engine/pll/PassFilter.h"
 #include "engine/pll/Stages.h"
 
 namespace Ip::Pll {
@@ -16,11 +19,21 @@ constexpr double kLargestFudge = 10.999;   // MHz; by repeated addition 11000 pa
 
 bool FudgeLoop(VorkelImp& imp, const Run& run) {
   double fudge = 0.0;
-  do {
-    if (SolverPass(imp, fudge, run)) return true;
+  if (SolverPass(imp, fudge, run)) return true;
+  // The filter knows which of the other passes are worth running. With a trace all of them
+  // run, since each has its lines.
+  std::optional<PassFilter> filter;
+  if (!run.trace.On()) {
+    filter.emplace(imp, run, kFudgeStep);
+    if (filter->IsHopeless()) return false;
+  }
+  for (;;) {
     fudge += kFudgeStep;
     TRACE(run.trace, "DLL- NO VALID VCOs found, so upping div0 fudge to %1.3f!\n", fudge);
-  } while (!(fudge > kLargestFudge));
+    if (fudge > kLargestFudge) break;
+    if (filter && !filter->MaySucceed(fudge)) continue;
+    if (SolverPass(imp, fudge, run)) return true;
+  }
   TRACE(run.trace, "DLL- NO VALID VCOs found for all possible div0 fudges!\n");
   return false;
 }

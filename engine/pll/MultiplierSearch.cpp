@@ -3,6 +3,8 @@
 //
 // Tested by multiplier_search_test.cpp.
 
+#include "engine/pll/MultiplierSearch.h"
+
 #include <cmath>
 
 #include "engine/Numbers.h"
@@ -15,16 +17,6 @@ namespace {
 constexpr int kTrials = 498;  // fractional steps from 1 to 64: 1, 2 and then 62 x 8
 constexpr double kIntegerStep = 1.0;
 constexpr double kFractionalStep = 0.125;
-constexpr double kLargestM = 64.0;
-
-// A TSYN multiplies by 1 or by 5 and more.
-constexpr double kTsynGapBegin = 2.0;
-constexpr double kTsynGapEnd = 5.0;
-
-// D before rounding lies strictly between these; D is at most 80.
-constexpr double kDAbove = 0.5;
-constexpr double kDBelow = 80.5;
-constexpr double kLargestRemainder = 0.0005;  // of D; exclusive
 
 }  // namespace
 
@@ -65,9 +57,8 @@ bool SearchMAndD(VcoCandidate& candidate, double inFreq, double pfdMin, double p
 bool CalculateMAndD(VorkelImp& imp, double inFreq, bool integerStep, const Trace& trace) {
   VcoCandidateTable& candidates = imp.pll._vcoCandidates;
   TRACE(trace, "DLL------- Calculating M and D\n");
-  double pfdMax = imp.pllLimits.pfdMax;
+  const double pfdMax = PfdMaximum(imp);
   if (imp.lowBandwidth) {
-    pfdMax = imp.pllLimits._maxPfdLowB;
     TRACE(trace, "DLL  --- Using _maxPfdLowB (%f) for PFD max\n", pfdMax);
   }
   for (const int slot : candidates.Occupied()) {

@@ -1,8 +1,16 @@
 // The dividers of outputs 1 and later: whole numbers, found for each candidate within a
 // relative tolerance that starts at 0 for every output and widens until a candidate has one.
 //
+// The divider of a candidate does not depend on the tolerance, so one evaluation tells the
+// narrowest tolerance that the candidate keeps; the candidates that keep the narrowest of all
+// are those that the widening would stop at.
+//
 // Tested by output_dividers_test.cpp.
 
+#include "engine/pll/OutputDividers.h"
+
+#include <algorithm>
+#include <array>
 #include <cmath>
 
 #include "engine/Numbers.h"
@@ -15,65 +23,97 @@ namespace {
 constexpr double kSmallestDivider = 1.0;
 constexpr double kLargestDivider = 128.0;
 constexpr double kToleranceStep = 0.01;  // a fraction of the requested frequency
-constexpr int kTolerances = 27;          // 0.00, 0.01, ... 0.26
 
-// The highest frequency of output n. Output 1 of a PLL may drive an I/O clock, which goes
-// higher; that the others may not is meant so.
-double OutputMaximum(const PllLimits& limits, int n) {
-  return VorkelImp::_prim == kPll && n == 1 ? limits.clkoutMaxIo : limits.clkoutMax;
-}
-
-// Tries output n on one candidate; on success stores its divider.
-bool TryDivider(VcoCandidate& candidate, int n, double requested, double tolerance,
-                const PllLimits& limits, const Trace& trace) {
-  double ratio = candidate.vco / requested;
-  if (ratio < kSmallestDivider) ratio = kSmallestDivider;
-  if (ratio > kLargestDivider) ratio = kLargestDivider;
-  const int divider = RoundToInt(ratio);
-  const double actual = candidate.vco / divider;
-  const double diff = std::fabs(actual - requested);
-  // Written so that a NaN, which a request can be, fails.
-  if (!(diff / requested <= tolerance)) return false;
-  if (!(actual >= limits.clkoutMin && actual <= OutputMaximum(limits, n))) return false;
-
-  const auto output = static_cast<std::size_t>(n);
-  candidate.divN[output] = static_cast<std::uint32_t>(divider);
-  candidate.freqDiff[output] = diff;
-  if (diff == 0.0) {
-    TRACE(trace, "DLL ---------- for VCO = %f: div%d = %d\n", candidate.vco, n, divider);
-  } else {
-    TRACE(trace, "DLL ---------- for VCO = %f: div%d = %d (diff = %1.3f)\n", candidate.vco, n,
-          divider, diff);
+// The tolerances, and the one that comes after the last.
+constexpr std::array<double, kTolerances + 1> MakeTolerances() {
+  std::array<double, kTolerances + 1> tolerances{};
+  double tolerance = 0.0;
+  for (double& entry : tolerances) {
+    entry = tolerance;
+    tolerance += kToleranceStep;
   }
-  return true;
+  return tolerances;
+}
+constexpr std::array<double, kTolerances + 1> kToleranceValues = MakeTolerances();
+
+// The first tolerance that `error` is not above, or kTolerances; that, too, for a NaN, which a
+// request can be.
+int FirstTolerance(double error) {
+  if (!(error <= kToleranceValues[kTolerances - 1])) return kTolerances;
+  // The quotient may be one off; begin before it.
+  int index = error > 0.0 ? std::max(static_cast<int>(error / kToleranceStep) - 1, 0) : 0;
+  while (!(error <= kToleranceValues[static_cast<std::size_t>(index)])) ++index;
+  return index;
 }
 
 // Keeps the candidates that serve output n at the smallest tolerance at which any does.
 bool FindDivider(VorkelImp& imp, int n, const Trace& trace) {
+  const auto output = static_cast<std::size_t>(n);
   VcoCandidateTable& candidates = imp.pll._vcoCandidates;
-  const double requested = imp.requests.reqOutFreq[static_cast<std::size_t>(n)];
+  const double requested = imp.requests.reqOutFreq[output];
+  const OutputRange range = RangeOfOutput(imp.pllLimits, n);
   TRACE(trace, "DLL----- Looking for valid div%d from remaining VCOs\n", n);
-  double tolerance = 0.0;
-  for (int retries = 0; retries < kTolerances; ++retries) {
-    VcoCandidateTable::Slots qualified;
-    for (const int slot : candidates.Occupied()) {
-      if (TryDivider(candidates[slot], n, requested, tolerance, imp.pllLimits, trace)) {
-        qualified.Insert(slot);
-      }
+
+  int narrowest = kTolerances;
+  VcoCandidateTable::Slots qualified;
+  for (const int slot : candidates.Occupied()) {
+    VcoCandidate& candidate = candidates[slot];
+    const OutputFit fit = FitOutput(candidate.vco, requested, range);
+    if (fit.tolerance == kTolerances || fit.tolerance > narrowest) continue;
+    if (fit.tolerance < narrowest) {
+      narrowest = fit.tolerance;
+      qualified.Clear();
     }
-    if (!qualified.IsEmpty()) {
-      candidates.KeepOnly(qualified);
-      return true;
-    }
-    tolerance += kToleranceStep;
-    TRACE(trace, "DLL------ Can't find a clkout%d_divide, so upping threshold to %1.3f!\n", n,
-          tolerance);
+    candidate.divN[output] = static_cast<std::uint32_t>(fit.divider);
+    candidate.freqDiff[output] = fit.diff;
+    qualified.Insert(slot);
   }
-  TRACE(trace, "DLL-- Can't find a clkout%d_divide for all possible thresholds!\n", n);
-  return false;
+
+  for (int tolerance = 0; tolerance < narrowest; ++tolerance) {
+    TRACE(trace, "DLL------ Can't find a clkout%d_divide, so upping threshold to %1.3f!\n", n,
+          kToleranceValues[static_cast<std::size_t>(tolerance) + 1]);
+  }
+  if (narrowest == kTolerances) {
+    TRACE(trace, "DLL-- Can't find a clkout%d_divide for all possible thresholds!\n", n);
+    return false;
+  }
+  candidates.KeepOnly(qualified);
+  if (!trace.On()) return true;
+  for (const int slot : qualified) {
+    const VcoCandidate& candidate = candidates[slot];
+    const double diff = candidate.freqDiff[output];
+    if (diff == 0.0) {
+      trace.Print("DLL ---------- for VCO = %f: div%d = %u\n", candidate.vco, n,
+                  candidate.divN[output]);
+    } else {
+      trace.Print("DLL ---------- for VCO = %f: div%d = %u (diff = %1.3f)\n", candidate.vco, n,
+                  candidate.divN[output], diff);
+    }
+  }
+  return true;
 }
 
 }  // namespace
+
+double LargestTolerance() { return kToleranceValues[kTolerances - 1]; }
+
+// Output 1 of a PLL may drive an I/O clock, which goes higher; that the others may not is
+// meant so.
+OutputRange RangeOfOutput(const PllLimits& limits, int n) {
+  const bool ioClock = VorkelImp::_prim == kPll && n == 1;
+  return {limits.clkoutMin, ioClock ? limits.clkoutMaxIo : limits.clkoutMax};
+}
+
+OutputFit FitOutput(double vco, double requested, const OutputRange& range) {
+  double ratio = vco / requested;
+  if (ratio < kSmallestDivider) ratio = kSmallestDivider;
+  if (ratio > kLargestDivider) ratio = kLargestDivider;
+  const int divider = RoundToInt(ratio);
+  const double actual = vco / divider;
+  const double diff = std::fabs(actual - requested);
+  const bool inRange = actual >= range.min && actual <= range.max;
+  return {divider, diff, inRange ? FirstTolerance(diff / requested) : kTolerances};
+}
 
 bool FindOutputDividers(VorkelImp& imp, int count, const Trace& trace) {
   for (int n = 1; n < count; ++n) {

@@ -12,11 +12,6 @@ namespace {
 // Outputs from which a TSYN has only whole dividers on output 0.
 constexpr int kOutputsWithIntegerDiv0 = 6;
 
-bool IntegerDiv0(const VorkelImp& imp, const Run& run) {
-  if (run.prim == kPll) return true;
-  return run.prim == kTsyn && (run.count >= kOutputsWithIntegerDiv0 || imp.pll._intDiv0Only);
-}
-
 // The valid VCOs: the candidates that have an M and a D. An upward attempt that ended before
 // the M and D search leaves candidates without them in the table; they do not count.
 int CountValidVcos(const VcoCandidateTable& candidates) {
@@ -59,12 +54,17 @@ const VcoCandidate* Choose(VorkelImp& imp, const Run& run) {
 
 }  // namespace
 
+bool HasIntegerDiv0(const VorkelImp& imp, const Run& run) {
+  if (run.prim == kPll) return true;
+  return run.prim == kTsyn && (run.count >= kOutputsWithIntegerDiv0 || imp.pll._intDiv0Only);
+}
+
 bool SolverPass(VorkelImp& imp, double fudge, const Run& run) {
   PllState& pll = imp.pll;
   pll._vcoCandidates.EmptyAll();
   pll.chosen = nullptr;
   VorkelImp::_prim = run.prim;
-  const bool integerDiv0 = IntegerDiv0(imp, run);
+  const bool integerDiv0 = HasIntegerDiv0(imp, run);
 
   // The table is not emptied between the attempts: what the upward one has left takes part in
   // the downward one. With a fudge of 0 there is nothing to enumerate downward, and the second

@@ -84,7 +84,12 @@ const VcoCandidate* SelectPhaseSolution(VorkelImp& imp, const Run& run);
 // True when it has chosen a candidate.
 bool SolverPass(VorkelImp& imp, double fudge, const Run& run);
 
-// FudgeLoop.cpp: passes with fudges 0.000, 0.001, ... 10.999 MHz until one succeeds.
+// SolverPass.cpp: true when output 0 has whole dividers only: on a PLL, and on a TSYN with six
+// or more outputs or when the caller forces it.
+bool HasIntegerDiv0(const VorkelImp& imp, const Run& run);
+
+// FudgeLoop.cpp: passes with fudges 0.000, 0.001, ... 10.999 MHz until one succeeds. Without a
+// trace, passes that fail for certain (PassFilter.h) are left out.
 bool FudgeLoop(VorkelImp& imp, const Run& run);
 
 // ChosenValues.cpp: prints the chosen configuration.

@@ -4,17 +4,10 @@
 // Tested by vco_enumeration_test.cpp.
 
 #include "engine/Numbers.h"
+#include "engine/pll/Div0Steps.h"
 #include "engine/pll/Stages.h"
 
 namespace Ip::Pll {
-
-namespace {
-
-constexpr double kLargestDivider = 128.0;
-constexpr double kIntegerStep = 1.0;
-constexpr double kFractionalStep = 0.125;
-
-}  // namespace
 
 // Output 0 itself is not held against the output limits; only the VCO range bounds it.
 int EnumerateVcoCandidates(VorkelImp& imp, double reqOutFreq0, double fudge, bool integerDiv0,
@@ -23,17 +16,18 @@ int EnumerateVcoCandidates(VorkelImp& imp, double reqOutFreq0, double fudge, boo
   TRACE(trace, "DLL--- Using fudged oFreq = %3.3f (ofreq: %3.3f, fudge: %2.3f)\n",
         reqOutFreq0 + fudge, reqOutFreq0, fudge);
   int created = 0;
-  double divider = 1.0;
-  for (int slot = 0; slot < MAX_VCO_CANDIDATES; ++slot) {
-    // Nothing lies between 1 and 2: the first step is a whole one in either mode.
-    if (slot == 1) divider = 2.0;
-    if (slot > 1) divider += integerDiv0 ? kIntegerStep : kFractionalStep;
-    if (divider > kLargestDivider) break;
-    const double vco = (fudge + reqOutFreq0) * divider;
-    if (!(pll.minAdjVco <= vco && vco <= pll.maxAdjVco)) continue;
-    const double div0 = integerDiv0 ? RoundToInt(divider) : divider;
+  const double outFreq0 = fudge + reqOutFreq0;
+  const Div0Steps steps(integerDiv0);
+  for (int slot = steps.FirstWorthTrying(outFreq0, pll.minAdjVco); slot < steps.Count(); ++slot) {
+    const double step = steps[slot];
+    const double vco = outFreq0 * step;
+    if (!(pll.minAdjVco <= vco && vco <= pll.maxAdjVco)) {
+      if (vco > pll.maxAdjVco && outFreq0 > 0.0) break;  // and so are all that follow
+      continue;
+    }
+    const double div0 = integerDiv0 ? RoundToInt(step) : step;
     TRACE(trace, "DLL----- Found valid VCO = %4.3f and div0 = %3.3f (ofreq0_fudge = %1.3f)\n",
-          vco, divider, fudge);
+          vco, step, fudge);
     pll._vcoCandidates.Put(slot, vco, div0);
     ++created;
   }

@@ -1,0 +1,44 @@
+// The divider steps of output 0: 1, 2, 3, ... 128, or in fractional mode 1, 2, 2.125, ... 128.
+// Nothing lies between 1 and 2 in either mode.
+//
+// Tested by vco_enumeration_test.cpp.
+#ifndef VORKEL_ENGINE_PLL_DIV0STEPS_H_
+#define VORKEL_ENGINE_PLL_DIV0STEPS_H_
+
+#include <algorithm>
+
+#include "engine/pll/VcoCandidate.h"
+
+namespace Ip::Pll {
+
+class Div0Steps {
+ public:
+  explicit Div0Steps(bool integer) : width_(integer ? 1.0 : 0.125) {}
+
+  // The number of steps; step i belongs to slot i of the candidate table.
+  int Count() const { return width_ == 1.0 ? 128 : MAX_VCO_CANDIDATES; }
+
+  // The divider of a step; exact, as all of them are multiples of 1/8.
+  double operator[](int step) const { return step == 0 ? 1.0 : 2.0 + width_ * (step - 1); }
+
+  // The last step whose divider is not above `divider`, cut to the steps there are.
+  int Below(double divider) const {
+    if (!(divider >= 2.0)) return 0;
+    return static_cast<int>(std::min((divider - 2.0) / width_ + 1.0, Count() - 1.0));
+  }
+
+  // A step before which no divider brings `outFreq0` (MHz) up to `minVco` (MHz). One step more
+  // than the quotient says makes up for its rounding. Count() when no step does.
+  int FirstWorthTrying(double outFreq0, double minVco) const {
+    if (!(minVco > 0.0)) return 0;
+    if (!(outFreq0 > 0.0)) return Count();
+    return std::max(Below(minVco / outFreq0) - 1, 0);
+  }
+
+ private:
+  double width_;
+};
+
+}  // namespace Ip::Pll
+
+#endif  // VORKEL_ENGINE_PLL_DIV0STEPS_H_

@@ -1,0 +1,38 @@
+// The divider that serves one output from one VCO frequency, and how well.
+//
+// Tested by output_dividers_test.cpp.
+#ifndef VORKEL_ENGINE_PLL_OUTPUTDIVIDERS_H_
+#define VORKEL_ENGINE_PLL_OUTPUTDIVIDERS_H_
+
+#include "engine/DeviceLimits.h"
+
+namespace Ip::Pll {
+
+// Relative tolerances of an output frequency: 0.00, 0.01, ... 0.26, by repeated addition.
+inline constexpr int kTolerances = 27;
+
+// The widest of them.
+double LargestTolerance();
+
+// What one VCO frequency does for one output.
+struct OutputFit {
+  int divider;
+  double diff;    // |actual - requested| frequency, MHz
+  int tolerance;  // number of the narrowest tolerance that it keeps; kTolerances: none, or out
+                  // of the output range
+};
+
+// The range of frequencies of output n (MHz).
+struct OutputRange {
+  double min;
+  double max;
+};
+OutputRange RangeOfOutput(const PllLimits& limits, int n);
+
+// The divider, a whole number from 1 to 128, nearest to the ratio of `vco` and `requested`
+// (both MHz), and what comes of it.
+OutputFit FitOutput(double vco, double requested, const OutputRange& range);
+
+}  // namespace Ip::Pll
+
+#endif  // VORKEL_ENGINE_PLL_OUTPUTDIVIDERS_H_

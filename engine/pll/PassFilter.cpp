@@ -1,0 +1,170 @@
+#include "engine/pll/PassFilter.h"
+
+#include <algorithm>
+#include <cmath>
+
+#include "engine/pll/OutputDividers.h"
+
+namespace Ip::Pll {
+
+namespace {
+
+constexpr int kFirstChunk = 16;   // passes; small, since most fudges are
+constexpr int kChunkGrowth = 4;
+constexpr int kKeyBits = 5;       // for tolerance numbers 0 to kTolerances
+static_assert(kTolerances < (1 << kKeyBits) - 1);
+
+// Above this output-0 frequency, in MHz, rounding is no longer small against a fudge step.
+constexpr double kLargestOutFreq0 = 1e9;
+
+// Frequencies above this one, in MHz, are far enough from the smallest doubles for relative
+// errors to be bounded.
+constexpr double kSmallestFrequency = 1e-200;
+
+}  // namespace
+
+PassFilter::PassFilter(const VorkelImp& imp, const Run& run, double fudgeStep)
+    : imp_(imp),
+      run_(run),
+      fudgeStep_(fudgeStep),
+      outFreq0_(imp.requests.reqOutFreq[0]),
+      steps_(HasIntegerDiv0(imp, run)),
+      windows_(FindVcoWindows(imp, run)),
+      applies_(Applies(imp, run)) {}
+
+// M and D need an input frequency that is no further from the VCO's than 64 or 80 times. So
+// where the VCO range begins well above 0, only input frequencies do that matter; where it does
+// not (a negative second input clock moves its lower end), the input frequency must itself.
+bool PassFilter::Applies(const VorkelImp& imp, const Run& run) {
+  return std::fabs(imp.requests.reqOutFreq[0]) <= kLargestOutFreq0 &&
+         (imp.pll.minAdjVco >= kSmallestFrequency || run.inFreq >= kSmallestFrequency);
+}
+
+bool PassFilter::MaySucceed(double fudge) {
+  if (!applies_) return true;
+  if (next_ == chunk_) WorkOutChunk(fudge);
+  return maybe_.test(static_cast<std::size_t>(next_++));
+}
+
+void PassFilter::WorkOutChunk(double firstFudge) {
+  chunk_ = std::min(std::max(chunk_ * kChunkGrowth, kFirstChunk), kLargestChunk);
+  next_ = 0;
+  maybe_.reset();
+  double fudge = firstFudge;
+  for (int attempt = 0; attempt < chunk_; ++attempt) {
+    fudges_[static_cast<std::size_t>(attempt)] = fudge;
+    fudge += fudgeStep_;  // as the loop adds
+  }
+  WorkOutDirection(1.0);
+  WorkOutDirection(-1.0);
+}
+
+// Goes through the divider steps and, since a larger step reaches higher VCO frequencies, on
+// through the windows beside them.
+void PassFilter::WorkOutDirection(double sign) {
+  sign_ = sign;
+  std::fill_n(best_.begin(), chunk_, kNoKey);
+  const double slowest = std::min(OutFreq0(0), OutFreq0(chunk_ - 1)) - fudgeStep_;
+  const double fastest = std::max(OutFreq0(0), OutFreq0(chunk_ - 1)) + fudgeStep_;
+  if (!(fastest > 0.0)) return;  // no VCO frequency above 0
+  auto window = windows_.begin();
+  for (int step = steps_.FirstWorthTrying(fastest, windows_.front().low); step < steps_.Count();
+       ++step) {
+    const double lowestVco = slowest * steps_[step];
+    const double highestVco = fastest * steps_[step];
+    while (window != windows_.end() && window->high < lowestVco) ++window;
+    if (window == windows_.end()) return;
+    for (auto met = window; met != windows_.end() && met->low <= highestVco; ++met) {
+      AddAttempts(*met, step);
+    }
+  }
+}
+
+// The attempts that bring the VCO of a step into a window.
+void PassFilter::AddAttempts(const VcoWindow& window, int step) {
+  const double firstFudge = fudges_[0];
+  auto attemptAt = [&](double vco) {
+    return (sign_ * (vco / steps_[step] - outFreq0_) - firstFudge) / fudgeStep_;
+  };
+  const double a = attemptAt(window.low);
+  const double b = attemptAt(window.high);
+  const double first = std::max(std::floor(std::min(a, b)) - 1.0, 0.0);
+  const double last = std::min(std::ceil(std::max(a, b)) + 1.0, chunk_ - 1.0);
+  for (double attempt = first; attempt <= last; ++attempt) {
+    const double vco = OutFreq0(static_cast<int>(attempt)) * steps_[step];
+    if (window.low <= vco && vco <= window.high) AddCandidate(static_cast<int>(attempt), vco);
+  }
+}
+
+// Notes that an attempt has a candidate in a window, unless a witness puts it out.
+void PassFilter::AddCandidate(int attempt, double vco) {
+  const auto index = static_cast<std::size_t>(attempt);
+  if (maybe_.test(index) || !IsCandidate(vco)) return;
+  if (run_.count > 1) {
+    if (best_[index] == kNoKey) best_[index] = WitnessKey(attempt);
+    const Key key = KeyOf(vco, best_[index]);
+    if (key == kNoKey) return;
+    // No witness yet, or this candidate is as good: look at all of them.
+    best_[index] = SmallestKey(attempt);
+    if (key > best_[index]) return;
+  }
+  maybe_.set(index);
+}
+
+// The frequency that an attempt takes for output 0, by the additions of the search.
+double PassFilter::OutFreq0(int attempt) const {
+  const double fudge = fudges_[static_cast<std::size_t>(attempt)];
+  return (sign_ > 0.0 ? fudge : 0.0 - fudge) + outFreq0_;
+}
+
+bool PassFilter::IsCandidate(double vco) const {
+  return imp_.pll.minAdjVco <= vco && vco <= imp_.pll.maxAdjVco;
+}
+
+// The key of a VCO frequency; kNoKey when it is above `atMost`. The digits after that of an
+// output without a divider are 0: the divider search does not get to them.
+PassFilter::Key PassFilter::KeyOf(double vco, Key atMost) const {
+  Key key = 0;
+  for (int n = 1; n < run_.count; ++n) {
+    const OutputFit fit = FitOutput(vco, imp_.requests.reqOutFreq[static_cast<std::size_t>(n)],
+                                    RangeOfOutput(imp_.pllLimits, n));
+    key = key << kKeyBits | static_cast<Key>(fit.tolerance);
+    const int digitsLeft = run_.count - 1 - n;
+    if (atMost != kNoKey && key > atMost >> (kKeyBits * digitsLeft)) return kNoKey;
+    if (fit.tolerance == kTolerances) return key << (kKeyBits * digitsLeft);
+  }
+  return key;
+}
+
+// The smallest key among the candidates around the last witness; kNoKey when there are none.
+PassFilter::Key PassFilter::WitnessKey(int attempt) const {
+  const double outFreq0 = OutFreq0(attempt);
+  Key smallest = kNoKey;
+  if (witness_ == 0.0 || !(outFreq0 > 0.0)) return smallest;
+  const int nearest = steps_.Below(witness_ / outFreq0);
+  for (int step = std::max(nearest - 1, 0); step <= std::min(nearest + 2, steps_.Count() - 1);
+       ++step) {
+    const double vco = outFreq0 * steps_[step];
+    if (IsCandidate(vco)) smallest = std::min(smallest, KeyOf(vco, smallest));
+  }
+  return smallest;
+}
+
+// The smallest key of all candidates of an attempt, which becomes the witness.
+PassFilter::Key PassFilter::SmallestKey(int attempt) {
+  const double outFreq0 = OutFreq0(attempt);
+  Key smallest = kNoKey;
+  for (int step = steps_.FirstWorthTrying(outFreq0, imp_.pll.minAdjVco); step < steps_.Count();
+       ++step) {
+    const double vco = outFreq0 * steps_[step];
+    if (vco > imp_.pll.maxAdjVco) break;
+    if (!IsCandidate(vco)) continue;
+    const Key key = KeyOf(vco, smallest);
+    if (key >= smallest) continue;
+    smallest = key;
+    witness_ = vco;
+  }
+  return smallest;
+}
+
+}  // namespace Ip::Pll

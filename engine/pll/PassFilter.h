@@ -1,0 +1,105 @@
+// Which passes of the fudge loop are worth running.
+//
+// A request that cannot be met at the requested output-0 frequency goes through up to 11000
+// passes, each with two attempts: output 0 a fudge higher, and a fudge lower. Nearly all of
+// them fail, and most can be told to fail without running a stage. The filter answers "no"
+// only where a pass fails for certain, and "maybe" otherwise; the pass then runs as it is. So
+// the loop chooses what it would choose without the filter.
+//
+// An attempt succeeds only if one of its candidates is accepted by the M and D search and is
+// among those that the divider search keeps. From this the filter rules out, coarse to fine:
+//
+// 1. The whole call, when no VCO frequency at all has an M, a D and dividers (VcoWindows).
+// 2. Attempts none of whose candidates lies in a window. The loop is not asked what each
+//    attempt has in the windows; the windows are asked which attempts they belong to: a
+//    window [low, high] and a divider step s are met by the fudges that bring output 0 into
+//    [low / s, high / s]. A chunk of attempts is worked out at a time.
+// 3. Candidates that another candidate of the same attempt puts out. The divider search keeps,
+//    output by output, the candidates with the narrowest tolerance. That is: it keeps those
+//    with the smallest key, when the numbers of the tolerances that a candidate keeps on
+//    outputs 1, 2, ... are read as the digits of one number, the key. One candidate with a
+//    smaller key - a witness - proves that a candidate goes. What is a witness in one attempt
+//    is mostly one in the next, too, since neighbouring attempts differ by 0.001 MHz.
+//
+// Example: 100 MHz in, PLL, outputs 200 and 66 MHz. At a fudge of 0.5 MHz the candidates are
+// 401, 601.5, 802 and 1002.5 MHz; the windows around 400, 600, 800 and 1000 MHz have none of
+// them, and so belong to other fudges. At 0.05 MHz, 400.1 MHz lies in a window; it keeps
+// tolerance 2 on 66 MHz and 600.15 MHz keeps 1, so it goes.
+//
+// Why a "no" is safe. (1), (2): the windows are outer bounds, and so are the fudges worked out
+// from them: the division and the difference to the fudge's number are off by far less than
+// the whole attempt that is added on either side. (3): witnesses are evaluated by the same
+// function on the same doubles as the divider search does. What an upward attempt leaves in
+// the table for the downward one can only put out candidates there, not bring any in.
+//
+// Tested by pass_filter_test.cpp, and by comparing whole answers with a plain search.
+#ifndef VORKEL_ENGINE_PLL_PASSFILTER_H_
+#define VORKEL_ENGINE_PLL_PASSFILTER_H_
+
+#include <array>
+#include <bitset>
+#include <cstdint>
+
+#include "engine/pll/Div0Steps.h"
+#include "engine/pll/Stages.h"
+#include "engine/pll/VcoWindows.h"
+
+namespace Ip::Pll {
+
+class PassFilter {
+ public:
+  // For a run whose VCO range is prepared and whose first pass has failed.
+  PassFilter(const VorkelImp& imp, const Run& run, double fudgeStep);
+
+  // True when no pass at all can succeed.
+  bool IsHopeless() const { return applies_ && windows_.empty(); }
+
+  // False when the pass at `fudge` (MHz) fails for certain. To be asked for each fudge in turn,
+  // from the one after 0 on.
+  bool MaySucceed(double fudge);
+
+ private:
+  // The tolerances that a candidate keeps, five bits an output, output 1 first.
+  using Key = std::uint32_t;
+  static constexpr Key kNoKey = ~Key{0};  // above all keys
+
+  static constexpr int kLargestChunk = 1024;
+
+  static bool Applies(const VorkelImp& imp, const Run& run);
+  void WorkOutChunk(double firstFudge);
+  void WorkOutDirection(double sign);
+  void AddAttempts(const VcoWindow& window, int step);
+  void AddCandidate(int attempt, double vco);
+
+  double OutFreq0(int attempt) const;
+  bool IsCandidate(double vco) const;
+  Key KeyOf(double vco, Key atMost) const;
+  Key WitnessKey(int attempt) const;
+  Key SmallestKey(int attempt);
+
+  const VorkelImp& imp_;
+  const Run& run_;
+  const double fudgeStep_;
+  const double outFreq0_;
+  const Div0Steps steps_;
+  const VcoWindows windows_;
+  const bool applies_;  // the numbers are such that the reasoning above holds
+
+  // The chunk at hand: its fudges, the passes that may succeed, and the next to be asked for.
+  int chunk_ = 4;
+  int next_ = 4;
+  std::array<double, kLargestChunk> fudges_;
+  std::bitset<kLargestChunk> maybe_;
+
+  // The direction at hand: 1.0 upward, -1.0 downward, and the key of the best candidate known
+  // of each attempt.
+  double sign_ = 1.0;
+  std::array<Key, kLargestChunk> best_;
+
+  // The VCO that last had the smallest key of an attempt, MHz; 0: none yet.
+  double witness_ = 0.0;
+};
+
+}  // namespace Ip::Pll
+
+#endif  // VORKEL_ENGINE_PLL_PASSFILTER_H_
