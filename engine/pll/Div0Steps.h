@@ -18,6 +18,9 @@ class Div0Steps {
   // The number of steps; step i belongs to slot i of the candidate table.
   int Count() const { return width_ == 1.0 ? 128 : MAX_VCO_CANDIDATES; }
 
+  // The distance of two steps, beside that of the first two, which is 1.
+  double Width() const { return width_; }
+
   // The divider of a step; exact, as all of them are multiples of 1/8.
   double operator[](int step) const { return step == 0 ? 1.0 : 2.0 + width_ * (step - 1); }
 

@@ -36,15 +36,17 @@ constexpr std::array<double, kTolerances + 1> MakeTolerances() {
 }
 constexpr std::array<double, kTolerances + 1> kToleranceValues = MakeTolerances();
 
-// The first tolerance that `error` is not above, or kTolerances; that, too, for a NaN, which a
-// request can be.
+}  // namespace
+
 int FirstTolerance(double error) {
   if (!(error <= kToleranceValues[kTolerances - 1])) return kTolerances;
-  // The quotient may be one off; begin before it.
-  int index = error > 0.0 ? std::max(static_cast<int>(error / kToleranceStep) - 1, 0) : 0;
+  // The number may be one off; begin before it.
+  int index = error > 0.0 ? std::max(static_cast<int>(error * 100.0) - 1, 0) : 0;
   while (!(error <= kToleranceValues[static_cast<std::size_t>(index)])) ++index;
   return index;
 }
+
+namespace {
 
 // Keeps the candidates that serve output n at the smallest tolerance at which any does.
 bool FindDivider(VorkelImp& imp, int n, const Trace& trace) {
@@ -95,7 +97,7 @@ bool FindDivider(VorkelImp& imp, int n, const Trace& trace) {
 
 }  // namespace
 
-double LargestTolerance() { return kToleranceValues[kTolerances - 1]; }
+double Tolerance(int number) { return kToleranceValues[static_cast<std::size_t>(number)]; }
 
 // Output 1 of a PLL may drive an I/O clock, which goes higher; that the others may not is
 // meant so.

@@ -11,8 +11,12 @@ namespace Ip::Pll {
 // Relative tolerances of an output frequency: 0.00, 0.01, ... 0.26, by repeated addition.
 inline constexpr int kTolerances = 27;
 
-// The widest of them.
-double LargestTolerance();
+// A tolerance by its number, 0 to kTolerances - 1.
+double Tolerance(int number);
+
+// The number of the first tolerance that `error` is not above. kTolerances when there is none,
+// and for a NaN, which a request can bring about.
+int FirstTolerance(double error);
 
 // What one VCO frequency does for one output.
 struct OutputFit {

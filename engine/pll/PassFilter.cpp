@@ -3,8 +3,6 @@
 #include <algorithm>
 #include <cmath>
 
-#include "engine/pll/OutputDividers.h"
-
 namespace Ip::Pll {
 
 namespace {
@@ -30,7 +28,11 @@ PassFilter::PassFilter(const VorkelImp& imp, const Run& run, double fudgeStep)
       outFreq0_(imp.requests.reqOutFreq[0]),
       steps_(HasIntegerDiv0(imp, run)),
       windows_(FindVcoWindows(imp, run)),
-      applies_(Applies(imp, run)) {}
+      applies_(Applies(imp, run)) {
+  for (int n = 1; n < run.count; ++n) {
+    ranges_[static_cast<std::size_t>(n)] = RangeOfOutput(imp.pllLimits, n);
+  }
+}
 
 // M and D need an input frequency that is no further from the VCO's than 64 or 80 times. So
 // where the VCO range begins well above 0, only input frequencies do that matter; where it does
@@ -64,20 +66,58 @@ void PassFilter::WorkOutChunk(double firstFudge) {
 void PassFilter::WorkOutDirection(double sign) {
   sign_ = sign;
   std::fill_n(best_.begin(), chunk_, kNoKey);
-  const double slowest = std::min(OutFreq0(0), OutFreq0(chunk_ - 1)) - fudgeStep_;
-  const double fastest = std::max(OutFreq0(0), OutFreq0(chunk_ - 1)) + fudgeStep_;
+  const double slowest = std::min(OutFreq0(0), OutFreq0(chunk_ - 1));
+  const double fastest = std::max(OutFreq0(0), OutFreq0(chunk_ - 1));
   if (!(fastest > 0.0)) return;  // no VCO frequency above 0
-  auto window = windows_.begin();
-  for (int step = steps_.FirstWorthTrying(fastest, windows_.front().low); step < steps_.Count();
-       ++step) {
-    const double lowestVco = slowest * steps_[step];
-    const double highestVco = fastest * steps_[step];
-    while (window != windows_.end() && window->high < lowestVco) ++window;
-    if (window == windows_.end()) return;
-    for (auto met = window; met != windows_.end() && met->low <= highestVco; ++met) {
+  if (run_.count > 1) NarrowWindows(SurelyKeptTolerance(slowest, fastest));
+  const VcoWindows& windows = Windows();
+  if (windows.empty()) return;
+  auto window = windows.begin();
+  for (int step = steps_.FirstWorthTrying(fastest, window->low); step < steps_.Count(); ++step) {
+    const double lowestVco = (slowest - fudgeStep_) * steps_[step];
+    const double highestVco = (fastest + fudgeStep_) * steps_[step];
+    while (window != windows.end() && window->high < lowestVco) ++window;
+    if (window == windows.end()) return;
+    for (auto met = window; met != windows.end() && met->low <= highestVco; ++met) {
       AddAttempts(*met, step);
     }
   }
+}
+
+// The number of a tolerance that, in every attempt with an output-0 frequency from `slowest` to
+// `fastest` (MHz), some candidate keeps on output 1.
+//
+// The steps lie evenly, so any frequency between the lowest and the highest of their VCOs has
+// one within half a step width. Taken for a multiple of output 1 - the higher, the less half a
+// step width is against it - this is a candidate if it lies in the VCO range, rounds to the
+// divider of that multiple, and leaves output 1 in its range.
+int PassFilter::SurelyKeptTolerance(double slowest, double fastest) const {
+  constexpr int kAny = kTolerances - 1;
+  constexpr double kMargin = 1.0 + 1e-9;  // for the roundings here and in the search
+  const double requested = imp_.requests.reqOutFreq[1];
+  if (!(requested > 0.0 && slowest > 0.0)) return kAny;
+  const double off = 0.5 * steps_.Width() * fastest * kMargin;
+  const double highest = std::min(imp_.pll.maxAdjVco, slowest * steps_[steps_.Count() - 1]) - off;
+  const double divider = std::min(std::floor(highest / requested), 128.0);
+  const double multiple = divider * requested;
+  const double lowest = std::max(imp_.pll.minAdjVco, fastest * steps_[1]) + off;
+  if (!(divider >= 1.0 && multiple * kMargin <= highest && multiple >= lowest * kMargin)) {
+    return kAny;
+  }
+  if (!(off < 0.49 * requested)) return kAny;
+  const double outputOff = off / divider * kMargin;
+  if (!(requested - outputOff >= ranges_[1].min && requested + outputOff <= ranges_[1].max)) {
+    return kAny;
+  }
+  return std::min(FirstTolerance(off / multiple * kMargin), kAny);
+}
+
+// Leaves of the windows what is within the tolerance of that number on output 1.
+void PassFilter::NarrowWindows(int tolerance) {
+  if (tolerance == narrowedTo_) return;
+  narrowedTo_ = tolerance;
+  FindOutputWindows(imp_, 1, tolerance, output1_);
+  Intersect(windows_, output1_, narrowed_);
 }
 
 // The attempts that bring the VCO of a step into a window.
@@ -126,8 +166,8 @@ bool PassFilter::IsCandidate(double vco) const {
 PassFilter::Key PassFilter::KeyOf(double vco, Key atMost) const {
   Key key = 0;
   for (int n = 1; n < run_.count; ++n) {
-    const OutputFit fit = FitOutput(vco, imp_.requests.reqOutFreq[static_cast<std::size_t>(n)],
-                                    RangeOfOutput(imp_.pllLimits, n));
+    const auto output = static_cast<std::size_t>(n);
+    const OutputFit fit = FitOutput(vco, imp_.requests.reqOutFreq[output], ranges_[output]);
     key = key << kKeyBits | static_cast<Key>(fit.tolerance);
     const int digitsLeft = run_.count - 1 - n;
     if (atMost != kNoKey && key > atMost >> (kKeyBits * digitsLeft)) return kNoKey;
@@ -150,19 +190,22 @@ PassFilter::Key PassFilter::WitnessKey(int attempt) const {
   return smallest;
 }
 
-// The smallest key of all candidates of an attempt, which becomes the witness.
+// The smallest key of all candidates of an attempt, whose VCO becomes the witness. Candidates
+// outside the windows of output 1 do not have it.
 PassFilter::Key PassFilter::SmallestKey(int attempt) {
   const double outFreq0 = OutFreq0(attempt);
   Key smallest = kNoKey;
-  for (int step = steps_.FirstWorthTrying(outFreq0, imp_.pll.minAdjVco); step < steps_.Count();
-       ++step) {
-    const double vco = outFreq0 * steps_[step];
-    if (vco > imp_.pll.maxAdjVco) break;
-    if (!IsCandidate(vco)) continue;
-    const Key key = KeyOf(vco, smallest);
-    if (key >= smallest) continue;
-    smallest = key;
-    witness_ = vco;
+  for (const VcoWindow& window : output1_) {
+    const int first = std::max(steps_.Below(window.low / outFreq0) - 1, 0);
+    const int last = std::min(steps_.Below(window.high / outFreq0) + 1, steps_.Count() - 1);
+    for (int step = first; step <= last; ++step) {
+      const double vco = outFreq0 * steps_[step];
+      if (!IsCandidate(vco)) continue;
+      const Key key = KeyOf(vco, smallest);
+      if (key >= smallest) continue;
+      smallest = key;
+      witness_ = vco;
+    }
   }
   return smallest;
 }

@@ -14,7 +14,10 @@
 //    attempt has in the windows; the windows are asked which attempts they belong to: a
 //    window [low, high] and a divider step s are met by the fudges that bring output 0 into
 //    [low / s, high / s]. A chunk of attempts is worked out at a time.
-// 3. Candidates that another candidate of the same attempt puts out. The divider search keeps,
+// 3. Candidates that keep only a wider tolerance on output 1 than some other candidate of the
+//    attempt surely does: the steps lie close enough for one of them to come near a multiple
+//    of output 1. This narrows the windows before (2).
+// 4. Candidates that another candidate of the same attempt puts out. The divider search keeps,
 //    output by output, the candidates with the narrowest tolerance. That is: it keeps those
 //    with the smallest key, when the numbers of the tolerances that a candidate keeps on
 //    outputs 1, 2, ... are read as the digits of one number, the key. One candidate with a
@@ -28,8 +31,8 @@
 //
 // Why a "no" is safe. (1), (2): the windows are outer bounds, and so are the fudges worked out
 // from them: the division and the difference to the fudge's number are off by far less than
-// the whole attempt that is added on either side. (3): witnesses are evaluated by the same
-// function on the same doubles as the divider search does. What an upward attempt leaves in
+// the whole attempt that is added on either side. (3): see SurelyKeptTolerance. (4): witnesses
+// are evaluated by the same function on the same doubles as the divider search does. What an upward attempt leaves in
 // the table for the downward one can only put out candidates there, not bring any in.
 //
 // Tested by pass_filter_test.cpp, and by comparing whole answers with a plain search.
@@ -41,6 +44,7 @@
 #include <cstdint>
 
 #include "engine/pll/Div0Steps.h"
+#include "engine/pll/OutputDividers.h"
 #include "engine/pll/Stages.h"
 #include "engine/pll/VcoWindows.h"
 
@@ -59,18 +63,22 @@ class PassFilter {
   bool MaySucceed(double fudge);
 
  private:
-  // The tolerances that a candidate keeps, five bits an output, output 1 first.
+  // The numbers of the tolerances that a candidate keeps, five bits an output, output 1 first.
   using Key = std::uint32_t;
   static constexpr Key kNoKey = ~Key{0};  // above all keys
 
   static constexpr int kLargestChunk = 1024;
+  static constexpr int kNotNarrowed = -1;
 
   static bool Applies(const VorkelImp& imp, const Run& run);
   void WorkOutChunk(double firstFudge);
   void WorkOutDirection(double sign);
+  int SurelyKeptTolerance(double slowest, double fastest) const;
+  void NarrowWindows(int tolerance);
   void AddAttempts(const VcoWindow& window, int step);
   void AddCandidate(int attempt, double vco);
 
+  const VcoWindows& Windows() const { return run_.count > 1 ? narrowed_ : windows_; }
   double OutFreq0(int attempt) const;
   bool IsCandidate(double vco) const;
   Key KeyOf(double vco, Key atMost) const;
@@ -83,7 +91,14 @@ class PassFilter {
   const double outFreq0_;
   const Div0Steps steps_;
   const VcoWindows windows_;
+  std::array<OutputRange, MAX_OUTPUTS> ranges_{};
   const bool applies_;  // the numbers are such that the reasoning above holds
+
+  // The windows, and those of output 1 alone, as far as output 1 keeps the tolerance of this
+  // number there; not in use with one output.
+  int narrowedTo_ = kNotNarrowed;
+  VcoWindows narrowed_;
+  VcoWindows output1_;
 
   // The chunk at hand: its fudges, the passes that may succeed, and the next to be asked for.
   int chunk_ = 4;

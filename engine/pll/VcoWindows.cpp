@@ -12,6 +12,7 @@ namespace Ip::Pll {
 namespace {
 
 constexpr double kMargin = 1e-9;  // relative
+constexpr double kLargestDivider = 128.0;
 constexpr double kNoLimit = std::numeric_limits<double>::infinity();
 
 VcoWindow Widened(double low, double high) {
@@ -26,15 +27,6 @@ void Append(VcoWindows& windows, const VcoWindow& window) {
   } else {
     windows.push_back(window);
   }
-}
-
-VcoWindows Common(const VcoWindows& a, const VcoWindows& b) {
-  VcoWindows common;
-  for (std::size_t i = 0, j = 0; i < a.size() && j < b.size();) {
-    Append(common, {std::max(a[i].low, b[j].low), std::min(a[i].high, b[j].high)});
-    a[i].high < b[j].high ? ++i : ++j;
-  }
-  return common;
 }
 
 // Where an M and a D are found: for each M the values of D before rounding that the VCO range,
@@ -66,31 +58,43 @@ VcoWindows WindowsOfMAndD(const VorkelImp& imp, const Run& run) {
   return windows;
 }
 
-// Where output n has a divider within the largest tolerance.
-VcoWindows WindowsOfOutput(const VorkelImp& imp, int n) {
-  const double f = imp.requests.reqOutFreq[static_cast<std::size_t>(n)];
-  const OutputRange range = RangeOfOutput(imp.pllLimits, n);
-  VcoWindows windows;
-  // A negative request takes a divider of 1 and keeps every tolerance.
-  if (f < 0.0) Append(windows, Widened(range.min, range.max));
-  if (!(f > 0.0) || !std::isfinite(f)) return windows;
-  for (double divider = 1.0; divider <= 128.0; divider += 1.0) {
-    // Ratios that round to the divider, frequencies within the tolerance, the output range.
-    const double low = std::max({divider == 1.0 ? 0.0 : (divider - 0.5) * f,
-                                 divider * f * (1.0 - LargestTolerance()), divider * range.min});
-    const double high = std::min({divider == 128.0 ? kNoLimit : (divider + 0.5) * f,
-                                  divider * f * (1.0 + LargestTolerance()), divider * range.max});
-    Append(windows, Widened(low, high));
+}  // namespace
+
+void Intersect(const VcoWindows& a, const VcoWindows& b, VcoWindows& common) {
+  common.clear();
+  for (std::size_t i = 0, j = 0; i < a.size() && j < b.size();) {
+    Append(common, {std::max(a[i].low, b[j].low), std::min(a[i].high, b[j].high)});
+    a[i].high < b[j].high ? ++i : ++j;
   }
-  return windows;
 }
 
-}  // namespace
+void FindOutputWindows(const VorkelImp& imp, int n, int tolerance, VcoWindows& windows) {
+  const double f = imp.requests.reqOutFreq[static_cast<std::size_t>(n)];
+  const OutputRange range = RangeOfOutput(imp.pllLimits, n);
+  windows.clear();
+  // A negative request takes a divider of 1 and keeps every tolerance.
+  if (f < 0.0) Append(windows, Widened(range.min, range.max));
+  if (!(f > 0.0) || !std::isfinite(f)) return;
+  const double slowest = f * (1.0 - Tolerance(tolerance));
+  const double fastest = f * (1.0 + Tolerance(tolerance));
+  for (double divider = 1.0; divider <= kLargestDivider; divider += 1.0) {
+    // Ratios that round to the divider, frequencies within the tolerance, the output range.
+    const double low = std::max({divider == 1.0 ? 0.0 : (divider - 0.5) * f, divider * slowest,
+                                 divider * range.min});
+    const double high = std::min({divider == kLargestDivider ? kNoLimit : (divider + 0.5) * f,
+                                  divider * fastest, divider * range.max});
+    Append(windows, Widened(low, high));
+  }
+}
 
 VcoWindows FindVcoWindows(const VorkelImp& imp, const Run& run) {
   VcoWindows windows = WindowsOfMAndD(imp, run);
+  VcoWindows ofOutput;
+  VcoWindows common;
   for (int n = 1; n < run.count && !windows.empty(); ++n) {
-    windows = Common(windows, WindowsOfOutput(imp, n));
+    FindOutputWindows(imp, n, kTolerances - 1, ofOutput);
+    Intersect(windows, ofOutput, common);
+    windows.swap(common);
   }
   return windows;
 }

@@ -30,8 +30,15 @@ struct VcoWindow {
 // In rising order, without overlaps.
 using VcoWindows = std::vector<VcoWindow>;
 
-// The windows of a run whose VCO range is prepared.
+// The windows of a run whose VCO range is prepared and whose primitive is that of the process.
 VcoWindows FindVcoWindows(const VorkelImp& imp, const Run& run);
+
+// Those in which output n, not output 0, has a divider within a tolerance of that number. The
+// result is put into `windows`.
+void FindOutputWindows(const VorkelImp& imp, int n, int tolerance, VcoWindows& windows);
+
+// What two lists of windows have in common, put into `common`.
+void Intersect(const VcoWindows& a, const VcoWindows& b, VcoWindows& common);
 
 }  // namespace Ip::Pll
 
