@@ -1,0 +1,164 @@
+# The devices that the host knows: what they have, and what a part name stands for.
+
+package provide vorkel::catalogue 1.1
+package require vorkel::engine 1.1
+
+namespace eval ::vorkel::catalogue {
+  variable defaultPart vk40
+}
+
+# The names of all devices, sorted.
+proc ::vorkel::catalogue::names {} {
+  ::vorkel::engine::load
+  return [::Vorkel::Devices names]
+}
+
+# A device as the host describes it. A device file that cannot be read is wrong usage; the
+# message tells file, line and column.
+proc ::vorkel::catalogue::describe {device} {
+  ::vorkel::engine::load
+  try {
+    return [::Vorkel::Devices describe $device]
+  } on error {message} {
+    throw {VORKEL USAGE} $message
+  }
+}
+
+# What a part name, `<device>[<package>][-<grade>]`, stands for, as a dict: device, package,
+# grade, part (the full name, defaults filled in), primitives (those of that grade), limits (a
+# dict from keyword to text, MHz, ns or a count), and description (what `describe` answers).
+# A name that stands for nothing is wrong usage.
+#
+# Nothing marks where the device ends, so a name can begin with several devices. As for the
+# host, the longest that has such a package and grade is meant.
+proc ::vorkel::catalogue::resolve {part} {
+  set complaint "unknown device \"$part\"; the devices are [join [names] {, }]"
+  set longest 1
+  foreach device [Prefixes $part] {
+    try {
+      return [Resolve $device [string range $part [string length $device] end]]
+    } trap {VORKEL DETAIL} {reason} {
+      if {$longest} {
+        set complaint $reason
+      }
+      set longest 0
+    }
+  }
+  throw {VORKEL USAGE} $complaint
+}
+
+# The devices that a part name begins with, the longest first.
+proc ::vorkel::catalogue::Prefixes {part} {
+  set prefixes [lmap name [names] {
+    if {![string equal -length [string length $name] $name $part]} continue
+    set name
+  }]
+  # Prefixes of one text sort by their length.
+  return [lsort -decreasing $prefixes]
+}
+
+# The part that is made of a device and the rest of a part name. A package or grade that the
+# device does not have is thrown as {VORKEL DETAIL}.
+proc ::vorkel::catalogue::Resolve {device rest} {
+  set description [describe $device]
+  regexp {^([^-]*)(-?)(.*)$} $rest -> package dash grade
+  set package [Member $description package $package [expr {$package ne ""}]]
+  set grade [Member $description grade $grade [expr {$dash ne ""}]]
+  set limits [dict get $description limits $grade]
+  return [dict create device $device package $package grade $grade part "$device$package-$grade" \
+    primitives [Primitives $limits] limits $limits description $description]
+}
+
+# The package or grade (`kind`) of a device: the one named, or the default. A device may do
+# without a default package, but its limits are those of a grade.
+proc ::vorkel::catalogue::Member {description kind name named} {
+  set device [dict get $description name]
+  set known [dict get $description ${kind}s]
+  if {!$named} {
+    set name [dict get $description default_$kind]
+    if {$name eq "" && $kind eq "grade"} {
+      throw {VORKEL DETAIL} "$device has no default grade; it has [join $known {, }]"
+    }
+  } elseif {$name ni $known} {
+    throw {VORKEL DETAIL} "$device has no $kind \"$name\"; it has [join $known {, }]"
+  }
+  return $name
+}
+
+# The primitives whose limits are all there, in the host's order.
+proc ::vorkel::catalogue::Primitives {limits} {
+  set incomplete {}
+  set all {}
+  foreach keyword [::Vorkel::Devices keywords] {
+    lassign $keyword name unit primitives
+    foreach primitive $primitives {
+      if {$primitive ni $all} {
+        lappend all $primitive
+      }
+      if {![dict exists $limits $name]} {
+        lappend incomplete $primitive
+      }
+    }
+  }
+  return [lmap primitive $all {
+    if {$primitive in $incomplete} continue
+    set primitive
+  }]
+}
+
+# The keywords that a primitive needs, each a list of keyword and unit.
+proc ::vorkel::catalogue::keywordsOf {primitive} {
+  set keywords {}
+  foreach keyword [::Vorkel::Devices keywords] {
+    lassign $keyword name unit primitives
+    if {$primitive in $primitives} {
+      lappend keywords [list $name $unit]
+    }
+  }
+  return $keywords
+}
+
+# The lowest and the highest output frequency of a primitive, MHz.
+proc ::vorkel::catalogue::outputRange {primitive limits} {
+  switch -- $primitive {
+    PLL {
+      return [list [dict get $limits CLKOUT_FREQ_MIN_GCLK] [dict get $limits CLKOUT_FREQ_MAX_GCLK]]
+    }
+    TSYN {
+      return [list [dict get $limits TSYN_CLKOUT_FREQ_MIN] [dict get $limits TSYN_CLKOUT_FREQ_MAX]]
+    }
+  }
+  # The others have their limits as periods of each pin, in ns.
+  set shortest {}
+  set longest {}
+  foreach keyword [keywordsOf $primitive] {
+    set name [lindex $keyword 0]
+    if {[string match *_MINPERIOD $name]} {
+      lappend shortest [dict get $limits $name]
+    } elseif {[string match *_MAXPERIOD $name]} {
+      lappend longest [dict get $limits $name]
+    }
+  }
+  return [list [expr {1000.0 / [tcl::mathfunc::max {*}$longest]}] \
+    [expr {1000.0 / [tcl::mathfunc::min {*}$shortest]}]]
+}
+
+# The lowest and the highest VCO frequency of a PLL or a TSYN, MHz; "" for other primitives.
+proc ::vorkel::catalogue::vcoRange {primitive limits} {
+  return [Range $primitive VCOCLK $limits]
+}
+
+# The lowest and the highest frequency at the phase-frequency detector, likewise.
+proc ::vorkel::catalogue::pfdRange {primitive limits} {
+  return [Range $primitive CLKPFD $limits]
+}
+
+proc ::vorkel::catalogue::Range {primitive what limits} {
+  switch -- $primitive {
+    PLL { set prefix "" }
+    TSYN { set prefix TSYN_ }
+    default { return "" }
+  }
+  set keyword $prefix${what}_FREQ
+  return [list [dict get $limits ${keyword}_MIN] [dict get $limits ${keyword}_MAX]]
+}

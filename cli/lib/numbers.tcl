@@ -1,0 +1,75 @@
+# Numbers as the user writes them, checked before the engine sees them, and as reports show
+# them. The engine reads any text as a number; a mistyped one would silently be 0 there.
+
+package provide vorkel::numbers 1.1
+
+namespace eval ::vorkel::numbers {
+  variable decimal {^[-+]?([0-9]+\.?[0-9]*|\.[0-9]+)([eE][-+]?[0-9]+)?$}
+  variable largest 1.7976931348623157e308
+}
+
+# The value of a decimal number. `what` names it in the message when it is none, or has no
+# finite double. Numbers such as 0100 are decimal, as the engine reads them.
+proc ::vorkel::numbers::parse {text what} {
+  variable decimal
+  variable largest
+  if {![regexp -- $decimal $text] || [scan $text %f value] != 1} {
+    throw {VORKEL USAGE} "$what: \"$text\" is not a number"
+  }
+  if {abs($value) > $largest} {
+    throw {VORKEL USAGE} "$what: $text is too large"
+  }
+  return $value
+}
+
+# The entries of a comma-separated list, each a number that `check` accepts: a command prefix
+# that is called with the value and answers "" or what the number must be.
+proc ::vorkel::numbers::parseList {text what check} {
+  set entries {}
+  foreach entry [split $text ,] {
+    set entry [string trim $entry]
+    if {$entry eq ""} {
+      throw {VORKEL USAGE} "$what: a number is missing in \"$text\""
+    }
+    set demand [{*}$check [parse $entry $what]]
+    if {$demand ne ""} {
+      throw {VORKEL USAGE} "$what: $entry must be $demand"
+    }
+    lappend entries $entry
+  }
+  if {[llength $entries] == 0} {
+    throw {VORKEL USAGE} "$what: the list is empty"
+  }
+  return $entries
+}
+
+# Checks for parseList.
+proc ::vorkel::numbers::positive {value} {
+  return [expr {$value > 0.0 ? "" : "greater than 0"}]
+}
+
+proc ::vorkel::numbers::percentage {value} {
+  return [expr {$value >= 0.0 && $value <= 100.0 ? "" : "between 0 and 100"}]
+}
+
+proc ::vorkel::numbers::any {value} {
+  return ""
+}
+
+# A number with up to `decimals` decimals, without trailing zeros and never "-0".
+proc ::vorkel::numbers::short {value decimals} {
+  set text [fixed $value $decimals]
+  if {[string first . $text] >= 0} {
+    set text [string trimright [string trimright $text 0] .]
+  }
+  return $text
+}
+
+# A number with exactly `decimals` decimals, and never "-0.00".
+proc ::vorkel::numbers::fixed {value decimals} {
+  set text [format %.*f $decimals $value]
+  if {[regexp {^-[0.]*$} $text]} {
+    set text [string range $text 1 end]
+  }
+  return $text
+}

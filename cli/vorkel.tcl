@@ -1,0 +1,9 @@
+# The command line: finds the clock settings of a device's PLL or TSYN.
+
+apply {{} {
+  # Joining a name to the script before normalizing follows a link to the script itself.
+  set folder [file dirname [file dirname [file normalize [file join [info script] _]]]]
+  lappend ::auto_path [file join $folder lib]
+  package require vorkel::main
+  exit [::vorkel::main::run $::argv]
+}}

@@ -1,0 +1,115 @@
+# What the tests of the command line share: running a program and looking at what it leaves.
+
+package require tcltest 2.5
+namespace import -force ::tcltest::test
+
+namespace eval ::cli {
+  variable folder [file dirname [file normalize [info script]]]
+  variable checkout [file dirname [file dirname $folder]]
+  variable program [file join $checkout cli vorkel.tcl]
+  # A folder of the test file's own, gone when it ends.
+  variable scratch [exec mktemp -d]
+  variable counter 0
+}
+
+# Ends a test file.
+proc ::cli::finish {} {
+  variable scratch
+  file delete -force $scratch
+  ::tcltest::cleanupTests
+}
+
+# Runs a command; answers its exit status, standard output and standard error as a dict with
+# the keys status, out and err. Standard output goes to a file, so it is buffered as in a pipe.
+proc ::cli::execute {args} {
+  variable scratch
+  variable counter
+  set base [file join $scratch run-[incr counter]]
+  set status 0
+  if {[catch {exec {*}$args >$base.out 2>$base.err </dev/null} message options]} {
+    set code [dict get $options -errorcode]
+    if {[lindex $code 0] ne "CHILDSTATUS"} {
+      error "could not run $args: $message"
+    }
+    set status [lindex $code 2]
+  }
+  set result [dict create status $status]
+  foreach {key suffix} {out out err err} {
+    set channel [open $base.$suffix]
+    dict set result $key [read $channel]
+    close $channel
+    file delete $base.$suffix
+  }
+  return $result
+}
+
+# Writes a file of the scratch folder; its path.
+proc ::cli::write {name text} {
+  variable scratch
+  set path [file join $scratch $name]
+  file mkdir [file dirname $path]
+  set channel [open $path w]
+  puts -nonewline $channel $text
+  close $channel
+  return $path
+}
+
+# Runs the command line with the given words, in this interpreter's environment.
+proc ::cli::vorkel {args} {
+  variable program
+  return [execute [info nameofexecutable] $program {*}$args]
+}
+
+# Runs the command line, which must succeed and say nothing on standard error; its output.
+proc ::cli::output {args} {
+  set result [vorkel {*}$args]
+  if {[dict get $result status] != 0 || [dict get $result err] ne ""} {
+    error "unexpected failure: $result"
+  }
+  return [dict get $result out]
+}
+
+# What the report says: a dict with device, input, VCO, PFD, M, D as they stand, notes (a
+# list), and rows (a list with one dict for each output, from heading to text).
+proc ::cli::report {text} {
+  set report [dict create notes {} rows {}]
+  set headings {}
+  foreach line [split $text \n] {
+    if {[regexp {^(device|input|VCO|PFD|M|D) +(.*)$} $line -> name value]} {
+      dict set report $name $value
+    } elseif {[regexp {^note: (.*)$} $line -> note]} {
+      dict lappend report notes $note
+    } elseif {[regexp {^output  } $line]} {
+      set headings [regexp -all -inline {\S+(?: \S+)*} $line]
+    } elseif {$headings ne "" && [regexp {^ +[0-9]} $line]} {
+      set row [dict create]
+      foreach heading $headings value [regexp -all -inline {\S+} $line] {
+        dict set row $heading $value
+      }
+      dict lappend report rows $row
+    } elseif {$line ne ""} {
+      error "a line that no report has: $line"
+    }
+  }
+  return $report
+}
+
+# The report on a request that must succeed.
+proc ::cli::solve {args} {
+  return [report [output {*}$args]]
+}
+
+# The entries of a column of the table.
+proc ::cli::column {report heading} {
+  return [lmap row [dict get $report rows] {dict get $row $heading}]
+}
+
+# The headings of the table.
+proc ::cli::headings {report} {
+  return [dict keys [lindex [dict get $report rows] 0]]
+}
+
+# Some entries of a report above the table.
+proc ::cli::summary {report args} {
+  return [lmap name $args {dict get $report $name}]
+}
