@@ -8,14 +8,9 @@
 
 namespace compare {
 
-namespace {
-
-constexpr const char* kPart = "dut";
-
-// Gives the limits to the product as speed data, and takes them over as it reads them.
-plain::PllLimits Publish(const plain::PllLimits& wanted, int prim) {
+plain::PllLimits PublishLimits(const plain::PllLimits& wanted, int prim) {
   FakeHost& host = FakeHost::Instance();
-  host.devices[kPart].clear();
+  host.devices[kComparedPart].clear();
   host.reads.clear();
   host.messages.clear();
   plain::PllLimits limits = wanted;
@@ -28,19 +23,17 @@ plain::PllLimits Publish(const plain::PllLimits& wanted, int prim) {
   }
   if (!wanted.readable) return limits;
   if (prim == plain::kPrimPll) {
-    SetPll(kPart, {wanted.vcoMin, wanted.vcoMax, wanted.clkoutMin, wanted.clkoutMax,
+    SetPll(kComparedPart, {wanted.vcoMin, wanted.vcoMax, wanted.clkoutMin, wanted.clkoutMax,
                    wanted.pfdMin, wanted.pfdMax, wanted.maxHighLowCount, wanted.clkoutMaxIo});
   } else {
-    SetTsyn(kPart, {wanted.vcoMin, wanted.vcoMax, wanted.clkoutMin, wanted.clkoutMax,
+    SetTsyn(kComparedPart, {wanted.vcoMin, wanted.vcoMax, wanted.clkoutMin, wanted.clkoutMax,
                     wanted.pfdMin, wanted.pfdMax, wanted.vcoTarget, wanted.maxHighLowCount,
                     wanted.maxPfdLowB});
   }
   return limits;
 }
 
-}  // namespace
-
-PllPair::PllPair() : imp_(nullptr) { imp_.SetDevice(kPart); }
+PllPair::PllPair() : imp_(nullptr) { imp_.SetDevice(kComparedPart); }
 
 int PllPair::RunProduct(const plain::PllRequest& r, bool traced) {
   imp_.SetLowBandwidth(r.lowBandwidth);
@@ -77,7 +70,7 @@ std::string PllPair::CompareAnswers(int code) {
 }
 
 std::string PllPair::FirstDifference(const Case& drawn, bool traced) {
-  plain::PllLimits limits = Publish(drawn.limits, drawn.request.prim);
+  plain::PllLimits limits = PublishLimits(drawn.limits, drawn.request.prim);
   // A PLL run reads no low-bandwidth maximum and works with what an earlier TSYN run has read.
   if (drawn.request.prim == plain::kPrimPll) limits.maxPfdLowB = maxPfdLowB_;
   plain::Trace trace(traced);

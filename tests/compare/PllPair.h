@@ -11,6 +11,12 @@
 
 namespace compare {
 
+// The part whose speed data PublishLimits sets.
+inline constexpr const char* kComparedPart = "dut";
+
+// Gives limits to the product, as speed data of kComparedPart. Returns them as it reads them.
+plain::PllLimits PublishLimits(const plain::PllLimits& limits, int prim);
+
 class PllPair {
  public:
   PllPair();
