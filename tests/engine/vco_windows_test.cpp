@@ -1,6 +1,5 @@
 #include "engine/pll/VcoWindows.h"
 
-#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "tests/support/FakeHost.h"
@@ -18,7 +17,7 @@ class VcoWindowsTest : public testing::Test {
   }
 
   VcoWindows Windows(const char* outFreqs, int count, double inFreq = 100.0) {
-    const Run run = {inFreq, count, kTsyn, trace_};
+    const Pll::Run run = {inFreq, count, kTsyn, trace_};
     VorkelImp::_prim = kTsyn;
     EXPECT_EQ(PrepareVcoRange(imp_, outFreqs, 0.0, run), kSolved);
     return FindVcoWindows(imp_, run);
@@ -60,7 +59,9 @@ TEST_F(VcoWindowsTest, RisesWithoutOverlaps) {
   const VcoWindows windows = Windows("100", 1);
   for (std::size_t i = 0; i < windows.size(); ++i) {
     EXPECT_LE(windows[i].low, windows[i].high);
-    if (i > 0) EXPECT_GT(windows[i].low, windows[i - 1].high);
+    if (i > 0) {
+      EXPECT_GT(windows[i].low, windows[i - 1].high);
+    }
   }
 }
 
@@ -98,7 +99,7 @@ TEST_F(VcoWindowsTest, NothingForAnOutputThatNoVcoServes) {
 }
 
 TEST_F(VcoWindowsTest, NothingWithoutAnInputFrequency) {
-  const Run run = {-100.0, 1, kTsyn, trace_};
+  const Pll::Run run = {-100.0, 1, kTsyn, trace_};
   EXPECT_TRUE(FindVcoWindows(imp_, run).empty());
 }
 
