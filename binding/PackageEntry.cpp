@@ -16,14 +16,17 @@ int InitVorkel(ClientData, Tcl_Interp* interp, int, Tcl_Obj* const*) {
   if (!Tcl::Bind(interp)) return TCL_ERROR;
   // Without memory for the object the handle has none, and its methods say so.
   auto* imp = new (std::nothrow) Ip::VorkelImp(interp);
-  auto* handle = new (std::nothrow) Ip::VorkelPtrHandle(imp, interp);
-  if (handle == nullptr) {
-    delete imp;
-    Tcl::SetResult(interp, "Ip::Vorkel::Init: out of memory.");
-    return TCL_ERROR;
+  Ip::VorkelPtrHandle* handle = nullptr;
+  try {
+    handle = new Ip::VorkelPtrHandle(imp, interp);
+    if (handle->SetResult(interp) == TCL_OK) return TCL_OK;
+  } catch (const std::bad_alloc&) {
+    // Tcl is C: nothing may be thrown through it.
   }
-  handle->SetResult(interp);
-  return TCL_OK;
+  delete handle;
+  delete imp;
+  Tcl::SetResult(interp, "Ip::Vorkel::Init: out of memory.");
+  return TCL_ERROR;
 }
 
 // Fails only where no Tcl can be called, with Tcl's own message.

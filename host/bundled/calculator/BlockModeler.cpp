@@ -1,0 +1,28 @@
+// How calculators are handed out.
+//
+// Tested by calculator_lifetime_test.cpp.
+#include <memory>
+
+#include "host/Dly_SpeedController.h"
+#include "host/Tw_BmCMBCalculator.h"
+#include "host/bundled/calculator/DeviceCalculator.h"
+#include "host/bundled/device/Personality.h"
+
+Tw_BmCMBCalculator::~Tw_BmCMBCalculator() = default;
+
+bool Tw_BmCMBCalculator::Unused(Port::StringBase* error) {
+  if (error != nullptr) *error = "This operation does nothing.";
+  return false;
+}
+
+Tw_BmCMBCalculator* Tw_BmPhysicalBlockModeler::GetCMBCalculator(Dly_SpeedController* controller) {
+  if (controller == nullptr) return nullptr;
+  const Dly_SpeedController::Data& data = controller->data();
+  if (*data.calculator != nullptr) return *data.calculator;
+  const Device::Grade& grade = data.speed_data;
+  if (!grade.Has(Device::CoefficientGroup::kLoop) && !grade.Has(Device::CoefficientGroup::kKru)) {
+    return nullptr;
+  }
+  // The caller owns it. It notes itself in the controller's place.
+  return new Calculator::DeviceCalculator(grade, data.device + '-' + data.grade, data.calculator);
+}

@@ -1,0 +1,35 @@
+#include "host/bundled/device/BundledFolder.h"
+
+#include <dlfcn.h>
+
+#include <filesystem>
+#include <system_error>
+
+namespace Device {
+namespace {
+
+// An address inside this library.
+const char anchor = 0;
+
+std::string FindFolder() {
+  Dl_info info{};
+  if (dladdr(&anchor, &info) == 0 || info.dli_fname == nullptr) return {};
+  std::error_code error;
+  std::filesystem::path library = std::filesystem::canonical(info.dli_fname, error);
+  if (error) library = std::filesystem::absolute(info.dli_fname, error);
+  if (error) return {};
+  return (library.parent_path() / "devices").native();
+}
+
+// The system may know the library by a path relative to the current directory of the time
+// when it was loaded, so the question is asked then and not at the first use.
+[[maybe_unused]] const std::string& asked_at_load = BundledFolder();
+
+}  // namespace
+
+const std::string& BundledFolder() {
+  static const auto* const folder = new std::string(FindFolder());
+  return *folder;
+}
+
+}  // namespace Device

@@ -1,0 +1,52 @@
+// Tested by personality_test.cpp.
+#include "host/Dly_SpeedController.h"
+
+#include <exception>
+#include <limits>
+
+#include "host/bundled/device/KeywordTable.h"
+#include "host/bundled/device/Personality.h"
+#include "host/bundled/device/SpeedFigure.h"
+
+namespace {
+
+// The grade that the personality stands for. Throws DeviceError when it has none.
+const Device::Grade& GradeOf(const PM_PIC* pic) {
+  if (pic == nullptr) throw Device::DeviceError("there is no device to read the speed data of");
+  const Device::Part& part = pic->data().part;
+  if (part.grade) {
+    const Device::Grade* const grade = part.file.FindGrade(*part.grade);
+    if (grade != nullptr) return *grade;
+  }
+  throw Device::ErrorAt(part.file.path, part.file.grades_position,
+                        "no speed grade was given for device \"" + part.file.device +
+                            "\", which has " + Device::JoinNames(part.file.GradeNames()));
+}
+
+}  // namespace
+
+Dly_SpeedController::Dly_SpeedController(const PM_PIC* pic) {
+  try {
+    const Device::Grade& grade = GradeOf(pic);
+    data_ = std::make_unique<Data>();
+    data_->device = pic->data().part.file.device;
+    data_->grade = grade.name;
+    data_->speed_data = grade;
+    data_->calculator = std::make_shared<Tw_BmCMBCalculator*>(nullptr);
+    const auto keywords = Device::Keywords();
+    for (std::size_t i = 0; i < keywords.size(); ++i) {
+      if (!grade.figures[i]) continue;
+      data_->figures.emplace(keywords[i].name, Device::SpeedFigure(*grade.figures[i]));
+    }
+  } catch (const std::exception& error) {
+    Device::ReportAndThrow(error.what());
+  }
+}
+
+Dly_SpeedController::~Dly_SpeedController() = default;
+
+double Dly_SpeedController::GetBelDelay(const Port::StringBase& key,
+                                        const Pds_PdmBlock* /*block*/) const {
+  const auto found = data_->figures.find(key.View());
+  return found == data_->figures.end() ? std::numeric_limits<double>::max() : found->second;
+}

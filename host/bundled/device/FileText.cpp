@@ -1,0 +1,94 @@
+#include "host/bundled/device/FileText.h"
+
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <system_error>
+
+#include "host/bundled/device/DeviceError.h"
+
+namespace Device {
+namespace {
+
+DeviceError CannotRead(const std::string& path, const std::string& reason) {
+  return DeviceError(path + ": cannot be read: " + reason);
+}
+
+std::string SystemReason() { return std::generic_category().message(errno); }
+
+// A file descriptor, closed at the end of its scope.
+class OpenFile {
+ public:
+  // Opening a named pipe waits for a writer unless O_NONBLOCK is given; for regular files
+  // the flag means nothing.
+  explicit OpenFile(const std::string& path)
+      : path_(path), descriptor_(open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK)) {
+    if (descriptor_ < 0) throw CannotRead(path_, SystemReason());
+  }
+  ~OpenFile() { close(descriptor_); }
+  OpenFile(const OpenFile&) = delete;
+  OpenFile& operator=(const OpenFile&) = delete;
+
+  void RequireRegular() const {
+    struct stat status {};
+    if (fstat(descriptor_, &status) != 0) throw CannotRead(path_, SystemReason());
+    if (S_ISDIR(status.st_mode)) throw CannotRead(path_, "it is a directory");
+    if (!S_ISREG(status.st_mode)) throw CannotRead(path_, "it is not a regular file");
+  }
+
+  // The next bytes into `buffer`; how many, 0 at the end.
+  std::size_t Read(char* buffer, std::size_t size) const {
+    for (;;) {
+      const ssize_t count = read(descriptor_, buffer, size);
+      if (count >= 0) return static_cast<std::size_t>(count);
+      if (errno != EINTR) throw CannotRead(path_, SystemReason());
+    }
+  }
+
+ private:
+  const std::string& path_;
+  int descriptor_;
+};
+
+void RequireFewDots(const std::string& path, const std::string& text) {
+  SourcePosition position;
+  std::size_t dots = 0;
+  for (const char c : text) {
+    if (c == '.' && ++dots > kMostDots) {
+      throw ErrorAt(path, position,
+                    "no device file has more than " + std::to_string(kMostDots) + " dots");
+    }
+    if (c == '\n') {
+      ++position.line;
+      position.column = 1;
+    } else {
+      ++position.column;
+    }
+  }
+}
+
+}  // namespace
+
+std::string ReadFileText(const std::string& path) {
+  const OpenFile file(path);
+  file.RequireRegular();
+  std::string text(kLargestFile + 1, '\0');
+  std::size_t length = 0;
+  while (length < text.size()) {
+    const std::size_t count = file.Read(text.data() + length, text.size() - length);
+    if (count == 0) break;
+    length += count;
+  }
+  if (length > kLargestFile) {
+    throw DeviceError(path + ": is longer than " + std::to_string(kLargestFile) +
+                      " bytes, which no device file is");
+  }
+  text.resize(length);
+  RequireFewDots(path, text);
+  return text;
+}
+
+}  // namespace Device

@@ -1,0 +1,80 @@
+#include "host/bundled/device/PartName.h"
+
+#include <utility>
+
+namespace Device {
+namespace {
+
+DeviceError UnknownDevice(const DeviceCatalogue& catalogue, std::string_view what,
+                          std::string_view name) {
+  std::string text = "unknown device in ";
+  text += what;
+  text += " \"";
+  text += name;
+  text += "\": the devices are ";
+  const std::vector<std::string> names = catalogue.Names();
+  text += names.empty() ? "none" : JoinNames(names);
+  text += "; the folders searched are ";
+  text += catalogue.folders().empty() ? "none" : JoinNames(catalogue.folders());
+  return DeviceError(text);
+}
+
+// "unknown package "x" in part name "vk10x": device vk10 has q144, b256"
+std::string UnknownDetail(std::string_view what, std::string_view detail,
+                          std::string_view part_name, const DeviceFile& file,
+                          const std::vector<std::string>& known) {
+  std::string text = "unknown ";
+  text += what;
+  text += " \"";
+  text += detail;
+  text += "\" in part name \"";
+  text += part_name;
+  text += "\": device " + file.device + " has " + JoinNames(known);
+  return text;
+}
+
+// Fills in the package and grade that `rest`, the part name behind the device, names. What is
+// wrong with them, or nothing.
+std::optional<DeviceError> TakeRest(std::string_view rest, std::string_view part_name, Part* part) {
+  const DeviceFile& file = part->file;
+  const std::size_t dash = rest.find('-');
+  const std::string_view package = rest.substr(0, dash);
+  if (!package.empty()) {
+    if (!file.HasPackage(package)) {
+      return ErrorAt(file.path, file.packages_position,
+                     UnknownDetail("package", package, part_name, file, file.packages));
+    }
+    part->package = package;
+  }
+  if (dash != std::string_view::npos) {
+    const std::string_view grade = rest.substr(dash + 1);
+    if (file.FindGrade(grade) == nullptr) {
+      return ErrorAt(file.path, file.grades_position,
+                     UnknownDetail("grade", grade, part_name, file, file.GradeNames()));
+    }
+    part->grade = grade;
+  }
+  return std::nullopt;
+}
+
+}  // namespace
+
+Part FindPart(const DeviceCatalogue& catalogue, std::string_view part_name) {
+  std::optional<DeviceError> complaint;
+  for (const std::string& device : catalogue.PrefixesOf(part_name)) {
+    Part part{FindDevice(catalogue, device), {}, {}};
+    auto wrong = TakeRest(part_name.substr(device.size()), part_name, &part);
+    if (!wrong) return part;
+    if (!complaint) complaint = std::move(wrong);
+  }
+  if (complaint) throw *complaint;
+  throw UnknownDevice(catalogue, "part name", part_name);
+}
+
+DeviceFile FindDevice(const DeviceCatalogue& catalogue, std::string_view device) {
+  const std::string* const path = catalogue.FindFile(device);
+  if (path == nullptr) throw UnknownDevice(catalogue, "device name", device);
+  return DeviceFile::Read(*path, device);
+}
+
+}  // namespace Device

@@ -1,0 +1,34 @@
+#include "host/bundled/script/TclAccess.h"
+
+namespace Script {
+namespace {
+
+// The oldest Tcl whose stubs table has all the functions that this library calls.
+constexpr char kOldestTcl[] = "8.4";
+
+}  // namespace
+
+bool ReachTcl(Tcl_Interp* interp) {
+  if (interp == nullptr) return false;
+  // Asking twice would be right as well, but Tcl_InitStubs empties the interpreter's result.
+  return tclStubsPtr != nullptr || Tcl_InitStubs(interp, kOldestTcl, 0) != nullptr;
+}
+
+int SetResultObject(Tcl_Interp* interp, Tcl_Obj* object) {
+  if (object == nullptr || !ReachTcl(interp)) return TCL_ERROR;
+  Tcl_SetObjResult(interp, object);
+  return TCL_OK;
+}
+
+int SetVariableObject(Tcl_Interp* interp, const char* name, Tcl_Obj* object) {
+  if (object == nullptr || name == nullptr || !ReachTcl(interp)) return TCL_ERROR;
+  const Tcl_Obj* const stored = Tcl_SetVar2Ex(interp, name, nullptr, object, TCL_LEAVE_ERR_MSG);
+  return stored != nullptr ? TCL_OK : TCL_ERROR;
+}
+
+int ErrorResult(Tcl_Interp* interp, const char* text) {
+  if (ReachTcl(interp)) Tcl_SetObjResult(interp, Tcl_NewStringObj(text, -1));
+  return TCL_ERROR;
+}
+
+}  // namespace Script

@@ -1,0 +1,30 @@
+// An allocator that can be told to refuse memory: the operators new and delete of the program
+// that is linked with RefusingAllocator.cpp.
+#ifndef VORKEL_TESTS_BINDING_REFUSINGALLOCATOR_H_
+#define VORKEL_TESTS_BINDING_REFUSINGALLOCATOR_H_
+
+#include <cstddef>
+
+// While it lives, the allocation that reports failure by null refuses objects of `size` bytes.
+class RefuseSize {
+ public:
+  explicit RefuseSize(std::size_t size);
+  ~RefuseSize();
+  RefuseSize(const RefuseSize&) = delete;
+  RefuseSize& operator=(const RefuseSize&) = delete;
+};
+
+// While it lives, the allocation that comes after so many others is refused, whichever way it
+// reports that. Only one is.
+class RefuseAfter {
+ public:
+  explicit RefuseAfter(int allocations);
+  ~RefuseAfter();
+  RefuseAfter(const RefuseAfter&) = delete;
+  RefuseAfter& operator=(const RefuseAfter&) = delete;
+};
+
+// How many allocations were refused since the last of these objects was made.
+int Refusals();
+
+#endif  // VORKEL_TESTS_BINDING_REFUSINGALLOCATOR_H_
