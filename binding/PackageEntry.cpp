@@ -18,8 +18,8 @@ int InitVorkel(ClientData, Tcl_Interp* interp, int, Tcl_Obj* const*) {
   auto* imp = new (std::nothrow) Ip::VorkelImp(interp);
   Ip::VorkelPtrHandle* handle = nullptr;
   try {
-    handle = new Ip::VorkelPtrHandle(imp, interp);
-    if (handle->SetResult(interp) == TCL_OK) return TCL_OK;
+    handle = new (std::nothrow) Ip::VorkelPtrHandle(imp, interp);
+    if (handle != nullptr && handle->SetResult(interp) == TCL_OK) return TCL_OK;
   } catch (const std::bad_alloc&) {
     // Tcl is C: nothing may be thrown through it.
   }

@@ -3,8 +3,9 @@
 // It holds the device and its limits, the requests, the state of every solver and the host
 // objects through which speed data and timing figures are reached. Each file of the engine
 // adds the operations of one technique: SpeedData.cpp and LimitLoaders.cpp the device data,
-// ListParsers.cpp the requests, pll/ the PLL and TSYN search, kru/ and kru_clkgen/ the KRUs. The state is open to them and
-// to their tests; callers outside the engine use the operations.
+// ListParsers.cpp the requests, pll/ the PLL and TSYN search, kru/ and kru_clkgen/ the KRUs,
+// timing/ the timing figures. The state is open to them and to their tests; callers outside
+// the engine use the operations.
 //
 // The engine reports failure by result codes and false returns and throws nothing of its own.
 // All calls come from the interpreter's thread.

@@ -12,7 +12,7 @@ VORKEL_ROOT=$(cd -P -- "$(dirname -- "${BASH_SOURCE[0]}")/.." && pwd -P)
 # The folders that the package is built from. A tree that is configured with tests builds the
 # package alone by the targets of these folders.
 readonly PROGRAM_FOLDERS=(host engine binding)
-readonly PROGRAM_SOURCES=(CMakeLists.txt devices "${PROGRAM_FOLDERS[@]}")
+readonly PROGRAM_SOURCES=(CMakeLists.txt devices doc examples "${PROGRAM_FOLDERS[@]}")
 readonly TEST_SOURCES=(tests)
 
 # Without it there is nothing to run, whatever the stamp says.

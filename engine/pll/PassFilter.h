@@ -32,8 +32,9 @@
 // Why a "no" is safe. (1), (2): the windows are outer bounds, and so are the fudges worked out
 // from them: the division and the difference to the fudge's number are off by far less than
 // the whole attempt that is added on either side. (3): see SurelyKeptTolerance. (4): witnesses
-// are evaluated by the same function on the same doubles as the divider search does. What an upward attempt leaves in
-// the table for the downward one can only put out candidates there, not bring any in.
+// are evaluated by the same function on the same doubles as in the divider search. What an
+// upward attempt leaves in the table for the downward one can only put out candidates there,
+// not bring any in.
 //
 // Tested by pass_filter_test.cpp, and by comparing whole answers with a plain search.
 #ifndef VORKEL_ENGINE_PLL_PASSFILTER_H_

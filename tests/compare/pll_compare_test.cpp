@@ -6,6 +6,7 @@
 #include <gtest/gtest.h>
 
 #include <cstdlib>
+#include <ostream>
 #include <string>
 
 #include "tests/compare/PllPair.h"
@@ -21,6 +22,9 @@ struct Load {
   int longRequests;  // in the long run
   int longFar;
   int traceEvery;    // one in so many is compared with its trace
+
+  // What GoogleTest shows of a load.
+  friend void PrintTo(const Load& load, std::ostream* out) { *out << KindName(load.kind); }
 };
 
 // True when the plain search finds nothing within the first fudges: it would go on for up to

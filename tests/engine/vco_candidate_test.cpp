@@ -1,0 +1,118 @@
+// Tests of candidates and of the table that holds them.
+
+#include "engine/pll/VcoCandidate.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <memory>
+
+#include "tests/engine/EngineTest.h"
+
+namespace {
+
+using engine_test::SlotsOf;
+using Ip::Pll::MAX_VCO_CANDIDATES;
+using Ip::Pll::VcoCandidate;
+using Ip::Pll::VcoCandidateTable;
+using testing::Each;
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+class VcoCandidateTableTest : public testing::Test {
+ protected:
+  VcoCandidateTable& table_ = engine_test::NewImp().pll._vcoCandidates;
+};
+
+TEST_F(VcoCandidateTableTest, HasASlotForEveryStepOfTheFractionalWalk) {
+  // 1, then 2 to 128 in eighths: 1 + 126 * 8 + 1.
+  EXPECT_EQ(MAX_VCO_CANDIDATES, 1010);
+  EXPECT_EQ(Ip::MAX_OUTPUTS, 7);
+}
+
+TEST_F(VcoCandidateTableTest, IsEmptyAtFirst) {
+  EXPECT_THAT(SlotsOf(table_.Occupied()), IsEmpty());
+}
+
+TEST_F(VcoCandidateTableTest, PutsACandidateWithNothingButVcoAndDiv0) {
+  table_.Put(3, 850.0, 2.125);
+  const VcoCandidate& candidate = table_[3];
+  EXPECT_EQ(candidate.vco, 850.0);
+  EXPECT_EQ(candidate.div0, 2.125);
+  EXPECT_EQ(candidate.m, 0.0);
+  EXPECT_EQ(candidate.d, 0u);
+  EXPECT_THAT(candidate.freqDiff, Each(0.0));
+  EXPECT_THAT(candidate.phase, Each(0.0));
+  EXPECT_THAT(candidate.phaseDiff, Each(0.0));
+  EXPECT_THAT(candidate.dutyCycle, Each(0.0));
+  EXPECT_THAT(candidate.dutyDiff, Each(0.0));
+  EXPECT_THAT(candidate.divN, Each(0u));
+}
+
+TEST_F(VcoCandidateTableTest, APutTakesTheSlotOver) {
+  table_.Put(0, 400.0, 4.0);
+  VcoCandidate& old = table_[0];
+  old.m = 4.0;
+  old.d = 1;
+  old.freqDiff.fill(1.0);
+  old.phase.fill(2.0);
+  old.phaseDiff.fill(3.0);
+  old.dutyCycle.fill(4.0);
+  old.dutyDiff.fill(5.0);
+  old.divN.fill(6);
+  table_.Put(0, 500.0, 5.0);
+  EXPECT_EQ(table_[0].vco, 500.0);
+  EXPECT_EQ(table_[0].div0, 5.0);
+  EXPECT_EQ(table_[0].m, 0.0);
+  EXPECT_EQ(table_[0].d, 0u);
+  EXPECT_THAT(table_[0].freqDiff, Each(0.0));
+  EXPECT_THAT(table_[0].phase, Each(0.0));
+  EXPECT_THAT(table_[0].phaseDiff, Each(0.0));
+  EXPECT_THAT(table_[0].dutyCycle, Each(0.0));
+  EXPECT_THAT(table_[0].dutyDiff, Each(0.0));
+  EXPECT_THAT(table_[0].divN, Each(0u));
+  EXPECT_THAT(SlotsOf(table_.Occupied()), ElementsAre(0));
+}
+
+TEST_F(VcoCandidateTableTest, ASlotTakenAgainAfterEmptyingHasNothingOfItsFormerCandidate) {
+  table_.Put(7, 400.0, 4.0);
+  table_[7].m = 4.0;
+  table_[7].divN[2] = 8;
+  table_.EmptyAll();
+  table_.Put(7, 500.0, 5.0);
+  EXPECT_FALSE(table_[7].HasMAndD());
+  EXPECT_EQ(table_[7].divN[2], 0u);
+}
+
+TEST_F(VcoCandidateTableTest, EmptiesOneSlotOrAllOrAllBut) {
+  for (const int slot : {0, 63, 64, 1009}) table_.Put(slot, 100.0 + slot, 1.0);
+  EXPECT_THAT(SlotsOf(table_.Occupied()), ElementsAre(0, 63, 64, 1009));
+  table_.Empty(63);
+  EXPECT_THAT(SlotsOf(table_.Occupied()), ElementsAre(0, 64, 1009));
+  VcoCandidateTable::Slots kept;
+  kept.Insert(64);
+  kept.Insert(1009);
+  table_.KeepOnly(kept);
+  EXPECT_THAT(SlotsOf(table_.Occupied()), ElementsAre(64, 1009));
+  EXPECT_EQ(table_[1009].vco, 1109.0);
+  table_.EmptyAll();
+  EXPECT_THAT(SlotsOf(table_.Occupied()), IsEmpty());
+}
+
+TEST(VcoCandidate, HasTheDividersOfItsOutputs) {
+  VcoCandidate candidate{};
+  candidate.div0 = 2.125;
+  candidate.divN = {99, 1, 2, 3, 4, 5, 128};
+  EXPECT_EQ(candidate.Divider(0), 2.125);
+  for (int n = 1; n <= 5; ++n) EXPECT_EQ(candidate.Divider(n), n);
+  EXPECT_EQ(candidate.Divider(6), 128.0);
+}
+
+TEST(VcoCandidate, HasMAndDWhenAnMIsSet) {
+  VcoCandidate candidate{};
+  EXPECT_FALSE(candidate.HasMAndD());
+  candidate.m = 1.0;
+  EXPECT_TRUE(candidate.HasMAndD());
+}
+
+}  // namespace
