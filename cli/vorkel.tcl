@@ -1,4 +1,4 @@
-# The command line: finds the clock settings of a device's PLL or TSYN.
+# The command line: finds the settings of a device's clock primitives.
 
 apply {{} {
   # Joining a name to the script before normalizing follows a link to the script itself.

@@ -143,6 +143,27 @@ proc ::vorkel::catalogue::outputRange {primitive limits} {
     [expr {1000.0 / [tcl::mathfunc::min {*}$shortest]}]]
 }
 
+# The lowest and the highest frequency of a pin of a KRU, MHz. With a doubled feedback, which
+# is one by CLK2X, some pins have another highest frequency.
+proc ::vorkel::catalogue::pinRange {pin doubled limits} {
+  # Opposite phases share their limits.
+  set pins {CLK180 CLK0 CLK270 CLK90 CLK2X180 CLK2X CLKFX180 CLKFX}
+  if {[dict exists $pins $pin]} {
+    set pin [dict get $pins $pin]
+  }
+  set keyword D_KRU_${pin}_CLKIN_DIVIDE_BY_2_FALSE_
+  if {$pin ne "CLKFXDV"} {
+    append keyword CLK_FEEDBACK_1X_
+  }
+  set longest [dict get $limits ${keyword}MAXPERIOD]
+  set shortest [dict get $limits ${keyword}MINPERIOD]
+  set other [string map {_1X_ _2X_} ${keyword}MINPERIOD]
+  if {$doubled && [dict exists $limits $other]} {
+    set shortest [dict get $limits $other]
+  }
+  return [list [expr {1000.0 / $longest}] [expr {1000.0 / $shortest}]]
+}
+
 # The lowest and the highest VCO frequency of a PLL or a TSYN, MHz; "" for other primitives.
 proc ::vorkel::catalogue::vcoRange {primitive limits} {
   return [Range $primitive VCOCLK $limits]

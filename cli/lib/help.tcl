@@ -9,12 +9,22 @@ namespace eval ::vorkel::help {
   variable commands {
     tsyn    {--in F[,F2] --out LIST [OPTION...]}  "find the settings of a TSYN"
     pll     {--in F[,F2] --out LIST [OPTION...]}  "find the settings of a PLL"
+    kru     {--in F --out LIST [OPTION...]}       "find the settings of a KRU_SP"
+    clkgen  {--in F --out LIST [OPTION...]}       "find the settings of a KRU_CLKGEN"
     devices {[NAME]}                              "list the devices, or all limits of one"
     help    {[COMMAND]}                           "show this help"
   }
-  # An exact solution: 27 MHz times 33 is 891 MHz, of which all three are whole parts.
-  variable example {tsyn --in 27 --out 148.5,74.25,27}
-  variable solvers {tsyn pll}
+  # The primitives of the commands that solve.
+  variable primitives {tsyn TSYN pll PLL kru KRU_SP clkgen KRU_CLKGEN}
+  # Words that have an exact solution: 27 MHz times 33 is 891 MHz, of which all three are whole
+  # parts; 100 MHz times 6 is 600 MHz, and 0 and 90 degrees are steps of its dividers; half of
+  # 100 MHz, doubled, as it is and times 3; 100 MHz times 3 / 2, as it is and halved.
+  variable examples {
+    tsyn   {--in 27 --out 148.5,74.25,27}
+    pll    {--in 100 --out 200,100 --phase 0,90}
+    kru    {--in 100 --out 100,50,150 --phase 0,180,0 --feedback}
+    clkgen {--in 100 --out 150,75}
+  }
 }
 
 # How the program was called, as it can be pasted into a shell.
@@ -38,7 +48,6 @@ proc ::vorkel::help::usage {{command ""}} {
 
 # The help of the command help: for the whole program or for one command.
 proc ::vorkel::help::run {words} {
-  variable commands
   switch -- [llength $words] {
     0 { return [All] }
     1 { return [One [lindex $words 0]] }
@@ -48,14 +57,14 @@ proc ::vorkel::help::run {words} {
 
 proc ::vorkel::help::All {} {
   variable commands
-  variable example
+  variable examples
   set text "usage: [Program] COMMAND \[OPTION...\]\n\n"
-  append text "Finds clock settings for the PLL or TSYN of a device: VCO, M, D and dividers.\n\n"
-  append text "Commands:\n"
+  append text "Finds the settings of a device's clock primitives: VCO, M, D, dividers and pins,\n"
+  append text "with the jitter and the phase error that they have.\n\nCommands:\n"
   foreach {name arguments description} $commands {
     append text [Line $name $description]
   }
-  append text \n [Options] \n
+  append text \n [Options {tsyn pll} TSYN] \n [Options {kru clkgen} KRU_SP] \n
   append text "Exit status:\n"
   foreach {status meaning} {
     0 "solved, or shown what was asked for"
@@ -65,18 +74,23 @@ proc ::vorkel::help::All {} {
   } {
     append text [Line $status $meaning]
   }
-  append text "\nExample:\n  [Program] $example\n"
+  append text "\nExamples:\n"
+  dict for {command words} $examples {
+    append text "  [Program] $command $words\n"
+  }
   return $text
 }
 
 proc ::vorkel::help::One {command} {
   variable commands
-  variable solvers
+  variable primitives
+  variable examples
   foreach {name arguments description} $commands {
     if {$name eq $command} {
       set text "[usage $command]\n\n[string totitle $description 0 0].\n"
-      if {$command in $solvers} {
-        append text \n [Options]
+      if {[dict exists $primitives $command]} {
+        append text \n [Options $command [dict get $primitives $command]]
+        append text "\nExample:\n  [Program] $command [dict get $examples $command]\n"
       }
       return $text
     }
@@ -84,10 +98,11 @@ proc ::vorkel::help::One {command} {
   throw {VORKEL USAGE} "unknown command \"$command\""
 }
 
-proc ::vorkel::help::Options {} {
-  variable solvers
-  set text "Options of [join $solvers { and }] (MHz, degrees, percent; commas between numbers):\n"
-  foreach {name placeholder description} $::vorkel::request::options {
+# The options of commands, which are those for a primitive.
+proc ::vorkel::help::Options {commands primitive} {
+  set text "Options of [join $commands { and }] (MHz, degrees, percent, ps; commas between"
+  append text " numbers):\n"
+  foreach {name placeholder description} [::vorkel::request::optionsOf $primitive] {
     append text [Line [string trimright "$name $placeholder"] $description]
   }
   append text [Line "" "Without --device: $::vorkel::catalogue::defaultPart."]

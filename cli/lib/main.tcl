@@ -10,6 +10,8 @@ namespace eval ::vorkel::main {
   variable commands {
     tsyn      {::vorkel::synthesis::run TSYN}
     pll       {::vorkel::synthesis::run PLL}
+    kru       {::vorkel::synthesis::run KRU_SP}
+    clkgen    {::vorkel::synthesis::run KRU_CLKGEN}
     devices   ::vorkel::devices::run
     help      ::vorkel::help::run
     --help    ::vorkel::help::run

@@ -22,8 +22,17 @@ proc ::vorkel::numbers::parse {text what} {
   return $value
 }
 
-# The entries of a comma-separated list, each a number that `check` accepts: a command prefix
-# that is called with the value and answers "" or what the number must be.
+# A number that `check` accepts, as it is written. `check` is a command prefix that is called
+# with the value and answers "" or what the number must be.
+proc ::vorkel::numbers::parseOne {text what check} {
+  set demand [{*}$check [parse $text $what]]
+  if {$demand ne ""} {
+    throw {VORKEL USAGE} "$what: $text must be $demand"
+  }
+  return $text
+}
+
+# The entries of a comma-separated list, each a number that `check` accepts.
 proc ::vorkel::numbers::parseList {text what check} {
   set entries {}
   foreach entry [split $text ,] {
@@ -31,11 +40,7 @@ proc ::vorkel::numbers::parseList {text what check} {
     if {$entry eq ""} {
       throw {VORKEL USAGE} "$what: a number is missing in \"$text\""
     }
-    set demand [{*}$check [parse $entry $what]]
-    if {$demand ne ""} {
-      throw {VORKEL USAGE} "$what: $entry must be $demand"
-    }
-    lappend entries $entry
+    lappend entries [parseOne $entry $what $check]
   }
   if {[llength $entries] == 0} {
     throw {VORKEL USAGE} "$what: the list is empty"
@@ -43,9 +48,13 @@ proc ::vorkel::numbers::parseList {text what check} {
   return $entries
 }
 
-# Checks for parseList.
+# Checks for parseOne and parseList.
 proc ::vorkel::numbers::positive {value} {
   return [expr {$value > 0.0 ? "" : "greater than 0"}]
+}
+
+proc ::vorkel::numbers::notNegative {value} {
+  return [expr {$value >= 0.0 ? "" : "0 or greater"}]
 }
 
 proc ::vorkel::numbers::percentage {value} {

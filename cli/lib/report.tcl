@@ -1,37 +1,37 @@
-# The report on a configuration. Its frequencies are those of the hardware, worked out from
-# the chosen M, D and dividers. The engine accepts an M and a D whose ratio misses its VCO by
-# a small remainder, so its own figures can lie beside them; they are shown where they do.
+# The report on a configuration of a PLL or a TSYN. Its frequencies are those of the hardware,
+# worked out from the chosen M, D and dividers. The engine accepts an M and a D whose ratio
+# misses its VCO by a small remainder, so its own figures can lie beside them; they are shown
+# where they do.
 
 package provide vorkel::report 1.1
 package require vorkel::notes 1.1
 package require vorkel::numbers 1.1
 package require vorkel::table 1.1
+package require vorkel::timing 1.1
 
 namespace eval ::vorkel::report {
   # Decimals of a frequency in MHz: down to 1 Hz.
   variable decimals 6
   # The engine prints 3 decimals. What differs by no more than their rounding agrees.
   variable visible 0.0006
+  variable frequency_columns {{right {requested MHz}} {right {actual MHz}} {right {error ppm}}}
 }
 
-# The report on the solution (see engine.tcl) of a request (see request.tcl), as text.
-proc ::vorkel::report::render {request solution} {
+# The report on the solution (see engine.tcl) of a request (see request.tcl) with its timing
+# (see timing.tcl), as text.
+proc ::vorkel::report::render {request solution timing} {
   set clocks [Clocks $request $solution]
-  set text [Summary $request $solution $clocks]\n
-  append text [Outputs $request $solution $clocks]
-  set notes [::vorkel::notes::on $request $clocks]
-  if {[llength $notes] > 0} {
-    append text \n
+  set text [Summary $request $solution $clocks $timing]\n
+  append text [Outputs $request $solution $clocks $timing]
+  if {[dict get $request closest]} {
+    append text \n [Shapes $request $solution]
   }
-  foreach note $notes {
-    append text "note: $note\n"
-  }
+  append text [::vorkel::notes::text [::vorkel::notes::on $request $clocks $timing]]
   return $text
 }
 
 # The frequencies in MHz that the hardware will have: the lists vcos and pfds, one for each
-# input clock, and outputs, for each a dict of divider, frequency (with the first input) and
-# error (ppm of the requested frequency).
+# input clock, and outputs, for each a dict of divider and frequency (with the first input).
 proc ::vorkel::report::Clocks {request solution} {
   set m [dict get $solution m]
   set d [dict get $solution d]
@@ -42,35 +42,44 @@ proc ::vorkel::report::Clocks {request solution} {
     dict lappend clocks pfds [expr {$input / $d}]
   }
   set vco [lindex [dict get $clocks vcos] 0]
-  foreach output [dict get $solution outputs] requested [dict get $request outputs] {
-    scan $requested %f requested
+  foreach output [dict get $solution outputs] {
     set divider [dict get $output divider]
-    set frequency [expr {$vco / $divider}]
-    dict lappend clocks outputs [dict create divider $divider frequency $frequency \
-      error [expr {($frequency - $requested) / $requested * 1e6}]]
+    dict lappend clocks outputs \
+      [dict create divider $divider frequency [expr {$vco / $divider}]]
   }
   return $clocks
 }
 
 # The lines above the table.
-proc ::vorkel::report::Summary {request solution clocks} {
+proc ::vorkel::report::Summary {request solution clocks timing} {
   set vco [Both [dict get $clocks vcos]]
   set counted [dict get $solution vco]
   if {[Differs $counted [lindex [dict get $clocks vcos] 0]]} {
     append vco " (the search took it as $counted)"
   }
   set inputs [lmap input [dict get $request inputs] {scan $input %f}]
-  set lines {}
-  foreach {name value} [list \
+  set pairs [list \
     device "[dict get $request part] [dict get $request primitive]" \
     input [Both $inputs] \
     VCO $vco \
     PFD [Both [dict get $clocks pfds]] \
     M [::vorkel::numbers::short [dict get $solution m] 3] \
-    D [dict get $solution d]] {
-    lappend lines [format "%-8s%s" $name $value]
+    D [dict get $solution d]]
+  if {[::vorkel::timing::isKnown $timing]} {
+    lappend pairs bandwidth [dict get $request bandwidth] \
+      {input jitter} "[::vorkel::numbers::short [scan [dict get $request inputJitter] %f] 3] ps"
   }
-  return "[join $lines \n]\n"
+  lappend pairs {*}[phaseError $timing]
+  return [::vorkel::table::pairs $pairs]
+}
+
+# The label and the value of the phase error, if there is one.
+proc ::vorkel::report::phaseError {timing} {
+  set error [dict get $timing phaseError]
+  if {$error eq ""} {
+    return {}
+  }
+  return [list {phase error} "$error ps"]
 }
 
 # One frequency, or that of each input clock.
@@ -85,48 +94,81 @@ proc ::vorkel::report::Both {frequencies} {
   return "[lindex $texts 0], with the second input [lindex $texts 1]"
 }
 
-# The table of the outputs. Phases and duty cycles have columns when they were asked for, and
-# the engine's own frequency when one of them can be seen to differ.
-proc ::vorkel::report::Outputs {request solution clocks} {
-  variable decimals
+# The table of the outputs. The engine's own frequencies have a column when one of them can be
+# seen to differ, and the jitter has one when it is known.
+proc ::vorkel::report::Outputs {request solution clocks timing} {
+  variable frequency_columns
   set search 0
   foreach output [dict get $solution outputs] clock [dict get $clocks outputs] {
     if {[Differs [dict get $output frequency] [dict get $clock frequency]]} {
       set search 1
     }
   }
-  set columns {{right output} {right divider} {right {requested MHz}} {right {actual MHz}}
-    {right {error ppm}}}
+  set columns {{right output} {right divider}}
+  lappend columns {*}$frequency_columns
   if {$search} {
     lappend columns {right {search MHz}}
   }
+  lappend columns {*}[jitterColumn $timing]
+
+  set rows {}
+  foreach output [dict get $solution outputs] clock [dict get $clocks outputs] \
+      asked [dict get $request outputs] jitter [dict get $timing jitters] {
+    set row [list [llength $rows] [::vorkel::numbers::short [dict get $output divider] 3] \
+      {*}[frequencyCells $asked [dict get $clock frequency]]]
+    if {$search} {
+      lappend row [dict get $output frequency]
+    }
+    lappend rows [list {*}$row {*}[jitterCell $timing $jitter]]
+  }
+  return [::vorkel::table::render $columns $rows]
+}
+
+# A requested and an actual frequency, MHz, and the error, for the columns frequency_columns.
+proc ::vorkel::report::frequencyCells {requested actual} {
+  variable decimals
+  scan $requested %f requested
+  return [list [::vorkel::numbers::fixed $requested $decimals] \
+    [::vorkel::numbers::fixed $actual $decimals] \
+    [::vorkel::numbers::fixed [expr {($actual - $requested) / $requested * 1e6}] 2]]
+}
+
+# The column of the jitter, if that of some output is known, and an entry of it.
+proc ::vorkel::report::jitterColumn {timing} {
+  if {[::vorkel::timing::isKnown $timing]} {
+    return {{right {jitter ps}}}
+  }
+  return {}
+}
+
+proc ::vorkel::report::jitterCell {timing jitter} {
+  if {[::vorkel::timing::isKnown $timing]} {
+    return [expr {$jitter eq "" ? "-" : $jitter}]
+  }
+  return {}
+}
+
+# The table of phases and duty cycles, each if it was asked for. One table with the above would
+# be wider than a terminal.
+proc ::vorkel::report::Shapes {request solution} {
+  set columns {{right output}}
   if {[dict get $request phaseAsked]} {
     lappend columns {right {phase deg}} {right {actual deg}}
   }
   if {[dict get $request dutyAsked]} {
     lappend columns {right {duty %}} {right {actual %}}
   }
-
   set rows {}
-  set n 0
-  foreach output [dict get $solution outputs] clock [dict get $clocks outputs] \
-      asked [dict get $request outputs] phase [dict get $request phases] \
+  foreach output [dict get $solution outputs] phase [dict get $request phases] \
       duty [dict get $request duties] {
-    set row [list $n [::vorkel::numbers::short [dict get $output divider] 3] \
-      [::vorkel::numbers::fixed [scan $asked %f] $decimals] \
-      [::vorkel::numbers::fixed [dict get $clock frequency] $decimals] \
-      [::vorkel::numbers::fixed [dict get $clock error] 2]]
-    if {$search} {
-      lappend row [dict get $output frequency]
-    }
+    set row [llength $rows]
     if {[dict get $request phaseAsked]} {
-      lappend row [Phase [scan $phase %f]] [Phase [dict get $output phase]]
+      lappend row [phase $phase] [phase [dict get $output phase]]
     }
     if {[dict get $request dutyAsked]} {
       lappend row {*}[Duty [scan $duty %f] [dict get $output duty]]
     }
     lappend rows $row
-    incr n
   }
   return [::vorkel::table::render $columns $rows]
 }
@@ -137,8 +179,9 @@ proc ::vorkel::report::Differs {figure frequency} {
   return [expr {abs($figure - $frequency) > $visible}]
 }
 
-proc ::vorkel::report::Phase {degrees} {
-  return [::vorkel::numbers::fixed $degrees 3]
+# A phase in degrees.
+proc ::vorkel::report::phase {degrees} {
+  return [::vorkel::numbers::fixed [scan $degrees %f] 3]
 }
 
 # Requested (percent) and actual (a fraction) duty cycle; nothing is worked out for 0.

@@ -1,4 +1,4 @@
-# Tables of text for a terminal.
+# Tables and lists of text for a terminal.
 
 package provide vorkel::table 1.1
 
@@ -23,5 +23,13 @@ proc ::vorkel::table::render {columns rows} {
     }]
     lappend lines [string trimright [join $cells $gap]]
   }
+  return "[join $lines \n]\n"
+}
+
+# Labels and their values, a line for each, with the values below each other.
+proc ::vorkel::table::pairs {pairs} {
+  variable gap
+  set width [tcl::mathfunc::max {*}[lmap {label value} $pairs {string length $label}]]
+  set lines [lmap {label value} $pairs {format "%-*s%s%s" $width $label $gap $value}]
   return "[join $lines \n]\n"
 }

@@ -10,6 +10,11 @@ namespace eval ::cli {
   # A folder of the test file's own, gone when it ends.
   variable scratch [exec mktemp -d]
   variable counter 0
+  # The names of the values above the tables of a report.
+  variable labels [join {
+    device input VCO PFD M D bandwidth {input jitter} {phase error}
+    CLKIN_DIVIDE_BY_2 CLKDV CLKFXDV {phase offset} PHASE_SHIFT
+  } |]
 }
 
 # Ends a test file.
@@ -69,28 +74,31 @@ proc ::cli::output {args} {
   return [dict get $result out]
 }
 
-# What the report says: a dict with device, input, VCO, PFD, M, D as they stand, notes (a
-# list), and rows (a list with one dict for each output, from heading to text).
+# What the report says: a dict with device, input, VCO and so on as they stand, notes (a list),
+# and rows (a list with one dict for each output, from heading to text). An output has a line in
+# each table.
 proc ::cli::report {text} {
-  set report [dict create notes {} rows {}]
+  variable labels
+  set report [dict create notes {}]
+  set rows [dict create]
   set headings {}
   foreach line [split $text \n] {
-    if {[regexp {^(device|input|VCO|PFD|M|D) +(.*)$} $line -> name value]} {
+    if {[regexp "^($labels)  +(.*)\$" $line -> name value]} {
       dict set report $name $value
     } elseif {[regexp {^note: (.*)$} $line -> note]} {
       dict lappend report notes $note
     } elseif {[regexp {^output  } $line]} {
       set headings [regexp -all -inline {\S+(?: \S+)*} $line]
     } elseif {$headings ne "" && [regexp {^ +[0-9]} $line]} {
-      set row [dict create]
-      foreach heading $headings value [regexp -all -inline {\S+} $line] {
-        dict set row $heading $value
+      set values [regexp -all -inline {\S+} $line]
+      foreach heading $headings value $values {
+        dict set rows [lindex $values 0] $heading $value
       }
-      dict lappend report rows $row
     } elseif {$line ne ""} {
       error "a line that no report has: $line"
     }
   }
+  dict set report rows [dict values $rows]
   return $report
 }
 
@@ -104,7 +112,7 @@ proc ::cli::column {report heading} {
   return [lmap row [dict get $report rows] {dict get $row $heading}]
 }
 
-# The headings of the table.
+# The headings of the tables.
 proc ::cli::headings {report} {
   return [dict keys [lindex [dict get $report rows] 0]]
 }
