@@ -23,6 +23,7 @@ int InitVorkel(ClientData, Tcl_Interp* interp, int, Tcl_Obj* const*) {
   } catch (const std::bad_alloc&) {
     // Tcl is C: nothing may be thrown through it.
   }
+  // No script has seen the object: it goes, unlike one that a handle was made for.
   delete handle;
   delete imp;
   Tcl::SetResult(interp, "Ip::Vorkel::Init: out of memory.");

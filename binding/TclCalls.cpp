@@ -2,10 +2,6 @@
 
 #include <dlfcn.h>
 
-// The headers wrap some of these functions in macros that call others in their place.
-#undef Tcl_Eval
-#undef Tcl_PkgProvide
-
 namespace Tcl {
 
 namespace {

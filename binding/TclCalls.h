@@ -1,7 +1,7 @@
 // The five Tcl functions that the package calls, through the interpreter's stubs table.
 //
 // The table is the one that the Tcl library exports, where it exports one; so the package
-// loads into any Tcl from 8.4 on and is linked against none.
+// loads into Tcl 8.4 to 8.6 and is linked against none.
 #ifndef VORKEL_BINDING_TCLCALLS_H_
 #define VORKEL_BINDING_TCLCALLS_H_
 
@@ -10,8 +10,8 @@
 namespace Tcl {
 
 // Finds the stubs table: the exported one when the process has a non-null one, else that of
-// `interp` for Tcl 8.4 and later. False, with Tcl's own message as the interpreter's result,
-// when there is neither. A table once found serves the whole process.
+// `interp`. False, with Tcl's own message as the interpreter's result, when there is neither. A
+// table once found serves the whole process.
 bool Bind(Tcl_Interp* interp);
 
 // The functions; Bind has succeeded.

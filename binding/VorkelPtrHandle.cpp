@@ -38,7 +38,9 @@ Script::Handle* VorkelPtrHandle::CreateHandle(Tcl_Interp* interp) const {
 
 Script::PtrHandleBase* VorkelPtrHandle::GetPtrHandleBase() const {
   static VorkelPtrHandle* prototype = nullptr;
-  if (prototype == nullptr) prototype = new (std::nothrow) VorkelPtrHandle(GetTclInterp());
+  if (prototype == nullptr) {
+    prototype = Script::NewPrototype<VorkelPtrHandle>(GetTclInterp());
+  }
   return prototype;
 }
 

@@ -1,7 +1,7 @@
 // The limits of a device, as its speed data gives them. Frequencies in MHz.
 //
-// The defaults are what an object works with until a load of speed data succeeds; the odd
-// figures among them are meant exactly as written.
+// The defaults are what an object works with until speed data are loaded; a load that fails
+// midway has replaced what it has read. The odd figures are meant exactly as written.
 #ifndef VORKEL_ENGINE_DEVICELIMITS_H_
 #define VORKEL_ENGINE_DEVICELIMITS_H_
 

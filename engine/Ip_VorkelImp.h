@@ -56,10 +56,6 @@ class VorkelImp {
 
   // --- Speed data: engine/SpeedData.cpp, engine/LimitLoaders.cpp ----------------------
 
-  // Asks the host for the calculator of the device. False, with a message issued, when there
-  // is none. engine/timing/Calculator.cpp.
-  bool ObtainCalculator();
-
   // True when a speed controller is there, made on first need from the device selected then.
   bool EnsureSpeedController();
 
@@ -128,9 +124,13 @@ class VorkelImp {
 
   // --- Timing: engine/timing/ ----------------------------------------------------------
 
+  // Asks the host for the calculator of the device. False, with a message issued, when there
+  // is none.
+  bool ObtainCalculator();
+
   // Queries of the host's calculator. It is asked for anew by each; without one, a message is
-  // issued, the error text stays empty and the answer is false. The arguments go to it unread,
-  // and its answer, error text and figure come back as they are.
+  // issued, the error text stays empty and the answer is false. The arguments go to it unread
+  // but for pin names, and its answer, error text and figure come back as they are.
   bool GetVcoFreq(double a1, double a2, double a3, double a4, Port::StringBase* error,
                   double* frequency);
   bool GetPLLPkToPkJitter(double a1, double a2, double a3, const Port::StringBase& t4, double a5,

@@ -5,6 +5,7 @@
 #include <span>
 
 #include "engine/Ip_VorkelImp.h"
+#include "engine/pll/Stages.h"
 
 namespace Ip {
 
@@ -87,8 +88,8 @@ bool Load(VorkelImp& imp, std::span<const Key<Limits>> keys, Limits& limits,
 
 bool VorkelImp::LoadPllLimits(int prim) {
   switch (prim) {
-    case 1: return Load<PllLimits>(*this, kPllKeys, pllLimits, AsRead);
-    case 0: return Load<PllLimits>(*this, kTsynKeys, pllLimits, AsRead);
+    case Pll::kPll: return Load<PllLimits>(*this, kPllKeys, pllLimits, AsRead);
+    case Pll::kTsyn: return Load<PllLimits>(*this, kTsynKeys, pllLimits, AsRead);
     default: return false;
   }
 }

@@ -8,7 +8,7 @@
 class Port_MsgManData {
  public:
   // `category` names the area that speaks ("DesignEntry"), `source`, `line` and `revision`
-  // the statement that reports. The four texts must outlive the object. Never null.
+  // the statement that reports. The texts must outlive the object. Never null.
   static std::unique_ptr<Port_MsgManData> createObject(const char* category, const char* source,
                                                        int line, const char* revision);
 

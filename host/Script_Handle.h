@@ -13,7 +13,8 @@ class PtrHandleBase;
 // interface's slots; the order is part of it.
 class Handle {
  public:
-  // Called when the handle has become visible to scripts, and before it stops being so.
+  // Called when the handle has become visible to scripts, and when its command ends before it
+  // does. Native code that deletes a handle needs no call.
   virtual void Attached() {}
   virtual void Detached() {}
 

@@ -15,8 +15,8 @@ class InterpreterLink;
 
 // A handle with an untyped pointer to a native object, its value.
 //
-// The handle becomes visible to scripts, as a Tcl command with a name of its own, when its
-// Tcl object, text or result is first asked for. From then on the command owns the handle:
+// The handle becomes visible to scripts, as a Tcl command with a name of its own, when it is
+// first made a result or a variable's value, or asked for its Tcl object or text. From then on the command owns the handle:
 // `rename $handle {}` and the end of the interpreter delete it.
 class PtrHandleBase : public Handle {
  public:
@@ -33,6 +33,10 @@ class PtrHandleBase : public Handle {
   // Stores the value and returns 0 (TCL_OK); returns non-zero, with nothing stored, when the
   // handle has none.
   int GetValue(void** value) const;
+  // Keeps the handle from scripts for good: no command is ever made for it, and so none owns
+  // it. For prototypes, which native code holds on to.
+  void StayInvisible() { invisible_ = true; }
+
   // The interpreter of the handle; null when it was given none, and once it has ended.
   Tcl_Interp* GetTclInterp() const;
 
@@ -44,7 +48,16 @@ class PtrHandleBase : public Handle {
   void* value_ = nullptr;
   std::shared_ptr<const InterpreterLink> link_;
   mutable Visible* visible_ = nullptr;
+  bool invisible_ = false;
 };
+
+// A prototype handle of class H; null when there is no memory.
+template <typename H>
+H* NewPrototype(Tcl_Interp* interp) {
+  H* const prototype = new (std::nothrow) H(interp);
+  if (prototype != nullptr) prototype->StayInvisible();
+  return prototype;
+}
 
 // The typed level: handles that stand for objects of class T.
 template <typename T>
@@ -60,7 +73,7 @@ class PtrHandle : public PtrHandleBase {
 
   PtrHandleBase* GetPtrHandleBase() const override {
     static PtrHandle<T>* prototype = nullptr;
-    if (prototype == nullptr) prototype = new (std::nothrow) PtrHandle<T>(GetTclInterp());
+    if (prototype == nullptr) prototype = NewPrototype<PtrHandle<T>>(GetTclInterp());
     return prototype;
   }
 };

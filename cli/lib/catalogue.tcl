@@ -26,7 +26,8 @@ proc ::vorkel::catalogue::describe {device} {
 
 # What a part name, `<device>[<package>][-<grade>]`, stands for, as a dict: device, package,
 # grade, part (the full name, defaults filled in), primitives (those of that grade), limits (a
-# dict from keyword to text, MHz, ns or a count), and description (what `describe` answers).
+# dict from keyword to text, MHz, ns or a count), calculator (its coefficients likewise; empty
+# when it has none), and description (what `describe` answers).
 # A name that stands for nothing is wrong usage.
 #
 # Nothing marks where the device ends, so a name can begin with several devices. As for the
@@ -66,7 +67,8 @@ proc ::vorkel::catalogue::Resolve {device rest} {
   set grade [Member $description grade $grade [expr {$dash ne ""}]]
   set limits [dict get $description limits $grade]
   return [dict create device $device package $package grade $grade part "$device$package-$grade" \
-    primitives [Primitives $limits] limits $limits description $description]
+    primitives [Primitives $limits] limits $limits \
+    calculator [dict get $description calculator $grade] description $description]
 }
 
 # The package or grade (`kind`) of a device: the one named, or the default. A device may do

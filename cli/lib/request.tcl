@@ -89,7 +89,8 @@ proc ::vorkel::request::parse {primitive words} {
   set device [Device $primitive \
     [::vorkel::options::get $given --device $::vorkel::catalogue::defaultPart]]
   return [dict merge $request $special \
-    [dict create part [dict get $device part] limits [dict get $device limits]]]
+    [dict create part [dict get $device part] limits [dict get $device limits] \
+      calculator [dict get $device calculator]]]
 }
 
 # What only a PLL and a TSYN have:

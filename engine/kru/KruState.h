@@ -24,9 +24,9 @@ struct KruState {
   KruPinList _kruChosenPin{};
   std::int32_t _kruChosenM = 0;
   std::int32_t _kruChosenD = 0;
-  bool _kruChosenDivBy2 = false;  // CLKIN_DIVIDE_BY_2; KRU_SP only
+  bool _kruChosenDivBy2 = false;  // CLKIN_DIVIDE_BY_2; a KRU_CLKGEN run leaves it as it is
   double _kruChosenClkdv = 0.0;   // CLKDV or CLKFXDV divide; 0: not used
-  double _kruPhaseOffset = 0.0;   // degrees, common to all outputs; KRU_SP only
+  double _kruPhaseOffset = 0.0;   // degrees, common to all outputs; likewise
 };
 
 }  // namespace Ip

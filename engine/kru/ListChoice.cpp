@@ -45,46 +45,41 @@ bool SynthesiserServes(VorkelImp& imp, const KruPinList& pins, bool divBy2, cons
   return FindMAndD(imp, pins, divBy2, run);
 }
 
-void Take(KruState& kru, const KruPinList& pins, bool divBy2, double clkdv) {
-  kru._kruChosenPin = pins;
-  kru._kruChosenDivBy2 = divBy2;
-  kru._kruChosenClkdv = clkdv;
-}
+// One of the two lists, and what its trace lines call it.
+struct List {
+  KruPinList& pins;
+  const ClkdvList& clkdv;
+  bool divBy2;
+  char name;
+  const char* setting;  // as the trace spells it
+  const char* dashes;
+};
 
-bool TryListF(VorkelImp& imp, const ClkdvList& values, const Run& run) {
-  KruPinList& pins = imp.kru._kruPinsDivBy2F;
-  if (const int n = FirstUnfilled(pins, run.numOut); n < run.numOut) {
+bool TryList(VorkelImp& imp, const List& list, const Run& run) {
+  if (const int n = FirstUnfilled(list.pins, run.numOut); n < run.numOut) {
     TRACE(run.trace,
-          "DLL -------- _kruPinsDivby2F[%d] isn't filled, so KRU won't work for DivBy2 = F\n", n);
+          "DLL -------- _kruPinsDivby2%c[%d] isn't filled, so KRU won't work for %s = %c\n",
+          list.name, n, list.setting, list.name);
     return false;
   }
-  const double clkdv = MakeClkdvConsistent(pins, values, 'F', run);
-  if (!SynthesiserServes(imp, pins, false, run)) return false;
-  TRACE(run.trace, "DLL --    _kruPinsDivBy2F list works!\n");
-  Take(imp.kru, pins, false, clkdv);
-  return true;
-}
-
-bool TryListT(VorkelImp& imp, const ClkdvList& values, const Run& run) {
-  KruPinList& pins = imp.kru._kruPinsDivBy2T;
-  if (const int n = FirstUnfilled(pins, run.numOut); n < run.numOut) {
-    TRACE(run.trace,
-          "DLL -------- _kruPinsDivby2T[%d] isn't filled, so KRU won't work for DivyBy2 = T\n", n);
-    return false;
-  }
-  const double clkdv = MakeClkdvConsistent(pins, values, 'T', run);
-  if (!SynthesiserServes(imp, pins, true, run)) return false;
-  TRACE(run.trace, "DLL ---------- _kruPinsDivBy2T list works!\n");
-  Take(imp.kru, pins, true, clkdv);
+  const double clkdv = MakeClkdvConsistent(list.pins, list.clkdv, list.name, run);
+  if (!SynthesiserServes(imp, list.pins, list.divBy2, run)) return false;
+  TRACE(run.trace, "DLL %s _kruPinsDivBy2%c list works!\n", list.dashes, list.name);
+  imp.kru._kruChosenPin = list.pins;
+  imp.kru._kruChosenDivBy2 = list.divBy2;
+  imp.kru._kruChosenClkdv = clkdv;
   return true;
 }
 
 }  // namespace
 
 bool ChooseList(VorkelImp& imp, const ClkdvLists& clkdv, const Run& run) {
-  if (TryListF(imp, clkdv.f, run)) return true;
+  KruState& kru = imp.kru;
+  if (TryList(imp, {kru._kruPinsDivBy2F, clkdv.f, false, 'F', "DivBy2", "--   "}, run)) {
+    return true;
+  }
   TRACE(run.trace, "DLL ---------- checking 2nd list: _kruPinsDivBy2T \n");
-  return TryListT(imp, clkdv.t, run);
+  return TryList(imp, {kru._kruPinsDivBy2T, clkdv.t, true, 'T', "DivyBy2", "----------"}, run);
 }
 
 }  // namespace Ip::Kru

@@ -26,10 +26,11 @@ struct Split {
   bool onBase = false;  // the request is a fixed phase itself
 };
 
-// The fixed phases lie `distance` degrees apart from 0 on: 180 with the synthesiser's pins
-// alone, 90 with all. `last` is the highest of them; with all pins it serves every phase above
-// it, and with the synthesiser's alone a phase from 360 on is left as it is.
-Split SplitPhase(double phase, double distance) {
+// The fixed phases are 0 and 180 with the synthesiser's pins alone, and 0, 90, 180 and 270 with
+// all pins. With all pins the last of them serves every phase above it, too; with the
+// synthesiser's alone a phase from 360 on is left as it is.
+Split SplitPhase(double phase, bool allPins) {
+  const double distance = allPins ? 90.0 : 180.0;
   const double last = 360.0 - distance;
   for (double base = 0.0; base <= last; base += distance) {
     if (phase == base) return {0.0, 0.0, true};
@@ -37,7 +38,7 @@ Split SplitPhase(double phase, double distance) {
   if (phase < 0.0) return {-phase, phase, false};
   for (double base = 0.0; base <= last; base += distance) {
     const double next = base + distance;
-    const bool open = base == last && distance == 90.0;
+    const bool open = allPins && base == last;
     if (phase >= base && (phase < next || open)) return {phase - base, phase - next, false};
   }
   return {};
@@ -93,7 +94,7 @@ bool FindPhaseOffset(VorkelImp& imp, const Run& run) {
   bool anyOnBase = false;
   for (int n = 0; n < run.numOut; ++n) {
     const auto output = static_cast<std::size_t>(n);
-    const Split split = SplitPhase(imp.requests.reqPhase[output], run.feedbackUsed ? 90.0 : 180.0);
+    const Split split = SplitPhase(imp.requests.reqPhase[output], run.feedbackUsed);
     offsets[output] = split.offset;
     negOffsets[output] = split.negOffset;
     anyOnBase = anyOnBase || split.onBase;

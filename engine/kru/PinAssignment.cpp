@@ -159,9 +159,13 @@ class Assignment {
   // True when the range holds the frequency; else the trace says that the pin cannot be used.
   bool InRangeOf(KruPin pin, const Range& range) const {
     if (range.Holds(frequency_, limits_, feedback2x_)) return true;
+    TraceOutOfRange(pin);
+    return false;
+  }
+
+  void TraceOutOfRange(KruPin pin) const {
     TRACE(run_.trace, "DLL -!!!!!! Can't %suse %s because requested freq %3.3f is out of range\n",
           UsesSynthesiser(pin) ? "potentially " : "", KruPinName(pin).CStr(), frequency_);
-    return false;
   }
 
   // Any other frequency: CLKDV where a value divides the input to it, else CLKFX.
@@ -179,7 +183,7 @@ class Assignment {
         } else if (!foundT && FrequencyIs(half / value)) {
           if (!PhaseIs(0.0)) {
             // The words speak of the frequency; they stand for the phase, too.
-            TraceNoClkdv();
+            TraceOutOfRange(CLKDV);
           } else if (kClkdvByT.Holds(frequency_, limits_, feedback2x_)) {
             PutClkdv(kru_._kruPinsDivBy2T, clkdv_.t, value);
             foundT = true;
@@ -202,12 +206,6 @@ class Assignment {
   void PutClkdv(KruPinList& list, ClkdvList& values, double value) {
     list[output_] = CLKDV;
     values[output_] = value;
-  }
-
-  void TraceNoClkdv() const {
-    TRACE(run_.trace,
-          "DLL -!!!!!! Can't use CLKDV because requested freq %3.3f is out of range\n",
-          frequency_);
   }
 
   KruState& kru_;

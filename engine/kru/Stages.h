@@ -27,8 +27,8 @@ enum ResultCode : int {
 
 // One run of the solver.
 struct Run {
-  double inFreq;  // MHz; not 0
-  int numOut;     // outputs, 1 to kKruOutputs
+  double inFreq;  // MHz; not 0 once the request is parsed
+  int numOut;     // outputs, 1 to kKruOutputs then
   bool feedbackUsed;
   const Trace& trace;
 };
@@ -78,7 +78,7 @@ inline bool Matches(double f, double x, double tolerance) {
   return f == x || InRange(f, x - tolerance, x + tolerance);
 }
 
-// A pin other than CLKFX and CLKFX180 draws on nothing of the frequency synthesiser.
+// True for the pins of a KRU_SP that need an M and a D.
 inline bool UsesSynthesiser(KruPin pin) {
   return pin == KruPin::CLKFX || pin == KruPin::CLKFX180;
 }

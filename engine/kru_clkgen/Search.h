@@ -9,8 +9,8 @@ namespace Ip::KruClkgen {
 
 // One run of the solver.
 struct Run {
-  double inFreq;  // MHz; not 0
-  int numOut;     // outputs, 1 to kKruOutputs
+  double inFreq;  // MHz; not 0 once the request is parsed
+  int numOut;     // outputs, 1 to kKruOutputs then
   const Trace& trace;
 };
 

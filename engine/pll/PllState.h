@@ -47,7 +47,7 @@ struct PllState {
   VcoCandidateTable _vcoCandidates;
   SolutionTable _solutions;
 
-  // The answer of the last run that found one; points into _vcoCandidates, or null.
+  // The answer of the last run; points into _vcoCandidates. Null when that found none.
   const VcoCandidate* chosen = nullptr;
 };
 

@@ -11,7 +11,7 @@
 namespace Ip {
 
 // The earlier calculator is replaced, possibly by none, and not deleted: the host answers with
-// the same one for the same device.
+// the same one for the same controller.
 bool VorkelImp::ObtainCalculator() {
   if (EnsureSpeedController()) {
     cmbCalculator = Tw_BmPhysicalBlockModeler::GetCMBCalculator(speedController);

@@ -10,11 +10,14 @@ namespace Ip {
 
 namespace {
 
-// Walks of up to this many steps, a millisecond or two, are walked.
+// Walks of up to this many steps, some milliseconds at the most, are walked.
 constexpr double kLongestWalk = 1e6;
 
 // Steps looked at on either side of the request.
 constexpr int kWindow = 8;
+
+// Less than the step of any divider.
+constexpr double kSmallestPhaseStep = 1e-307;
 
 // From here on not every whole number is a double.
 constexpr double kAllWhole = 9007199254740992.0;  // 2^53
@@ -31,7 +34,7 @@ double WholeBefore(double k) { return k <= kAllWhole ? k - 1.0 : std::nextafter(
 // it; what the walk holds when it comes to the window is no nearer than the window's first.
 // Downward: up to the request the walk holds some multiple not above it. Which one does not
 // matter, since the first multiple above the request replaces each of them, and no later one
-// replaces that.
+// replaces that; where there is none above, the last multiple does.
 double WalkWindow(double phase, double step, bool positive) {
   const double end = positive ? std::min(phase, 360.0) : std::min(phase + 360.0, 360.0);
   double k = std::floor(end / step);
@@ -73,12 +76,28 @@ double AddUpTo(double duty, double step, double end) {
   return duty;
 }
 
+// Where a walk stops coming nearer to `requested`: at the request itself or, for one below the
+// range, at the last double whose rounded distance is still that of the lowest value. A request
+// that is far below has many of these, and the walk takes the last.
+double LastNearest(double requested, const DutyRange& range) {
+  if (!(requested < range.lowest)) return std::min(requested, range.highest);
+  const double least = range.lowest - requested;
+  if (range.highest - requested <= least) return range.highest;
+  double near = range.lowest;
+  double far = range.highest;
+  for (;;) {
+    const double middle = near + (far - near) / 2.0;
+    if (middle <= near || middle >= far) return near;
+    (middle - requested <= least ? near : far) = middle;
+  }
+}
+
 // The walk of a negative divider goes down from `lowest` for ever, unless it meets the request.
+// Additions round alike on both sides of 0.
 double MeetBelow(double requested, const DutyRange& range) {
-  double duty = range.lowest;
-  for (double steps = 0.0; steps < kLongestWalk && duty >= requested; ++steps) {
+  double duty = -AddUpTo(-range.lowest, -range.step, -requested);
+  for (int i = 0; i < 3 * kWindow && duty >= requested; ++i, duty += range.step) {
     if (duty == requested) return duty;
-    duty += range.step;
   }
   return 0.0;
 }
@@ -92,6 +111,7 @@ double NearestPhaseStepOfAny(double phase, double step, bool positive) {
     return !positive && phase == -360.0 ? phase : 0.0;
   }
   if (360.0 / step <= kLongestWalk || step == 0.0) return NearestPhaseStep(phase, step, positive);
+  if (step < kSmallestPhaseStep) return 0.0;  // no divider's
   // Nothing replaces the first multiple for a request below the range, nor for a NaN.
   if (!positive && !(phase > -360.0)) return -360.0;
   return WalkWindow(phase, step, positive);
@@ -108,7 +128,7 @@ double NearestDutyCycleOfAny(double percent, double divider, double maxHighLowCo
   // A step that does not move the upper end leaves the walk standing somewhere below it.
   if (range.step == 0.0 || range.highest + range.step == range.highest) return 0.0;
   if ((range.highest - range.lowest) / range.step > kLongestWalk) {
-    range.lowest = AddUpTo(range.lowest, range.step, std::min(requested, range.highest));
+    range.lowest = AddUpTo(range.lowest, range.step, LastNearest(requested, range));
     // Beyond the request no step comes nearer.
     range.highest = std::min(range.highest, range.lowest + 3 * kWindow * range.step);
   }

@@ -10,7 +10,7 @@
 
 namespace Ip {
 
-// As NearestPhaseStep, for any step.
+// As NearestPhaseStep, for the step of any divider.
 double NearestPhaseStepOfAny(double phase, double step, bool positive);
 
 // As NearestDutyCycle, for any divider.

@@ -18,8 +18,9 @@ double PhaseStep(double divider);
 
 // The multiple of `step` that a requested phase is snapped to, in degrees; 0 when either is 0.
 // Upward (`positive`) that is the nearest from 0 to 360, and the later of two equally near.
-// Downward it is the first from -360 to 0 that is not below the request, for a request from
-// -360 on: each multiple is weighed against the best so far and not against the request.
+// Downward it is the first from -360 to 0 that is not below the request, or the last where all
+// are: each multiple is weighed against the best so far and not against the request. A request
+// below -360 stays there.
 // `step` is positive and at least 360 / INT_MAX, or 0.
 double NearestPhaseStep(double phase, double step, bool positive);
 

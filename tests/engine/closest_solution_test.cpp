@@ -255,6 +255,17 @@ TEST_F(ClosestSolutionTest, SolutionsOfAnEarlierRunAreGone) {
   EXPECT_EQ(trace_, Clk0("0.000000") + kOneForClk0);
 }
 
+TEST_F(ClosestSolutionTest, FewerSolutionsLeaveNoneOfAnEarlierRunBehindThem) {
+  Add(800);
+  Add(900);
+  Add(600);
+  ASSERT_EQ(SelectVco(1), 600.0);
+  (*this)[2].phaseDiff[0] = 1;
+  EXPECT_EQ(SelectVco(1), 800.0);
+  EXPECT_THAT(trace_, HasSubstr(kPickBest + Listed(0, "800.000") + Listed(1, "900.000") +
+                                kBestClk0));
+}
+
 TEST_F(ClosestSolutionTest, LeavesTheCandidates) {
   AddThree();
   (*this)[1].phaseDiff[1] = 0.6;

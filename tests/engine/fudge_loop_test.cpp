@@ -168,6 +168,34 @@ TEST_F(FudgeLoopTest, AFailedLoopLeavesNothingChosen) {
   EXPECT_EQ(imp_.GetChosenVCO(), 0.0);
 }
 
+// Without a trace the loop leaves out passes that cannot succeed. What it answers is the same,
+// at both ends of the fudges and beyond them.
+TEST_F(FudgeLoopTest, AnswersTheSameWithTheTraceOff) {
+  struct Case {
+    double inFreq, freq, least, most;
+  };
+  for (const Case& c : {Case{100, 200, 400, 1080}, Case{100, 199.998, 399.9999, 400.0001},
+                        Case{100, 200.003, 399.9999, 400.0001},
+                        Case{110.999, 100, 110.9985, 110.9995},
+                        Case{89.001, 100, 89.0005, 89.0015}, Case{111, 100, 110.9999, 111.0001},
+                        Case{89, 100, 88.9999, 89.0001}, Case{100, 0, 400, 1080},
+                        Case{100, -5, 400, 1080}, Case{33, 7.3, 1079.99, 1080}}) {
+    inFreq_ = c.inFreq;
+    const bool solved = Loop(c.freq, c.least, c.most);
+    const double vco = imp_.GetChosenVCO();
+    const double div0 = imp_.GetChosenDiv0();
+    const double m = imp_.GetChosenM();
+    const int d = imp_.GetChosenD();
+    imp_.pll.chosen = nullptr;
+    const Trace silent(false);
+    EXPECT_EQ(Ip::Pll::FudgeLoop(imp_, {inFreq_, 1, kPll, silent}), solved) << c.freq;
+    EXPECT_EQ(imp_.GetChosenVCO(), vco) << c.freq;
+    EXPECT_EQ(imp_.GetChosenDiv0(), div0) << c.freq;
+    EXPECT_EQ(imp_.GetChosenM(), m) << c.freq;
+    EXPECT_EQ(imp_.GetChosenD(), d) << c.freq;
+  }
+}
+
 TEST_F(FudgeLoopTest, IsSilentWithTheTraceOff) {
   imp_.pll.minAdjVco = 2;
   imp_.pll.maxAdjVco = 1;

@@ -167,6 +167,7 @@ TEST_F(ImplementationObjectTest, SetLowBandwidthSetsAndClears) {
 // --- Speed controller ----------------------------------------------------------------------
 
 TEST_F(ImplementationObjectTest, WithoutADeviceThereIsNoController) {
+  host_.devices[""] = {{"KEY", FigureFor(3)}};  // not even when the host would have one
   EXPECT_FALSE(imp_.EnsureSpeedController());
   EXPECT_EQ(imp_.pic, nullptr);
   EXPECT_EQ(imp_.speedController, nullptr);

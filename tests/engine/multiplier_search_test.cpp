@@ -87,6 +87,28 @@ TEST_F(MultiplierSearchTest, ThePfdFrequencyIsThatOfTheRealD) {
   EXPECT_FALSE(Search(512, 512 * 1.0004, 512.1, kNoMaximum));
 }
 
+// 33.333 / 3 is one unit in the last place less than 55.555 / 5.
+TEST_F(MultiplierSearchTest, ThePfdFrequencyIsTheInputByD) {
+  volatile double inFreq = 33.333;
+  volatile double vco = 55.555;
+  ASSERT_EQ(inFreq * 5 / vco, 3.0);
+  ASSERT_LT(inFreq / 3, vco / 5);
+  EXPECT_TRUE(Search(vco, inFreq, kNoMinimum, inFreq / 3));
+  EXPECT_EQ(candidate_.m, 5.0);
+  EXPECT_EQ(candidate_.d, 3u);
+}
+
+// 27 * 49 / 1323 is 1, and 27 / 1323 * 49 is one unit in the last place less.
+TEST_F(MultiplierSearchTest, DIsTheProductByTheVco) {
+  volatile double inFreq = 27;
+  volatile double vco = 1323;
+  ASSERT_NE(inFreq / vco * 49, 1.0);
+  EXPECT_TRUE(Search(vco, inFreq));
+  EXPECT_EQ(trace_,
+            "DLL - RK --> _prim = 1 \n"
+            "DLL-- For VCO = 1323.000000: M = 49.000000, D = (float) 1.000000, (int) 1\n");
+}
+
 // --- Remainder of D: a VCO of a power of two makes inFreq / vco exact --------------------------
 
 TEST_F(MultiplierSearchTest, ASmallRemainderIsAcceptedAndTraced) {

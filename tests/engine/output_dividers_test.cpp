@@ -7,6 +7,7 @@
 #include <cstdio>
 #include <string>
 
+#include "engine/pll/OutputDividers.h"
 #include "engine/pll/Stages.h"
 #include "tests/engine/EngineTest.h"
 
@@ -203,6 +204,43 @@ TEST_F(OutputDividersTest, AnEmptyTableServesNoOutput) {
   Request(50);
   EXPECT_FALSE(Find(2));
   EXPECT_EQ(trace_, GivenUp(1));
+}
+
+TEST_F(OutputDividersTest, EveryToleranceIsInclusive) {
+  volatile double tolerance = 0.0;
+  for (int number = 0; number < 27; ++number) {
+    EXPECT_EQ(Ip::Pll::Tolerance(number), tolerance);
+    EXPECT_EQ(Ip::Pll::FirstTolerance(tolerance), number);
+    EXPECT_EQ(Ip::Pll::FirstTolerance(Above(tolerance)), number + 1);
+    tolerance = tolerance + 0.01;
+  }
+  EXPECT_EQ(Ip::Pll::kTolerances, 27);
+}
+
+TEST_F(OutputDividersTest, ErrorsThatAreNoFractionsHaveTheFirstToleranceOrNone) {
+  EXPECT_EQ(Ip::Pll::FirstTolerance(-5), 0);
+  EXPECT_EQ(Ip::Pll::FirstTolerance(-1e300), 0);
+  EXPECT_EQ(Ip::Pll::FirstTolerance(-kInfinity), 0);
+  EXPECT_EQ(Ip::Pll::FirstTolerance(-0.0), 0);
+  EXPECT_EQ(Ip::Pll::FirstTolerance(5e-324), 1);
+  EXPECT_EQ(Ip::Pll::FirstTolerance(1), 27);
+  EXPECT_EQ(Ip::Pll::FirstTolerance(1e300), 27);
+  EXPECT_EQ(Ip::Pll::FirstTolerance(kInfinity), 27);
+  EXPECT_EQ(Ip::Pll::FirstTolerance(kNan), 27);
+}
+
+// Against the walk from tolerance to tolerance, on a grid that meets none of them exactly.
+TEST_F(OutputDividersTest, TheFirstToleranceIsThatOfTheWalk) {
+  for (int i = 0; i < 3000; ++i) {
+    const double error = i * 1.0001e-4;
+    int number = 0;
+    double tolerance = 0.0;
+    while (number < 27 && !(error <= tolerance)) {
+      tolerance += 0.01;
+      ++number;
+    }
+    EXPECT_EQ(Ip::Pll::FirstTolerance(error), number) << error;
+  }
 }
 
 // --- Several outputs -------------------------------------------------------------------------

@@ -490,6 +490,33 @@ TEST_F(PllDriverTest, TheSpeedDataStayThoseOfTheFirstDevice) {
   EXPECT_EQ(imp_.GetChosenVCO(), 400.0);
 }
 
+// Passes that are left out without a trace are such as fail. The requests below are solved by a
+// fudge, or by none.
+TEST_F(PllDriverTest, TheAnswerDoesNotDependOnTheTraceFlag) {
+  SetPll(kPart, {.vcoMin = 399.9999, .vcoMax = 400.0001});
+  for (const char* freqs :
+       {"199.998 50", "200.003 31", "199.998 0", "199.998 -100", "199.998 nan", "199.998 inf",
+        "199.998 -inf", "199.998 1e-320", "-1 50", "nan 50", "inf 50", "1e300 50", "0 50"}) {
+    const int code = MinPower({.freqs = freqs, .count = 2});
+    const double vco = imp_.GetChosenVCO();
+    const int div1 = imp_.GetChosenDivN(1);
+    EXPECT_EQ(imp_.CalculateMinPowerOutFreqs(freqs, 100, 0, 2, false, false, kPll, false), code)
+        << freqs;
+    EXPECT_EQ(imp_.GetChosenVCO(), vco) << freqs;
+    EXPECT_EQ(imp_.GetChosenDivN(1), div1) << freqs;
+  }
+}
+
+// A quotient by -0 is negative and so within any tolerance: output 1 has a divider.
+TEST_F(PllDriverTest, TheAnswerToARequestOfMinusZeroDoesNotDependOnTheTraceFlag) {
+  SetPll(kPart, {.vcoMin = 399.9999, .vcoMax = 400.0001});
+  ASSERT_EQ(MinPower({.freqs = "199.998 -0", .count = 2}), 1);
+  EXPECT_EQ(imp_.GetChosenDivN(1), 1);
+  EXPECT_EQ(
+      imp_.CalculateMinPowerOutFreqs("199.998 -0", 100, 0, 2, false, false, kPll, false), 1);
+  EXPECT_EQ(imp_.GetChosenDivN(1), 1);
+}
+
 // --- Trace ---------------------------------------------------------------------------------
 
 TEST_F(PllDriverTest, WithoutTheTraceFlagNothingIsPrinted) {

@@ -454,6 +454,21 @@ TEST_F(SolverPassTest, APassBeginsWithAnEmptyTableAndNothingChosen) {
   EXPECT_THAT(SlotsOf(table_.Occupied()), IsEmpty());
 }
 
+TEST_F(SolverPassTest, WhatWasChosenIsGoneHoweverThePassFails) {
+  imp_.requests.reqOutFreq = {200};
+  ASSERT_TRUE(Pass(0, 1));
+  imp_.requests.reqOutFreq = {7000};
+  SetRange(7000, 7000);
+  EXPECT_FALSE(Pass(0, 1)) << "no M and D";
+  EXPECT_EQ(imp_.pll.chosen, nullptr);
+
+  SetRange(400, 1080);
+  imp_.requests.reqOutFreq = {200, 2000};
+  ASSERT_TRUE(Pass(0, 1));
+  EXPECT_FALSE(Pass(0, 2)) << "no divider of output 1";
+  EXPECT_EQ(imp_.pll.chosen, nullptr);
+}
+
 TEST_F(SolverPassTest, APassSetsThePrimitiveOfTheProcess) {
   imp_.requests.reqOutFreq = {3};
   SetRange(7000, 7001);

@@ -5,6 +5,7 @@
 
 #include <string>
 
+#include "engine/pll/Div0Steps.h"
 #include "engine/pll/Stages.h"
 #include "tests/engine/EngineTest.h"
 
@@ -210,6 +211,79 @@ TEST_F(VcoEnumerationTest, ARangeThatIsNoNumberHoldsNothing) {
   EXPECT_EQ(Enumerate(200, 0, true), 0);
   SetRange(kNan, 1080);
   EXPECT_EQ(Enumerate(200, 0, true), 0);
+}
+
+// Products of the smallest doubles are rounded to whole multiples of 5e-324: 2.625 times it is
+// three of them, as many as 3 times, and lies in the range.
+TEST_F(VcoEnumerationTest, TheSmallestFrequencies) {
+  const double smallest = 5e-324;
+  SetRange(3 * smallest, 3 * smallest);
+  EXPECT_EQ(Enumerate(smallest, 0, false), 7) << "2.625, 2.75, ... 3.375";
+  EXPECT_THAT(SlotsOf(table_.Occupied()), ElementsAre(6, 7, 8, 9, 10, 11, 12));
+}
+
+// --- Steps -----------------------------------------------------------------------------------
+
+using Ip::Pll::Div0Steps;
+
+TEST(Div0Steps, AreWholeOrEighthsFrom2On) {
+  const Div0Steps whole(true);
+  ASSERT_EQ(whole.Count(), 128);
+  for (int step = 0; step < 128; ++step) EXPECT_EQ(whole[step], step + 1.0);
+  const Div0Steps eighths(false);
+  ASSERT_EQ(eighths.Count(), 1010);
+  double divider = 2.0;
+  EXPECT_EQ(eighths[0], 1.0);
+  for (int step = 1; step < 1010; ++step) {
+    EXPECT_EQ(eighths[step], divider);
+    divider += 0.125;
+  }
+}
+
+TEST(Div0Steps, BelowIsTheLastStepThatIsNotAbove) {
+  for (const bool integer : {true, false}) {
+    const Div0Steps steps(integer);
+    for (int step = 0; step < steps.Count(); ++step) {
+      EXPECT_EQ(steps.Below(steps[step]), step);
+      EXPECT_EQ(steps.Below(Below(steps[step])), step == 0 ? 0 : step - 1);
+    }
+    EXPECT_EQ(steps.Below(1.9), 0);
+    EXPECT_EQ(steps.Below(-3), 0);
+    EXPECT_EQ(steps.Below(kNan), 0);
+    EXPECT_EQ(steps.Below(200), steps.Count() - 1);
+    EXPECT_EQ(steps.Below(kInfinity), steps.Count() - 1);
+  }
+}
+
+// No step before it may bring the frequency up to the VCO minimum, however the numbers round.
+TEST(Div0Steps, NoneBeforeTheFirstWorthTryingReachesTheMinimum) {
+  for (const bool integer : {true, false}) {
+    const Div0Steps steps(integer);
+    for (const double freq : {0.1, 1.0 / 3.0, 3.14, 27.0, 66.6, 148.35, 399.9, 1e-300, 1e300}) {
+      for (int meets = 0; meets < steps.Count(); meets += 7) {
+        const double exact = freq * steps[meets];
+        for (const double minimum : {exact, Above(exact), Below(exact)}) {
+          const int first = steps.FirstWorthTrying(freq, minimum);
+          ASSERT_GE(first, 0);
+          ASSERT_LE(first, steps.Count());
+          if (first > 0) {
+            EXPECT_FALSE(freq * steps[first - 1] >= minimum) << freq << " " << minimum;
+          }
+        }
+      }
+    }
+  }
+}
+
+TEST(Div0Steps, OddFrequencies) {
+  const Div0Steps steps(false);
+  EXPECT_EQ(steps.FirstWorthTrying(0.0, 400), 1010);
+  EXPECT_EQ(steps.FirstWorthTrying(-1.0, 400), 1010);
+  EXPECT_EQ(steps.FirstWorthTrying(kNan, 400), 1010);
+  EXPECT_EQ(steps.FirstWorthTrying(-1.0, -400), 0);
+  EXPECT_EQ(steps.FirstWorthTrying(0.0, 0.0), 0);
+  EXPECT_EQ(steps.FirstWorthTrying(1.0, kNan), 0);
+  EXPECT_EQ(steps.FirstWorthTrying(kInfinity, 400), 0);
 }
 
 TEST_F(VcoEnumerationTest, ANegativeRangeHoldsNegativeFrequencies) {

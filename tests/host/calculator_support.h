@@ -95,7 +95,8 @@ class Asked {
     });
   }
   Answer KruPhaseError() {
-    return Ask([&](auto* error, auto* figure) { return calculator_->KruPhaseError(error, figure); });
+    return Ask(
+        [&](auto* error, auto* figure) { return calculator_->KruPhaseError(error, figure); });
   }
   // The period; phase and duty cycle are kept.
   Answer KruPeriod(double input, int pin, bool divide_by_2, double m = 0, double d = 0,

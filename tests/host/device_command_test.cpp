@@ -49,7 +49,7 @@ TEST_F(DeviceCommandTest, DescribesADevice) {
                                          "CLKPFD_FREQ_MAX = 1e-7\n");
   EXPECT_EQ(tcl_.Eval("dict keys [::Vorkel::Devices describe dev]"),
             "name description file packages default_package grades default_grade primitives "
-            "limits");
+            "limits calculator");
   EXPECT_EQ(Described("dev", "name"), "dev");
   EXPECT_EQ(Described("dev", "description"), "for t\xc3\xa9sts");
   EXPECT_EQ(Described("dev", "file"), path);
@@ -61,6 +61,7 @@ TEST_F(DeviceCommandTest, DescribesADevice) {
   EXPECT_EQ(Described("dev", "limits slow"),
             "VCOCLK_FREQ_MIN 400 VCOCLK_FREQ_MAX 1000.5 O_MAX_HT_LT 64");
   EXPECT_EQ(Described("dev", "limits fast"), "CLKPFD_FREQ_MAX 1e-07");
+  EXPECT_EQ(Described("dev", "calculator slow"), "");
 }
 
 TEST_F(DeviceCommandTest, DescribesADeviceWithoutDefaults) {

@@ -12,9 +12,9 @@ struct LoopCoefficients {
   // `grade` has the coefficients of the loop.
   static LoopCoefficients Of(const Device::Grade& grade);
 
-  double kappa;                 // LOOP_KAPPA, ps per square root of a microsecond
-  double kappa_vco;             // LOOP_KAPPA_VCO, the VCO frequency of that kappa, MHz
-  double bandwidth_low;         // LOOP_BANDWIDTH_..., fractions of the PFD frequency
+  double kappa;          // LOOP_KAPPA, ps per square root of a microsecond
+  double kappa_vco;      // LOOP_KAPPA_VCO, the VCO frequency of that kappa, MHz
+  double bandwidth_low;  // LOOP_BANDWIDTH_..., fractions of the PFD frequency
   double bandwidth_optimized;
   double bandwidth_high;
   double buffer_jitter;         // LOOP_BUFFER_JITTER, ps rms

@@ -97,9 +97,8 @@ bool DeviceCalculator::KruPkToPkJitter(double a1, int pin, bool isKruClkgen, boo
     arguments.CheckD(a3);
     const KruSettings settings = {
         .input = a1, .divide_by_2 = f1, .feedback = f2, .phase_shift = f3, .m = a2, .d = a3};
-    arguments.CheckFrequency(output.source == KruSource::kDivider
-                                 ? LineFrequency(settings)
-                                 : PinFrequency(output, settings));
+    arguments.CheckFrequency(output.source == KruSource::kDivider ? LineFrequency(settings)
+                                                                  : PinFrequency(output, settings));
     *jitter = Calculator::KruPkToPkJitter(KruCoefficients::Of(grade_), output, settings);
   });
 }
@@ -129,9 +128,8 @@ bool DeviceCalculator::KruPhaseError(Port::StringBase* error, double* phaseError
 
 // a1 input frequency (MHz), f1 CLKIN_DIVIDE_BY_2, a2 M, a3 D, a4 CLKDV divide.
 bool DeviceCalculator::KruPeriodPhaseDutyCycle(double a1, int pin, bool f1, double a2, double a3,
-                                               double a4, Port::StringBase* error,
-                                               double* period, double* phase,
-                                               double* dutyCycle) {
+                                               double a4, Port::StringBase* error, double* period,
+                                               double* phase, double* dutyCycle) {
   return Answer(error, [&] {
     auto arguments = KruArguments::Any(grade_, device_name_);
     CheckInputFrequency(a1);
@@ -140,8 +138,7 @@ bool DeviceCalculator::KruPeriodPhaseDutyCycle(double a1, int pin, bool f1, doub
     arguments.CheckM(a2);
     arguments.CheckD(a3);
     arguments.CheckDivide(a4);
-    const KruSettings settings = {
-        .input = a1, .divide_by_2 = f1, .m = a2, .d = a3, .clkdv = a4};
+    const KruSettings settings = {.input = a1, .divide_by_2 = f1, .m = a2, .d = a3, .clkdv = a4};
     *period = kNanosecondsTimesMegahertz / PinFrequency(output, settings);
     *phase = output.phase;
     *dutyCycle = KruDutyCycle(output, settings);

@@ -114,8 +114,8 @@ void KruArguments::CheckDivide(double divide) {
 }
 
 void KruArguments::CheckFrequency(double frequency) const {
-  const std::string keyword = "D_KRU_" + std::string(pin_->frequency) +
-                              "_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_";
+  const std::string keyword =
+      "D_KRU_" + std::string(pin_->frequency) + "_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_";
   const double lowest = 1000.0 / *grade_.Figure(keyword + "MAXPERIOD");
   const double highest = 1000.0 / *grade_.Figure(keyword + "MINPERIOD");
   if (IsWithinLimits(frequency, lowest, highest)) return;

@@ -31,8 +31,7 @@ double Buffers(const KruSettings& settings) {
 // for the doubler the place of its second tap, for the synthesiser the length of its ring; and
 // that of the phase shifter.
 double TapSettings(const KruPin& pin, const KruSettings& settings) {
-  const bool second =
-      pin.source == KruSource::kDoubler || pin.source == KruSource::kSynthesiser;
+  const bool second = pin.source == KruSource::kDoubler || pin.source == KruSource::kSynthesiser;
   return 1.0 + (second ? 1.0 : 0.0) + (settings.phase_shift ? 1.0 : 0.0);
 }
 

@@ -36,9 +36,8 @@ std::string RangeOfM(Primitive primitive) {
 }
 
 bool IsOutputDivider(Primitive primitive, double divider) {
-  return primitive == Device::kTsyn
-             ? IsTsynValue(divider, kLeastFractionalDivider, kLargestDivider)
-             : IsWhole(divider, 1.0, kLargestDivider);
+  return primitive == Device::kTsyn ? IsTsynValue(divider, kLeastFractionalDivider, kLargestDivider)
+                                    : IsWhole(divider, 1.0, kLargestDivider);
 }
 
 std::string RangeOfOutputDivider(Primitive primitive) {
@@ -111,9 +110,9 @@ double LoopArguments::CheckLargestCount(double count, double divider) const {
   const double largest = count == 0.0 ? *grade_.Figure("O_MAX_HT_LT") : count;
   if (IsWithin(largest, least, std::numeric_limits<double>::max())) return largest;
   if (count == 0.0) {
-    Refuse(Statement("Output divider", divider),
-           "at most " + NumberText(2.0 * largest + 0.5) + ", as high and low counts end at " +
-               NumberText(largest));
+    Refuse(Statement("Output divider", divider), "at most " + NumberText(2.0 * largest + 0.5) +
+                                                     ", as high and low counts end at " +
+                                                     NumberText(largest));
   }
   Refuse(Statement("Largest high or low count", count),
          "0 (the device's) or a finite number from " + NumberText(least) +

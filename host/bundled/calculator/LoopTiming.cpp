@@ -22,7 +22,7 @@ double PhaseOnStep(double requested, double divider) {
   if (requested >= 0.0) {
     return std::floor(requested * steps / kFullCycle + 0.5) / steps * kFullCycle;
   }
-  const double from = std::max(requested + kFullCycle - kPrintedPhase, 0.0);
+  const double from = requested + kFullCycle - kPrintedPhase;
   return std::ceil(from * steps / kFullCycle) / steps * kFullCycle - kFullCycle;
 }
 

@@ -2,7 +2,7 @@
 //
 // Users of the speed data multiply every figure by 1e9 and compare the product with round
 // numbers: a limit of 1080 MHz must admit 1080 MHz. The figure is therefore chosen for its
-// product. A few numbers are the product of no double, because the products of neighbouring
+// product. About one number in twenty is the product of no double, because the products of neighbouring
 // doubles can lie almost two units in the last place apart. Those, with 15, 60 and 960 among
 // them, come back one unit in the last place off, whatever is done here.
 //

@@ -82,10 +82,8 @@ Tcl_Obj* NewPrimitiveList(unsigned primitives) {
 // The set of the primitives of which the grade has all keywords.
 unsigned CompletePrimitives(const Device::Grade& grade) {
   unsigned complete = 0;
-  for (const Device::Primitive primitive : Device::kPrimitives) complete |= primitive;
-  const auto keywords = Device::Keywords();
-  for (std::size_t i = 0; i < keywords.size(); ++i) {
-    if (!grade.figures[i]) complete &= ~keywords[i].primitives;
+  for (const Device::Primitive primitive : Device::kPrimitives) {
+    if (grade.Has(primitive)) complete |= primitive;
   }
   return complete;
 }
@@ -99,12 +97,26 @@ Tcl_Obj* NewLimits(const Device::Grade& grade) {
   return limits;
 }
 
+Tcl_Obj* NewCoefficients(const Device::Grade& grade) {
+  Tcl_Obj* const list = NewList();
+  const auto coefficients = Device::Coefficients();
+  for (std::size_t i = 0; i < coefficients.size(); ++i) {
+    if (!grade.coefficients[i]) continue;
+    AppendPair(list, coefficients[i].name, NewNumber(*grade.coefficients[i]));
+  }
+  return list;
+}
+
 Tcl_Obj* NewDescription(const Device::DeviceFile& file) {
   const std::string default_grade = file.default_grade.value_or("");
   const Device::Grade* grade = file.FindGrade(default_grade);
   if (grade == nullptr) grade = &file.grades.front();
   Tcl_Obj* const limits = NewList();
-  for (const Device::Grade& each : file.grades) AppendPair(limits, each.name, NewLimits(each));
+  Tcl_Obj* const calculator = NewList();
+  for (const Device::Grade& each : file.grades) {
+    AppendPair(limits, each.name, NewLimits(each));
+    AppendPair(calculator, each.name, NewCoefficients(each));
+  }
 
   Tcl_Obj* const description = NewList();
   AppendPair(description, "name", NewText(file.device));
@@ -116,6 +128,7 @@ Tcl_Obj* NewDescription(const Device::DeviceFile& file) {
   AppendPair(description, "default_grade", NewText(default_grade));
   AppendPair(description, "primitives", NewPrimitiveList(CompletePrimitives(*grade)));
   AppendPair(description, "limits", limits);
+  AppendPair(description, "calculator", calculator);
   return description;
 }
 

@@ -28,7 +28,7 @@ int PtrHandleBase::GetValue(void** value) const {
 
 PtrHandleBase::Visible* PtrHandleBase::EnsureVisible() const {
   Tcl_Interp* const interp = GetTclInterp();
-  if (visible_ == nullptr && interp != nullptr) {
+  if (visible_ == nullptr && interp != nullptr && !invisible_) {
     // From here on the command owns the handle, constant or not.
     auto* const self = const_cast<PtrHandleBase*>(this);
     visible_ = Visible::Create(self, interp);
