@@ -24,16 +24,18 @@ class Div0Steps {
   // The divider of a step; exact, as all of them are multiples of 1/8.
   double operator[](int step) const { return step == 0 ? 1.0 : 2.0 + width_ * (step - 1); }
 
-  // The last step whose divider is not above `divider`, cut to the steps there are.
+  // The last step whose divider is not above `divider`, cut to the steps there are; the first
+  // when all are above.
   int Below(double divider) const {
     if (!(divider >= 2.0)) return 0;
     return static_cast<int>(std::min((divider - 2.0) / width_ + 1.0, Count() - 1.0));
   }
 
   // A step before which no divider brings `outFreq0` (MHz) up to `minVco` (MHz). One step more
-  // than the quotient says makes up for its rounding. Count() when no step does.
+  // than the quotient says makes up for its rounding, which is not so near the smallest
+  // doubles. Count() where no step can.
   int FirstWorthTrying(double outFreq0, double minVco) const {
-    if (!(minVco > 0.0)) return 0;
+    if (!(minVco > 1e-290)) return 0;
     if (!(outFreq0 > 0.0)) return Count();
     return std::max(Below(minVco / outFreq0) - 1, 0);
   }

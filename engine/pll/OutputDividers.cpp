@@ -21,7 +21,6 @@ namespace Ip::Pll {
 namespace {
 
 constexpr double kSmallestDivider = 1.0;
-constexpr double kLargestDivider = 128.0;
 constexpr double kToleranceStep = 0.01;  // a fraction of the requested frequency
 
 // The tolerances, and the one that comes after the last.

@@ -8,6 +8,9 @@
 
 namespace Ip::Pll {
 
+// The largest divider of an output.
+inline constexpr double kLargestDivider = 128.0;
+
 // Relative tolerances of an output frequency: 0.00, 0.01, ... 0.26, by repeated addition.
 inline constexpr int kTolerances = 27;
 
@@ -34,7 +37,7 @@ struct OutputRange {
 OutputRange RangeOfOutput(const PllLimits& limits, int n);
 
 // The divider, a whole number from 1 to 128, nearest to the ratio of `vco` and `requested`
-// (both MHz), and what comes of it.
+// (both MHz), and what comes of it. A NaN has the divider 0, and no tolerance.
 OutputFit FitOutput(double vco, double requested, const OutputRange& range);
 
 }  // namespace Ip::Pll

@@ -10,7 +10,8 @@ namespace {
 constexpr int kFirstChunk = 16;   // passes; small, since most fudges are
 constexpr int kChunkGrowth = 4;
 constexpr int kKeyBits = 5;       // for tolerance numbers 0 to kTolerances
-static_assert(kTolerances < (1 << kKeyBits) - 1);
+constexpr unsigned kDigit = (1u << kKeyBits) - 1;
+static_assert(kTolerances < kDigit);
 
 // Above this output-0 frequency, in MHz, rounding is no longer small against a fudge step.
 constexpr double kLargestOutFreq0 = 1e9;
@@ -28,18 +29,23 @@ PassFilter::PassFilter(const VorkelImp& imp, const Run& run, double fudgeStep)
       outFreq0_(imp.requests.reqOutFreq[0]),
       steps_(HasIntegerDiv0(imp, run)),
       windows_(FindVcoWindows(imp, run)),
-      applies_(Applies(imp, run)) {
+      hopeless_(IsHopelessRun(imp, run, windows_)),
+      applies_(std::fabs(outFreq0_) <= kLargestOutFreq0) {
   for (int n = 1; n < run.count; ++n) {
-    ranges_[static_cast<std::size_t>(n)] = RangeOfOutput(imp.pllLimits, n);
+    const auto output = static_cast<std::size_t>(n);
+    ranges_[output] = RangeOfOutput(imp.pllLimits, n);
+    inverse_[output] = 1.0 / imp.requests.reqOutFreq[output];
   }
 }
 
-// M and D need an input frequency that is no further from the VCO's than 64 or 80 times. So
-// where the VCO range begins well above 0, only input frequencies do that matter; where it does
-// not (a negative second input clock moves its lower end), the input frequency must itself.
-bool PassFilter::Applies(const VorkelImp& imp, const Run& run) {
-  return std::fabs(imp.requests.reqOutFreq[0]) <= kLargestOutFreq0 &&
-         (imp.pll.minAdjVco >= kSmallestFrequency || run.inFreq >= kSmallestFrequency);
+bool PassFilter::IsHopelessRun(const VorkelImp& imp, const Run& run, const VcoWindows& windows) {
+  // M and D need a VCO above 0. Fudges end at 11 MHz and dividers begin at 1.
+  const double outFreq0 = imp.requests.reqOutFreq[0];
+  if (!(outFreq0 >= -11.0 && outFreq0 - 11.0 <= imp.pll.maxAdjVco)) return true;
+  // So small an input frequency needs as small a VCO; but output 0 shifted by a fudge is 0, or
+  // as large as the rounding of the fudge at least.
+  if (!(run.inFreq >= kSmallestFrequency)) return true;
+  return windows.empty();
 }
 
 bool PassFilter::MaySucceed(double fudge) {
@@ -66,6 +72,7 @@ void PassFilter::WorkOutChunk(double firstFudge) {
 void PassFilter::WorkOutDirection(double sign) {
   sign_ = sign;
   std::fill_n(best_.begin(), chunk_, kNoKey);
+  scanned_.reset();
   const double slowest = std::min(OutFreq0(0), OutFreq0(chunk_ - 1));
   const double fastest = std::max(OutFreq0(0), OutFreq0(chunk_ - 1));
   if (!(fastest > 0.0)) return;  // no VCO frequency above 0
@@ -98,7 +105,7 @@ int PassFilter::SurelyKeptTolerance(double slowest, double fastest) const {
   if (!(requested > 0.0 && slowest > 0.0)) return kAny;
   const double off = 0.5 * steps_.Width() * fastest * kMargin;
   const double highest = std::min(imp_.pll.maxAdjVco, slowest * steps_[steps_.Count() - 1]) - off;
-  const double divider = std::min(std::floor(highest / requested), 128.0);
+  const double divider = std::min(std::floor(highest / requested), kLargestDivider);
   const double multiple = divider * requested;
   const double lowest = std::max(imp_.pll.minAdjVco, fastest * steps_[1]) + off;
   if (!(divider >= 1.0 && multiple * kMargin <= highest && multiple >= lowest * kMargin)) {
@@ -141,24 +148,69 @@ void PassFilter::AddCandidate(int attempt, double vco) {
   const auto index = static_cast<std::size_t>(attempt);
   if (maybe_.test(index) || !IsCandidate(vco)) return;
   if (run_.count > 1) {
-    if (best_[index] == kNoKey) best_[index] = WitnessKey(attempt);
     const Key key = KeyOf(vco, best_[index]);
-    if (key == kNoKey) return;
-    // No witness yet, or this candidate is as good: look at all of them.
-    best_[index] = SmallestKey(attempt);
-    if (key > best_[index]) return;
+    if (key == kNoKey || IsPutOut(attempt, key)) return;
   }
   maybe_.set(index);
 }
 
+// True when a candidate with that key, which is not above the smallest known, goes all the
+// same: by a witness, by any candidate of the attempt, or by one that the upward attempt left.
+bool PassFilter::IsPutOut(int attempt, Key key) {
+  const auto index = static_cast<std::size_t>(attempt);
+  if (!scanned_.test(index)) {
+    for (const double witness : witnesses_) {
+      best_[index] = std::min(best_[index], WitnessKey(attempt, witness));
+      if (best_[index] < key) return true;
+    }
+    best_[index] = SmallestKey(attempt);
+    scanned_.set(index);
+    if (best_[index] < key) return true;
+  }
+  return sign_ < 0.0 && IsPutOutByLeftovers(attempt, key);
+}
+
+// When the divider search of the upward attempt has found no divider for an output, what it
+// then had is left: the candidates with the smallest key. In the downward attempt, those stay
+// whose slot is not taken over.
+bool PassFilter::IsPutOutByLeftovers(int attempt, Key key) const {
+  const double upward = OutFreq0(attempt, 1.0);
+  const double downward = OutFreq0(attempt, -1.0);
+  Key smallest = kNoKey;
+  bool stays = false;
+  for (int step = steps_.FirstWorthTrying(upward, imp_.pll.minAdjVco); step < steps_.Count();
+       ++step) {
+    const double vco = upward * steps_[step];
+    if (vco > imp_.pll.maxAdjVco) break;
+    if (!IsCandidate(vco)) continue;
+    const Key left = KeyOf(vco, smallest);
+    if (left > smallest || left == kNoKey) continue;
+    stays = (left == smallest && stays) || !IsCandidate(downward * steps_[step]);
+    smallest = left;
+  }
+  return stays && smallest < key && LacksDivider(smallest);
+}
+
 // The frequency that an attempt takes for output 0, by the additions of the search.
-double PassFilter::OutFreq0(int attempt) const {
+double PassFilter::OutFreq0(int attempt, double sign) const {
   const double fudge = fudges_[static_cast<std::size_t>(attempt)];
-  return (sign_ > 0.0 ? fudge : 0.0 - fudge) + outFreq0_;
+  return (sign > 0.0 ? fudge : 0.0 - fudge) + outFreq0_;
 }
 
 bool PassFilter::IsCandidate(double vco) const {
   return imp_.pll.minAdjVco <= vco && vco <= imp_.pll.maxAdjVco;
+}
+
+// True when the divider of output n is off by more than the tolerance of that number for
+// certain; cheap, and often false where it could be true. Without divisions the ratio is off by
+// some 1e-15 of its value. Half way between two dividers it may take the wrong one; they are
+// both off by half a divider there, which is held against the larger one's tolerance.
+bool PassFilter::SurelyMissesTolerance(double vco, int n, int tolerance) const {
+  constexpr double kMargin = 1e-9;
+  const double ratio = vco * inverse_[static_cast<std::size_t>(n)];
+  if (!(ratio >= 1.0 && ratio <= kLargestDivider)) return false;
+  const double divider = static_cast<int>(ratio + 0.5);
+  return std::fabs(ratio - divider) > Tolerance(tolerance) * (divider + 1.0) + kMargin;
 }
 
 // The key of a VCO frequency; kNoKey when it is above `atMost`. The digits after that of an
@@ -167,34 +219,48 @@ PassFilter::Key PassFilter::KeyOf(double vco, Key atMost) const {
   Key key = 0;
   for (int n = 1; n < run_.count; ++n) {
     const auto output = static_cast<std::size_t>(n);
+    const int digitsLeft = run_.count - 1 - n;
+    const Key most = atMost >> (kKeyBits * digitsLeft);
+    const auto digit = static_cast<int>(most & kDigit);
+    if (atMost != kNoKey && key == most >> kKeyBits && digit < kTolerances &&
+        SurelyMissesTolerance(vco, n, digit)) {
+      return kNoKey;
+    }
     const OutputFit fit = FitOutput(vco, imp_.requests.reqOutFreq[output], ranges_[output]);
     key = key << kKeyBits | static_cast<Key>(fit.tolerance);
-    const int digitsLeft = run_.count - 1 - n;
-    if (atMost != kNoKey && key > atMost >> (kKeyBits * digitsLeft)) return kNoKey;
+    if (atMost != kNoKey && key > most) return kNoKey;
     if (fit.tolerance == kTolerances) return key << (kKeyBits * digitsLeft);
   }
   return key;
 }
 
-// The smallest key among the candidates around the last witness; kNoKey when there are none.
-PassFilter::Key PassFilter::WitnessKey(int attempt) const {
+// True when the candidates with that key have no divider for some output.
+bool PassFilter::LacksDivider(Key key) const {
+  for (int n = 1; n < run_.count; ++n, key >>= kKeyBits) {
+    if ((key & kDigit) == kTolerances) return true;
+  }
+  return false;
+}
+
+// The smaller key of the two candidates on either side of a witness; kNoKey without them.
+PassFilter::Key PassFilter::WitnessKey(int attempt, double witness) const {
   const double outFreq0 = OutFreq0(attempt);
   Key smallest = kNoKey;
-  if (witness_ == 0.0 || !(outFreq0 > 0.0)) return smallest;
-  const int nearest = steps_.Below(witness_ / outFreq0);
-  for (int step = std::max(nearest - 1, 0); step <= std::min(nearest + 2, steps_.Count() - 1);
-       ++step) {
+  if (witness == 0.0) return smallest;
+  const int below = steps_.Below(witness / outFreq0);
+  for (int step = below; step <= std::min(below + 1, steps_.Count() - 1); ++step) {
     const double vco = outFreq0 * steps_[step];
     if (IsCandidate(vco)) smallest = std::min(smallest, KeyOf(vco, smallest));
   }
   return smallest;
 }
 
-// The smallest key of all candidates of an attempt, whose VCO becomes the witness. Candidates
+// The smallest key of all candidates of an attempt, whose VCO becomes a witness. Candidates
 // outside the windows of output 1 do not have it.
 PassFilter::Key PassFilter::SmallestKey(int attempt) {
   const double outFreq0 = OutFreq0(attempt);
   Key smallest = kNoKey;
+  double witness = 0.0;
   for (const VcoWindow& window : output1_) {
     const int first = std::max(steps_.Below(window.low / outFreq0) - 1, 0);
     const int last = std::min(steps_.Below(window.high / outFreq0) + 1, steps_.Count() - 1);
@@ -204,9 +270,11 @@ PassFilter::Key PassFilter::SmallestKey(int attempt) {
       const Key key = KeyOf(vco, smallest);
       if (key >= smallest) continue;
       smallest = key;
-      witness_ = vco;
+      witness = vco;
     }
   }
+  witnesses_[static_cast<std::size_t>(nextWitness_)] = witness;
+  nextWitness_ = (nextWitness_ + 1) % kWitnesses;
   return smallest;
 }
 

@@ -23,18 +23,21 @@
 //    outputs 1, 2, ... are read as the digits of one number, the key. One candidate with a
 //    smaller key - a witness - proves that a candidate goes. What is a witness in one attempt
 //    is mostly one in the next, too, since neighbouring attempts differ by 0.001 MHz.
+//    Candidates that the upward attempt has left in the table are witnesses as well.
 //
-// Example: 100 MHz in, PLL, outputs 200 and 66 MHz. At a fudge of 0.5 MHz the candidates are
-// 401, 601.5, 802 and 1002.5 MHz; the windows around 400, 600, 800 and 1000 MHz have none of
-// them, and so belong to other fudges. At 0.05 MHz, 400.1 MHz lies in a window; it keeps
-// tolerance 2 on 66 MHz and 600.15 MHz keeps 1, so it goes.
+// Example: 100 MHz in, PLL, outputs 200 and 70 MHz, VCO 400 to 1080 MHz. At a fudge of 0.5 MHz
+// the candidates are 401, 601.5, 802 and 1002.5 MHz; the windows around 400, 600, 800 and 1000
+// MHz have none of them, and so belong to other fudges. At 0.05 MHz, 400.1 MHz lies in a window;
+// divided by 6 it is 66.68 MHz, off by 5 percent, and 1000.25 / 14 is 71.45 MHz, off by 2.1. So
+// 400.1 MHz goes.
 //
 // Why a "no" is safe. (1), (2): the windows are outer bounds, and so are the fudges worked out
 // from them: the division and the difference to the fudge's number are off by far less than
 // the whole attempt that is added on either side. (3): see SurelyKeptTolerance. (4): witnesses
-// are evaluated by the same function on the same doubles as in the divider search. What an
-// upward attempt leaves in the table for the downward one can only put out candidates there,
-// not bring any in.
+// are evaluated by the same function on the same doubles as in the divider search. An upward
+// attempt that ends in the divider search leaves candidates in the table for the downward one.
+// They lack a divider for some output, so there they can only put out others; one that comes as
+// far as M and D has already made the pass a "maybe".
 //
 // Tested by pass_filter_test.cpp, and by comparing whole answers with a plain search.
 #ifndef VORKEL_ENGINE_PLL_PASSFILTER_H_
@@ -57,7 +60,7 @@ class PassFilter {
   PassFilter(const VorkelImp& imp, const Run& run, double fudgeStep);
 
   // True when no pass at all can succeed.
-  bool IsHopeless() const { return applies_ && windows_.empty(); }
+  bool IsHopeless() const { return hopeless_; }
 
   // False when the pass at `fudge` (MHz) fails for certain. To be asked for each fudge in turn,
   // from the one after 0 on.
@@ -70,20 +73,26 @@ class PassFilter {
 
   static constexpr int kLargestChunk = 1024;
   static constexpr int kNotNarrowed = -1;
+  static constexpr int kWitnesses = 8;
 
-  static bool Applies(const VorkelImp& imp, const Run& run);
+  static bool IsHopelessRun(const VorkelImp& imp, const Run& run, const VcoWindows& windows);
   void WorkOutChunk(double firstFudge);
   void WorkOutDirection(double sign);
   int SurelyKeptTolerance(double slowest, double fastest) const;
   void NarrowWindows(int tolerance);
   void AddAttempts(const VcoWindow& window, int step);
   void AddCandidate(int attempt, double vco);
+  bool IsPutOut(int attempt, Key key);
+  bool IsPutOutByLeftovers(int attempt, Key key) const;
 
   const VcoWindows& Windows() const { return run_.count > 1 ? narrowed_ : windows_; }
-  double OutFreq0(int attempt) const;
+  double OutFreq0(int attempt) const { return OutFreq0(attempt, sign_); }
+  double OutFreq0(int attempt, double sign) const;
   bool IsCandidate(double vco) const;
+  bool SurelyMissesTolerance(double vco, int n, int tolerance) const;
   Key KeyOf(double vco, Key atMost) const;
-  Key WitnessKey(int attempt) const;
+  bool LacksDivider(Key key) const;
+  Key WitnessKey(int attempt, double witness) const;
   Key SmallestKey(int attempt);
 
   const VorkelImp& imp_;
@@ -92,8 +101,10 @@ class PassFilter {
   const double outFreq0_;
   const Div0Steps steps_;
   const VcoWindows windows_;
+  const bool hopeless_;
+  const bool applies_;  // rounding is small against a fudge step
   std::array<OutputRange, MAX_OUTPUTS> ranges_{};
-  const bool applies_;  // the numbers are such that the reasoning above holds
+  std::array<double, MAX_OUTPUTS> inverse_{};  // of the requested frequencies
 
   // The windows, and those of output 1 alone, as far as output 1 keeps the tolerance of this
   // number there; not in use with one output.
@@ -102,18 +113,20 @@ class PassFilter {
   VcoWindows output1_;
 
   // The chunk at hand: its fudges, the passes that may succeed, and the next to be asked for.
-  int chunk_ = 4;
-  int next_ = 4;
+  int chunk_ = 0;
+  int next_ = 0;
   std::array<double, kLargestChunk> fudges_;
   std::bitset<kLargestChunk> maybe_;
 
-  // The direction at hand: 1.0 upward, -1.0 downward, and the key of the best candidate known
-  // of each attempt.
+  // The direction at hand: 1.0 upward, -1.0 downward; the smallest key known of each attempt,
+  // and the attempts of which it is that of all candidates.
   double sign_ = 1.0;
   std::array<Key, kLargestChunk> best_;
+  std::bitset<kLargestChunk> scanned_;
 
-  // The VCO that last had the smallest key of an attempt, MHz; 0: none yet.
-  double witness_ = 0.0;
+  // VCO frequencies (MHz) that have lately had the smallest key of an attempt; 0: none.
+  std::array<double, kWitnesses> witnesses_{};
+  int nextWitness_ = 0;
 };
 
 }  // namespace Ip::Pll

@@ -12,7 +12,6 @@ namespace Ip::Pll {
 namespace {
 
 constexpr double kMargin = 1e-9;  // relative
-constexpr double kLargestDivider = 128.0;
 constexpr double kNoLimit = std::numeric_limits<double>::infinity();
 
 VcoWindow Widened(double low, double high) {
@@ -72,8 +71,8 @@ void FindOutputWindows(const VorkelImp& imp, int n, int tolerance, VcoWindows& w
   const double f = imp.requests.reqOutFreq[static_cast<std::size_t>(n)];
   const OutputRange range = RangeOfOutput(imp.pllLimits, n);
   windows.clear();
-  // A negative request takes a divider of 1 and keeps every tolerance.
-  if (f < 0.0) Append(windows, Widened(range.min, range.max));
+  // A negative request, -0 among them, takes a divider of 1 and keeps every tolerance.
+  if (std::signbit(f) && std::isfinite(f)) Append(windows, Widened(range.min, range.max));
   if (!(f > 0.0) || !std::isfinite(f)) return;
   const double slowest = f * (1.0 - Tolerance(tolerance));
   const double fastest = f * (1.0 + Tolerance(tolerance));

@@ -32,7 +32,8 @@ inline std::string Names(const Ip::KruPinList& pins) {
   while (filled > 0 && pins[filled - 1] == Ip::KruPin::NONE) --filled;
   std::string names;
   for (std::size_t n = 0; n < filled; ++n) {
-    names += (n == 0 ? "" : " ") + std::string(Ip::KruPinName(pins[n]).CStr());
+    if (n > 0) names += ' ';
+    names += Ip::KruPinName(pins[n]).CStr();
   }
   return names;
 }

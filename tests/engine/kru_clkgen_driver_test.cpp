@@ -14,7 +14,6 @@ using engine_test::Names;
 using Ip::VorkelImp;
 using testing::Each;
 using testing::ElementsAre;
-using testing::EndsWith;
 using testing::IsEmpty;
 
 constexpr char kPart[] = "clkgen";

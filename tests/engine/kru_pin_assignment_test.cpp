@@ -720,7 +720,9 @@ TEST_F(PinAssignmentTest, TheOffsetIsThePhaseOfClkdv) {
 }
 
 // Three times the input goes through the values without a match.
-TEST_F(PinAssignmentTest, AMultipleWithoutAPinOfItsOwn) { ExpectOne({300}, true, "CLKFX", "CLKFX"); }
+TEST_F(PinAssignmentTest, AMultipleWithoutAPinOfItsOwn) {
+  ExpectOne({300}, true, "CLKFX", "CLKFX");
+}
 
 // --- Whole runs --------------------------------------------------------------------------------
 
