@@ -123,6 +123,7 @@ int PassFilter::SurelyKeptTolerance(double slowest, double fastest) const {
 void PassFilter::NarrowWindows(int tolerance) {
   if (tolerance == narrowedTo_) return;
   narrowedTo_ = tolerance;
+  scannedFor_ = kStale;
   FindOutputWindows(imp_, 1, tolerance, output1_);
   Intersect(windows_, output1_, narrowed_);
 }
@@ -163,7 +164,7 @@ bool PassFilter::IsPutOut(int attempt, Key key) {
       best_[index] = std::min(best_[index], WitnessKey(attempt, witness));
       if (best_[index] < key) return true;
     }
-    best_[index] = SmallestKey(attempt);
+    best_[index] = SmallestKey(attempt, best_[index]);
     scanned_.set(index);
     if (best_[index] < key) return true;
   }
@@ -173,21 +174,17 @@ bool PassFilter::IsPutOut(int attempt, Key key) {
 // When the divider search of the upward attempt has found no divider for an output, what it
 // then had is left: the candidates with the smallest key. In the downward attempt, those stay
 // whose slot is not taken over.
-bool PassFilter::IsPutOutByLeftovers(int attempt, Key key) const {
-  const double upward = OutFreq0(attempt, 1.0);
+bool PassFilter::IsPutOutByLeftovers(int attempt, Key key) {
   const double downward = OutFreq0(attempt, -1.0);
-  Key smallest = kNoKey;
+  Key smallest = key;
   bool stays = false;
-  for (int step = steps_.FirstWorthTrying(upward, imp_.pll.minAdjVco); step < steps_.Count();
-       ++step) {
-    const double vco = upward * steps_[step];
-    if (vco > imp_.pll.maxAdjVco) break;
-    if (!IsCandidate(vco)) continue;
+  FindScanWindows(key);
+  Scan(OutFreq0(attempt, 1.0), [&](int step, double vco) {
     const Key left = KeyOf(vco, smallest);
-    if (left > smallest || left == kNoKey) continue;
+    if (left > smallest) return;
     stays = (left == smallest && stays) || !IsCandidate(downward * steps_[step]);
     smallest = left;
-  }
+  });
   return stays && smallest < key && LacksDivider(smallest);
 }
 
@@ -255,27 +252,60 @@ PassFilter::Key PassFilter::WitnessKey(int attempt, double witness) const {
   return smallest;
 }
 
-// The smallest key of all candidates of an attempt, whose VCO becomes a witness. Candidates
-// outside the windows of output 1 do not have it.
-PassFilter::Key PassFilter::SmallestKey(int attempt) {
-  const double outFreq0 = OutFreq0(attempt);
-  Key smallest = kNoKey;
+// The smallest key of all candidates of an attempt, one of which has the key `known` if that is
+// a key. The VCO of a smaller one becomes a witness.
+PassFilter::Key PassFilter::SmallestKey(int attempt, Key known) {
+  Key smallest = known;
   double witness = 0.0;
-  for (const VcoWindow& window : output1_) {
-    const int first = std::max(steps_.Below(window.low / outFreq0) - 1, 0);
-    const int last = std::min(steps_.Below(window.high / outFreq0) + 1, steps_.Count() - 1);
-    for (int step = first; step <= last; ++step) {
-      const double vco = outFreq0 * steps_[step];
-      if (!IsCandidate(vco)) continue;
-      const Key key = KeyOf(vco, smallest);
-      if (key >= smallest) continue;
-      smallest = key;
-      witness = vco;
+  FindScanWindows(known);
+  Scan(OutFreq0(attempt), [&](int, double vco) {
+    const Key key = KeyOf(vco, smallest);
+    if (key >= smallest) return;
+    smallest = key;
+    witness = vco;
+  });
+  if (witness != 0.0) {
+    witnesses_[static_cast<std::size_t>(nextWitness_)] = witness;
+    nextWitness_ = (nextWitness_ + 1) % kWitnesses;
+  }
+  return smallest;
+}
+
+// Visits the candidates of an output-0 frequency in the windows found last, some of them twice.
+template <typename Visit>
+void PassFilter::Scan(double outFreq0, Visit visit) const {
+  for (const VcoWindows* windows : {&narrower_, &asNarrow_}) {
+    for (const VcoWindow& window : *windows) {
+      const int first = std::max(steps_.Below(window.low / outFreq0) - 1, 0);
+      const int last = std::min(steps_.Below(window.high / outFreq0) + 1, steps_.Count() - 1);
+      for (int step = first; step <= last; ++step) {
+        const double vco = outFreq0 * steps_[step];
+        if (IsCandidate(vco)) visit(step, vco);
+      }
     }
   }
-  witnesses_[static_cast<std::size_t>(nextWitness_)] = witness;
-  nextWitness_ = (nextWitness_ + 1) % kWitnesses;
-  return smallest;
+}
+
+// Candidates outside the windows of output 1 do not have the smallest key; with a key known,
+// many of the others do not, either.
+void PassFilter::FindScanWindows(Key known) {
+  constexpr int kAny = kTolerances - 1;
+  const Key digits = known == kNoKey || run_.count < 3
+                         ? kNoKey
+                         : known >> (kKeyBits * (run_.count - 3));
+  if (digits == scannedFor_) return;
+  scannedFor_ = digits;
+  narrower_.clear();
+  if (digits == kNoKey) {
+    asNarrow_ = output1_;
+    return;
+  }
+  const int first = std::min(static_cast<int>(digits >> kKeyBits), kAny);
+  const int second = std::min(static_cast<int>(digits & kDigit), kAny);
+  if (first > 0) FindOutputWindows(imp_, 1, first - 1, narrower_);
+  FindOutputWindows(imp_, 1, first, scratch_[0]);
+  FindOutputWindows(imp_, 2, second, scratch_[1]);
+  Intersect(scratch_[0], scratch_[1], asNarrow_);
 }
 
 }  // namespace Ip::Pll

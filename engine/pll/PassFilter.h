@@ -83,7 +83,7 @@ class PassFilter {
   void AddAttempts(const VcoWindow& window, int step);
   void AddCandidate(int attempt, double vco);
   bool IsPutOut(int attempt, Key key);
-  bool IsPutOutByLeftovers(int attempt, Key key) const;
+  bool IsPutOutByLeftovers(int attempt, Key key);
 
   const VcoWindows& Windows() const { return run_.count > 1 ? narrowed_ : windows_; }
   double OutFreq0(int attempt) const { return OutFreq0(attempt, sign_); }
@@ -93,7 +93,10 @@ class PassFilter {
   Key KeyOf(double vco, Key atMost) const;
   bool LacksDivider(Key key) const;
   Key WitnessKey(int attempt, double witness) const;
-  Key SmallestKey(int attempt);
+  Key SmallestKey(int attempt, Key known);
+  void FindScanWindows(Key known);
+  template <typename Visit>
+  void Scan(double outFreq0, Visit visit) const;
 
   const VorkelImp& imp_;
   const Run& run_;
@@ -127,6 +130,14 @@ class PassFilter {
   // VCO frequencies (MHz) that have lately had the smallest key of an attempt; 0: none.
   std::array<double, kWitnesses> witnesses_{};
   int nextWitness_ = 0;
+
+  // Where candidates lie whose key is not above a known one: those that keep a narrower
+  // tolerance on output 1, and those that keep the same one there and no wider one on output 2.
+  static constexpr Key kStale = kNoKey - 1;
+  Key scannedFor_ = kStale;  // the digits of outputs 1 and 2; kNoKey: all of output1_
+  VcoWindows narrower_;
+  VcoWindows asNarrow_;
+  VcoWindows scratch_[2];
 };
 
 }  // namespace Ip::Pll
