@@ -5,6 +5,9 @@ package require vorkel::engine 1.1
 
 namespace eval ::vorkel::catalogue {
   variable defaultPart vk40
+  # The highest frequency at the phase-frequency detector of a PLL with a narrow loop, MHz. A
+  # device file has it for a TSYN only.
+  variable low_bandwidth_pfd 300
 }
 
 # The names of all devices, sorted.
@@ -26,8 +29,7 @@ proc ::vorkel::catalogue::describe {device} {
 
 # What a part name, `<device>[<package>][-<grade>]`, stands for, as a dict: device, package,
 # grade, part (the full name, defaults filled in), primitives (those of that grade), limits (a
-# dict from keyword to text, MHz, ns or a count), calculator (its coefficients likewise; empty
-# when it has none), and description (what `describe` answers).
+# dict from keyword to text, MHz, ns or a count), and description (what `describe` answers).
 # A name that stands for nothing is wrong usage.
 #
 # Nothing marks where the device ends, so a name can begin with several devices. As for the
@@ -67,8 +69,7 @@ proc ::vorkel::catalogue::Resolve {device rest} {
   set grade [Member $description grade $grade [expr {$dash ne ""}]]
   set limits [dict get $description limits $grade]
   return [dict create device $device package $package grade $grade part "$device$package-$grade" \
-    primitives [Primitives $limits] limits $limits \
-    calculator [dict get $description calculator $grade] description $description]
+    primitives [Primitives $limits] limits $limits description $description]
 }
 
 # The package or grade (`kind`) of a device: the one named, or the default. A device may do
@@ -120,11 +121,13 @@ proc ::vorkel::catalogue::keywordsOf {primitive} {
   return $keywords
 }
 
-# The lowest and the highest output frequency of a primitive, MHz.
-proc ::vorkel::catalogue::outputRange {primitive limits} {
+# The lowest and the highest frequency of an output of a primitive, MHz. Output 1 of a PLL may
+# drive an I/O clock, which runs faster.
+proc ::vorkel::catalogue::outputRange {primitive limits {index 0}} {
   switch -- $primitive {
     PLL {
-      return [list [dict get $limits CLKOUT_FREQ_MIN_GCLK] [dict get $limits CLKOUT_FREQ_MAX_GCLK]]
+      set highest [expr {$index == 1 ? "CLKOUT_FREQ_MAX_IOCLK" : "CLKOUT_FREQ_MAX_GCLK"}]
+      return [list [dict get $limits CLKOUT_FREQ_MIN_GCLK] [dict get $limits $highest]]
     }
     TSYN {
       return [list [dict get $limits TSYN_CLKOUT_FREQ_MIN] [dict get $limits TSYN_CLKOUT_FREQ_MAX]]
@@ -171,9 +174,20 @@ proc ::vorkel::catalogue::vcoRange {primitive limits} {
   return [Range $primitive VCOCLK $limits]
 }
 
-# The lowest and the highest frequency at the phase-frequency detector, likewise.
-proc ::vorkel::catalogue::pfdRange {primitive limits} {
-  return [Range $primitive CLKPFD $limits]
+# The lowest and the highest frequency at the phase-frequency detector, likewise. A narrow loop
+# has a lower highest one.
+proc ::vorkel::catalogue::pfdRange {primitive limits {bandwidth ""}} {
+  variable low_bandwidth_pfd
+  set range [Range $primitive CLKPFD $limits]
+  if {$range eq "" || $bandwidth ne "LOW"} {
+    return $range
+  }
+  lassign $range lowest highest
+  set narrow $low_bandwidth_pfd
+  if {$primitive eq "TSYN"} {
+    set narrow [dict get $limits TSYN_CLKPFD_FREQ_MAX_LBW]
+  }
+  return [list $lowest [expr {$narrow < $highest ? $narrow : $highest}]]
 }
 
 proc ::vorkel::catalogue::Range {primitive what limits} {
@@ -184,4 +198,48 @@ proc ::vorkel::catalogue::Range {primitive what limits} {
   }
   set keyword $prefix${what}_FREQ
   return [list [dict get $limits ${keyword}_MIN] [dict get $limits ${keyword}_MAX]]
+}
+
+# Like resolve, but takes the beginning of a name, too, if only one goes on like it: of a device,
+# or of a device and its package, either with a grade or without.
+proc ::vorkel::catalogue::find {part} {
+  try {
+    return [resolve $part]
+  } trap {VORKEL USAGE} {complaint options} {
+    set matches [Completions $part]
+    if {[llength $matches] == 1} {
+      return [resolve [lindex $matches 0]]
+    }
+    if {[llength $matches] > 1} {
+      throw {VORKEL USAGE} "device \"$part\" could be [join $matches {, }]"
+    }
+    return -options $options $complaint
+  }
+}
+
+# The names that a part name is the beginning of: those of devices, or else those of devices
+# with a package. A file that cannot be read has no packages.
+proc ::vorkel::catalogue::Completions {part} {
+  if {![regexp {^([^-]+)(-.*)?$} $part -> head grade]} {
+    return {}
+  }
+  set devices {}
+  set packages {}
+  foreach name [names] {
+    if {[string equal -length [string length $head] $head $name]} {
+      lappend devices $name$grade
+    } elseif {[string equal -length [string length $name] $name $head]} {
+      try {
+        set known [dict get [describe $name] packages]
+      } trap {VORKEL USAGE} {} {
+        continue
+      }
+      foreach package $known {
+        if {[string equal -length [string length $head] $head $name$package]} {
+          lappend packages $name$package$grade
+        }
+      }
+    }
+  }
+  return [expr {[llength $devices] > 0 ? $devices : $packages}]
 }

@@ -6,6 +6,9 @@ namespace eval ::vorkel::engine {
   # Where the package stands when the environment does not say it: in the build folder.
   variable checkout [file dirname [file dirname [file dirname [file normalize [info script]]]]]
   variable bundled [file join $checkout build ip_vorkel1.1]
+  # How many clocks the primitives can have.
+  variable most_inputs  {PLL 2 TSYN 2 KRU_SP 1 KRU_CLKGEN 1}
+  variable most_outputs {PLL 7 TSYN 7 KRU_SP 6 KRU_CLKGEN 6}
   # What the engine answers when it cannot read the limits of the device that it was given.
   variable noData "Could not get data from speedsfile."
 }

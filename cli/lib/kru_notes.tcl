@@ -10,28 +10,34 @@ package require vorkel::timing 1.1
 
 namespace eval ::vorkel::kru_notes {}
 
-# The notes on a request, its solution (see engine.tcl), the frequencies of the outputs and the
-# timing (see timing.tcl), as sentences.
-proc ::vorkel::kru_notes::on {request solution frequencies timing} {
-  set notes {}
-  set pins [dict get $solution pins]
-  set n 0
-  foreach pin $pins frequency $frequencies {
-    lappend notes {*}[::vorkel::notes::outside "output $n" $frequency \
-      {*}[Range $pin $pins [dict get $request limits]]]
-    incr n
+# What of the configuration of an answer (see answer.tcl) is outside the device's range, as
+# sentences.
+proc ::vorkel::kru_notes::violations {answer} {
+  set violations {}
+  set pins [lmap output [dict get $answer outputs] {dict get $output pin}]
+  foreach output [dict get $answer outputs] pin $pins {
+    lappend violations {*}[::vorkel::notes::outside "output [dict get $output index]" \
+      [dict get $output actual] {*}[Range $pin $pins [dict get $answer request limits]]]
   }
-  scan [lindex [dict get $request phases] 0] %f phase
-  if {[dict get $request primitive] eq "KRU_CLKGEN" && $phase != 0} {
+  return $violations
+}
+
+# The other notes on an answer, as sentences.
+proc ::vorkel::kru_notes::on {answer} {
+  set notes {}
+  set request [dict get $answer request]
+  set phase [dict get [lindex [dict get $request outputs] 0] phase]
+  if {[dict get $answer primitive] eq "KRU_CLKGEN" && $phase ne "" && $phase != 0} {
     lappend notes "output 0 is at phase 0: a KRU_CLKGEN has it on CLKFX whatever its phase"
   }
-  if {[dict get $request bandwidthAsked]} {
+  if {[dict exists $request bandwidthAsked] && [dict get $request bandwidthAsked]} {
     lappend notes "--bandwidth changes nothing: a KRU has no such setting"
   }
-  scan [dict get $request inputJitter] %f jitter
+  set jitter [dict get $request inputJitter]
+  set timing [dict get $answer timing]
   if {$jitter > 0 && [::vorkel::timing::isKnown $timing]} {
-    lappend notes "the input's jitter passes through a KRU: add up to\
-      [::vorkel::numbers::short $jitter 3] ps to each output's"
+    lappend notes "the jitter of each output is with all of the input's,\
+      [::vorkel::numbers::short $jitter 3] ps, which passes through a KRU"
   }
   return [list {*}$notes {*}[::vorkel::notes::refusals $timing]]
 }

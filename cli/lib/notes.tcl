@@ -5,52 +5,131 @@
 
 package provide vorkel::notes 1.1
 package require vorkel::catalogue 1.1
+package require vorkel::colour 1.1
 package require vorkel::numbers 1.1
+package require vorkel::table 1.1
 
 namespace eval ::vorkel::notes {
   # MHz. A frequency that reads like a limit, in a report to 1 Hz, is not outside of it: it can
   # be so by the rounding of the arithmetic alone.
   variable rounding 5e-7
+  # The engine prints 3 decimals. What differs by no more than their rounding agrees.
+  variable visible 0.0006
+  # What the errors of an output are those of, and their units.
+  variable error_words {
+    ppm {frequency ppm} phaseError {phase degrees} dutyError {{duty cycle} {percent points}}
+  }
 }
 
-# The notes on a request, the clocks of its configuration (see report.tcl) and their timing
-# (see timing.tcl), as sentences.
-proc ::vorkel::notes::on {request clocks timing} {
-  set primitive [dict get $request primitive]
+# What of the configuration of an answer (see answer.tcl) is outside the device's range, as
+# sentences.
+proc ::vorkel::notes::violations {answer} {
+  set primitive [dict get $answer primitive]
+  set request [dict get $answer request]
   set limits [dict get $request limits]
-  set notes {}
+  set m [dict get $answer settings M]
+  set d [dict get $answer settings D]
   set vcoRange [::vorkel::catalogue::vcoRange $primitive $limits]
-  set pfdRange [::vorkel::catalogue::pfdRange $primitive $limits]
-  foreach vco [dict get $clocks vcos] pfd [dict get $clocks pfds] \
-      suffix {"" " with the second input"} {
-    lappend notes {*}[outside "the VCO$suffix" $vco $vcoRange]
-    lappend notes {*}[outside "the PFD$suffix" $pfd $pfdRange]
+  set pfdRange [::vorkel::catalogue::pfdRange $primitive $limits [dict get $answer bandwidth]]
+  set violations {}
+  foreach input [dict get $request inputs] suffix {"" " with the second input"} {
+    if {$input eq ""} continue
+    lappend violations {*}[outside "the VCO$suffix" [expr {double($input) * $m / $d}] $vcoRange]
+    lappend violations {*}[outside "the PFD$suffix" [expr {double($input) / $d}] $pfdRange]
   }
-  set first [lindex [dict get $clocks outputs] 0]
-  lappend notes {*}[outside "output 0" [dict get $first frequency] \
-    [::vorkel::catalogue::outputRange $primitive $limits]]
-  set divider [dict get $first divider]
-  if {[dict get $request closest] && $primitive eq "TSYN" && $divider != round($divider)} {
+  foreach output [dict get $answer outputs] {
+    set index [dict get $output index]
+    lappend violations {*}[outside "output $index" [dict get $output actual] \
+      [::vorkel::catalogue::outputRange $primitive $limits $index]]
+  }
+  return $violations
+}
+
+# The other notes on an answer, as sentences.
+proc ::vorkel::notes::on {answer} {
+  set primitive [dict get $answer primitive]
+  set request [dict get $answer request]
+  set divider [dict get [lindex [dict get $answer outputs] 0] divider]
+  set closest [expr {[dict exists $request closest] && [dict get $request closest]}]
+  set asked 0
+  foreach output [dict get $request outputs] {
+    if {[dict get $output phase] ne "" || [dict get $output duty] ne ""} {
+      set asked 1
+    }
+  }
+  set notes [Search $answer]
+  if {$asked && $primitive eq "TSYN" && $divider != round($divider)} {
     lappend notes "with a fractional divider all phases are 0 and all duty cycles 50 %;\
       --int-div0 avoids it"
   }
-  if {[dict get $request preferMaxVco] && ![dict get $request closest]} {
+  if {[dict get $request preferMaxVco] && !$asked && !$closest} {
     lappend notes "--prefer-max-vco counts only with --phase or --duty"
   }
   if {[dict get $request intDiv0] && $primitive eq "PLL"} {
     lappend notes "--int-div0 changes nothing: all dividers of a PLL are whole numbers"
   }
-  return [list {*}$notes {*}[refusals $timing]]
+  return [list {*}$notes {*}[refusals [dict get $answer timing]]]
 }
 
-# The notes as the end of a report: a blank line and a line for each, or nothing.
+# A list of one sentence when the engine counted with frequencies that can be seen to differ from
+# those of its settings, else none.
+proc ::vorkel::notes::Search {answer} {
+  variable visible
+  set figures {}
+  set differ 0
+  foreach output [dict get $answer outputs] {
+    set search [dict get $output search]
+    if {$search eq ""} {
+      return {}
+    }
+    lappend figures $search
+    set differ [expr {$differ || abs($search - [dict get $output actual]) > $visible}]
+  }
+  if {!$differ} {
+    return {}
+  }
+  return [list "the search counted with [join $figures {, }] MHz, which M and D do not make"]
+}
+
+# All that is to be said of an answer: what is off, what is outside the device's range, and the
+# other notes.
+proc ::vorkel::notes::all {answer} {
+  return [list {*}[errors $answer] {*}[dict get $answer violations] {*}[dict get $answer notes]]
+}
+
+# What of the outputs is outside its tolerance, as sentences.
+proc ::vorkel::notes::errors {answer} {
+  variable error_words
+  set errors {}
+  foreach output [dict get $answer outputs] {
+    if {[dict get $output within]} continue
+    set parts [lmap key [dict get $output offs] {
+      lassign [dict get $error_words $key] what unit
+      set allowed [::vorkel::answer::allowance $key [dict get $answer request tolerance]]
+      string cat "$what is off by [Figure [dict get $output $key]] $unit, with " \
+        "[::vorkel::numbers::short $allowed 6] allowed"
+    }]
+    lappend errors "output [dict get $output index]: the [join $parts {; the }]"
+  }
+  return $errors
+}
+
+# An error with two decimals, or with as many as it takes not to look like none.
+proc ::vorkel::notes::Figure {error} {
+  if {abs($error) < 0.005} {
+    return [format %.2g $error]
+  }
+  return [::vorkel::numbers::fixed $error 2]
+}
+
+# The notes as the end of a report: a blank line and a paragraph for each, or nothing.
 proc ::vorkel::notes::text {notes} {
   set text ""
   if {[llength $notes] > 0} {
     append text \n
   }
   foreach note $notes {
-    append text "note: $note\n"
+    append text [::vorkel::colour::paint note [::vorkel::table::prose "note: " $note]]
   }
   return $text
 }

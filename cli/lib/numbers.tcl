@@ -6,6 +6,7 @@ package provide vorkel::numbers 1.1
 namespace eval ::vorkel::numbers {
   variable decimal {^[-+]?([0-9]+\.?[0-9]*|\.[0-9]+)([eE][-+]?[0-9]+)?$}
   variable largest 1.7976931348623157e308
+  variable largest_jitter 1e9
 }
 
 # The value of a decimal number. `what` names it in the message when it is none, or has no
@@ -57,8 +58,21 @@ proc ::vorkel::numbers::notNegative {value} {
   return [expr {$value >= 0.0 ? "" : "0 or greater"}]
 }
 
+# A jitter in ps; a millisecond is beyond any clock.
+proc ::vorkel::numbers::jitter {value} {
+  variable largest_jitter
+  if {$value > $largest_jitter} {
+    return "at most 1 ms"
+  }
+  return [notNegative $value]
+}
+
 proc ::vorkel::numbers::percentage {value} {
   return [expr {$value >= 0.0 && $value <= 100.0 ? "" : "between 0 and 100"}]
+}
+
+proc ::vorkel::numbers::turn {value} {
+  return [expr {abs($value) <= 360.0 ? "" : "between -360 and 360"}]
 }
 
 proc ::vorkel::numbers::any {value} {

@@ -1,8 +1,31 @@
 # Options of a command, as words: `--name value`, `--name=value`, or `--name` for a flag.
+#
+# A command that takes a request calls
+#
+#     set call [::vorkel::options::request $words ?table?]
+#
+# with the words after its name and a table of options of its own, in the form that `parse`
+# takes: name, placeholder and description of each, flat. Anything wrong is thrown as
+# {VORKEL USAGE}, which the program makes a complaint and exit status 2. The answer is a dict:
+#   request     the request, see answer.tcl
+#   primitive   that of --primitive: PLL, TSYN, KRU_SP, KRU_CLKGEN, or auto, the default
+#   primitives  a list: the one of --primitive, or those of the device
+#   format      text (the default), json, tcl or sdc
+#   file        the file of -o, or "" for standard output
+#   given       the options that were given, from name to value; those of `table` among them
+#   words       the words, to be shown in a hint
+#
+# ::vorkel::output::write TEXT FILE then writes what the command has to say.
 
 package provide vorkel::options 1.1
 
 namespace eval ::vorkel::options {}
+
+# See above.
+proc ::vorkel::options::request {words {table {}}} {
+  package require vorkel::request 1.1
+  return [::vorkel::request::read $words $table]
+}
 
 # Reads the words of a command. `table` has three entries for each option: its name with the
 # dashes, the placeholder of its value ("" for a flag), and a description.
@@ -26,7 +49,7 @@ proc ::vorkel::options::parse {table words} {
       set name $word
     }
     if {![dict exists $placeholders $name]} {
-      throw {VORKEL USAGE} "unknown option $name"
+      throw {VORKEL USAGE} "unknown option $name[nearest $name [dict keys $placeholders]]"
     }
     if {[dict exists $given $name]} {
       throw {VORKEL USAGE} "$name is given twice"
@@ -49,10 +72,60 @@ proc ::vorkel::options::parse {table words} {
   return $given
 }
 
+# Refuses words that are no options, of which `most` are allowed.
+proc ::vorkel::options::refuseOperands {given {most 0}} {
+  set operands [dict get $given operands]
+  if {[llength $operands] > $most} {
+    throw {VORKEL USAGE} "unexpected word \"[lindex $operands $most]\""
+  }
+}
+
 # The value of an option, or `default` when it was not given.
 proc ::vorkel::options::get {given name default} {
   if {[dict exists $given $name]} {
     return [dict get $given $name]
   }
   return $default
+}
+
+# "; did you mean X?" for the name that is nearest to a mistyped one, or "" when none is near.
+proc ::vorkel::options::nearest {name names} {
+  set best ""
+  # One slip, or two in a long name.
+  set least [expr {[string length $name] > 8 ? 3 : [string length $name] > 2 ? 2 : 0}]
+  foreach candidate $names {
+    set distance [Distance $name $candidate]
+    if {$distance < $least} {
+      set least $distance
+      set best $candidate
+    }
+  }
+  return [expr {$best eq "" ? "" : "; did you mean $best?"}]
+}
+
+# How many letters must be changed, added, left out or swapped with the next to make one word of
+# the other.
+proc ::vorkel::options::Distance {one other} {
+  set row {}
+  for {set i 0} {$i <= [string length $other]} {incr i} {
+    lappend row $i
+  }
+  set above {}
+  set last ""
+  foreach letter [split $one ""] {
+    set next [list [expr {[lindex $row 0] + 1}]]
+    for {set i 0} {$i < [string length $other]} {incr i} {
+      set against [string index $other $i]
+      set cost [expr {min([lindex $row $i] + ($letter ne $against),
+        [lindex $row $i+1] + 1, [lindex $next $i] + 1)}]
+      if {$i > 0 && $last eq $against && $letter eq [string index $other $i-1]} {
+        set cost [expr {min($cost, [lindex $above $i-1] + 1)}]
+      }
+      lappend next $cost
+    }
+    set above $row
+    set row $next
+    set last $letter
+  }
+  return [lindex $row end]
 }

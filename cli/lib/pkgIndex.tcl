@@ -1,8 +1,9 @@
+# Every file of this folder is a package of its name.
 apply {dir {
-  foreach name {
-    catalogue devices engine help kru_notes kru_report main notes numbers options report request
-    synthesis table timing
-  } {
-    package ifneeded vorkel::$name 1.1 [list source -encoding utf-8 [file join $dir $name.tcl]]
+  foreach file [glob -directory $dir *.tcl] {
+    set name [file rootname [file tail $file]]
+    if {$name ne "pkgIndex"} {
+      package ifneeded vorkel::$name 1.1 [list source -encoding utf-8 $file]
+    }
   }
 }} $dir

@@ -1,9 +1,10 @@
-# The report on a configuration of a PLL or a TSYN. Its frequencies are those of the hardware,
-# worked out from the chosen M, D and dividers. The engine accepts an M and a D whose ratio
-# misses its VCO by a small remainder, so its own figures can lie beside them; they are shown
-# where they do.
+# The report on an answer as text: the settings, a table of the outputs, what was asked for beside
+# what comes out, and notes. Frequencies are those of the hardware, worked out from the settings.
+# On a PLL or a TSYN the engine accepts an M and a D whose ratio misses its VCO by a small
+# remainder, so its own figures can lie beside them; they are shown where they do.
 
 package provide vorkel::report 1.1
+package require vorkel::kru_report 1.1
 package require vorkel::notes 1.1
 package require vorkel::numbers 1.1
 package require vorkel::table 1.1
@@ -12,74 +13,52 @@ package require vorkel::timing 1.1
 namespace eval ::vorkel::report {
   # Decimals of a frequency in MHz: down to 1 Hz.
   variable decimals 6
-  # The engine prints 3 decimals. What differs by no more than their rounding agrees.
-  variable visible 0.0006
-  variable frequency_columns {{right {requested MHz}} {right {actual MHz}} {right {error ppm}}}
+  # The errors that each table shows, and so marks.
+  variable frequency_errors ppm
+  variable shape_errors {phaseError dutyError}
 }
 
-# The report on the solution (see engine.tcl) of a request (see request.tcl) with its timing
-# (see timing.tcl), as text.
-proc ::vorkel::report::render {request solution timing} {
-  set clocks [Clocks $request $solution]
-  set text [Summary $request $solution $clocks $timing]\n
-  append text [Outputs $request $solution $clocks $timing]
-  if {[dict get $request closest]} {
-    append text \n [Shapes $request $solution]
+# The report on an answer that is solved (see answer.tcl), as text.
+proc ::vorkel::report::render {answer} {
+  set family [::vorkel::engine::family [dict get $answer primitive]]
+  if {$family eq "Kru"} {
+    set pairs [::vorkel::kru_report::summary $answer]
+  } else {
+    set pairs [Summary $answer]
   }
-  append text [::vorkel::notes::text [::vorkel::notes::on $request $clocks $timing]]
-  return $text
+  set error [dict get $answer phaseError]
+  if {$error ne ""} {
+    lappend pairs {phase error} "$error ps"
+  }
+  set text [::vorkel::table::pairs $pairs]\n[Outputs $answer]
+  set shapes [Shapes $answer]
+  if {$shapes ne ""} {
+    append text \n$shapes
+  }
+  return $text[::vorkel::notes::text [::vorkel::notes::all $answer]]
 }
 
-# The frequencies in MHz that the hardware will have: the lists vcos and pfds, one for each
-# input clock, and outputs, for each a dict of divider and frequency (with the first input).
-proc ::vorkel::report::Clocks {request solution} {
-  set m [dict get $solution m]
-  set d [dict get $solution d]
-  set clocks [dict create vcos {} pfds {} outputs {}]
-  foreach input [dict get $request inputs] {
-    scan $input %f input
-    dict lappend clocks vcos [expr {$input * $m / $d}]
-    dict lappend clocks pfds [expr {$input / $d}]
-  }
-  set vco [lindex [dict get $clocks vcos] 0]
-  foreach output [dict get $solution outputs] {
-    set divider [dict get $output divider]
-    dict lappend clocks outputs \
-      [dict create divider $divider frequency [expr {$vco / $divider}]]
-  }
-  return $clocks
-}
-
-# The lines above the table.
-proc ::vorkel::report::Summary {request solution clocks timing} {
-  set vco [Both [dict get $clocks vcos]]
-  set counted [dict get $solution vco]
-  if {[Differs $counted [lindex [dict get $clocks vcos] 0]]} {
+# The labels and values above the table for a PLL or a TSYN.
+proc ::vorkel::report::Summary {answer} {
+  set request [dict get $answer request]
+  set m [dict get $answer settings M]
+  set d [dict get $answer settings D]
+  set inputs [lmap input [dict get $request inputs] {expr {double($input)}}]
+  set vcos [lmap input $inputs {expr {$input * $m / $d}}]
+  set vco [Both $vcos]
+  set counted [dict get $answer searchVco]
+  if {$counted ne "" && abs($counted - [lindex $vcos 0]) > $::vorkel::notes::visible} {
     append vco " (the search took it as $counted)"
   }
-  set inputs [lmap input [dict get $request inputs] {scan $input %f}]
   set pairs [list \
-    device "[dict get $request part] [dict get $request primitive]" \
-    input [Both $inputs] \
-    VCO $vco \
-    PFD [Both [dict get $clocks pfds]] \
-    M [::vorkel::numbers::short [dict get $solution m] 3] \
-    D [dict get $solution d]]
-  if {[::vorkel::timing::isKnown $timing]} {
-    lappend pairs bandwidth [dict get $request bandwidth] \
-      {input jitter} "[::vorkel::numbers::short [scan [dict get $request inputJitter] %f] 3] ps"
+    device "[dict get $request device] [dict get $answer primitive]" \
+    input [Both $inputs] VCO $vco PFD [Both [lmap input $inputs {expr {$input / $d}}]] \
+    M [::vorkel::numbers::short $m 3] D $d]
+  if {[::vorkel::timing::isKnown [dict get $answer timing]]} {
+    lappend pairs bandwidth [dict get $answer bandwidth] \
+      {input jitter} "[::vorkel::numbers::short [dict get $answer inputJitter] 3] ps"
   }
-  lappend pairs {*}[phaseError $timing]
-  return [::vorkel::table::pairs $pairs]
-}
-
-# The label and the value of the phase error, if there is one.
-proc ::vorkel::report::phaseError {timing} {
-  set error [dict get $timing phaseError]
-  if {$error eq ""} {
-    return {}
-  }
-  return [list {phase error} "$error ps"]
+  return $pairs
 }
 
 # One frequency, or that of each input clock.
@@ -94,101 +73,139 @@ proc ::vorkel::report::Both {frequencies} {
   return "[lindex $texts 0], with the second input [lindex $texts 1]"
 }
 
-# The table of the outputs. The engine's own frequencies have a column when one of them can be
-# seen to differ, and the jitter has one when it is known.
-proc ::vorkel::report::Outputs {request solution clocks timing} {
-  variable frequency_columns
-  set search 0
-  foreach output [dict get $solution outputs] clock [dict get $clocks outputs] {
-    if {[Differs [dict get $output frequency] [dict get $clock frequency]]} {
-      set search 1
-    }
-  }
-  set columns {{right output} {right divider}}
-  lappend columns {*}$frequency_columns
-  if {$search} {
-    lappend columns {right {search MHz}}
-  }
-  lappend columns {*}[jitterColumn $timing]
-
-  set rows {}
-  foreach output [dict get $solution outputs] clock [dict get $clocks outputs] \
-      asked [dict get $request outputs] jitter [dict get $timing jitters] {
-    set row [list [llength $rows] [::vorkel::numbers::short [dict get $output divider] 3] \
-      {*}[frequencyCells $asked [dict get $clock frequency]]]
-    if {$search} {
-      lappend row [dict get $output frequency]
-    }
-    lappend rows [list {*}$row {*}[jitterCell $timing $jitter]]
-  }
-  return [::vorkel::table::render $columns $rows]
-}
-
-# A requested and an actual frequency, MHz, and the error, for the columns frequency_columns.
-proc ::vorkel::report::frequencyCells {requested actual} {
+# The table of the outputs. The jitter has a column when it is known, and so have marks when
+# there are any.
+proc ::vorkel::report::Outputs {answer} {
   variable decimals
-  scan $requested %f requested
-  return [list [::vorkel::numbers::fixed $requested $decimals] \
-    [::vorkel::numbers::fixed $actual $decimals] \
-    [::vorkel::numbers::fixed [expr {($actual - $requested) / $requested * 1e6}] 2]]
-}
-
-# The column of the jitter, if that of some output is known, and an entry of it.
-proc ::vorkel::report::jitterColumn {timing} {
-  if {[::vorkel::timing::isKnown $timing]} {
-    return {{right {jitter ps}}}
-  }
-  return {}
-}
-
-proc ::vorkel::report::jitterCell {timing jitter} {
-  if {[::vorkel::timing::isKnown $timing]} {
-    return [expr {$jitter eq "" ? "-" : $jitter}]
-  }
-  return {}
-}
-
-# The table of phases and duty cycles, each if it was asked for. One table with the above would
-# be wider than a terminal.
-proc ::vorkel::report::Shapes {request solution} {
+  variable frequency_errors
+  set outputs [dict get $answer outputs]
+  set kru [expr {[::vorkel::engine::family [dict get $answer primitive]] eq "Kru"}]
+  set known [::vorkel::timing::isKnown [dict get $answer timing]]
+  set marks [HasMarks $outputs $frequency_errors]
   set columns {{right output}}
-  if {[dict get $request phaseAsked]} {
-    lappend columns {right {phase deg}} {right {actual deg}}
+  lappend columns [expr {$kru ? {left pin} : {right divider}}] {right {requested MHz}} \
+    {right {actual MHz}} {right {error ppm}}
+  if {$known} {
+    lappend columns {right {jitter ps}}
   }
-  if {[dict get $request dutyAsked]} {
-    lappend columns {right {duty %}} {right {actual %}}
+  if {$marks} {
+    lappend columns {left mark}
   }
   set rows {}
-  foreach output [dict get $solution outputs] phase [dict get $request phases] \
-      duty [dict get $request duties] {
-    set row [llength $rows]
-    if {[dict get $request phaseAsked]} {
-      lappend row [phase $phase] [phase [dict get $output phase]]
+  foreach output $outputs {
+    set row [list [dict get $output index] [Place $output] \
+      [::vorkel::numbers::fixed [dict get $output requested] $decimals] \
+      [::vorkel::numbers::fixed [dict get $output actual] $decimals] \
+      [::vorkel::numbers::fixed [dict get $output ppm] 2]]
+    if {$known} {
+      lappend row [Cell [dict get $output jitter] 3]
     }
-    if {[dict get $request dutyAsked]} {
-      lappend row {*}[Duty [scan $duty %f] [dict get $output duty]]
+    if {$marks} {
+      lappend row [Mark $output $frequency_errors]
     }
     lappend rows $row
   }
-  return [::vorkel::table::render $columns $rows]
+  return [::vorkel::table::render $columns $rows [Roles $outputs $frequency_errors]]
 }
 
-# Whether the engine's figure (3 decimals) can be seen to differ from a frequency.
-proc ::vorkel::report::Differs {figure frequency} {
-  variable visible
-  return [expr {abs($figure - $frequency) > $visible}]
-}
-
-# A phase in degrees.
-proc ::vorkel::report::phase {degrees} {
-  return [::vorkel::numbers::fixed [scan $degrees %f] 3]
-}
-
-# Requested (percent) and actual (a fraction) duty cycle; nothing is worked out for 0.
-proc ::vorkel::report::Duty {asked actual} {
-  if {$asked == 0} {
-    return {- -}
+# The pin of an output, or its divider.
+proc ::vorkel::report::Place {output} {
+  if {[dict get $output divider] eq ""} {
+    return [dict get $output pin]
   }
-  return [list [::vorkel::numbers::fixed $asked 1] \
-    [::vorkel::numbers::fixed [expr {$actual * 100}] 1]]
+  return [::vorkel::numbers::short [dict get $output divider] 3]
+}
+
+# The table of phases and duty cycles, each if it was asked for, or if an output has another one
+# than is usual; "" without any. One table with the above would be wider than a terminal.
+proc ::vorkel::report::Shapes {answer} {
+  variable shape_errors
+  set outputs [dict get $answer outputs]
+  set phases [expr {[IsAsked $outputs reqPhase] || [IsOther $outputs phase 0.0]}]
+  set duties [expr {[IsAsked $outputs reqDuty] || [IsOther $outputs duty 50.0]}]
+  if {!$phases && !$duties} {
+    return ""
+  }
+  set columns {{right output}}
+  if {$phases} {
+    lappend columns {right {phase deg}} {right {actual deg}} {right {error deg}}
+  }
+  if {$duties} {
+    lappend columns {right {duty %}} {right {actual %}} {right {error points}}
+  }
+  set marks [HasMarks $outputs $shape_errors]
+  if {$marks} {
+    lappend columns {left mark}
+  }
+  set rows {}
+  foreach output $outputs {
+    set row [list [dict get $output index]]
+    if {$phases} {
+      lappend row {*}[Asked $output reqPhase phase phaseError]
+    }
+    if {$duties} {
+      lappend row {*}[Asked $output reqDuty duty dutyError]
+    }
+    if {$marks} {
+      lappend row [Mark $output $shape_errors]
+    }
+    lappend rows $row
+  }
+  return [::vorkel::table::render $columns $rows [Roles $outputs $shape_errors]]
+}
+
+proc ::vorkel::report::IsAsked {outputs key} {
+  foreach output $outputs {
+    if {[dict get $output $key] ne ""} {
+      return 1
+    }
+  }
+  return 0
+}
+
+proc ::vorkel::report::IsOther {outputs key usual} {
+  foreach output $outputs {
+    if {[dict get $output $key] != $usual} {
+      return 1
+    }
+  }
+  return 0
+}
+
+# What was asked for, what comes out, and the difference; "-" where nothing was asked for.
+proc ::vorkel::report::Asked {output requested actual error} {
+  return [lmap key [list $requested $actual $error] {
+    Cell [dict get $output $key] 3
+  }]
+}
+
+# A number in a table, "-" for none.
+proc ::vorkel::report::Cell {value decimals} {
+  if {$value eq ""} {
+    return -
+  }
+  return [::vorkel::numbers::fixed $value $decimals]
+}
+
+# The mark of an output some of whose errors is larger than it may be.
+proc ::vorkel::report::Mark {output errors} {
+  foreach key $errors {
+    if {$key in [dict get $output offs]} {
+      return OFF
+    }
+  }
+  return ""
+}
+
+proc ::vorkel::report::HasMarks {outputs errors} {
+  foreach output $outputs {
+    if {[Mark $output $errors] ne ""} {
+      return 1
+    }
+  }
+  return 0
+}
+
+proc ::vorkel::report::Roles {outputs errors} {
+  return [lmap output $outputs {expr {[Mark $output $errors] eq "" ? "" : "off"}}]
 }

@@ -1,19 +1,33 @@
 # The commands tsyn, pll, kru and clkgen.
 
 package provide vorkel::synthesis 1.1
-package require vorkel::engine 1.1
-package require vorkel::kru_report 1.1
+package require vorkel::answer 1.1
+package require vorkel::output 1.1
 package require vorkel::report 1.1
 package require vorkel::request 1.1
-package require vorkel::timing 1.1
 
 namespace eval ::vorkel::synthesis {}
 
-# Solves what the words ask of a primitive (request.tcl) and answers the report.
+# Solves what the words ask of a primitive (request.tcl), writes the report, and answers the
+# exit status.
 proc ::vorkel::synthesis::run {primitive words} {
-  set request [::vorkel::request::parse $primitive $words]
-  set solution [::vorkel::engine::solve $request]
-  set timing [::vorkel::timing::of $request $solution]
-  set report [expr {[::vorkel::engine::family $primitive] eq "Kru" ? "kru_report" : "report"}]
-  return [::vorkel::${report}::render $request $solution $timing]
+  set call [::vorkel::request::parse $primitive $words]
+  set request [dict get $call request]
+  if {[dict get $request trace] && [dict get $call format] ne "text"} {
+    throw {VORKEL USAGE} "--trace goes with --format text only"
+  }
+  if {[dict get $call file] ne ""} {
+    ::vorkel::colour::off
+  }
+  set answer [::vorkel::answer::solve $request $primitive]
+  if {![dict get $answer solved]} {
+    throw {VORKEL UNSOLVED} [dict get $answer reason]
+  }
+  if {[dict get $call format] eq "text"} {
+    set text [::vorkel::report::render $answer]
+  } else {
+    set text [::vorkel::output::format [dict get $call format] [list $answer] $request]
+  }
+  ::vorkel::output::write $text [dict get $call file]
+  return [::vorkel::answer::status $answer]
 }

@@ -1,9 +1,13 @@
 # Jitter and phase error of a configuration, from the calculator of the device.
 
 package provide vorkel::timing 1.1
+package require vorkel::catalogue 1.1
 package require vorkel::engine 1.1
 
-namespace eval ::vorkel::timing {}
+namespace eval ::vorkel::timing {
+  # Whether a part has a calculator, for those that have been looked at.
+  variable calculators {}
+}
 
 # Asks for the figures of a solution (see engine.tcl). Answers a dict:
 #   jitters     for each output its peak-to-peak jitter, ps
@@ -14,8 +18,7 @@ namespace eval ::vorkel::timing {}
 proc ::vorkel::timing::of {request solution} {
   set part [dict get $request part]
   set questions [Questions $request $solution]
-  # Without coefficients the engine would complain of each question on standard error.
-  if {[dict get $request calculator] eq ""} {
+  if {![HasCalculator $part]} {
     return [Nothing $questions "$part has no calculator coefficients"]
   }
   set figures [dict create jitters {} phaseError "" refusals {}]
@@ -25,13 +28,25 @@ proc ::vorkel::timing::of {request solution} {
     dict set figures phaseError [Ask $handle [dict get $questions phaseError] phaseError figures]
     set n 0
     foreach question [dict get $questions jitters] {
-      dict lappend figures jitters [Ask $handle $question $n figures]
+      dict lappend figures jitters [Passed $request [Ask $handle $question $n figures]]
       incr n
     }
   } finally {
     rename $handle {}
   }
   return $figures
+}
+
+# Whether a part has a calculator. Without one the engine complains of each question on the
+# standard error of the process, where no script can keep it from appearing.
+proc ::vorkel::timing::HasCalculator {part} {
+  variable calculators
+  if {![dict exists $calculators $part]} {
+    set device [::vorkel::catalogue::resolve $part]
+    set coefficients [dict get $device description calculator [dict get $device grade]]
+    dict set calculators $part [expr {$coefficients ne ""}]
+  }
+  return [dict get $calculators $part]
 }
 
 # Whether there is a figure for the jitter of some output.
@@ -49,6 +64,19 @@ proc ::vorkel::timing::Ask {handle question what figuresName} {
     dict lappend refusals [string trimright $answer .] $what
   }
   return ""
+}
+
+# The jitter of an output, ps, from the answer of the calculator. A KRU passes that of its input
+# on, which the calculator leaves out; at worst the two add up.
+proc ::vorkel::timing::Passed {request jitter} {
+  if {$jitter eq "" || [::vorkel::engine::family [dict get $request primitive]] ne "Kru"} {
+    return $jitter
+  }
+  set input [dict get $request inputJitter]
+  if {$input == 0} {
+    return $jitter
+  }
+  return [format %.3f [expr {$jitter + $input}]]
 }
 
 # The figures where there is none at all, for a reason.
@@ -94,8 +122,9 @@ proc ::vorkel::timing::KruQuestions {request solution} {
     set switches [list [dict get $solution divideBy2] \
       [::vorkel::engine::flag [dict get $request feedback]] [::vorkel::engine::flag $shifted]]
   }
+  set input [lindex [dict get $request inputs] 0]
   set jitters [lmap pin [dict get $solution pins] {
-    list $method [dict get $request inputs] [string map {CLKFXDV CLKFX} $pin] {*}$switches \
+    list $method $input [string map {CLKFXDV CLKFX} $pin] {*}$switches \
       [dict get $solution m] [dict get $solution d]
   }]
   return [dict create phaseError GetKRUPhaseError jitters $jitters]

@@ -41,6 +41,7 @@ proc ::cli::execute {args} {
   set result [dict create status $status]
   foreach {key suffix} {out out err err} {
     set channel [open $base.$suffix]
+    fconfigure $channel -translation lf
     dict set result $key [read $channel]
     close $channel
     file delete $base.$suffix
@@ -74,6 +75,15 @@ proc ::cli::output {args} {
   return [dict get $result out]
 }
 
+# The same for a run whose answer is outside of its tolerance or the device's range.
+proc ::cli::offOutput {args} {
+  set result [vorkel {*}$args]
+  if {[dict get $result status] != 3 || [dict get $result err] ne ""} {
+    error "not off as it must be: $result"
+  }
+  return [dict get $result out]
+}
+
 # What the report says: a dict with device, input, VCO and so on as they stand, notes (a list),
 # and rows (a list with one dict for each output, from heading to text). An output has a line in
 # each table.
@@ -82,6 +92,8 @@ proc ::cli::report {text} {
   set report [dict create notes {}]
   set rows [dict create]
   set headings {}
+  # What goes on in the next line is indented by two.
+  regsub -all {\n  (?=\S)} $text { } text
   foreach line [split $text \n] {
     if {[regexp "^($labels)  +(.*)\$" $line -> name value]} {
       dict set report $name $value
@@ -105,6 +117,11 @@ proc ::cli::report {text} {
 # The report on a request that must succeed.
 proc ::cli::solve {args} {
   return [report [output {*}$args]]
+}
+
+# The same for one that is outside of its tolerance or the device's range.
+proc ::cli::solveOff {args} {
+  return [report [offOutput {*}$args]]
 }
 
 # The entries of a column of the table.

@@ -1,0 +1,298 @@
+# The command best: the best of all settings of a PLL or a TSYN, beside what the engine answers.
+
+package provide vorkel::best 1.1
+package require vorkel::answer 1.1
+package require vorkel::colour 1.1
+package require vorkel::engine 1.1
+package require vorkel::grid 1.1
+package require vorkel::help 1.1
+package require vorkel::numbers 1.1
+package require vorkel::options 1.1
+package require vorkel::output 1.1
+package require vorkel::report 1.1
+package require vorkel::table 1.1
+
+namespace eval ::vorkel::best {
+  # Options beside those of a request (see options.tcl).
+  variable options {
+    --front N         "trade-offs to show, 6 by default"
+  }
+  variable default_front 6
+  variable most_front 1000
+  # What the answers are.
+  variable best_variant "best of the grid"
+  variable tradeoff_variant "trade-off"
+}
+
+# Writes the report on the best settings, what the engine has, and the trade-offs. The exit status
+# is that of the best settings.
+proc ::vorkel::best::run {words} {
+  variable options
+  variable best_variant
+  variable tradeoff_variant
+  set call [::vorkel::options::request $words $options]
+  set request [dict get $call request]
+  set primitives [Primitives $call]
+  set most [Most [dict get $call given]]
+  if {[dict get $call file] ne ""} {
+    ::vorkel::colour::off
+  }
+  set points [dict create]
+  foreach primitive $primitives {
+    dict set points $primitive [::vorkel::grid::order $request \
+      [::vorkel::grid::points $request $primitive]]
+  }
+  set all [::vorkel::grid::order $request [concat {*}[dict values $points]]]
+  if {[llength $all] == 0} {
+    Unsolved $call $primitives
+  }
+  set grid [BestOfEach $request $points [lindex $all 0]]
+  set engine [Engine $request $primitives]
+  set winner [lindex $grid 0]
+  set format [dict get $call format]
+  if {$format eq "sdc"} {
+    # Constraints are those of one plan.
+    set text [::vorkel::output::format $format [list $winner] $request]
+  } else {
+    # The first trade-off is the winner itself.
+    set front [::vorkel::grid::tradeoffs $all]
+    set shown [lmap point [lrange $front 1 [expr {$most - 1}]] {
+      ::vorkel::grid::answer $request $point $tradeoff_variant
+    }]
+    if {$format eq "text"} {
+      set text [Text $grid $engine $shown [expr {[llength $front] - 1 - [llength $shown]}] $most]
+      append text [Hint $call $winner]
+    } else {
+      set text [::vorkel::output::format $format [concat $grid $shown $engine] $request]
+    }
+  }
+  ::vorkel::output::write $text [dict get $call file]
+  return [::vorkel::answer::status $winner]
+}
+
+# The primitives to search: those with a grid of M, D and dividers.
+proc ::vorkel::best::Primitives {call} {
+  set primitives [lmap primitive [dict get $call primitives] {
+    if {[::vorkel::engine::family $primitive] ne "Loop"} continue
+    set primitive
+  }]
+  if {[llength $primitives] > 0} {
+    return $primitives
+  }
+  if {[dict get $call primitive] ne "auto"} {
+    throw {VORKEL USAGE} "--primitive: best searches the settings of PLL and TSYN, not of\
+      [dict get $call primitive]; use plan or compare"
+  }
+  throw {VORKEL USAGE} "best searches the settings of PLL and TSYN, and\
+    [dict get $call request device] has neither; use plan or compare"
+}
+
+# How many trade-offs to show, the best settings among them.
+proc ::vorkel::best::Most {given} {
+  variable default_front
+  variable most_front
+  set text [::vorkel::options::get $given --front $default_front]
+  if {![regexp {^[0-9]{1,4}$} $text] || [scan $text %d] > $most_front} {
+    throw {VORKEL USAGE} "--front: \"$text\" must be a whole number from 0 to $most_front"
+  }
+  return [scan $text %d]
+}
+
+# The best answer of each primitive that has one, the best of all first.
+proc ::vorkel::best::BestOfEach {request points winner} {
+  variable best_variant
+  set firsts [lmap list [dict values $points] {
+    if {[llength $list] == 0} continue
+    lindex $list 0
+  }]
+  set others [lsearch -exact -all -inline -not $firsts $winner]
+  return [lmap point [list $winner {*}$others] {
+    ::vorkel::grid::answer $request $point $best_variant
+  }]
+}
+
+# What the engine has for each primitive.
+proc ::vorkel::best::Engine {request primitives} {
+  return [lmap primitive $primitives {
+    lindex [::vorkel::answer::rank [::vorkel::answer::all $request [list $primitive]]] 0
+  }]
+}
+
+proc ::vorkel::best::Unsolved {call primitives} {
+  throw {VORKEL UNSOLVED} "no setting of [join $primitives { or }] of\
+    [dict get $call request device] has everything in the device's ranges\nhint:\
+    [::vorkel::help::command explain [Plain [dict get $call words]]]"
+}
+
+# The words without the options that only this command has.
+proc ::vorkel::best::Plain {words} {
+  set plain {}
+  while {[llength $words] > 0} {
+    set words [lassign $words word]
+    if {$word eq "--front"} {
+      set words [lrange $words 1 end]
+    } elseif {![string match --front=* $word]} {
+      lappend plain $word
+    }
+  }
+  return $plain
+}
+
+# The report. `left` is how many trade-offs there are beside those that are shown.
+proc ::vorkel::best::Text {grid engine shown left most} {
+  set winner [lindex $grid 0]
+  set text [::vorkel::report::render $winner]
+  append text "\n" [Beside [concat $grid $engine]]
+  append text "\n" [::vorkel::table::prose "why: " [Why $winner [concat $grid $engine]]]
+  if {$most > 0} {
+    append text "\n" [Front $winner $shown $left $most]
+  }
+  foreach answer $engine {
+    set sentences [expr {[dict get $answer solved] ? [dict get $answer violations] :
+      [list [dict get $answer reason]]}]
+    foreach sentence $sentences {
+      append text [::vorkel::table::prose "[dict get $answer primitive], engine: " $sentence]
+    }
+  }
+  return $text
+}
+
+# The table of the best settings and the engine's answers.
+proc ::vorkel::best::Beside {answers} {
+  set columns {{left source} {left primitive} {left loop} {right M} {right D} {right {VCO MHz}}
+    {right {worst ppm}} {right {jitter ps}} {left mark}}
+  set rows {}
+  set roles {}
+  foreach answer $answers {
+    set source [dict get $answer source]
+    if {![dict get $answer solved]} {
+      lappend rows [list $source [dict get $answer primitive] - - - - - - none]
+      lappend roles off
+      continue
+    }
+    lappend rows [list $source [dict get $answer primitive] [dict get $answer bandwidth] \
+      {*}[Loop $answer] [format %.6g [dict get $answer settings VCO]] [Ppm $answer] \
+      [Jitter $answer] [Mark $answer]]
+    lappend roles [Role $answer [expr {[llength $rows] == 1}]]
+  }
+  return [::vorkel::table::render $columns $rows $roles]
+}
+
+# The trade-offs as text: the winner and those behind it.
+proc ::vorkel::best::Front {winner shown left most} {
+  if {[dict get $winner maxJitter] eq ""} {
+    return "trade-offs: none, as the jitter is not known\n"
+  }
+  if {[llength $shown] + $left == 0} {
+    return "trade-offs: none, no other setting has less jitter\n"
+  }
+  set text "trade-offs, less jitter for larger errors:\n[Tradeoffs [list $winner {*}$shown]]"
+  if {$left > 0} {
+    append text "and $left more with larger errors; --front [expr {$most + $left}] shows all\n"
+  }
+  return $text
+}
+
+# The table of trade-offs. The error tells as much as the mark, for which there is no room beside
+# many dividers.
+proc ::vorkel::best::Tradeoffs {answers} {
+  set columns {{left primitive} {left loop} {right M} {right D} {right {worst ppm}}
+    {right {jitter ps}} {left dividers} {left mark}}
+  set rows {}
+  foreach answer $answers {
+    set dividers [lmap output [dict get $answer outputs] {
+      ::vorkel::numbers::short [dict get $output divider] 3
+    }]
+    lappend rows [list [dict get $answer primitive] [dict get $answer bandwidth] \
+      {*}[Loop $answer] [Ppm $answer] [Jitter $answer] [join $dividers ,] [Mark $answer]]
+  }
+  set roles [lmap answer $answers {Role $answer 0}]
+  set widths [lmap line [split [::vorkel::table::render $columns $rows] \n] {string length $line}]
+  if {[tcl::mathfunc::max {*}$widths] > $::vorkel::table::line_width} {
+    set columns [lrange $columns 0 end-1]
+    set rows [lmap row $rows {lrange $row 0 end-1}]
+  }
+  return [::vorkel::table::render $columns $rows $roles]
+}
+
+proc ::vorkel::best::Loop {answer} {
+  return [list [::vorkel::numbers::short [dict get $answer settings M] 3] \
+    [dict get $answer settings D]]
+}
+
+# The largest error of a frequency, in at most nine characters.
+proc ::vorkel::best::Ppm {answer} {
+  set ppm [dict get $answer worstPpm]
+  if {$ppm >= 1e6} {
+    return [format %.3g $ppm]
+  }
+  return [::vorkel::numbers::fixed $ppm 2]
+}
+
+proc ::vorkel::best::Jitter {answer} {
+  set jitter [dict get $answer maxJitter]
+  return [expr {$jitter eq "" ? "-" : $jitter}]
+}
+
+proc ::vorkel::best::Mark {answer} {
+  return [expr {[dict get $answer within] ? "" : "OFF"}]
+}
+
+proc ::vorkel::best::Role {answer first} {
+  if {![dict get $answer within]} {
+    return off
+  }
+  return [expr {$first ? "good" : ""}]
+}
+
+# What makes the winner the best.
+proc ::vorkel::best::Why {winner answers} {
+  set request [dict get $winner request]
+  set asked [expr {[::vorkel::answer::isAsked $request phase] ||
+    [::vorkel::answer::isAsked $request duty]}]
+  set order "smallest worst frequency error first, then "
+  if {$asked} {
+    append order "smallest phase error, then duty cycle error, then "
+  }
+  append order [expr {[dict get $request preferMaxVco] ? "highest VCO, then least jitter" :
+    "least jitter, then lowest VCO"}]
+  set text "the best of all settings in the device's ranges by: $order"
+  if {$asked} {
+    append text [expr {[dict get $winner within] ?
+      "; only settings with everything within its tolerance count, as there are such" :
+      "; none has everything within its tolerance"}]
+  }
+  return "$text. [Gain $winner $answers]"
+}
+
+# What the search has gained over the engine's best answer.
+proc ::vorkel::best::Gain {winner answers} {
+  set engine [lmap answer [::vorkel::answer::rank $answers] {
+    if {[dict get $answer source] ne "engine" || ![dict get $answer solved]} continue
+    set answer
+  }]
+  if {[llength $engine] == 0} {
+    return "The engine finds none."
+  }
+  set engine [lindex $engine 0]
+  set reached [dict get $engine worstPpm]
+  set least [dict get $winner worstPpm]
+  set name [dict get $engine primitive]
+  if {$reached > $least + 0.005} {
+    return "The engine's best answer, of a $name, is [Ppm $engine] ppm off, this one\
+      [Ppm $winner] ppm."
+  }
+  if {[dict get $engine within] == [dict get $winner within] && $reached <= $least + 0.005} {
+    return "The engine's best answer, of a $name, has frequencies as near as that."
+  }
+  return "The engine's best answer, of a $name, is nearer in frequency, but not within all\
+    tolerances."
+}
+
+proc ::vorkel::best::Hint {call winner} {
+  if {[dict get $winner within]} {
+    return ""
+  }
+  return "hint: what would work: [::vorkel::help::command explain \
+    [Plain [dict get $call words]]]\n"
+}

@@ -1,0 +1,315 @@
+# Which limits of a KRU_SP or a KRU_CLKGEN stand in the way of a request. The findings are those
+# of explain_loop.tcl.
+
+package provide vorkel::explain_kru 1.1
+package require vorkel::actual 1.1
+package require vorkel::answer 1.1
+package require vorkel::catalogue 1.1
+package require vorkel::explain_loop 1.1
+package require vorkel::numbers 1.1
+
+namespace eval ::vorkel::explain_kru {
+  variable divides {2 2.5 3 3.5 4 4.5 5 5.5 6 6.5 7 7.5 8 9 10 11 12 13 14 15 16 17}
+  # M and D of CLKFX.
+  variable largest {KRU_SP 32 KRU_CLKGEN 256}
+  variable smallest_m 2
+  # The divides of CLKFXDV.
+  variable fx_divides {2 4 8 16 32}
+  # The ranges in which the engine looks for a KRU_CLKGEN, MHz, whatever those of the device.
+  variable searched {CLKFX {5 374.532} CLKFXDV {0.156 187.266}}
+}
+
+# The findings; none when all outputs are possible.
+proc ::vorkel::explain_kru::findings {request primitive} {
+  set findings {}
+  set index 0
+  foreach output [dict get $request outputs] {
+    lappend findings {*}[Alone $request $primitive $output $index]
+    incr index
+  }
+  if {[llength $findings] == 0 && [llength [dict get $request outputs]] > 1} {
+    return [Together $request $primitive]
+  }
+  return $findings
+}
+
+# A request with only some of the outputs, and no duty cycles, for which a KRU has no setting.
+proc ::vorkel::explain_kru::Part {request indices} {
+  dict set request outputs [lmap index $indices {
+    dict replace [lindex [dict get $request outputs] $index] duty ""
+  }]
+  return $request
+}
+
+# Whether the engine has an answer within the tolerance.
+proc ::vorkel::explain_kru::works {request primitive} {
+  foreach answer [::vorkel::answer::all $request [list $primitive]] {
+    if {[dict get $answer within]} {
+      return 1
+    }
+  }
+  return 0
+}
+
+# What a pin can make: a list of the distance from a frequency, the frequency, the pin without
+# its phase, how it is made, and its ratio to the input. For each D of CLKFX the M next to the
+# frequency are enough.
+proc ::vorkel::explain_kru::made {request primitive frequency} {
+  variable divides
+  variable largest
+  variable smallest_m
+  set input [lindex [dict get $request inputs] 0]
+  set halves [expr {$primitive eq "KRU_SP" ? {1 2} : {1}}]
+  set most [dict get $largest $primitive]
+  set rows {}
+  foreach half $halves {
+    set base [expr {double($input) / $half}]
+    set from "[::vorkel::explain_loop::MHz $input][expr {$half == 2 ? " / 2" : ""}]"
+    if {$primitive eq "KRU_SP"} {
+      lappend rows [Row $frequency $base CLK0 $from [list 1 $half]]
+      lappend rows [Row $frequency [expr {2 * $base}] CLK2X "$from x 2" [list 2 $half]]
+      foreach divide $divides {
+        lappend rows [Row $frequency [expr {$base / $divide}] CLKDV "$from / $divide" \
+          [list 2 [expr {round(2 * $half * $divide)}]]]
+      }
+    }
+    for {set d 1} {$d <= $most} {incr d} {
+      set below [expr {int(min($most, max($smallest_m, floor($frequency * $d / $base))))}]
+      foreach m [list $below [expr {min($most, $below + 1)}]] {
+        lappend rows [Row $frequency [expr {$base * $m / $d}] CLKFX "$from x $m / $d" \
+          [list $m [expr {$half * $d}]]]
+      }
+    }
+  }
+  set seen [dict create]
+  return [lmap row [lsort -real -index 0 $rows] {
+    set key [list [format %.9g [lindex $row 1]] [lindex $row 2]]
+    if {[dict exists $seen $key]} continue
+    dict set seen $key 1
+    set row
+  }]
+}
+
+proc ::vorkel::explain_kru::Row {frequency value pin how ratio} {
+  return [list [expr {abs($value - $frequency)}] $value $pin $how \
+    [::vorkel::actual::reduce {*}$ratio]]
+}
+
+# The range of a pin, MHz.
+proc ::vorkel::explain_kru::range {request primitive pin} {
+  variable searched
+  lassign [::vorkel::catalogue::pinRange $pin 0 [dict get $request limits]] lowest highest
+  if {$primitive eq "KRU_CLKGEN"} {
+    lassign [dict get $searched $pin] low high
+    set lowest [expr {max($lowest, $low)}]
+    set highest [expr {min($highest, $high)}]
+  }
+  return [list $lowest $highest]
+}
+
+proc ::vorkel::explain_kru::inRange {request primitive pin frequency} {
+  lassign [range $request $primitive $pin] lowest highest
+  return [expr {$frequency >= $lowest * (1 - 1e-9) && $frequency <= $highest * (1 + 1e-9)}]
+}
+
+# Why an output cannot be made by itself, if so. On a KRU_CLKGEN all follow output 0.
+proc ::vorkel::explain_kru::Alone {request primitive output index} {
+  set clkgen [expr {$primitive eq "KRU_CLKGEN"}]
+  if {$clkgen && $index > 0} {
+    return [Follower $request $output $index]
+  }
+  if {[works [Part $request $index] $primitive]} {
+    return {}
+  }
+  set frequency [dict get $output freq]
+  set allowed [expr {$frequency * ([dict get $request tolerance] * 1e-6 + 1e-12)}]
+  set rows [made $request $primitive $frequency]
+  set fitting [lmap row $rows {
+    if {[lindex $row 0] > $allowed} break
+    set row
+  }]
+  if {[llength $fitting] == 0} {
+    set findings [list [NoRatio $request $primitive $frequency $index $rows]]
+    if {$clkgen && [Phase $output] != 0} {
+      lappend findings [NoPhase $request $primitive $output $index CLKFX]
+    }
+    return $findings
+  }
+  set candidates [lsort -unique [lmap row $fitting {lindex $row 2}]]
+  # CLK90 and CLK270 have a range of their own.
+  set phase [Phase $output]
+  set quarter [expr {!$clkgen && fmod($phase, 180.0) != 0 && fmod($phase, 90.0) == 0}]
+  if {$quarter && "CLK0" in $candidates} {
+    set candidates [list CLK90]
+  }
+  set pins [lmap pin $candidates {
+    if {![inRange $request $primitive $pin $frequency]} continue
+    set pin
+  }]
+  if {[llength $pins] == 0} {
+    return [list [NoRange $request $primitive $frequency $index $candidates]]
+  }
+  set plain [Part $request $index]
+  dict set plain outputs [list [dict replace $output phase "" duty ""]]
+  if {![works $plain $primitive]} {
+    return [list [Inexact $primitive $frequency $index [lindex $fitting 0]]]
+  }
+  return [list [NoPhase $request $primitive $output $index $pins]]
+}
+
+# The phase of an output, from 0 to 360 degrees; 0 when it asks for none.
+proc ::vorkel::explain_kru::Phase {output} {
+  set phase [dict get $output phase]
+  if {$phase eq ""} {
+    return 0.0
+  }
+  return [expr {fmod($phase + 360.0, 360.0)}]
+}
+
+proc ::vorkel::explain_kru::NoRatio {request primitive frequency index rows} {
+  variable largest
+  set most [dict get $largest $primitive]
+  set pins [expr {$primitive eq "KRU_SP" ?
+    "CLK0 is the input, or its half; CLK2X doubles it; CLKDV divides it by 2 to 17; CLKFX makes\
+      input x M / D with M and D up to $most" : "CLKFX makes input x M / D with M and D up to\
+      $most"}]
+  set near [lmap row [lrange $rows 0 1] {
+    lassign $row distance value pin how
+    string cat "[::vorkel::explain_loop::MHz $value] MHz ($pin: $how,\
+      [::vorkel::explain_loop::change $value $frequency])"
+  }]
+  return [::vorkel::explain_loop::Finding "pin frequency" $index "no pin makes\
+    [::vorkel::explain_loop::MHz $frequency] MHz: $pins. The nearest are [join $near { and }]"]
+}
+
+proc ::vorkel::explain_kru::NoRange {request primitive frequency index pins} {
+  set ranges [lmap pin $pins {
+    lassign [range $request $primitive $pin] lowest highest
+    string cat "$pin only from [::vorkel::explain_loop::MHz $lowest] to\
+      [::vorkel::explain_loop::MHz $highest] MHz"
+  }]
+  return [::vorkel::explain_loop::Finding "pin range" $index "[::vorkel::explain_loop::MHz \
+    $frequency] MHz is out of the range of the pins that could make it: [join $ranges {; }]"]
+}
+
+# The engine does not use the tolerance that is allowed.
+proc ::vorkel::explain_kru::Inexact {primitive frequency index row} {
+  lassign $row distance value pin how
+  return [::vorkel::explain_loop::Finding "the engine" $index "$pin could make\
+    [::vorkel::explain_loop::MHz $value] MHz ($how,\
+    [::vorkel::explain_loop::change $value $frequency]), but the engine\
+    takes settings of a $primitive only where they make the frequency almost exactly"]
+}
+
+# What a pin that could make an output has for phases.
+proc ::vorkel::explain_kru::NoPhase {request primitive output index pins} {
+  set frequency [::vorkel::explain_loop::MHz [dict get $output freq]]
+  set phase [dict get $output phase]
+  if {$primitive eq "KRU_CLKGEN"} {
+    return [::vorkel::explain_loop::Finding "pin phase" $index "output 0 is on CLKFX, at 0 degrees\
+      whatever is asked for; [::vorkel::explain_loop::MHz $phase] degrees is for other outputs, of\
+      which CLKFX180 has 180"]
+  }
+  set known {CLK0 {0 180} CLK90 {90 270} CLK2X {0 180} CLKDV 0 CLKFX {0 180}}
+  set texts [lmap pin $pins {
+    string cat "$pin has [join [dict get $known $pin] { and }]"
+  }]
+  set part [Part $request $index]
+  foreach answer [::vorkel::answer::all $part [list $primitive]] {
+    if {![dict get $answer solved]} continue
+    set made [lindex [dict get $answer outputs] 0]
+    if {"phaseError" in [dict get $made offs]} {
+      return [::vorkel::explain_loop::Finding "phase grid" $index "PHASE_SHIFT moves all pins in\
+        steps of 360 / $::vorkel::actual::shift_steps =\
+        [::vorkel::numbers::short [expr {360.0 / $::vorkel::actual::shift_steps}] 3] degrees: next\
+        to [::vorkel::explain_loop::MHz $phase] degrees it makes\
+        [::vorkel::numbers::short [dict get $made phase] 3], off by\
+        [::vorkel::numbers::short [expr {abs([dict get $made phaseError])}] 3] with\
+        $::vorkel::answer::phase_tolerance allowed"]
+    }
+  }
+  return [::vorkel::explain_loop::Finding "pin phase" $index "the pins that make $frequency MHz\
+    have no phase of [::vorkel::explain_loop::MHz $phase] degrees: [join $texts {; }]"]
+}
+
+# Why an output of a KRU_CLKGEN cannot follow output 0, if so.
+proc ::vorkel::explain_kru::Follower {request output index} {
+  variable fx_divides
+  if {[works [Part $request [list 0 $index]] KRU_CLKGEN] ||
+      ![works [Part $request 0] KRU_CLKGEN]} {
+    return {}
+  }
+  set frequency [dict get $output freq]
+  set first [dict get [lindex [dict get $request outputs] 0] freq]
+  set text "[::vorkel::explain_loop::MHz $frequency] MHz"
+  set allowed [expr {[dict get $request tolerance] * 1e-6 + 1e-12}]
+  set divide ""
+  foreach candidate [list 1 {*}$fx_divides] {
+    if {abs($first / $candidate / $frequency - 1) <= $allowed} {
+      set divide $candidate
+    }
+  }
+  if {$divide eq ""} {
+    return [list [::vorkel::explain_loop::Finding "pin frequency" $index "$text is neither that of\
+      output 0, [::vorkel::explain_loop::MHz $first] MHz, for CLKFX and CLKFX180, nor that divided\
+      by [join [lrange $fx_divides 0 end-1] {, }] or [lindex $fx_divides end] for CLKFXDV"]]
+  }
+  set pin [expr {$divide == 1 ? "CLKFX" : "CLKFXDV"}]
+  if {![inRange $request KRU_CLKGEN $pin $frequency]} {
+    return [list [NoRange $request KRU_CLKGEN $frequency $index [list $pin]]]
+  }
+  set phase [dict get $output phase]
+  if {$phase ne "" && $phase != 0} {
+    set known [expr {$divide == 1 ? "CLKFX has 0 degrees and CLKFX180 180" :
+      "CLKFXDV has 0 degrees only"}]
+    return [list [::vorkel::explain_loop::Finding "pin phase" $index "$text is a frequency of $pin,\
+      but [::vorkel::explain_loop::MHz $phase] degrees is none of its phases: $known"]]
+  }
+  return [list [::vorkel::explain_loop::Finding "the engine" $index "$pin could make $text, but the\
+    engine finds no M and D for it that are near enough"]]
+}
+
+# Outputs that are possible each by itself, or beside output 0.
+proc ::vorkel::explain_kru::Together {request primitive} {
+  set indices {}
+  foreach output [dict get $request outputs] {
+    lappend indices [llength $indices]
+  }
+  if {[works [Part $request $indices] $primitive]} {
+    return {}
+  }
+  foreach index $indices {
+    set others [lsearch -all -inline -not -exact $indices $index]
+    # Whatever follows output 0 of a KRU_CLKGEN is nothing without it.
+    if {$primitive eq "KRU_CLKGEN" && $index == 0} continue
+    if {[llength $others] > 0 && ![works [Part $request $others] $primitive]} {
+      set indices $others
+    }
+  }
+  if {$primitive eq "KRU_CLKGEN"} {
+    return [list [::vorkel::explain_loop::Finding "outputs together" $indices "each can be made\
+      beside output 0, but one M, one D and one divide of CLKFXDV must serve them all"]]
+  }
+  set plain $request
+  dict set plain outputs [lmap index $indices {
+    dict replace [lindex [dict get $request outputs] $index] phase "" duty ""
+  }]
+  set phases [works $plain $primitive]
+  set offsets [lsort -unique [lmap index $indices {
+    set phase [Phase [lindex [dict get $request outputs] $index]]
+    ::vorkel::numbers::short [expr {fmod($phase, 90.0)}] 3
+  }]]
+  if {$phases && [llength $offsets] > 1} {
+    return [list [::vorkel::explain_loop::Finding "pin phase" $indices "one PHASE_SHIFT moves all\
+      outputs, on top of the 0, 90, 180 and 270 degrees of the pins; these phases would need\
+      [join $offsets { and }] degrees of it"]]
+  }
+  if {$phases} {
+    return [list [::vorkel::explain_loop::Finding "pin phase" $indices "no pins have these phases\
+      together: beside one PHASE_SHIFT for all, the pins at the input frequency have 0, 90, 180 and\
+      270 degrees, CLK2X and CLKFX 0 and 180, CLKDV 0"]]
+  }
+  return [list [::vorkel::explain_loop::Finding "outputs together" $indices "each can be made\
+    alone, but one CLKIN_DIVIDE_BY_2, one M and D of CLKFX and one divide of CLKDV must serve\
+    them all"]]
+}

@@ -1,0 +1,423 @@
+# Which limits of a PLL or a TSYN stand in the way of a request.
+#
+# A finding is a dict: kind (see explain.tcl), outputs (a list of indices, empty when it is the
+# input clocks'), and text, a sentence with the numbers.
+
+package provide vorkel::explain_loop 1.1
+package require vorkel::catalogue 1.1
+package require vorkel::explain_walk 1.1
+package require vorkel::numbers 1.1
+
+namespace eval ::vorkel::explain_loop {
+  # As many VCO frequencies are told one by one.
+  variable most_named 4
+}
+
+proc ::vorkel::explain_loop::Finding {kind outputs text} {
+  return [dict create kind $kind outputs $outputs text $text]
+}
+
+# A number in up to six decimals, or as it is short when that would be very long or nothing.
+proc ::vorkel::explain_loop::MHz {value} {
+  if {abs($value) >= 1e9 || ($value != 0 && abs($value) < 1e-6)} {
+    return [format %.6g $value]
+  }
+  return [::vorkel::numbers::short $value 6]
+}
+
+# The findings; none when there are settings for all that is asked.
+proc ::vorkel::explain_loop::findings {request primitive} {
+  set findings [Inputs $request $primitive]
+  foreach output [dict get $request outputs] {
+    lappend findings {*}[Range $request $primitive $output \
+      [expr {[incr index] - 1}]]
+  }
+  if {[llength $findings] > 0} {
+    return $findings
+  }
+  set pairs [::vorkel::explain_walk::pairs $request $primitive [dict get $request inputs]]
+  set fractional [::vorkel::explain_walk::isFractional $request $primitive]
+  set index 0
+  foreach output [dict get $request outputs] {
+    lappend findings {*}[Alone $request $primitive $output $index $pairs \
+      [expr {$fractional && $index == 0}]]
+    incr index
+  }
+  if {[llength $findings] > 0} {
+    return $findings
+  }
+  return [Together $request $primitive $pairs]
+}
+
+# What the input clocks are in the way of by themselves.
+proc ::vorkel::explain_loop::Inputs {request primitive} {
+  set inputs [dict get $request inputs]
+  set limits [dict get $request limits]
+  set bandwidth [dict get $request bandwidth]
+  set pfd [::vorkel::catalogue::pfdRange $primitive $limits $bandwidth]
+  set vco [::vorkel::catalogue::vcoRange $primitive $limits]
+  set narrow [expr {$bandwidth eq "LOW" ? " with bandwidth LOW" : ""}]
+  set findings {}
+  foreach input $inputs {
+    lassign [::vorkel::explain_walk::dividersOf $input $pfd] first last
+    if {$first > $last} {
+      lappend findings [Finding "PFD range" {} "the PFD runs at the input divided by D, and must\
+        have [MHz [lindex $pfd 0]] to [MHz [lindex $pfd 1]] MHz$narrow: [PfdMiss $input $pfd]"]
+    } elseif {[llength [::vorkel::explain_walk::pairs $request $primitive [list $input]]] == 0} {
+      lappend findings [Finding "VCO range" {} "the VCO must have [MHz [lindex $vco 0]] to\
+        [MHz [lindex $vco 1]] MHz, and [MHz $input] MHz x M / D, with M up to\
+        $::vorkel::explain_walk::largest_m and D from $first to $last, never has"]
+    }
+  }
+  if {[llength $findings] == 0 && [llength [::vorkel::explain_walk::pairs $request $primitive \
+      $inputs]] == 0} {
+    lappend findings [Apart $inputs $vco $pfd]
+  }
+  return $findings
+}
+
+proc ::vorkel::explain_loop::PfdMiss {input range} {
+  lassign $range lowest highest
+  if {$input < $lowest} {
+    return "even with D = 1 it has only the [MHz $input] MHz of the input"
+  }
+  set most $::vorkel::explain_walk::largest_d
+  if {$input / double($most) > $highest} {
+    return "even with D = $most it has [MHz [expr {$input / double($most)}]] MHz from an input of\
+      [MHz $input] MHz"
+  }
+  return "no whole D divides the [MHz $input] MHz of the input into that"
+}
+
+# Two input clocks of which each would do.
+proc ::vorkel::explain_loop::Apart {inputs vco pfd} {
+  lassign [lsort -real $inputs] slow fast
+  set times [expr {double($fast) / $slow}]
+  set span [expr {[lindex $vco 1] / [lindex $vco 0]}]
+  set text "the same M and D serve both input clocks. [MHz $fast] MHz is\
+    [::vorkel::numbers::short $times 3] times [MHz $slow] MHz"
+  if {$times > $span} {
+    append text ", but the highest VCO, [MHz [lindex $vco 1]] MHz, is only\
+      [::vorkel::numbers::short $span 3] times the lowest, [MHz [lindex $vco 0]] MHz"
+  } else {
+    append text "; no M and D keep the VCO in [MHz [lindex $vco 0]] to [MHz [lindex $vco 1]] MHz\
+      and the PFD in [MHz [lindex $pfd 0]] to [MHz [lindex $pfd 1]] MHz with both"
+  }
+  return [Finding "inputs too far apart" {} $text]
+}
+
+# An output that no input clock could help.
+proc ::vorkel::explain_loop::Range {request primitive output index} {
+  set frequency [dict get $output freq]
+  set limits [dict get $request limits]
+  lassign [::vorkel::catalogue::outputRange $primitive $limits $index] lowest highest
+  if {$frequency < $lowest || $frequency > $highest} {
+    set side [expr {$frequency < $lowest ? "below the lowest, [MHz $lowest]" :
+      "above the highest, [MHz $highest]"}]
+    return [list [Finding "output range" $index "[MHz $frequency] MHz is $side MHz"]]
+  }
+  lassign [::vorkel::catalogue::vcoRange $primitive $limits] slow fast
+  set most $::vorkel::explain_walk::largest_divider
+  set allowed [expr {1 + [dict get $request tolerance] * 1e-6}]
+  if {$frequency * $most * $allowed < $slow} {
+    set needed [expr {int(ceil($slow / $frequency))}]
+    return [list [Finding "divider range" $index "to make [MHz $frequency] MHz of the lowest VCO,\
+      [MHz $slow] MHz, the divider would have to be $needed; the largest is $most"]]
+  }
+  set fractional [expr {$index == 0 && [::vorkel::explain_walk::isFractional $request $primitive]}]
+  set steps [expr {$fractional ? $::vorkel::actual::fraction : 1}]
+  set below [expr {floor($fast * $allowed / $frequency * $steps) / $steps}]
+  # There is no divider between 1 and 2.
+  if {$below < 2} {
+    set below [expr {floor($below)}]
+  }
+  if {$below < 1 || $below * $frequency * $allowed < $slow} {
+    set above [expr {$below < 2 ? $below + 1 : $below + 1.0 / $steps}]
+    set parts [lmap divider [list $below $above] {
+      if {$divider < 1} continue
+      string cat "[::vorkel::numbers::short $divider 3] needs a VCO of " \
+        "[MHz [expr {$divider * $frequency}]] MHz"
+    }]
+    return [list [Finding "VCO range" $index "for [MHz $frequency] MHz a divider of\
+      [join $parts {, one of }], and the range of the VCO is [MHz $slow] to [MHz $fast] MHz"]]
+  }
+  return {}
+}
+
+# An output that cannot be made even when it is the only one.
+proc ::vorkel::explain_loop::Alone {request primitive output index pairs fractional} {
+  set level 0
+  set serving {}
+  foreach pair $pairs {
+    set reached [::vorkel::explain_walk::level $request $output [lindex $pair 0] $fractional]
+    set level [expr {max($level, $reached)}]
+    if {$reached > 0} {
+      lappend serving $pair
+    }
+  }
+  switch -- $level {
+    0 { return [list [Grid $request $primitive $output $index $pairs $fractional]] }
+    1 { return [list [Phase $output $index [Dividers $output $serving]]] }
+    2 { return [list [Duty $request $output $index [Dividers $output $serving]]] }
+  }
+  return {}
+}
+
+# The dividers that make an output of pairs that serve its frequency, sorted.
+proc ::vorkel::explain_loop::Dividers {output pairs} {
+  return [lsort -integer -unique [lmap pair $pairs {
+    expr {round([lindex $pair 0] / [dict get $output freq])}
+  }]]
+}
+
+# M and D do not make the VCO that the output needs.
+proc ::vorkel::explain_loop::Grid {request primitive output index pairs fractional} {
+  set frequency [dict get $output freq]
+  set limits [dict get $request limits]
+  set input [lindex [dict get $request inputs] 0]
+  set whole [expr {$fractional ? "a divider in eighths" : "a whole number"}]
+  set text "[MHz $frequency] MHz is the VCO divided by $whole"
+  if {!$fractional} {
+    append text [NamedVcos $frequency [::vorkel::catalogue::vcoRange $primitive $limits]]
+  }
+  append text ", but [MHz $input] MHz x M / D makes no such VCO:\
+    [MostM $primitive], and D ends at [LargestD $request $primitive]. The nearest are\
+    [join [lmap near [nearest $frequency $pairs $fractional 2] {Made $near $input $frequency}] \
+      { and }]"
+  return [Finding "M and D" $index $text[NoObstacle $output \
+    [::vorkel::catalogue::vcoRange $primitive $limits]]]
+}
+
+# What was asked for beside the frequency, when some divider has it.
+proc ::vorkel::explain_loop::NoObstacle {output range} {
+  set phase [dict get $output phase]
+  if {$phase in {"" 0 0.0}} {
+    return ""
+  }
+  lassign $range lowest highest
+  set frequency [dict get $output freq]
+  set divider [expr {max(1, int(ceil($lowest / $frequency)))}]
+  for {} {$divider * $frequency <= $highest} {incr divider} {
+    if {[::vorkel::explain_walk::phaseServes $output $divider]} {
+      return ". The phase is not in the way: a divider of $divider has [MHz $phase] degrees"
+    }
+  }
+  return ""
+}
+
+# The VCO frequencies that a frequency is a part of, if they are few.
+proc ::vorkel::explain_loop::NamedVcos {frequency range} {
+  variable most_named
+  lassign $range lowest highest
+  set vcos {}
+  for {set n [expr {max(1, int(ceil($lowest / $frequency)))}]} {$n * $frequency <= $highest} \
+      {incr n} {
+    lappend vcos [MHz [expr {$n * $frequency}]]
+  }
+  if {[llength $vcos] == 0 || [llength $vcos] > $most_named} {
+    return ""
+  }
+  return " (a VCO of [Either $vcos] MHz)"
+}
+
+proc ::vorkel::explain_loop::MostM {primitive} {
+  set most $::vorkel::explain_walk::largest_m
+  set gap [dict get $::vorkel::explain_walk::m_gap $primitive]
+  return [expr {[llength $gap] == 0 ? "M ends at $most" : "M is 1 or\
+    [expr {[lindex $gap end] + 1}] to $most"}]
+}
+
+proc ::vorkel::explain_loop::LargestD {request primitive} {
+  set range [::vorkel::catalogue::pfdRange $primitive [dict get $request limits] \
+    [dict get $request bandwidth]]
+  set last $::vorkel::explain_walk::largest_d
+  set text $last
+  foreach input [dict get $request inputs] {
+    set high [lindex [::vorkel::explain_walk::dividersOf $input $range] 1]
+    if {$high < $last} {
+      set last $high
+      set text "$high, as the PFD needs [MHz [lindex $range 0]] MHz"
+    }
+  }
+  return $text
+}
+
+# The frequencies that pairs make which are nearest to one, each a list of the distance, the
+# frequency, M, D and the divider.
+proc ::vorkel::explain_loop::nearest {frequency pairs fractional count} {
+  set made {}
+  set seen [dict create]
+  foreach pair $pairs {
+    lassign $pair vco m d
+    foreach divider [::vorkel::explain_walk::dividersAt [expr {$vco / $frequency}] $fractional] {
+      set value [expr {$vco / $divider}]
+      set key [format %.9g $value]
+      if {![dict exists $seen $key]} {
+        dict set seen $key 1
+        lappend made [list [expr {abs($value - $frequency)}] $value $m $d $divider]
+      }
+    }
+  }
+  return [lrange [lsort -real -index 0 $made] 0 [expr {$count - 1}]]
+}
+
+# How far a frequency is from another one.
+proc ::vorkel::explain_loop::change {value frequency} {
+  return [far [expr {($value / $frequency - 1) * 1e6}]]
+}
+
+# An error in ppm as text, in percent when it is much.
+proc ::vorkel::explain_loop::far {ppm} {
+  if {abs($ppm) >= 1e4} {
+    return "[format %+.3g [expr {$ppm / 1e4}]] %"
+  }
+  return "[format %+.2f $ppm] ppm"
+}
+
+proc ::vorkel::explain_loop::Made {near input frequency} {
+  lassign $near distance value m d divider
+  return "[MHz $value] MHz ([MHz $input] x $m / $d / [::vorkel::numbers::short $divider 3],\
+    [change $value $frequency])"
+}
+
+# "a", "a or b", "a, b or c".
+proc ::vorkel::explain_loop::Either {names {word or}} {
+  if {[llength $names] < 2} {
+    return [join $names]
+  }
+  return "[join [lrange $names 0 end-1] {, }] $word [lindex $names end]"
+}
+
+# Text for a list of dividers: all of them, or the ends.
+proc ::vorkel::explain_loop::Named {dividers} {
+  variable most_named
+  if {[llength $dividers] > $most_named} {
+    return "[lindex $dividers 0] to [lindex $dividers end]"
+  }
+  return [Either $dividers]
+}
+
+# No divider that makes the frequency has a step at the phase.
+proc ::vorkel::explain_loop::Phase {output index dividers} {
+  set phase [dict get $output phase]
+  set best ""
+  foreach divider $dividers {
+    set step [expr {$::vorkel::actual::phase_step / $divider}]
+    set made [::vorkel::actual::phaseOnStep $phase $divider]
+    set error [expr {abs([::vorkel::actual::phaseDifference $made $phase])}]
+    if {$best eq "" || $error < [lindex $best 0]} {
+      set best [list $error $made $divider $step]
+    }
+  }
+  lassign $best error made divider step
+  return [Finding "phase grid" $index "the phase moves in steps of\
+    [MHz $::vorkel::actual::phase_step] degrees of the VCO, 45 / N behind a divider N.\
+    [MHz [dict get $output freq]] MHz has a divider of [Named $dividers]; its step nearest to\
+    [MHz $phase] degrees is [::vorkel::numbers::short $made 3], with N = $divider in steps of\
+    [::vorkel::numbers::short $step 3], off by [::vorkel::numbers::short $error 3] with\
+    $::vorkel::answer::phase_tolerance allowed"]
+}
+
+# No divider that makes the frequency has the duty cycle: its counters are too short, or it has no
+# step there.
+proc ::vorkel::explain_loop::Duty {request output index dividers} {
+  set duty [dict get $output duty]
+  set most [dict get $request limits O_MAX_HT_LT]
+  set best ""
+  foreach divider $dividers {
+    set made [::vorkel::actual::dutyOnStep $duty $divider $most]
+    # What counters without an end would do.
+    set free [::vorkel::actual::dutyOnStep $duty $divider $divider]
+    set row [list [expr {abs($made - $duty)}] $made $divider \
+      [expr {abs($free - $duty) <= $::vorkel::answer::duty_tolerance + 1e-6}]]
+    if {$best eq "" || [lindex $row 0] < [lindex $best 0]} {
+      set best $row
+    }
+    lappend counted [lindex $row 3]
+  }
+  lassign $best error made divider
+  set near "the nearest is [::vorkel::numbers::short $made 3] %, with N = $divider"
+  set head "[MHz [dict get $output freq]] MHz has a divider N of [Named $dividers]"
+  if {1 in $counted} {
+    set low [expr {100.0 * max(1, $divider - $most) / $divider}]
+    set high [expr {100.0 * min($divider - 0.5, $most + 0.5) / $divider}]
+    return [Finding "high and low count" $index "$head, which holds its output high or low for at\
+      most $most VCO periods: with N = $divider that is a duty cycle of\
+      [::vorkel::numbers::short $low 3] to [::vorkel::numbers::short $high 3] %, not\
+      [MHz $duty] %; $near"]
+  }
+  return [Finding "duty grid" $index "$head and counts its high time in half VCO periods, at least\
+    one whole, so that [MHz $duty] % is none of its steps: $near, off by\
+    [::vorkel::numbers::short $error 3] points with $::vorkel::answer::duty_tolerance allowed"]
+}
+
+# Outputs of which each can be made, but not with the others.
+proc ::vorkel::explain_loop::Together {request primitive pairs} {
+  set masks [::vorkel::explain_walk::masks $request $primitive $pairs]
+  set indices {}
+  foreach mask $masks {
+    lappend indices [llength $indices]
+  }
+  if {[::vorkel::explain_walk::serving $masks $indices] != 0} {
+    return {}
+  }
+  # What can be left out without making it possible has no part in it.
+  foreach index $indices {
+    set others [lsearch -all -inline -not -exact $indices $index]
+    if {[::vorkel::explain_walk::serving $masks $others] == 0} {
+      set indices $others
+    }
+  }
+  return [list [Finding "outputs together" $indices [Conflict $request $primitive $indices]]]
+}
+
+proc ::vorkel::explain_loop::Conflict {request primitive indices} {
+  set outputs [dict get $request outputs]
+  set input [lindex [dict get $request inputs] 0]
+  set names [lmap index $indices {MHz [dict get [lindex $outputs $index] freq]}]
+  set text "each can be made alone, but [join $names { and }] MHz need one VCO that serves all of\
+    them. "
+  set range [::vorkel::catalogue::vcoRange $primitive [dict get $request limits]]
+  set common [Common $request $primitive $indices $range]
+  if {[llength $common] == 0} {
+    return [append text "None from [MHz [lindex $range 0]] to [MHz [lindex $range 1]] MHz, whatever\
+      the input clock, is a multiple of all of them with their phases and duty cycles"]
+  }
+  return [append text "That is one of [Vcos $common], and [MHz $input] MHz x M / D makes none of\
+    these: [MostM $primitive], and D ends at [LargestD $request $primitive]"]
+}
+
+# The VCO frequencies in the range that would serve these outputs.
+proc ::vorkel::explain_loop::Common {request primitive indices range} {
+  lassign $range lowest highest
+  set fractional [::vorkel::explain_walk::isFractional $request $primitive]
+  set seed [lindex [dict get $request outputs] [lindex $indices 0]]
+  set steps [expr {$fractional && [lindex $indices 0] == 0 ? $::vorkel::actual::fraction : 1}]
+  set vcos {}
+  set most [expr {$::vorkel::explain_walk::largest_divider * $steps}]
+  for {set n $steps} {$n <= $most} {incr n} {
+    set vco [expr {[dict get $seed freq] * double($n) / $steps}]
+    if {$vco < $lowest || $vco > $highest || ($n > $steps && $n < 2 * $steps)} continue
+    set serves 1
+    foreach index $indices {
+      set output [lindex [dict get $request outputs] $index]
+      if {[::vorkel::explain_walk::level $request $output $vco \
+          [expr {$fractional && $index == 0}]] < 3} {
+        set serves 0
+        break
+      }
+    }
+    if {$serves} {
+      lappend vcos $vco
+    }
+  }
+  return $vcos
+}
+
+proc ::vorkel::explain_loop::Vcos {vcos} {
+  variable most_named
+  set names [lmap vco [lrange $vcos 0 [expr {$most_named - 1}]] {MHz $vco}]
+  set more [expr {[llength $vcos] > $most_named ? " and [expr {[llength $vcos] - $most_named}]\
+    more" : ""}]
+  return "[join $names {, }] MHz$more"
+}

@@ -1,0 +1,123 @@
+# Values as people write them, such as 148.5MHz, 8ns, 100/3, 90deg or 50%, in the units that the
+# rest of the program counts in.
+
+package provide vorkel::units 1.1
+package require vorkel::numbers 1.1
+
+namespace eval ::vorkel::units {
+  variable number {[-+]?(?:[0-9]+\.?[0-9]*|\.[0-9]+)(?:[eE][-+]?[0-9]+)?}
+  # For each kind of value: the unit of a number without one, examples, what a value must be (a
+  # check of numbers.tcl), and its units. A unit is written in any case. It has what to do with
+  # the number: multiply it, divide it, or divide by it, as a period is made a frequency.
+  variable kinds {
+    frequency {unit MHz article "a frequency" examples "100, 148.5MHz, 100/3 or 8ns"
+      check positive units {hz {/ 1e6} khz {/ 1e3} mhz {* 1.0} ghz {* 1e3}
+        ps {by 1e6} ns {by 1e3} us {by 1.0} ms {by 1e-3}}
+      known "Hz, kHz, MHz and GHz, or ps, ns, us and ms for a period"}
+    phase {unit degrees article "a phase" examples "90, 90deg or -45"
+      check turn units {deg {* 1.0} degree {* 1.0} degrees {* 1.0} ° {* 1.0}} known "deg"}
+    duty {unit percent article "a duty cycle" examples "50, 50% or 33.3"
+      check percentage units {% {* 1.0} percent {* 1.0}} known "%"}
+    jitter {unit ps article "a jitter" examples "50, 50ps or 0.05ns"
+      check jitter units {fs {/ 1e3} ps {* 1.0} ns {* 1e3} us {* 1e6}}
+      known "fs, ps, ns and us"}
+    tolerance {unit ppm article "a tolerance" examples "100, 100ppm or 0.01%"
+      check notNegative units {ppm {* 1.0} ppb {/ 1e3} % {* 1e4}} known "ppm, ppb and %"}
+  }
+  # The entry of a list for an output that asks for nothing.
+  variable none -
+}
+
+# The value of a text, a double in the unit of its kind. `what` names it in a complaint, which
+# is thrown as wrong usage.
+proc ::vorkel::units::value {text kind what} {
+  return [lindex [Parse $text $kind $what] 0]
+}
+
+# The values of a text with commas between them. With `optional` an entry may be "-"; it is ""
+# in the answer. Where a period or a multiple is written with some entry, one without a unit
+# would be a trap: who writes "8,16 ns" means both.
+proc ::vorkel::units::values {text kind what {optional 0}} {
+  variable kinds
+  variable none
+  set values {}
+  set bare ""
+  set strange ""
+  foreach entry [split $text ,] {
+    set entry [string trim $entry]
+    if {$entry eq ""} {
+      throw {VORKEL USAGE} "$what: a number is missing in \"$text\""
+    }
+    if {$optional && $entry eq $none} {
+      lappend values ""
+      continue
+    }
+    lassign [Parse $entry $kind $what] value unit rule
+    lappend values $value
+    if {$unit eq ""} {
+      set bare $entry
+    } elseif {$rule ne {* 1.0}} {
+      set strange $entry
+    }
+  }
+  if {[llength $values] == 0} {
+    throw {VORKEL USAGE} "$what: the list is empty"
+  }
+  if {$bare ne "" && $strange ne ""} {
+    throw {VORKEL USAGE} "$what: is \"$bare\" beside \"$strange\" meant in\
+      [dict get $kinds $kind unit]? Write the unit of each"
+  }
+  return $values
+}
+
+# A list of the value, the unit as it is written, and what it does.
+proc ::vorkel::units::Parse {text kind what} {
+  variable kinds
+  variable number
+  set facts [dict get $kinds $kind]
+  set pattern "^\\s*($number)(?:\\s*/\\s*($number))?\\s*(\[^\\s0-9.\]\[^0-9\]*)?\$"
+  if {![regexp -- $pattern $text -> first second unit]} {
+    throw {VORKEL USAGE} "$what: \"$text\" is not [dict get $facts article], such as\
+      [dict get $facts examples]"
+  }
+  set value [::vorkel::numbers::parse $first $what]
+  if {$second ne ""} {
+    set divisor [::vorkel::numbers::parse $second $what]
+    if {$divisor == 0.0} {
+      throw {VORKEL USAGE} "$what: \"$text\" divides by 0"
+    }
+    set value [expr {$value / $divisor}]
+  }
+  set demand [::vorkel::numbers::[dict get $facts check] $value]
+  if {$demand ne ""} {
+    throw {VORKEL USAGE} "$what: $text must be $demand"
+  }
+  set rule {* 1.0}
+  set unit [string trim $unit]
+  if {$unit ne ""} {
+    set name [string tolower $unit]
+    if {![dict exists $facts units $name]} {
+      throw {VORKEL USAGE} "$what: unknown unit \"$unit\" in \"$text\"; the units of\
+        [dict get $facts article] are [dict get $facts known]"
+    }
+    set rule [dict get $facts units $name]
+  }
+  set value [Convert $value $rule]
+  set demand [::vorkel::numbers::[dict get $facts check] $value]
+  if {$demand ne "" && $kind eq "jitter"} {
+    throw {VORKEL USAGE} "$what: $text must be $demand"
+  }
+  if {$demand ne "" || abs($value) > $::vorkel::numbers::largest} {
+    throw {VORKEL USAGE} "$what: $text is out of any range"
+  }
+  return [list $value $unit $rule]
+}
+
+proc ::vorkel::units::Convert {value rule} {
+  lassign $rule operation factor
+  switch -- $operation {
+    * { return [expr {$value * $factor}] }
+    / { return [expr {$value / $factor}] }
+    by { return [expr {$factor / $value}] }
+  }
+}
