@@ -92,12 +92,12 @@ TEST_P(PllCompare, ProductAnswersAsThePlainSearch) {
 
 INSTANTIATE_TEST_SUITE_P(
     Kinds, PllCompare,
-    testing::Values(Load{Kind::kCommon, 800, 8, 20000, 300, 3},
-                    Load{Kind::kConstructed, 1500, 4, 40000, 300, 2},
-                    Load{Kind::kShifted, 400, 16, 15000, 600, 5},
-                    Load{Kind::kRangeEnds, 600, 4, 15000, 150, 3},
-                    Load{Kind::kInfeasible, 100, 12, 4000, 300, 6},
-                    Load{Kind::kWild, 800, 4, 15000, 100, 3}),
+    testing::Values(Load{Kind::kCommon, 800, 8, 20000, 60, 3},
+                    Load{Kind::kConstructed, 1500, 4, 40000, 60, 2},
+                    Load{Kind::kShifted, 400, 16, 15000, 120, 5},
+                    Load{Kind::kRangeEnds, 600, 4, 15000, 30, 3},
+                    Load{Kind::kInfeasible, 100, 12, 4000, 60, 6},
+                    Load{Kind::kWild, 800, 4, 15000, 20, 3}),
     [](const testing::TestParamInfo<Load>& parameter) {
       return KindName(parameter.param.kind);
     });

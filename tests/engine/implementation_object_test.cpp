@@ -286,6 +286,7 @@ TEST_F(ImplementationObjectTest, AnEntryOfTheRegistryIsUsedAgain) {
     EXPECT_EQ(Controllers::Instance(imp.pic).Find()->useCount, 2);
     return;
   }
+  Occupy(address);
   GTEST_SKIP() << "the allocator did not hand out the address again";
 }
 

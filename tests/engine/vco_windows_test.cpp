@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include "tests/engine/EngineTest.h"
 #include "tests/support/FakeHost.h"
 
 namespace Ip::Pll {
@@ -10,7 +11,7 @@ namespace {
 // A prepared run: 100 MHz into a TSYN with a VCO of 600 to 1440 MHz and a PFD of 10 to 500 MHz.
 class VcoWindowsTest : public testing::Test {
  protected:
-  VcoWindowsTest() : imp_(nullptr) {
+  VcoWindowsTest() {
     FakeHost::Instance().Reset();
     SetTsyn("windows", {});
     imp_.SetDevice("windows");
@@ -41,7 +42,7 @@ class VcoWindowsTest : public testing::Test {
   }
 
   Trace trace_{false};
-  VorkelImp imp_;
+  VorkelImp& imp_ = engine_test::NewImp();
 };
 
 // M = 6, D = 1 accepts 100 x 6 / 1.0005 = 599.70015 to 100 x 6 / 0.9995 = 600.30015 MHz, of
