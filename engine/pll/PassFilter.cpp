@@ -10,6 +10,7 @@ namespace {
 constexpr int kFirstChunk = 16;   // passes; small, since most fudges are
 constexpr int kChunkGrowth = 4;
 constexpr int kKeyBits = 5;       // for tolerance numbers 0 to kTolerances
+constexpr int kFewSteps = 100;
 constexpr unsigned kDigit = (1u << kKeyBits) - 1;
 static_assert(kTolerances < kDigit);
 
@@ -178,8 +179,7 @@ bool PassFilter::IsPutOutByLeftovers(int attempt, Key key) {
   const double downward = OutFreq0(attempt, -1.0);
   Key smallest = key;
   bool stays = false;
-  FindScanWindows(key);
-  Scan(OutFreq0(attempt, 1.0), [&](int step, double vco) {
+  Scan(OutFreq0(attempt, 1.0), key, [&](int step, double vco) {
     const Key left = KeyOf(vco, smallest);
     if (left > smallest) return;
     stays = (left == smallest && stays) || !IsCandidate(downward * steps_[step]);
@@ -257,8 +257,7 @@ PassFilter::Key PassFilter::WitnessKey(int attempt, double witness) const {
 PassFilter::Key PassFilter::SmallestKey(int attempt, Key known) {
   Key smallest = known;
   double witness = 0.0;
-  FindScanWindows(known);
-  Scan(OutFreq0(attempt), [&](int, double vco) {
+  Scan(OutFreq0(attempt), known, [&](int, double vco) {
     const Key key = KeyOf(vco, smallest);
     if (key >= smallest) return;
     smallest = key;
@@ -271,9 +270,22 @@ PassFilter::Key PassFilter::SmallestKey(int attempt, Key known) {
   return smallest;
 }
 
-// Visits the candidates of an output-0 frequency in the windows found last, some of them twice.
+// Visits the candidates of an output-0 frequency whose key can be the smallest and not above
+// `known`, and others, some of them twice. A few are all visited; that is quicker than to find
+// out where to look.
 template <typename Visit>
-void PassFilter::Scan(double outFreq0, Visit visit) const {
+void PassFilter::Scan(double outFreq0, Key known, Visit visit) {
+  const int lowest = steps_.FirstWorthTrying(outFreq0, imp_.pll.minAdjVco);
+  const int highest =
+      std::min(steps_.Below(imp_.pll.maxAdjVco / outFreq0) + 1, steps_.Count() - 1);
+  if (highest - lowest < kFewSteps) {
+    for (int step = lowest; step <= highest; ++step) {
+      const double vco = outFreq0 * steps_[step];
+      if (IsCandidate(vco)) visit(step, vco);
+    }
+    return;
+  }
+  FindScanWindows(known);
   for (const VcoWindows* windows : {&narrower_, &asNarrow_}) {
     for (const VcoWindow& window : *windows) {
       const int first = std::max(steps_.Below(window.low / outFreq0) - 1, 0);

@@ -96,7 +96,7 @@ class PassFilter {
   Key SmallestKey(int attempt, Key known);
   void FindScanWindows(Key known);
   template <typename Visit>
-  void Scan(double outFreq0, Visit visit) const;
+  void Scan(double outFreq0, Key known, Visit visit);
 
   const VorkelImp& imp_;
   const Run& run_;

@@ -4,6 +4,7 @@
 
 #include "tests/compare/Difference.h"
 #include "tests/plain/plain_kru_clkgen.h"
+#include "tests/engine/EngineTest.h"
 #include "tests/support/CaptureTrace.h"
 #include "tests/support/FakeHost.h"
 
@@ -49,7 +50,7 @@ void Publish(const KruCase& drawn, plain::KruLimits& limits) {
 
 }  // namespace
 
-KruPair::KruPair() : imp_(nullptr) {
+KruPair::KruPair() : imp_(engine_test::NewImp()) {
   FakeHost::Instance().devices[kPart];
   imp_.SetDevice(kPart);
 }

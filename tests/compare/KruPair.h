@@ -26,7 +26,7 @@ class KruPair {
  private:
   std::string CompareState(int code) const;
 
-  Ip::VorkelImp imp_;
+  Ip::VorkelImp& imp_;
   plain::RequestLists lists_;
   plain::KruState state_;
   plain::KruLimits limits_;

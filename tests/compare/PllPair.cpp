@@ -3,6 +3,7 @@
 #include <optional>
 
 #include "tests/compare/Difference.h"
+#include "tests/engine/EngineTest.h"
 #include "tests/support/CaptureTrace.h"
 #include "tests/support/FakeHost.h"
 
@@ -33,7 +34,7 @@ plain::PllLimits PublishLimits(const plain::PllLimits& wanted, int prim) {
   return limits;
 }
 
-PllPair::PllPair() : imp_(nullptr) { imp_.SetDevice(kComparedPart); }
+PllPair::PllPair() : imp_(engine_test::NewImp()) { imp_.SetDevice(kComparedPart); }
 
 int PllPair::RunProduct(const plain::PllRequest& r, bool traced) {
   imp_.SetLowBandwidth(r.lowBandwidth);

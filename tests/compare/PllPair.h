@@ -33,7 +33,7 @@ class PllPair {
   int RunProduct(const plain::PllRequest& request, bool traced);
   std::string CompareAnswers(int code);
 
-  Ip::VorkelImp imp_;
+  Ip::VorkelImp& imp_;
   plain::RequestLists lists_;
   plain::PllAnswer answer_;
   // What the limits keep from run to run: only a TSYN load sets the low-bandwidth maximum.

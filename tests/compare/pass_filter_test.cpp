@@ -10,6 +10,7 @@
 #include <cstdlib>
 
 #include "tests/compare/PllPair.h"
+#include "tests/engine/EngineTest.h"
 #include "tests/plain/plain_lists.h"
 
 namespace compare {
@@ -83,7 +84,7 @@ TEST_P(PassFilterProperty, LeavesOutNoPassThatSucceeds) {
   const bool longRun = std::getenv("VORKEL_TEST_LONG") != nullptr;
   const int requests = longRun ? 1500 : 250;
   const int passes = longRun ? 600 : 150;
-  Ip::VorkelImp imp(nullptr);
+  Ip::VorkelImp& imp = engine_test::NewImp();
   imp.SetDevice(kComparedPart);
   Counts counts;
   int wrong = 0;
