@@ -15,24 +15,48 @@ _vorkel_listed() {
       inside && /^  [-a-z]/ { print $1 }'
 }
 
+# The options of a command: _vorkel_options PROGRAM COMMAND.
+_vorkel_options() {
+  _vorkel_listed "$1" Options help "$2"
+  printf '%s\n' --help
+}
+
+# The words that an option of a command takes: _vorkel_values PROGRAM COMMAND OPTION. Its
+# description begins with them, as in "text (default), json or tcl; what it is about".
+_vorkel_values() {
+  "$1" help "$2" 2>/dev/null |
+    awk -v option="$3" '
+      /^  [-a-z]/ || !/^  / { inside = 0 }
+      $1 == option { inside = 1; $1 = $2 = "" }
+      inside { text = text " " $0 }
+      END {
+        gsub(/\([^)]*\)/, "", text)
+        sub(/;.*/, "", text)
+        gsub(/,| or /, " ", text)
+        print text
+      }'
+}
+
 _vorkel() {
-  local program=$1 word=$2 previous=$3 words=
+  local program=$1 word=$2 previous=$3 command=${COMP_WORDS[1]} words=
   COMPREPLY=()
   if ((COMP_CWORD == 1)); then
     words=$(_vorkel_listed "$program" Commands help)
+  elif [[ $word == -* && $previous != -* ]]; then
+    words=$(_vorkel_options "$program" "$command")
   else
     case $previous in
       -o | --request | check) mapfile -t COMPREPLY < <(compgen -f -- "$word"); return ;;
-      --format) words='text json tcl sdc' ;;
-      --bandwidth) words='LOW HIGH OPTIMIZED' ;;
-      --primitive) words='auto PLL TSYN KRU_SP KRU_CLKGEN' ;;
+      --format | --bandwidth | --primitive)
+        words=$(_vorkel_values "$program" "$command" "$previous")
+        ;;
       --device | devices)
         words=$("$program" devices 2>/dev/null | awk '/^$/ { exit } /^[^ ]/ && NR > 1 { print $1 }')
         ;;
       help) words=$(_vorkel_listed "$program" Commands help) ;;
       *)
         if [[ $word == -* ]]; then
-          words="$(_vorkel_listed "$program" Options help "${COMP_WORDS[1]}") --help"
+          words=$(_vorkel_options "$program" "$command")
         fi
         ;;
     esac

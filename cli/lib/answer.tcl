@@ -289,19 +289,20 @@ proc ::vorkel::answer::LoopSettings {request solution} {
 # in three decimals; the step that they mean is taken.
 proc ::vorkel::answer::LoopOutputs {request job solution} {
   set input [lindex [dict get $request inputs] 0]
+  set m [dict get $solution m]
   set first [dict get [lindex [dict get $solution outputs] 0] divider]
-  set fractional [expr {$first != round($first)}]
+  set fractional [expr {$m != round($m) || $first != round($first)}]
   set most [dict get $request limits O_MAX_HT_LT]
   set outputs {}
   foreach output [dict get $solution outputs] asked [dict get $request outputs] {
     set divider [expr {double([dict get $output divider])}]
-    set ratio [::vorkel::actual::loopRatio [dict get $solution m] [dict get $solution d] $divider]
+    set ratio [::vorkel::actual::loopRatio $m [dict get $solution d] $divider]
     set phase [Setting $output phase [dict get $asked phase]]
     set duty [dict get $asked duty]
     if {$duty ne "" && [dict exists $output duty] && [dict get $output duty] > 0} {
       set duty [expr {[dict get $output duty] * 100}]
     }
-    # Nothing can be moved beside a divider that changes from period to period.
+    # Nothing can be moved beside an M or a divider that changes from period to period.
     set phase [expr {$fractional || $phase eq "" ? 0.0 :
       [::vorkel::actual::phaseOnStep $phase $divider]}]
     set duty [expr {$fractional || $duty eq "" ? 50.0 :

@@ -9,6 +9,7 @@ package require vorkel::help 1.1
 package require vorkel::numbers 1.1
 package require vorkel::options 1.1
 package require vorkel::output 1.1
+package require vorkel::progress 1.1
 package require vorkel::report 1.1
 package require vorkel::table 1.1
 
@@ -19,6 +20,8 @@ namespace eval ::vorkel::best {
   }
   variable default_front 6
   variable most_front 1000
+  # How many steps of the search a run of the engine counts as where progress is shown.
+  variable run_steps 10
   # What the answers are.
   variable best_variant "best of the grid"
   variable tradeoff_variant "trade-off"
@@ -37,17 +40,12 @@ proc ::vorkel::best::run {words} {
   if {[dict get $call file] ne ""} {
     ::vorkel::colour::off
   }
-  set points [dict create]
-  foreach primitive $primitives {
-    dict set points $primitive [::vorkel::grid::order $request \
-      [::vorkel::grid::points $request $primitive]]
-  }
+  lassign [Search $request $primitives] points engine
   set all [::vorkel::grid::order $request [concat {*}[dict values $points]]]
   if {[llength $all] == 0} {
     Unsolved $call $primitives
   }
   set grid [BestOfEach $request $points [lindex $all 0]]
-  set engine [Engine $request $primitives]
   set winner [lindex $grid 0]
   set format [dict get $call format]
   if {$format eq "sdc"} {
@@ -98,6 +96,34 @@ proc ::vorkel::best::Most {given} {
   return [scan $text %d]
 }
 
+# The points of each primitive, a dict from primitive to list, the best first; and, if there are
+# any, what the engine has for each, a list. A terminal sees how far this has come.
+proc ::vorkel::best::Search {request primitives} {
+  variable run_steps
+  set steps [expr {[::vorkel::answer::runs $request $primitives] * $run_steps}]
+  foreach primitive $primitives {
+    incr steps [::vorkel::grid::steps $request $primitive]
+  }
+  ::vorkel::progress::start $steps "searching all settings"
+  try {
+    set points [dict create]
+    foreach primitive $primitives {
+      dict set points $primitive [::vorkel::grid::order $request \
+        [::vorkel::grid::points $request $primitive ::vorkel::progress::step]]
+    }
+    if {[llength [concat {*}[dict values $points]]] == 0} {
+      return [list $points {}]
+    }
+    set engine [lmap primitive $primitives {
+      lindex [::vorkel::answer::rank [::vorkel::answer::all $request [list $primitive] \
+        [list ::vorkel::progress::step $run_steps]]] 0
+    }]
+    return [list $points $engine]
+  } finally {
+    ::vorkel::progress::finish
+  }
+}
+
 # The best answer of each primitive that has one, the best of all first.
 proc ::vorkel::best::BestOfEach {request points winner} {
   variable best_variant
@@ -108,13 +134,6 @@ proc ::vorkel::best::BestOfEach {request points winner} {
   set others [lsearch -exact -all -inline -not $firsts $winner]
   return [lmap point [list $winner {*}$others] {
     ::vorkel::grid::answer $request $point $best_variant
-  }]
-}
-
-# What the engine has for each primitive.
-proc ::vorkel::best::Engine {request primitives} {
-  return [lmap primitive $primitives {
-    lindex [::vorkel::answer::rank [::vorkel::answer::all $request [list $primitive]]] 0
   }]
 }
 
@@ -231,7 +250,7 @@ proc ::vorkel::best::Ppm {answer} {
 
 proc ::vorkel::best::Jitter {answer} {
   set jitter [dict get $answer maxJitter]
-  return [expr {$jitter eq "" ? "-" : $jitter}]
+  return [expr {$jitter eq "" ? "-" : [::vorkel::numbers::fixed $jitter 3]}]
 }
 
 proc ::vorkel::best::Mark {answer} {

@@ -2,12 +2,16 @@
 
 package provide vorkel::catalogue 1.1
 package require vorkel::engine 1.1
+package require vorkel::options 1.1
 
 namespace eval ::vorkel::catalogue {
   variable defaultPart vk40
   # The highest frequency at the phase-frequency detector of a PLL with a narrow loop, MHz. A
   # device file has it for a TSYN only.
   variable low_bandwidth_pfd 300
+  # The ranges in which the engine looks for the outputs of a KRU_CLKGEN, MHz. It reads none from
+  # the device for it, and a handle of its own for each search keeps those that it begins with.
+  variable clkgen_ranges {CLKFX {5 374.532} CLKFXDV {0.156 187.266}}
 }
 
 # The names of all devices, sorted.
@@ -35,7 +39,8 @@ proc ::vorkel::catalogue::describe {device} {
 # Nothing marks where the device ends, so a name can begin with several devices. As for the
 # host, the longest that has such a package and grade is meant.
 proc ::vorkel::catalogue::resolve {part} {
-  set complaint "unknown device \"$part\"; the devices are [join [names] {, }]"
+  set complaint "unknown device \"[::vorkel::options::shown $part]\"; the devices are\
+    [join [names] {, }]"
   set longest 1
   foreach device [Prefixes $part] {
     try {
@@ -83,28 +88,34 @@ proc ::vorkel::catalogue::Member {description kind name named} {
       throw {VORKEL DETAIL} "$device has no default grade; it has [join $known {, }]"
     }
   } elseif {$name ni $known} {
-    throw {VORKEL DETAIL} "$device has no $kind \"$name\"; it has [join $known {, }]"
+    throw {VORKEL DETAIL} "$device has no $kind \"[::vorkel::options::shown $name]\"; it has\
+      [join $known {, }]"
   }
   return $name
 }
 
-# The primitives whose limits are all there, in the host's order.
-proc ::vorkel::catalogue::Primitives {limits} {
-  set incomplete {}
-  set all {}
+# All primitives that the host knows, in its order.
+proc ::vorkel::catalogue::primitives {} {
+  ::vorkel::engine::load
+  set primitives {}
   foreach keyword [::Vorkel::Devices keywords] {
-    lassign $keyword name unit primitives
-    foreach primitive $primitives {
-      if {$primitive ni $all} {
-        lappend all $primitive
-      }
-      if {![dict exists $limits $name]} {
-        lappend incomplete $primitive
+    foreach primitive [lindex $keyword 2] {
+      if {$primitive ni $primitives} {
+        lappend primitives $primitive
       }
     }
   }
-  return [lmap primitive $all {
-    if {$primitive in $incomplete} continue
+  return $primitives
+}
+
+# The primitives whose limits are all there, in the host's order.
+proc ::vorkel::catalogue::Primitives {limits} {
+  return [lmap primitive [primitives] {
+    set missing [lmap keyword [keywordsOf $primitive] {
+      if {[dict exists $limits [lindex $keyword 0]]} continue
+      set keyword
+    }]
+    if {[llength $missing] > 0} continue
     set primitive
   }]
 }
@@ -167,6 +178,14 @@ proc ::vorkel::catalogue::pinRange {pin doubled limits} {
     set shortest [dict get $limits $other]
   }
   return [list [expr {1000.0 / $longest}] [expr {1000.0 / $shortest}]]
+}
+
+# The lowest and the highest frequency at which the engine looks for an output of a KRU_CLKGEN,
+# MHz.
+proc ::vorkel::catalogue::clkgenRange {} {
+  variable clkgen_ranges
+  set bounds [concat {*}[dict values $clkgen_ranges]]
+  return [list [tcl::mathfunc::min {*}$bounds] [tcl::mathfunc::max {*}$bounds]]
 }
 
 # The lowest and the highest VCO frequency of a PLL or a TSYN, MHz; "" for other primitives.

@@ -66,9 +66,17 @@ proc ::vorkel::check::run {words} {
 # The bytes of a file whose name is that of a device file.
 proc ::vorkel::check::Contents {path} {
   variable largest_file
+  set name $path
+  set path [::vorkel::options::path $path]
   try {
+    if {$path eq ""} {
+      throw {POSIX ENOENT} "the name of the file is empty"
+    }
     if {![file exists $path]} {
-      throw {POSIX ENOENT} "there is no such file"
+      throw {POSIX ENOENT} "there is no such file[IsDevice $name]"
+    }
+    if {[file isdirectory $path]} {
+      throw {POSIX EISDIR} "it is a directory"
     }
     if {![file isfile $path]} {
       throw {POSIX EINVAL} "it is no plain file"
@@ -87,8 +95,20 @@ proc ::vorkel::check::Contents {path} {
     }
   } on error {reason options} {
     set cause [lindex [dict get $options -errorcode] 2]
-    throw {VORKEL USAGE} "$path: [expr {$cause eq "" ? $reason : $cause}]"
+    set label [expr {$name eq "" ? "" : "[::vorkel::options::shown $name]: "}]
+    throw {VORKEL USAGE} "$label[expr {$cause eq "" ? $reason : $cause}]"
   }
+}
+
+# What to say when the name of a file is that of a device, or its beginning.
+proc ::vorkel::check::IsDevice {name} {
+  try {
+    set device [dict get [::vorkel::catalogue::find $name] description]
+  } trap {VORKEL USAGE} {} {
+    return ""
+  }
+  return "; check takes the file of a device, that of [dict get $device name] is\
+    [dict get $device file], and devices [dict get $device name] shows its limits"
 }
 
 # The mistakes of a device file, each a line that begins with file, line and column, and what
@@ -236,7 +256,7 @@ proc ::vorkel::check::Grade {grade limits calculator} {
   set columns [list [list left "grade $grade"] {right keywords} {left {}}]
   set rows {}
   set begun {}
-  foreach primitive [Primitives] {
+  foreach primitive [::vorkel::catalogue::primitives] {
     lassign [Count $primitive $limits] there needed own
     set result [expr {$there == $needed ? "yes" : $own == 0 ? "left out" : "NO"}]
     if {$result eq "NO"} {
@@ -249,19 +269,6 @@ proc ::vorkel::check::Grade {grade limits calculator} {
     lappend rows [list $primitive "$there of $needed" $result]
   }
   return [::vorkel::table::render $columns $rows][Missing $limits $begun]
-}
-
-# All primitives, in the host's order.
-proc ::vorkel::check::Primitives {} {
-  set primitives {}
-  foreach keyword [::Vorkel::Devices keywords] {
-    foreach primitive [lindex $keyword 2] {
-      if {$primitive ni $primitives} {
-        lappend primitives $primitive
-      }
-    }
-  }
-  return $primitives
 }
 
 # How many of the keywords of a primitive there are, how many it needs, and how many of those
@@ -297,7 +304,7 @@ proc ::vorkel::check::Missing {limits begun} {
   if {[llength $rows] == 0} {
     return ""
   }
-  return "\n[::vorkel::table::render {{left missing} {left unit} {left costs}} $rows]"
+  return "\n[::vorkel::table::fitted {{left missing} {left unit} {left costs}} $rows]"
 }
 
 # Limits that contradict each other, a line each, with the line of the first.

@@ -7,18 +7,22 @@ package require vorkel::table 1.1
 
 namespace eval ::vorkel::devices {
   variable options {}
+  variable label_width 10
+  # So many grades stand beside each other.
+  variable most_grades 5
 }
 
 # Answers the list of all devices, or all limits of the device, or of the grade, that a part
-# name stands for.
+# name, or its beginning, stands for.
 proc ::vorkel::devices::run {words} {
   variable options
-  set operands [dict get [::vorkel::options::parse $options $words] operands]
-  switch -- [llength $operands] {
-    0 { return [All] }
-    1 { return [One [lindex $operands 0]] }
+  set given [::vorkel::options::parse $options $words]
+  ::vorkel::options::refuseOperands $given 1
+  set operands [dict get $given operands]
+  if {[llength $operands] == 0} {
+    return [All]
   }
-  throw {VORKEL USAGE} "unexpected word \"[lindex $operands 1]\""
+  return [One [lindex $operands 0]]
 }
 
 # One row for each primitive of each device, in its default grade. A device whose file cannot
@@ -38,6 +42,11 @@ proc ::vorkel::devices::All {} {
   set text [::vorkel::table::render $columns $rows]
   append text $unreadable
   append text "\nThe grade is the device's default; devices NAME shows all limits.\n"
+  if {[lsearch -index 2 $rows KRU_CLKGEN] >= 0} {
+    lassign [::vorkel::catalogue::clkgenRange] lowest highest
+    append text [::vorkel::table::paragraph "The engine looks for a KRU_CLKGEN from $lowest\
+      to $highest MHz only, whatever the device."]
+  }
   return $text
 }
 
@@ -75,38 +84,76 @@ proc ::vorkel::devices::SecondOutput {primitive limits} {
 
 # Everything that is known about a device: a row for each keyword, a column for each grade.
 proc ::vorkel::devices::One {part} {
-  set device [::vorkel::catalogue::resolve $part]
-  set description [dict get $device description]
-  set name [dict get $device device]
-  # A part name that is no more than the device's name asks for all grades.
-  set grades [dict get $description grades]
-  if {$part ne $name} {
-    set grades [list [dict get $device grade]]
-  }
-  set lines {}
+  variable label_width
+  lassign [Shown $part] description grades
+  set limits [dict get $description limits]
+  set text ""
   foreach {label value} [list \
-    device $name \
+    device [dict get $description name] \
     about [dict get $description description] \
     file [dict get $description file] \
     packages [Choice $description package] \
     grades [Choice $description grade]] {
-    lappend lines [string trimright [format "%-10s%s" $label $value]]
+    append text [::vorkel::table::labelled $label_width $label $value]
   }
-  set text "[join $lines \n]\n"
-  foreach primitive [dict get $device primitives] {
-    append text \n [Limits $primitive $grades [dict get $description limits]]
+  set there [concat {*}[lmap grade $grades {
+    ::vorkel::catalogue::Primitives [dict get $limits $grade]
+  }]]
+  foreach primitive [::vorkel::catalogue::primitives] {
+    if {$primitive ni $there} continue
+    append text \n [Limits $primitive $grades $limits]
+    if {$primitive eq "KRU_CLKGEN"} {
+      append text [ClkgenNote]
+    }
   }
   return $text
 }
 
-# The packages or grades (`kind`) of a device, with the default.
-proc ::vorkel::devices::Choice {description kind} {
-  return "[join [dict get $description ${kind}s] {, }] (default\
-    [dict get $description default_$kind])"
+# What the host says of the device that a part name, or its beginning, stands for, and the grades
+# to show: all of them when it says no more than the device.
+proc ::vorkel::devices::Shown {part} {
+  if {$part in [::vorkel::catalogue::names]} {
+    set description [::vorkel::catalogue::describe $part]
+    return [list $description [dict get $description grades]]
+  }
+  set device [::vorkel::catalogue::find $part]
+  set description [dict get $device description]
+  if {[string equal -length [string length $part] $part [dict get $device device]]} {
+    return [list $description [dict get $description grades]]
+  }
+  return [list $description [list [dict get $device grade]]]
 }
 
-# The limits of a primitive. A grade that lacks one shows "-".
+# The packages or grades (`kind`) of a device, with the default.
+proc ::vorkel::devices::Choice {description kind} {
+  set default [dict get $description default_$kind]
+  return "[join [dict get $description ${kind}s] {, }]\
+    ([expr {$default eq "" ? "no default" : "default $default"}])"
+}
+
+# What holds where a KRU_CLKGEN is planned.
+proc ::vorkel::devices::ClkgenNote {} {
+  set ranges [lmap {pin range} $::vorkel::catalogue::clkgen_ranges {
+    string cat [join $range { to }] " MHz on $pin"
+  }]
+  return [::vorkel::table::prose "note: " "the engine does not read these limits to find a\
+    KRU_CLKGEN: on every device it takes outputs from [join $ranges { and from }]. clkgen, plan\
+    and compare mark an answer that is then outside the limits above, with exit status 3."]
+}
+
+# The limits of a primitive. A grade that lacks one shows "-". Grades that do not fit a terminal
+# beside each other follow below.
 proc ::vorkel::devices::Limits {primitive grades limits} {
+  variable most_grades
+  set text ""
+  while {[llength $grades] > 0} {
+    append text [LimitsOf $primitive [lrange $grades 0 $most_grades-1] $limits]
+    set grades [lrange $grades $most_grades end]
+  }
+  return $text
+}
+
+proc ::vorkel::devices::LimitsOf {primitive grades limits} {
   set columns [list [list left $primitive] {left unit}]
   foreach grade $grades {
     lappend columns [list right "grade $grade"]
@@ -124,5 +171,5 @@ proc ::vorkel::devices::Limits {primitive grades limits} {
     }
     lappend rows $row
   }
-  return [::vorkel::table::render $columns $rows]
+  return [::vorkel::table::fitted $columns $rows]
 }

@@ -19,11 +19,13 @@ package require vorkel::colour 1.1
 package require vorkel::explain_kru 1.1
 package require vorkel::explain_loop 1.1
 package require vorkel::explain_nearest 1.1
+package require vorkel::explain_steps 1.1
 package require vorkel::help 1.1
 package require vorkel::notes 1.1
 package require vorkel::numbers 1.1
 package require vorkel::options 1.1
 package require vorkel::output 1.1
+package require vorkel::progress 1.1
 package require vorkel::table 1.1
 package require vorkel::units 1.1
 
@@ -48,14 +50,27 @@ proc ::vorkel::explain::run {words} {
     ::vorkel::colour::off
   }
   set texts [Oscillators $call]
+  # What is to be searched at most: both sides of each output on each primitive, and the inputs.
+  ::vorkel::progress::start [expr {2 * [llength [dict get $call request outputs]] *
+    [llength [dict get $call primitives]] + [llength $texts]}] "searching"
+  try {
+    set text [Explanation $call $texts]
+  } finally {
+    ::vorkel::progress::finish
+  }
+  ::vorkel::output::write $text [dict get $call file]
+  return 0
+}
+
+# All that is told.
+proc ::vorkel::explain::Explanation {call texts} {
   set answers [::vorkel::answer::rank [::vorkel::answer::all [dict get $call request] \
     [dict get $call primitives]]]
   set findings [Findings $call $answers]
   set text [Head $call]\n
   append text [Verdict $call $answers] [Reasons $findings] [Nearest $call $findings $answers] \
     [Inputs $call $texts [dict get [lindex $answers 0] within]] [Hints $call $answers]
-  ::vorkel::output::write $text [dict get $call file]
-  return 0
+  return $text
 }
 
 # The oscillators to try, as texts.
@@ -94,7 +109,7 @@ proc ::vorkel::explain::Why {request primitive answer} {
   set refusal [::vorkel::answer::Refusal $request $primitive]
   if {$refusal ne ""} {
     return [list [dict create kind "number of clocks" outputs {} \
-      text [string trimright $refusal .]]]
+      text [string tolower [string trimright $refusal .] 0 0]]]
   }
   if {[::vorkel::engine::family $primitive] eq "Kru"} {
     set found [::vorkel::explain_kru::findings $request $primitive]
@@ -160,7 +175,26 @@ proc ::vorkel::explain::Head {call} {
       ::vorkel::explain_loop::MHz $input
     }] {, }] MHz" \
     tolerance [expr {$tolerance == 0 ? "exact" : "$tolerance ppm"}]]] \
-    [::vorkel::table::prose "outputs    " [join $outputs {, }]]]
+    [List "outputs    " $outputs]]
+}
+
+# Words behind a label, with commas, in as many lines as it takes, below each other.
+proc ::vorkel::explain::List {label words} {
+  set lines {}
+  set line ""
+  foreach word [lrange $words 0 end-1] {
+    lappend parts $word,
+  }
+  lappend parts [lindex $words end]
+  foreach part $parts {
+    if {$line ne "" &&
+        [string length "$label$line $part"] > $::vorkel::table::line_width} {
+      lappend lines $line
+      set line ""
+    }
+    append line [expr {$line eq "" ? "" : " "}] $part
+  }
+  return "$label[join [list {*}$lines $line] \n[string repeat { } [string length $label]]]\n"
 }
 
 proc ::vorkel::explain::Asked {output} {
@@ -222,30 +256,30 @@ proc ::vorkel::explain::Nearest {call findings answers} {
   if {[dict get [lindex $answers 0] within]} {
     return ""
   }
-  set columns {{right output} {left {MHz instead}} {right change} {left {made by}}}
+  set offenders [Offenders $findings]
+  if {[llength $offenders] == 0} {
+    set offenders [Indices $request]
+  }
   set rows {}
   set moved {}
-  foreach index [lrange [Offenders $findings] 0 $most_outputs-1] {
-    foreach near [::vorkel::explain_nearest::frequencies $request $primitives $index] {
-      lappend rows [list $index [Spelled $near] [::vorkel::explain_loop::far [dict get $near ppm]] \
-        [join [dict get $near primitives] {, }]]
-    }
-    foreach {what unit} {phase degrees duty %} {
-      if {[dict get [lindex [dict get $request outputs] $index] $what] eq ""} continue
-      dict for {text primitive} [::vorkel::explain_nearest::steps $request $primitives $index \
-          $what] {
-        lappend moved "output $index: a [expr {$what eq "duty" ? "duty cycle" : $what}] of $text\
-          $unit works on the $primitive"
-      }
-    }
+  set tried {}
+  set helped 0
+  foreach index $offenders {
+    if {$helped >= $most_outputs} break
+    lappend tried $index
+    set own [Rows $request $primitives $index]
+    set steps [Steps $request $primitives $index]
+    lappend rows {*}$own
+    lappend moved {*}$steps
+    incr helped [expr {[llength $own] + [llength $steps] > 0}]
   }
+  set left [lrange $offenders [llength $tried] end]
   set text ""
   if {[llength $rows] > 0} {
-    append text "\nfrequencies nearby that work, all else as asked for:\n" \
-      [::vorkel::table::render $columns $rows]
+    append text \n [Table $rows $primitives]
   }
-  if {[llength $rows] == 0 && [llength $moved] == 0} {
-    append text [Sets [::vorkel::explain_nearest::sets $request $primitives]]
+  if {$helped == 0} {
+    append text [Together [::vorkel::explain_nearest::sets $request $primitives] $tried]
   }
   if {[llength $moved] > 0} {
     append text \n
@@ -253,15 +287,82 @@ proc ::vorkel::explain::Nearest {call findings answers} {
       append text [::vorkel::table::prose "" $sentence]
     }
   }
+  dict for {index texts} $::vorkel::explain_nearest::passed {
+    append text \n [::vorkel::table::prose "note: " "output $index: [join $texts {, }] would be\
+      nearer; the engine does not find the settings, best does"]
+  }
+  if {[llength $left] > 0} {
+    append text \n [::vorkel::table::prose "note: " "what would work instead of\
+      [Outputs $left] has not been searched"]
+  }
   return $text
 }
 
-# Frequencies for all outputs at once.
-proc ::vorkel::explain::Sets {sets} {
-  if {[llength $sets] == 0} {
-    return ""
+proc ::vorkel::explain::Indices {request} {
+  set indices {}
+  foreach output [dict get $request outputs] {
+    lappend indices [llength $indices]
   }
-  set text "\nno output can be moved alone; moved together, these work:\n"
+  return $indices
+}
+
+# "output 1", "outputs 1, 2 and 3".
+proc ::vorkel::explain::Outputs {indices} {
+  return "output[expr {[llength $indices] > 1 ? "s" : ""}]\
+    [::vorkel::explain_loop::Either $indices and]"
+}
+
+# The frequencies that work for an output, as rows of a table.
+proc ::vorkel::explain::Rows {request primitives index} {
+  return [lmap near [::vorkel::explain_nearest::frequencies $request $primitives $index] {
+    list $index [Spelled $near] [::vorkel::explain_loop::far [dict get $near ppm]] \
+      [join [dict get $near primitives] {, }]
+  }]
+}
+
+proc ::vorkel::explain::Table {rows primitives} {
+  set which [expr {[llength $primitives] == 1 ? "the nearest two below and above" :
+    "the nearest below and above of each primitive"}]
+  set columns {{right output} {left {MHz instead}} {right change} {left {made by}}}
+  set head [::vorkel::table::prose "" "frequencies nearby that work, all else as asked for;\
+    $which:"]
+  set table [::vorkel::table::render $columns $rows]
+  foreach line [split $table \n] {
+    if {[string length $line] > $::vorkel::table::line_width} {
+      # A quotient with many digits stands for itself.
+      set rows [lmap row $rows {lreplace $row 1 1 [lindex [split [lindex $row 1] =] 0]}]
+      return $head[::vorkel::table::render $columns $rows]
+    }
+  }
+  return $head$table
+}
+
+# Sentences on the phases and duty cycles that work for an output.
+proc ::vorkel::explain::Steps {request primitives index} {
+  set sentences {}
+  foreach {what name unit} {phase phase degrees duty "duty cycle" %} {
+    if {[dict get [lindex [dict get $request outputs] $index] $what] eq ""} continue
+    foreach {text makers} [::vorkel::explain_steps::nearest $request $primitives $index $what] {
+      set whom [lmap maker $makers {string cat "the " $maker}]
+      lappend sentences "output $index: a $name of $text $unit works on\
+        [::vorkel::explain_loop::Either $whom and]"
+    }
+  }
+  return $sentences
+}
+
+# Frequencies for all outputs at once, when to move those that were tried one at a time is in vain.
+proc ::vorkel::explain::Together {sets tried} {
+  set vain "to move [Outputs $tried][expr {[llength $tried] > 1 ? ", one at a time," : " alone"}]\
+    does not help"
+  if {$::vorkel::explain_nearest::stopped || [dict size $::vorkel::explain_nearest::passed] > 0} {
+    set vain ""
+  }
+  if {[llength $sets] == 0} {
+    return [expr {$vain eq "" ? "" : "\n[::vorkel::table::prose {} $vain]"}]
+  }
+  set text \n[::vorkel::table::prose "" \
+    "[expr {$vain eq "" ? "" : "$vain; "}]moved together, these work:"]
   foreach set $sets {
     append text [::vorkel::table::prose "[dict get $set primitive]: " \
       "--out [join [dict get $set texts] ,] (at most\
@@ -306,15 +407,17 @@ proc ::vorkel::explain::Inputs {call texts possible} {
   if {[llength $found] == 0 && $::vorkel::explain_nearest::stopped} {
     return ""
   }
+  set first [expr {[llength [dict get $call request inputs]] > 1 ?
+    " in place of the first input clock" : ""}]
   if {[llength $found] == 0} {
-    return "\n[::vorkel::table::prose {} "None of the $what makes every output exact."]"
+    return "\n[::vorkel::table::prose {} "None of the $what makes every output exact$first."]"
   }
   set groups [dict create]
   foreach pair $found {
     lassign $pair text primitives
     dict lappend groups $primitives $text
   }
-  set text "\n$what that make every output exact, MHz:\n"
+  set text \n[::vorkel::table::prose "" "$what that make every output exact$first, MHz:"]
   dict for {primitives inputs} $groups {
     append text [::vorkel::table::prose "[join $primitives {, }]: " [join $inputs {, }]]
   }
@@ -324,8 +427,8 @@ proc ::vorkel::explain::Inputs {call texts possible} {
 proc ::vorkel::explain::Hints {call answers} {
   set text ""
   if {$::vorkel::explain_nearest::stopped} {
-    append text \n [::vorkel::table::prose "note: " "the search for what works took too long and\
-      was cut short; there may be more"]
+    append text \n [::vorkel::table::prose "note: " "the search for what works was cut short; there\
+      may be more and nearer"]
   }
   set words [dict get $call words]
   if {[dict get [lindex $answers 0] within]} {

@@ -6,17 +6,12 @@ package require vorkel::actual 1.1
 package require vorkel::answer 1.1
 package require vorkel::catalogue 1.1
 package require vorkel::explain_loop 1.1
+package require vorkel::explain_pins 1.1
 package require vorkel::numbers 1.1
 
 namespace eval ::vorkel::explain_kru {
-  variable divides {2 2.5 3 3.5 4 4.5 5 5.5 6 6.5 7 7.5 8 9 10 11 12 13 14 15 16 17}
-  # M and D of CLKFX.
-  variable largest {KRU_SP 32 KRU_CLKGEN 256}
-  variable smallest_m 2
-  # The divides of CLKFXDV.
-  variable fx_divides {2 4 8 16 32}
-  # The ranges in which the engine looks for a KRU_CLKGEN, MHz, whatever those of the device.
-  variable searched {CLKFX {5 374.532} CLKFXDV {0.156 187.266}}
+  # The pins that have ranges of their own, and those that a KRU_CLKGEN has for output 0.
+  variable ranged {KRU_SP {CLK0 CLK90 CLK2X CLKDV CLKFX} KRU_CLKGEN CLKFX}
 }
 
 # The findings; none when all outputs are possible.
@@ -51,65 +46,31 @@ proc ::vorkel::explain_kru::works {request primitive} {
   return 0
 }
 
-# What a pin can make: a list of the distance from a frequency, the frequency, the pin without
-# its phase, how it is made, and its ratio to the input. For each D of CLKFX the M next to the
-# frequency are enough.
-proc ::vorkel::explain_kru::made {request primitive frequency} {
-  variable divides
-  variable largest
-  variable smallest_m
-  set input [lindex [dict get $request inputs] 0]
-  set halves [expr {$primitive eq "KRU_SP" ? {1 2} : {1}}]
-  set most [dict get $largest $primitive]
+# What pins make within the tolerance of a frequency, whatever their ranges: lists of the
+# distance, the frequency, the pin and how it is made, the nearest first.
+proc ::vorkel::explain_kru::Fitting {request primitive frequency} {
+  set allowed [expr {$frequency * ([dict get $request tolerance] * 1e-6 + 1e-12)}]
   set rows {}
-  foreach half $halves {
-    set base [expr {double($input) / $half}]
-    set from "[::vorkel::explain_loop::MHz $input][expr {$half == 2 ? " / 2" : ""}]"
-    if {$primitive eq "KRU_SP"} {
-      lappend rows [Row $frequency $base CLK0 $from [list 1 $half]]
-      lappend rows [Row $frequency [expr {2 * $base}] CLK2X "$from x 2" [list 2 $half]]
-      foreach divide $divides {
-        lappend rows [Row $frequency [expr {$base / $divide}] CLKDV "$from / $divide" \
-          [list 2 [expr {round(2 * $half * $divide)}]]]
-      }
-    }
-    for {set d 1} {$d <= $most} {incr d} {
-      set below [expr {int(min($most, max($smallest_m, floor($frequency * $d / $base))))}]
-      foreach m [list $below [expr {min($most, $below + 1)}]] {
-        lappend rows [Row $frequency [expr {$base * $m / $d}] CLKFX "$from x $m / $d" \
-          [list $m [expr {$half * $d}]]]
-      }
+  foreach {place value} [::vorkel::explain_pins::places $request $primitive $frequency] {
+    set distance [expr {abs($value - $frequency)}]
+    if {$distance <= $allowed} {
+      lappend rows [list $distance $value {*}[lrange $place 0 1]]
     }
   }
-  set seen [dict create]
-  return [lmap row [lsort -real -index 0 $rows] {
-    set key [list [format %.9g [lindex $row 1]] [lindex $row 2]]
-    if {[dict exists $seen $key]} continue
-    dict set seen $key 1
-    set row
-  }]
-}
-
-proc ::vorkel::explain_kru::Row {frequency value pin how ratio} {
-  return [list [expr {abs($value - $frequency)}] $value $pin $how \
-    [::vorkel::actual::reduce {*}$ratio]]
-}
-
-# The range of a pin, MHz.
-proc ::vorkel::explain_kru::range {request primitive pin} {
-  variable searched
-  lassign [::vorkel::catalogue::pinRange $pin 0 [dict get $request limits]] lowest highest
-  if {$primitive eq "KRU_CLKGEN"} {
-    lassign [dict get $searched $pin] low high
-    set lowest [expr {max($lowest, $low)}]
-    set highest [expr {min($highest, $high)}]
-  }
-  return [list $lowest $highest]
+  return [lsort -real -index 0 $rows]
 }
 
 proc ::vorkel::explain_kru::inRange {request primitive pin frequency} {
-  lassign [range $request $primitive $pin] lowest highest
+  lassign [::vorkel::explain_pins::pinRange $request $primitive $pin] lowest highest
   return [expr {$frequency >= $lowest * (1 - 1e-9) && $frequency <= $highest * (1 + 1e-9)}]
+}
+
+# Those of some pins whose range holds a frequency.
+proc ::vorkel::explain_kru::Holding {request primitive pins frequency} {
+  return [lmap pin $pins {
+    if {![inRange $request $primitive $pin $frequency]} continue
+    set pin
+  }]
 }
 
 # Why an output cannot be made by itself, if so. On a KRU_CLKGEN all follow output 0.
@@ -121,15 +82,16 @@ proc ::vorkel::explain_kru::Alone {request primitive output index} {
   if {[works [Part $request $index] $primitive]} {
     return {}
   }
+  variable ranged
   set frequency [dict get $output freq]
-  set allowed [expr {$frequency * ([dict get $request tolerance] * 1e-6 + 1e-12)}]
-  set rows [made $request $primitive $frequency]
-  set fitting [lmap row $rows {
-    if {[lindex $row 0] > $allowed} break
-    set row
-  }]
+  set fitting [Fitting $request $primitive $frequency]
   if {[llength $fitting] == 0} {
-    set findings [list [NoRatio $request $primitive $frequency $index $rows]]
+    set findings {}
+    set all [dict get $ranged $primitive]
+    if {[llength [Holding $request $primitive $all $frequency]] == 0} {
+      lappend findings [NoRange $request $primitive $frequency $index $all "every pin"]
+    }
+    lappend findings [NoRatio $request $primitive $index]
     if {$clkgen && [Phase $output] != 0} {
       lappend findings [NoPhase $request $primitive $output $index CLKFX]
     }
@@ -142,17 +104,22 @@ proc ::vorkel::explain_kru::Alone {request primitive output index} {
   if {$quarter && "CLK0" in $candidates} {
     set candidates [list CLK90]
   }
-  set pins [lmap pin $candidates {
-    if {![inRange $request $primitive $pin $frequency]} continue
-    set pin
-  }]
+  set pins [Holding $request $primitive $candidates $frequency]
   if {[llength $pins] == 0} {
-    return [list [NoRange $request $primitive $frequency $index $candidates]]
+    set findings [list [NoRange $request $primitive $frequency $index $candidates \
+      "the pins that could make it"]]
+    if {$clkgen && $phase != 0} {
+      lappend findings [NoPhase $request $primitive $output $index CLKFX]
+    }
+    return $findings
   }
   set plain [Part $request $index]
   dict set plain outputs [list [dict replace $output phase "" duty ""]]
   if {![works $plain $primitive]} {
-    return [list [Inexact $primitive $frequency $index [lindex $fitting 0]]]
+    foreach row $fitting {
+      if {[lindex $row 2] in $pins} break
+    }
+    return [list [Inexact $primitive $frequency $index $row]]
   }
   return [list [NoPhase $request $primitive $output $index $pins]]
 }
@@ -166,30 +133,48 @@ proc ::vorkel::explain_kru::Phase {output} {
   return [expr {fmod($phase + 360.0, 360.0)}]
 }
 
-proc ::vorkel::explain_kru::NoRatio {request primitive frequency index rows} {
-  variable largest
-  set most [dict get $largest $primitive]
-  set pins [expr {$primitive eq "KRU_SP" ?
-    "CLK0 is the input, or its half; CLK2X doubles it; CLKDV divides it by 2 to 17; CLKFX makes\
-      input x M / D with M and D up to $most" : "CLKFX makes input x M / D with M and D up to\
-      $most"}]
-  set near [lmap row [lrange $rows 0 1] {
-    lassign $row distance value pin how
-    string cat "[::vorkel::explain_loop::MHz $value] MHz ($pin: $how,\
-      [::vorkel::explain_loop::change $value $frequency])"
-  }]
+proc ::vorkel::explain_kru::NoRatio {request primitive index} {
+  set frequency [dict get [lindex [dict get $request outputs] $index] freq]
+  set most [dict get $::vorkel::explain_pins::largest $primitive]
+  set pins "CLKFX makes input x M / D, with M from $::vorkel::explain_pins::smallest_m and D from\
+    1 up to $most"
+  if {$primitive eq "KRU_SP"} {
+    set pins "CLK0 is the input, CLK2X doubles it, CLKDV divides it by 2 to 17, $pins; the input\
+      can be halved before that"
+  }
   return [::vorkel::explain_loop::Finding "pin frequency" $index "no pin makes\
-    [::vorkel::explain_loop::MHz $frequency] MHz: $pins. The nearest are [join $near { and }]"]
+    [::vorkel::explain_loop::MHz $frequency] MHz: $pins.\
+    [::vorkel::explain_loop::NearestMade $request $primitive $index]"]
 }
 
-proc ::vorkel::explain_kru::NoRange {request primitive frequency index pins} {
+# The frequency is in the range of none of some pins. `whose` says what these are.
+proc ::vorkel::explain_kru::NoRange {request primitive frequency index pins whose} {
   set ranges [lmap pin $pins {
-    lassign [range $request $primitive $pin] lowest highest
+    lassign [::vorkel::explain_pins::pinRange $request $primitive $pin] lowest highest
     string cat "$pin only from [::vorkel::explain_loop::MHz $lowest] to\
       [::vorkel::explain_loop::MHz $highest] MHz"
   }]
-  return [::vorkel::explain_loop::Finding "pin range" $index "[::vorkel::explain_loop::MHz \
-    $frequency] MHz is out of the range of the pins that could make it: [join $ranges {; }]"]
+  set text "[::vorkel::explain_loop::MHz $frequency] MHz is out of the range of $whose:\
+    [join $ranges {; }]"
+  return [::vorkel::explain_loop::Finding "pin range" $index \
+    $text[Narrowed $request $primitive $frequency $pins]]
+}
+
+# That a range ends where the engine's does, before the device's, or "".
+proc ::vorkel::explain_kru::Narrowed {request primitive frequency pins} {
+  if {$primitive ne "KRU_CLKGEN"} {
+    return ""
+  }
+  foreach pin $pins {
+    lassign [::vorkel::catalogue::pinRange $pin 0 [dict get $request limits]] lowest highest
+    lassign [dict get $::vorkel::explain_pins::searched $pin] low high
+    if {($frequency > $high && $highest > $high) || ($frequency < $low && $lowest < $low)} {
+      return ". The device has $pin from [::vorkel::explain_loop::MHz $lowest] to\
+        [::vorkel::explain_loop::MHz $highest] MHz, but the engine looks for a $primitive only\
+        from [::vorkel::explain_loop::MHz $low] to [::vorkel::explain_loop::MHz $high] MHz"
+    }
+  }
+  return ""
 }
 
 # The engine does not use the tolerance that is allowed.
@@ -234,9 +219,8 @@ proc ::vorkel::explain_kru::NoPhase {request primitive output index pins} {
 
 # Why an output of a KRU_CLKGEN cannot follow output 0, if so.
 proc ::vorkel::explain_kru::Follower {request output index} {
-  variable fx_divides
-  if {[works [Part $request [list 0 $index]] KRU_CLKGEN] ||
-      ![works [Part $request 0] KRU_CLKGEN]} {
+  set fx_divides $::vorkel::explain_pins::fx_divides
+  if {[works [Part $request [list 0 $index]] KRU_CLKGEN]} {
     return {}
   }
   set frequency [dict get $output freq]
@@ -254,9 +238,14 @@ proc ::vorkel::explain_kru::Follower {request output index} {
       output 0, [::vorkel::explain_loop::MHz $first] MHz, for CLKFX and CLKFX180, nor that divided\
       by [join [lrange $fx_divides 0 end-1] {, }] or [lindex $fx_divides end] for CLKFXDV"]]
   }
+  # Whatever else there is may be for want of output 0.
+  if {![works [Part $request 0] KRU_CLKGEN]} {
+    return {}
+  }
   set pin [expr {$divide == 1 ? "CLKFX" : "CLKFXDV"}]
   if {![inRange $request KRU_CLKGEN $pin $frequency]} {
-    return [list [NoRange $request KRU_CLKGEN $frequency $index [list $pin]]]
+    return [list [NoRange $request KRU_CLKGEN $frequency $index [list $pin] \
+      "the pin that could make it"]]
   }
   set phase [dict get $output phase]
   if {$phase ne "" && $phase != 0} {

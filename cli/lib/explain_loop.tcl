@@ -5,6 +5,7 @@
 
 package provide vorkel::explain_loop 1.1
 package require vorkel::catalogue 1.1
+package require vorkel::explain_ladder 1.1
 package require vorkel::explain_walk 1.1
 package require vorkel::numbers 1.1
 
@@ -28,19 +29,20 @@ proc ::vorkel::explain_loop::MHz {value} {
 # The findings; none when there are settings for all that is asked.
 proc ::vorkel::explain_loop::findings {request primitive} {
   set findings [Inputs $request $primitive]
-  foreach output [dict get $request outputs] {
-    lappend findings {*}[Range $request $primitive $output \
-      [expr {[incr index] - 1}]]
+  set possible [expr {[llength $findings] == 0}]
+  set pairs {}
+  if {$possible} {
+    set pairs [::vorkel::explain_walk::pairs $request $primitive [dict get $request inputs]]
   }
-  if {[llength $findings] > 0} {
-    return $findings
-  }
-  set pairs [::vorkel::explain_walk::pairs $request $primitive [dict get $request inputs]]
   set fractional [::vorkel::explain_walk::isFractional $request $primitive]
   set index 0
   foreach output [dict get $request outputs] {
-    lappend findings {*}[Alone $request $primitive $output $index $pairs \
-      [expr {$fractional && $index == 0}]]
+    set found [Range $request $primitive $output $index]
+    if {[llength $found] == 0 && $possible} {
+      set found [Alone $request $primitive $output $index $pairs \
+        [expr {$fractional && $index == 0}]]
+    }
+    lappend findings {*}$found
     incr index
   }
   if {[llength $findings] > 0} {
@@ -181,9 +183,8 @@ proc ::vorkel::explain_loop::Grid {request primitive output index pairs fraction
     append text [NamedVcos $frequency [::vorkel::catalogue::vcoRange $primitive $limits]]
   }
   append text ", but [MHz $input] MHz x M / D makes no such VCO:\
-    [MostM $primitive], and D ends at [LargestD $request $primitive]. The nearest are\
-    [join [lmap near [nearest $frequency $pairs $fractional 2] {Made $near $input $frequency}] \
-      { and }]"
+    [MostM $primitive], and D ends at [LargestD $request $primitive].\
+    [NearestMade $request $primitive $index]"
   return [Finding "M and D" $index $text[NoObstacle $output \
     [::vorkel::catalogue::vcoRange $primitive $limits]]]
 }
@@ -242,23 +243,38 @@ proc ::vorkel::explain_loop::LargestD {request primitive} {
   return $text
 }
 
-# The frequencies that pairs make which are nearest to one, each a list of the distance, the
-# frequency, M, D and the divider.
-proc ::vorkel::explain_loop::nearest {frequency pairs fractional count} {
-  set made {}
-  set seen [dict create]
-  foreach pair $pairs {
-    lassign $pair vco m d
-    foreach divider [::vorkel::explain_walk::dividersAt [expr {$vco / $frequency}] $fractional] {
-      set value [expr {$vco / $divider}]
-      set key [format %.9g $value]
-      if {![dict exists $seen $key]} {
-        dict set seen $key 1
-        lappend made [list [expr {abs($value - $frequency)}] $value $m $d $divider]
-      }
+# The nearest frequencies below and above that a primitive makes in the range of an output,
+# whatever the other outputs are, as a sentence without its full stop.
+proc ::vorkel::explain_loop::NearestMade {request primitive index} {
+  set near {}
+  foreach side {below above} {
+    set search [::vorkel::explain_ladder::search $request $primitive $index $side 1]
+    set rung [::vorkel::explain_ladder::next search]
+    if {$rung ne ""} {
+      lappend near $rung
     }
   }
-  return [lrange [lsort -real -index 0 $made] 0 [expr {$count - 1}]]
+  set frequency [dict get [lindex [dict get $request outputs] $index] freq]
+  set texts [lmap rung [lsort -real -index 0 $near] {
+    string cat "[MHz [lindex $rung 1]] MHz ([How $request $rung],\
+      [change [lindex $rung 1] $frequency])"
+  }]
+  switch -- [llength $texts] {
+    0 { return "It makes nothing that is in range" }
+    1 { return "The nearest is [lindex $texts 0]" }
+  }
+  return "The nearest are [join $texts { and }]"
+}
+
+# How a rung of explain_ladder.tcl is made.
+proc ::vorkel::explain_loop::How {request rung} {
+  set place [lindex $rung 2]
+  if {![string is double [lindex $place 0]]} {
+    return "[lindex $place 0]: [lindex $place 1]"
+  }
+  lassign $place vco m d divider
+  return "[MHz [lindex [dict get $request inputs] 0]] x $m / $d /\
+    [::vorkel::numbers::short $divider 3]"
 }
 
 # How far a frequency is from another one.
@@ -272,12 +288,6 @@ proc ::vorkel::explain_loop::far {ppm} {
     return "[format %+.3g [expr {$ppm / 1e4}]] %"
   }
   return "[format %+.2f $ppm] ppm"
-}
-
-proc ::vorkel::explain_loop::Made {near input frequency} {
-  lassign $near distance value m d divider
-  return "[MHz $value] MHz ([MHz $input] x $m / $d / [::vorkel::numbers::short $divider 3],\
-    [change $value $frequency])"
 }
 
 # "a", "a or b", "a, b or c".
@@ -381,10 +391,30 @@ proc ::vorkel::explain_loop::Conflict {request primitive indices} {
   set common [Common $request $primitive $indices $range]
   if {[llength $common] == 0} {
     return [append text "None from [MHz [lindex $range 0]] to [MHz [lindex $range 1]] MHz, whatever\
-      the input clock, is a multiple of all of them with their phases and duty cycles"]
+      the input clock, is [Multiple $request $primitive $indices]"]
   }
   return [append text "That is one of [Vcos $common], and [MHz $input] MHz x M / D makes none of\
     these: [MostM $primitive], and D ends at [LargestD $request $primitive]"]
+}
+
+# What a VCO that serves these outputs is.
+proc ::vorkel::explain_loop::Multiple {request primitive indices} {
+  set text "a whole multiple of all of them"
+  if {[lindex $indices 0] == 0 && [::vorkel::explain_walk::isFractional $request $primitive]} {
+    append text ", in eighths of output 0,"
+  }
+  foreach {what words} {phase "their phases" duty "their duty cycles"} {
+    foreach index $indices {
+      if {[dict get [lindex [dict get $request outputs] $index] $what] ne ""} {
+        lappend steps $words
+        break
+      }
+    }
+  }
+  if {[info exists steps]} {
+    append text " that has [join $steps { and }]"
+  }
+  return [string trimright $text ,]
 }
 
 # The VCO frequencies in the range that would serve these outputs.

@@ -6,9 +6,11 @@ package require vorkel::actual 1.1
 package require vorkel::answer 1.1
 package require vorkel::engine 1.1
 package require vorkel::explain_kru 1.1
+package require vorkel::explain_ladder 1.1
 package require vorkel::explain_loop 1.1
 package require vorkel::explain_walk 1.1
 package require vorkel::numbers 1.1
+package require vorkel::progress 1.1
 package require vorkel::units 1.1
 
 namespace eval ::vorkel::explain_nearest {
@@ -18,14 +20,22 @@ namespace eval ::vorkel::explain_nearest {
     33.3333 37.125 38.4 40 48 50 54 60 62.5 66.6667 74.25 80 100 106.25 122.88 125 133.3333 148.5
     150 153.6 155.52 156.25 161.1328125 200 212.5 250
   }
-  # As many candidates of a primitive are tried, and as many told, below and above an output.
-  variable most_tried 12
-  variable most_told 2
+  # As many frequencies of a primitive are tried below and above an output. Of several primitives
+  # the nearest one that works is told, of a single one the nearest two.
+  variable most_tried 300
+  variable told_of_one 2
+  variable told_of_each 1
+  # As many requests with all outputs moved are tried, and as many told.
+  variable most_sets_tried 12
   variable most_sets 2
-  # The time for all of it, ms, and when it ends.
+  # The time for all of it, ms, and when it ends. `stopped` tells that something has not been
+  # searched to its end.
   variable budget 1500
   variable deadline 0
   variable stopped 0
+  # What stands nearer to an output than what is told of a PLL or a TSYN: settings make it, but the
+  # engine does not take them. For each output a list of texts.
+  variable passed {}
 }
 
 # Begins the time for the search.
@@ -33,28 +43,44 @@ proc ::vorkel::explain_nearest::start {} {
   variable budget
   variable deadline
   variable stopped
+  variable passed
   set deadline [expr {[clock milliseconds] + $budget}]
   set stopped 0
+  set passed {}
 }
 
-# Whether the time has run out. Once it has, `stopped` tells so.
+# Whether the time has run out.
 proc ::vorkel::explain_nearest::isLate {} {
   variable deadline
   variable stopped
-  if {[clock milliseconds] > $deadline} {
-    set stopped 1
+  if {[clock milliseconds] <= $deadline} {
+    return 0
   }
-  return $stopped
+  set stopped 1
+  return 1
 }
 
-# The engine's first answer of a primitive that is within all tolerances, or "".
+# The engine's first answer of a primitive that is within all tolerances, or "". A narrow loop,
+# which the user can ask for, has another range of the PFD; it is tried where it is left open and
+# the engine has an answer, which is off.
 proc ::vorkel::explain_nearest::proof {request primitive} {
+  set widths [list [dict get $request bandwidth]]
+  if {[::vorkel::engine::family $primitive] eq "Loop" && !([dict exists $request bandwidthAsked] &&
+      [dict get $request bandwidthAsked])} {
+    lappend widths LOW
+  }
   dict set request bandwidthAsked 1
-  foreach variant [::vorkel::answer::Variants $request $primitive] {
-    set answer [::vorkel::answer::solve $request $primitive $variant]
-    if {[dict get $answer within]} {
-      return $answer
+  foreach width $widths {
+    set solved 0
+    dict set request bandwidth $width
+    foreach variant [::vorkel::answer::Variants $request $primitive] {
+      set answer [::vorkel::answer::solve $request $primitive $variant]
+      if {[dict get $answer within]} {
+        return $answer
+      }
+      incr solved [dict get $answer solved]
     }
+    if {$solved == 0} break
   }
   return ""
 }
@@ -62,8 +88,8 @@ proc ::vorkel::explain_nearest::proof {request primitive} {
 # A frequency as it can be given to the program: in up to six decimals if these are exact, else
 # as a quotient.
 proc ::vorkel::explain_nearest::spell {frequency input ratio} {
-  set text [::vorkel::numbers::short $frequency 6]
-  if {abs($text - $frequency) <= 1e-13 * $frequency} {
+  set text [plainMHz $frequency]
+  if {abs([::vorkel::numbers::short $frequency 6] - $frequency) <= 1e-13 * $frequency} {
     return $text
   }
   lassign $ratio multiply divide
@@ -74,124 +100,108 @@ proc ::vorkel::explain_nearest::spell {frequency input ratio} {
     }
     return $product/$divide
   }
-  return [format %.15g $frequency]
+  return $text
 }
 
-# The frequencies for an output, the nearest first, that work with all else as asked for: dicts of
-# text (to be given to the program), frequency (MHz), ppm (from what was asked) and primitives.
+# The frequencies for an output that work with all else as asked for: the nearest below and above
+# of each primitive, the nearest of all first. Dicts of text (to be given to the program),
+# frequency (MHz), ppm (from what was asked) and primitives, all that make it.
 proc ::vorkel::explain_nearest::frequencies {request primitives index} {
-  variable most_tried
-  variable most_told
-  set asked [dict get [lindex [dict get $request outputs] $index] freq]
-  set candidates {}
-  foreach primitive $primitives {
-    set family [::vorkel::engine::family $primitive]
-    set counts {0 0}
-    foreach candidate [${family}Candidates $request $primitive $index] {
-      set above [expr {[lindex $candidate 2] > $asked}]
-      if {[lindex $counts $above] < $most_tried} {
-        lset counts $above [expr {[lindex $counts $above] + 1}]
-        lappend candidates [list {*}$candidate $above $primitive]
-      }
-    }
-  }
+  variable told_of_one
+  variable told_of_each
+  set count [expr {[llength $primitives] == 1 ? $told_of_one : $told_of_each}]
   set told [dict create]
-  set sides {0 0}
-  foreach candidate [lsort -real -index 0 $candidates] {
-    lassign $candidate distance text value above primitive
-    if {[isLate]} break
-    if {![dict exists $told $text] && [lindex $sides $above] >= $most_told} continue
-    if {[dict exists $told $text] && $primitive in [dict get $told $text primitives]} continue
-    set frequency [::vorkel::units::value $text frequency nearest]
-    set changed $request
-    set outputs [dict get $request outputs]
-    lset outputs $index [dict replace [lindex $outputs $index] freq $frequency]
-    dict set changed outputs $outputs
-    if {[proof $changed $primitive] eq ""} continue
-    if {[dict exists $told $text]} {
-      dict set told $text primitives [list {*}[dict get $told $text primitives] $primitive]
-      continue
-    }
-    lset sides $above [expr {[lindex $sides $above] + 1}]
-    dict set told $text [dict create text $text frequency $frequency \
-      ppm [expr {($frequency / $asked - 1) * 1e6}] primitives [list $primitive]]
-  }
-  return [dict values $told]
-}
-
-# For a PLL or a TSYN: what the VCO frequencies that serve the other outputs make.
-proc ::vorkel::explain_nearest::LoopCandidates {request primitive index} {
-  set pairs [::vorkel::explain_walk::pairs $request $primitive [dict get $request inputs]]
-  set input [lindex [dict get $request inputs] 0]
-  set output [lindex [dict get $request outputs] $index]
-  set frequency [dict get $output freq]
-  set others {}
-  foreach other [dict get $request outputs] {
-    lappend others [llength $others]
-  }
-  set others [lsearch -all -inline -not -exact $others $index]
-  set common [::vorkel::explain_walk::serving \
-    [::vorkel::explain_walk::masks $request $primitive $pairs] $others]
-  set serving {}
-  foreach pair $pairs {
-    if {$common & 1} {
-      lappend serving $pair
-    }
-    set common [expr {$common >> 1}]
-  }
-  lassign [::vorkel::catalogue::outputRange $primitive [dict get $request limits] $index] \
-    lowest highest
-  # Beyond the range the nearest stand at its ends.
-  set aim [expr {min(max($frequency, $lowest), $highest)}]
-  set fractional [expr {$index == 0 && [::vorkel::explain_walk::isFractional $request $primitive]}]
-  set candidates {}
-  foreach near [::vorkel::explain_loop::nearest $aim $serving $fractional 1000] {
-    lassign $near distance value m d divider
-    if {$value < $lowest || $value > $highest} continue
-    if {![::vorkel::explain_walk::phaseServes $output $divider] ||
-        ![::vorkel::explain_walk::dutyServes $request $output $divider]} continue
-    lappend candidates [list [expr {abs($value - $frequency)}] \
-      [spell $value $input [::vorkel::actual::loopRatio $m $d $divider]] $value]
-  }
-  return [lsort -real -index 0 $candidates]
-}
-
-# For a KRU: what its pins make, and what divides or multiplies another output, as a KRU_CLKGEN
-# does.
-proc ::vorkel::explain_nearest::KruCandidates {request primitive index} {
-  set input [lindex [dict get $request inputs] 0]
-  set outputs [dict get $request outputs]
-  set frequency [dict get [lindex $outputs $index] freq]
-  set clkgen [expr {$primitive eq "KRU_CLKGEN"}]
-  set candidates {}
-  if {$clkgen && [llength $outputs] > 1} {
-    foreach other $outputs {
-      foreach factor {1 2 4 8 16 32} {
-        foreach value [list [expr {double([dict get $other freq]) / $factor}] \
-            [expr {double([dict get $other freq]) * $factor}]] {
-          lappend candidates [list [expr {abs($value - $frequency)}] [format %.15g $value] $value]
+  foreach primitive $primitives {
+    foreach side {below above} {
+      foreach near [Working $request $primitive $index $side $count] {
+        set key [format %.12g [dict get $near frequency]]
+        if {![dict exists $told $key]} {
+          dict set told $key $near
         }
       }
-    }
-    return [lsort -real -index 0 -unique $candidates]
-  }
-  set seen [dict create]
-  foreach row [::vorkel::explain_kru::made $request $primitive $frequency] {
-    lassign $row distance value pin how ratio
-    if {![::vorkel::explain_kru::inRange $request $primitive $pin $value]} continue
-    set text [spell $value $input $ratio]
-    if {![dict exists $seen $text]} {
-      dict set seen $text 1
-      lappend candidates [list $distance $text $value]
+      ::vorkel::progress::step
     }
   }
-  return $candidates
+  set asked [dict get [lindex [dict get $request outputs] $index] freq]
+  return [lsort -command ::vorkel::explain_nearest::Nearer [lmap near [dict values $told] {
+    set frequency [dict get $near frequency]
+    dict set near ppm [expr {($frequency / $asked - 1) * 1e6}]
+    dict set near primitives [Makers [With $request $index $frequency] $primitives \
+      [dict get $near primitives]]
+  }]]
+}
+
+proc ::vorkel::explain_nearest::Nearer {one other} {
+  set difference [expr {abs([dict get $one ppm]) - abs([dict get $other ppm])}]
+  return [expr {$difference < 0 ? -1 : $difference > 0}]
+}
+
+# As many frequencies of a primitive on one side as are wanted, the nearest ones that work.
+proc ::vorkel::explain_nearest::Working {request primitive index side count} {
+  variable most_tried
+  variable stopped
+  variable passed
+  if {[isLate] || [::vorkel::answer::Refusal $request $primitive] ne ""} {
+    return {}
+  }
+  set input [lindex [dict get $request inputs] 0]
+  set search [::vorkel::explain_ladder::search $request $primitive $index $side]
+  set told {}
+  set missed {}
+  set tried 0
+  while {[llength $told] < $count &&
+      [set rung [::vorkel::explain_ladder::next search]] ne ""} {
+    if {[isLate]} break
+    if {[incr tried] > $most_tried} {
+      set stopped 1
+      break
+    }
+    set text [spell [lindex $rung 1] $input [::vorkel::explain_ladder::ratio $search $rung]]
+    set frequency [::vorkel::units::value $text frequency nearest]
+    if {[proof [With $request $index $frequency] $primitive] ne ""} {
+      lappend told [dict create text $text frequency $frequency primitives [list $primitive]]
+    } elseif {[llength $told] == 0} {
+      lappend missed $text
+    }
+  }
+  if {[llength $missed] > 0 && [::vorkel::engine::family $primitive] eq "Loop"} {
+    dict lappend passed $index "[lindex $missed 0] MHz ($primitive)"
+  }
+  return $told
+}
+
+# A request with another frequency of an output.
+proc ::vorkel::explain_nearest::With {request index frequency} {
+  set outputs [dict get $request outputs]
+  lset outputs $index [dict replace [lindex $outputs $index] freq $frequency]
+  return [dict replace $request outputs $outputs]
+}
+
+# Those of some primitives that do what is asked. Of some it is `known`.
+proc ::vorkel::explain_nearest::Makers {request primitives known} {
+  return [lmap primitive $primitives {
+    if {$primitive ni $known && ([isLate] || ![CouldMake $request $primitive] ||
+        [proof $request $primitive] eq "")} continue
+    set primitive
+  }]
+}
+
+# Whether a request is worth a run of the engine: of a PLL or a TSYN it is when a pair of M and D
+# serves all outputs.
+proc ::vorkel::explain_nearest::CouldMake {request primitive} {
+  if {[::vorkel::answer::Refusal $request $primitive] ne ""} {
+    return 0
+  }
+  if {[::vorkel::engine::family $primitive] ne "Loop"} {
+    return 1
+  }
+  return [::vorkel::explain_walk::isServed $request $primitive]
 }
 
 # When no output can be moved alone: all frequencies that are in the way moved to those of one VCO.
 # Dicts of texts (one for each output), ppm (the largest change) and primitive, the nearest first.
 proc ::vorkel::explain_nearest::sets {request primitives} {
-  variable most_tried
+  variable most_sets_tried
   variable most_sets
   set candidates {}
   foreach primitive $primitives {
@@ -204,7 +214,7 @@ proc ::vorkel::explain_nearest::sets {request primitives} {
     }
   }
   set told [dict create]
-  foreach candidate [lrange [lsort -real -index 0 $candidates] 0 $most_tried-1] {
+  foreach candidate [lrange [lsort -real -index 0 $candidates] 0 $most_sets_tried-1] {
     lassign $candidate ppm texts primitive
     if {[dict size $told] >= $most_sets || [isLate]} break
     if {[dict exists $told $texts]} continue
@@ -257,37 +267,15 @@ proc ::vorkel::explain_nearest::Moved {request primitive pair} {
   return [list $worst $texts]
 }
 
-# The phases or duty cycles (`what`) next to the one of an output that is off in nothing else: a
-# dict from text to primitive. They are those that the engine chooses itself.
-proc ::vorkel::explain_nearest::steps {request primitives index what} {
-  variable most_sets
-  set outputs [dict get $request outputs]
-  set told [dict create]
-  foreach answer [::vorkel::answer::rank [::vorkel::answer::all \
-      [dict merge $request {bandwidthAsked 1}] $primitives]] {
-    if {![dict get $answer solved]} continue
-    set made [lindex [dict get $answer outputs] $index]
-    if {[dict get $made offs] ne "${what}Error"} continue
-    set text [::vorkel::numbers::short [dict get $made $what] 6]
-    set changed $outputs
-    lset changed $index [dict replace [lindex $outputs $index] $what $text]
-    set primitive [dict get $answer primitive]
-    if {[dict size $told] < $most_sets && ![dict exists $told $text] &&
-        [proof [dict replace $request outputs $changed] $primitive] ne ""} {
-      dict set told $text $primitive
-    }
-  }
-  return $told
-}
-
-# The input frequencies of a list that make every output exact: a list of the text and the
-# primitive for each. Of two input clocks the first one is replaced.
+# The input frequencies of a list that make every output exact: a list of the frequency in MHz,
+# as a text, and the primitives for each. Of two input clocks the first one is replaced.
 proc ::vorkel::explain_nearest::oscillators {request primitives texts} {
   dict set request tolerance 0
   set told {}
   foreach text $texts {
     if {[isLate]} break
-    set input [::vorkel::units::value $text frequency --oscillators]
+    set plain [plainMHz [::vorkel::units::value $text frequency --oscillators]]
+    set input [::vorkel::units::value $plain frequency --oscillators]
     set changed [dict replace $request inputs [lreplace [dict get $request inputs] 0 0 $input]]
     set serving {}
     foreach primitive $primitives {
@@ -296,10 +284,20 @@ proc ::vorkel::explain_nearest::oscillators {request primitives texts} {
       }
     }
     if {[llength $serving] > 0} {
-      lappend told [list $text $serving]
+      lappend told [list $plain $serving]
     }
+    ::vorkel::progress::step
   }
   return $told
+}
+
+# A frequency in MHz, in as many digits as it takes to be that one.
+proc ::vorkel::explain_nearest::plainMHz {frequency} {
+  set text [::vorkel::numbers::short $frequency 6]
+  if {abs($text - $frequency) <= 1e-13 * $frequency} {
+    return $text
+  }
+  return [format %.15g $frequency]
 }
 
 # Whether an exact answer of a primitive is worth a run of the engine: of a PLL or a TSYN it is

@@ -166,3 +166,50 @@ proc ::vorkel::explain_walk::serving {masks indices} {
   }
   return $common
 }
+
+# The pairs that serve all outputs but one. The pairs and masks of a request are kept, as each of
+# its outputs is asked for.
+proc ::vorkel::explain_walk::beside {request primitive index} {
+  variable known
+  if {![info exists known($primitive)] || [lindex $known($primitive) 0] ne $request} {
+    set pairs [pairs $request $primitive [dict get $request inputs]]
+    set single [expr {[llength [dict get $request outputs]] == 1}]
+    set known($primitive) [list $request $pairs \
+      [expr {$single ? 0 : [masks $request $primitive $pairs]}]]
+  }
+  lassign $known($primitive) -> pairs masks
+  set others {}
+  foreach mask $masks {
+    lappend others [llength $others]
+  }
+  set common [serving $masks [lsearch -all -inline -not -exact $others $index]]
+  set kept {}
+  foreach pair $pairs {
+    if {$common & 1} {
+      lappend kept $pair
+    }
+    set common [expr {$common >> 1}]
+  }
+  return $kept
+}
+
+# Whether some pair serves all outputs.
+proc ::vorkel::explain_walk::isServed {request primitive} {
+  set fractional [isFractional $request $primitive]
+  foreach pair [pairs $request $primitive [dict get $request inputs]] {
+    set vco [lindex $pair 0]
+    set eighths $fractional
+    set serves 1
+    foreach output [dict get $request outputs] {
+      if {[level $request $output $vco $eighths] < 3} {
+        set serves 0
+        break
+      }
+      set eighths 0
+    }
+    if {$serves} {
+      return 1
+    }
+  }
+  return 0
+}

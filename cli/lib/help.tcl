@@ -1,8 +1,8 @@
 # What the program says about its own use.
 
 package provide vorkel::help 1.1
-package require vorkel::catalogue 1.1
-package require vorkel::request 1.1
+package require vorkel::command_options 1.1
+package require vorkel::options 1.1
 package require vorkel::table 1.1
 
 namespace eval ::vorkel::help {
@@ -21,9 +21,6 @@ namespace eval ::vorkel::help {
     help    {[COMMAND]}                           "show this help"
     version {}                                    "show the version"
   }
-  # The primitives of the commands that solve for one, and the commands that take any.
-  variable primitives {tsyn TSYN pll PLL kru KRU_SP clkgen KRU_CLKGEN}
-  variable planners {plan compare best explain}
   # Words that can be pasted. The first two have an exact solution: 27 MHz times 33 is 891 MHz, of
   # which all three are whole parts. 100 MHz times 6 is 600 MHz, and 0 and 90 degrees are steps of
   # its dividers; half of 100 MHz, doubled, as it is and times 3; 100 MHz times 3 / 2, as it is
@@ -44,10 +41,39 @@ namespace eval ::vorkel::help {
   }
   # The commands whose examples the whole help shows.
   variable shown {plan compare best explain tsyn pll kru clkgen}
-  variable values [join {
-    {Values: 148.5, 148.5MHz, 100/3 or 8ns (MHz when nothing is said); 90 or 90deg;}
-    {50 or 50%; 50 or 50ps; 100 or 100ppm. Commas between the entries of a list.}
-  } \n]
+  # How values are written, with the option that a command has for them.
+  variable values {
+    --in        frequencies "148.5, 148.5MHz, 100/3, or 8ns for a period; MHz without a unit"
+    --phase     phases "90, 90deg, -45; degrees without a unit"
+    --duty      {duty cycles} "50, 50%"
+    --input-jitter jitter "50, 50ps, 0.05ns; ps without a unit"
+    --tolerance tolerance "100, 100ppm, 0.01%; ppm without a unit"
+    --in        lists
+      "24,27,33.3MHz are 24, 27 and 33.3 MHz: each entry has a unit of its own, or is in MHz.\
+      8,16ns is refused, because 8 could be meant in ns; write 8ns,16ns."
+  }
+  # What else there is to say of a command.
+  variable remarks {
+    explain
+      "The exit status is 0 also when the request is not possible: an explanation is what was\
+      asked for."
+    best
+      "KRU_SP and KRU_CLKGEN have no such settings to search; plan and compare ask them."
+    devices
+      "NAME is a device, or a part name with package and grade; the beginning is enough where only\
+      one goes on like it."
+    check
+      "FILE is named DEVICE.toml. Mistakes are on standard error, with line and column, and the\
+      exit status is 2. Missing keywords and limits that contradict each other are no mistakes:\
+      they are reported with exit status 0."
+  }
+  variable statuses {
+    0 "solved, or shown what was asked for; explain: also what is not possible"
+    1 "there is no configuration; the reason is on standard error"
+    2 "wrong usage, or a file or standard output that cannot be read or written"
+    3 "solved, but something is outside its tolerance or range"
+    4 "the program itself failed"
+  }
 }
 
 # How the program was called, as it can be pasted into a shell.
@@ -58,9 +84,10 @@ proc ::vorkel::help::Program {} {
   return ./vorkel
 }
 
-# A call of the program, as it can be pasted into a shell.
+# A call of a command, as it can be pasted into a shell, with those of the words of another
+# command that it takes.
 proc ::vorkel::help::command {name words} {
-  set quoted [lmap word $words {
+  set quoted [lmap word [::vorkel::command_options::kept $name $words] {
     if {![regexp {^[-A-Za-z0-9_./,=:%+@]+$} $word]} {
       set word '[string map {' '\\''} $word]'
     }
@@ -82,37 +109,32 @@ proc ::vorkel::help::usage {{command ""}} {
 
 # The help of the command help: for the whole program or for one command.
 proc ::vorkel::help::run {words} {
-  switch -- [llength $words] {
-    0 { return [All] }
-    1 { return [One [lindex $words 0]] }
+  set given [::vorkel::options::parse {} $words]
+  ::vorkel::options::refuseOperands $given 1
+  set operands [dict get $given operands]
+  if {[llength $operands] == 0} {
+    return [All]
   }
-  throw {VORKEL USAGE} "unexpected word \"[lindex $words 1]\""
+  return [One [lindex $operands 0]]
 }
 
 proc ::vorkel::help::All {} {
   variable commands
   variable examples
   variable shown
-  variable values
+  variable statuses
   set text "usage: [Program] COMMAND \[OPTION...\]\n\n"
   append text "Plans clocks: finds the settings of a device's clock primitives, VCO, M, D,\n"
-  append text "dividers and pins, with their errors and their jitter.\n\nCommands:\n"
-  foreach {name arguments description} $commands {
-    append text [Line $name $description]
-  }
-  append text "\nOptions of plan and compare:\n" [Options $::vorkel::request::options] \
-    [Line --trace "tsyn, pll, kru, clkgen: print the steps of the search first"] [Default]
-  append text "\nThe other commands have most of them; [Program] help COMMAND tells.\n$values\n"
-  append text "\nExit status:\n"
-  foreach {status meaning} {
-    0 "solved, or shown what was asked for"
-    1 "there is no configuration; the reason is on standard error"
-    2 "wrong usage, or a file that cannot be read or written"
-    3 "solved, but something is outside its tolerance or range"
-    4 "the program itself failed"
-  } {
-    append text [Line $status $meaning]
-  }
+  append text "dividers and pins, with their errors and their jitter.\n\n"
+  append text [Section Commands [lmap {name arguments description} $commands {
+    list $name $description
+  }]]
+  set options [::vorkel::command_options::of plan]
+  append text \n [Section "Options of plan" [Options $options]]
+  append text \n [Section "Options of other commands" [Options [Others $options]]]
+  append text "\n[Program] help COMMAND lists exactly those that a command takes.\n"
+  append text \n [Values $options]
+  append text \n [Section "Exit status" [lmap {status meaning} $statuses {list $status $meaning}]]
   append text "\nExamples:\n"
   foreach command $shown {
     append text "  [Program] $command [dict get $examples $command]\n"
@@ -120,62 +142,66 @@ proc ::vorkel::help::All {} {
   return $text
 }
 
+# The options that other commands have beside those of a table, with the commands.
+proc ::vorkel::help::Others {table} {
+  variable commands
+  set known [lmap {name placeholder description} $table {set name}]
+  set others {}
+  foreach {command arguments about} $commands {
+    foreach {name placeholder description} [::vorkel::command_options::of $command] {
+      if {$name ni $known} {
+        lappend known $name
+        lappend others $name $placeholder \
+          "[join [::vorkel::command_options::takers $name] {, }]: $description"
+      }
+    }
+  }
+  return $others
+}
+
 proc ::vorkel::help::One {command} {
   variable commands
   variable examples
-  variable values
+  variable remarks
   foreach {name arguments description} $commands {
     if {$name ne $command} continue
     set text "[usage $command]\n\n[string totitle $description 0 0].\n"
-    set options [OptionsOf $command]
+    set options [::vorkel::command_options::of $command]
     if {[llength $options] > 0} {
-      append text "\nOptions:\n" [Options $options]
-      if {"--device" in $options} {
-        append text [Default] \n $values \n
-      }
+      append text \n [Section Options [Options $options]] \n [Values $options]
+    }
+    if {[dict exists $remarks $command]} {
+      append text \n [::vorkel::table::paragraph [dict get $remarks $command]]
     }
     append text "\nExample:\n" \
       [string trimright "  [Program] $command [dict get $examples $command]"] \n
     return $text
   }
-  package require vorkel::options 1.1
-  throw {VORKEL USAGE} "unknown command \"$command\"[::vorkel::options::nearest $command \
+  throw {VORKEL USAGE} "unknown command\
+    \"[::vorkel::options::shown $command]\"[::vorkel::options::nearest $command \
     [lmap {name arguments description} $commands {set name}]]"
 }
 
-# The options of a command (see options.tcl). The planners have all of a request, and what stands
-# in their variable `options`.
-proc ::vorkel::help::OptionsOf {command} {
-  variable primitives
-  variable planners
-  if {[dict exists $primitives $command]} {
-    return [::vorkel::request::optionsOf [dict get $primitives $command]]
-  }
-  if {$command ni $planners} {
-    return {}
-  }
-  set own {}
-  if {[llength [package versions vorkel::$command]] > 0} {
-    package require vorkel::$command 1.1
-    if {[info exists ::vorkel::${command}::options]} {
-      set own [set ::vorkel::${command}::options]
+# Options as lines of a section.
+proc ::vorkel::help::Options {table} {
+  return [lmap {name placeholder description} $table {
+    list [string trimright "$name $placeholder"] $description
+  }]
+}
+
+# How the values of some options are written.
+proc ::vorkel::help::Values {options} {
+  variable values
+  set names [lmap {name placeholder description} $options {set name}]
+  set lines {}
+  foreach {option kind description} $values {
+    if {$option in $names} {
+      lappend lines [list $kind $description]
     }
   }
-  return [concat $::vorkel::request::options $own]
+  return [Section Values $lines]
 }
 
-proc ::vorkel::help::Options {table} {
-  set text ""
-  foreach {name placeholder description} $table {
-    append text [Line [string trimright "$name $placeholder"] $description]
-  }
-  return $text
-}
-
-proc ::vorkel::help::Default {} {
-  return [Line "" "Without --device: $::vorkel::catalogue::defaultPart."]
-}
-
-proc ::vorkel::help::Line {label text} {
-  return [format "  %-17s %s\n" $label $text]
+proc ::vorkel::help::Section {heading lines} {
+  return "$heading:\n[::vorkel::table::described $lines]"
 }

@@ -1,6 +1,7 @@
 # Runs a command of the program: its words in, text on standard output, an exit status back.
 
 package provide vorkel::main 1.1
+package require vorkel::options 1.1
 package require vorkel::output 1.1
 
 namespace eval ::vorkel::main {
@@ -27,6 +28,7 @@ namespace eval ::vorkel::main {
   variable done 0
   variable unsolved 1
   variable wrong_usage 2
+  variable unwritten 2
   variable failed 4
 }
 
@@ -35,6 +37,7 @@ namespace eval ::vorkel::main {
 proc ::vorkel::main::run {words} {
   variable unsolved
   variable wrong_usage
+  variable unwritten
   variable failed
   try {
     return [Dispatch $words]
@@ -45,6 +48,9 @@ proc ::vorkel::main::run {words} {
     package require vorkel::help 1.1
     Complain "vorkel: $reason\n[::vorkel::help::usage [lindex $words 0]]"
     return $wrong_usage
+  } trap {VORKEL UNWRITTEN} {reason} {
+    Complain "vorkel: $reason"
+    return $unwritten
   } on error {reason} {
     Complain "vorkel: $reason"
     return $failed
@@ -59,15 +65,21 @@ proc ::vorkel::main::Dispatch {words} {
   }
   set arguments [lassign $words command]
   if {![dict exists $commands $command]} {
-    package require vorkel::options 1.1
+    package require vorkel::command_options 1.1
+    set name [regsub {=.*$} $command {}]
+    if {[llength [::vorkel::command_options::takers $name]] > 0} {
+      throw {VORKEL USAGE} "a command must come before $name, such as plan"
+    }
     set kind [expr {[string match -* $command] ? "option" : "command"}]
-    throw {VORKEL USAGE} "unknown $kind \"$command\"[::vorkel::options::nearest $command \
+    throw {VORKEL USAGE} "unknown $kind\
+      \"[::vorkel::options::shown $command]\"[::vorkel::options::nearest $command \
       [dict keys $commands]]"
   }
   if {("--help" in $arguments || "-h" in $arguments) && ![string match -* $command]} {
     set arguments [list $command]
     set command help
   }
+  set ::vorkel::options::command $command
   set call [lassign [dict get $commands $command] package]
   package require vorkel::$package 1.1
   return [{*}$call $arguments]
@@ -82,9 +94,7 @@ proc ::vorkel::main::Show {call words} {
 
 proc ::vorkel::main::Version {words} {
   variable version
-  if {[llength $words] > 0} {
-    throw {VORKEL USAGE} "unexpected word \"[lindex $words 0]\""
-  }
+  ::vorkel::options::refuseOperands [::vorkel::options::parse {} $words]
   return "vorkel $version\n"
 }
 

@@ -58,9 +58,17 @@ proc ::vorkel::notes::on {answer} {
     }
   }
   set notes [Search $answer]
-  if {$asked && $primitive eq "TSYN" && $divider != round($divider)} {
-    lappend notes "with a fractional divider all phases are 0 and all duty cycles 50 %;\
-      --int-div0 avoids it"
+  set m [dict get $answer settings M]
+  set fractions {}
+  if {$m != round($m)} {
+    lappend fractions M
+  }
+  if {$divider != round($divider)} {
+    lappend fractions divider
+  }
+  if {$asked && $primitive eq "TSYN" && [llength $fractions] > 0} {
+    lappend notes "with a fractional [join $fractions { and }] all phases are 0 and all duty\
+      cycles 50 %; --int-div0 avoids it"
   }
   if {[dict get $request preferMaxVco] && !$asked && !$closest} {
     lappend notes "--prefer-max-vco counts only with --phase or --duty"

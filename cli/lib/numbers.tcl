@@ -2,6 +2,7 @@
 # them. The engine reads any text as a number; a mistyped one would silently be 0 there.
 
 package provide vorkel::numbers 1.1
+package require vorkel::options 1.1
 
 namespace eval ::vorkel::numbers {
   variable decimal {^[-+]?([0-9]+\.?[0-9]*|\.[0-9]+)([eE][-+]?[0-9]+)?$}
@@ -18,7 +19,7 @@ proc ::vorkel::numbers::parse {text what} {
     throw {VORKEL USAGE} "$what: \"$text\" is not a number"
   }
   if {abs($value) > $largest} {
-    throw {VORKEL USAGE} "$what: $text is too large"
+    throw {VORKEL USAGE} "$what: [::vorkel::options::shown $text] is too large"
   }
   return $value
 }

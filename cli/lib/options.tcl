@@ -19,7 +19,13 @@
 
 package provide vorkel::options 1.1
 
-namespace eval ::vorkel::options {}
+namespace eval ::vorkel::options {
+  # The command that runs, which the program sets. It decides which options there are; without
+  # one there are those of plan.
+  variable command ""
+  # Of a text that is wrong a complaint shows so many letters.
+  variable most_shown 60
+}
 
 # See above.
 proc ::vorkel::options::request {words {table {}}} {
@@ -30,8 +36,8 @@ proc ::vorkel::options::request {words {table {}}} {
 # Reads the words of a command. `table` has three entries for each option: its name with the
 # dashes, the placeholder of its value ("" for a flag), and a description.
 # Answers a dict from option names to values (1 for a flag), and the list of the other words
-# under the key "operands". An unknown option, a value too few or too many, and an option
-# that is given twice are wrong usage.
+# under the key "operands"; behind "--" there are no options. An unknown option, a value too few
+# or too many, and an option that is given twice are wrong usage.
 proc ::vorkel::options::parse {table words} {
   set placeholders [dict create]
   foreach {name placeholder description} $table {
@@ -40,7 +46,11 @@ proc ::vorkel::options::parse {table words} {
   set given [dict create operands {}]
   while {[llength $words] > 0} {
     set words [lassign $words word]
-    if {[string index $word 0] ne "-"} {
+    if {$word eq "--"} {
+      dict lappend given operands {*}$words
+      break
+    }
+    if {[string index $word 0] ne "-" || $word eq "-"} {
       dict lappend given operands $word
       continue
     }
@@ -49,7 +59,7 @@ proc ::vorkel::options::parse {table words} {
       set name $word
     }
     if {![dict exists $placeholders $name]} {
-      throw {VORKEL USAGE} "unknown option $name[nearest $name [dict keys $placeholders]]"
+      throw {VORKEL USAGE} [Unknown $name $placeholders]
     }
     if {[dict exists $given $name]} {
       throw {VORKEL USAGE} "$name is given twice"
@@ -72,11 +82,28 @@ proc ::vorkel::options::parse {table words} {
   return $given
 }
 
+# What is wrong with an option that the command does not have: another one may have it.
+proc ::vorkel::options::Unknown {name placeholders} {
+  variable command
+  package require vorkel::command_options 1.1
+  set takers [::vorkel::command_options::takers $name]
+  if {$command ne "" && [llength $takers] > 0} {
+    set text "option $name is not of the command $command; it is of [enumerate $takers]"
+    set reason [::vorkel::command_options::reason $command $name]
+    return [expr {$reason eq "" ? $text : "$text: $reason"}]
+  }
+  if {[regexp {^(-[a-z])=?(.+)$} $name -> letter value] && [dict exists $placeholders $letter]} {
+    return "unknown option [shown $name]; a value stands apart: $letter\
+      [dict get $placeholders $letter]"
+  }
+  return "unknown option [shown $name][nearest $name [dict keys $placeholders]]"
+}
+
 # Refuses words that are no options, of which `most` are allowed.
 proc ::vorkel::options::refuseOperands {given {most 0}} {
   set operands [dict get $given operands]
   if {[llength $operands] > $most} {
-    throw {VORKEL USAGE} "unexpected word \"[lindex $operands $most]\""
+    throw {VORKEL USAGE} "unexpected word \"[shown [lindex $operands $most]]\""
   }
 }
 
@@ -88,8 +115,39 @@ proc ::vorkel::options::get {given name default} {
   return $default
 }
 
+# Words as a list in a sentence.
+proc ::vorkel::options::enumerate {words {last and}} {
+  if {[llength $words] < 2} {
+    return [join $words]
+  }
+  return "[join [lrange $words 0 end-1] {, }] $last [lindex $words end]"
+}
+
+# The name of a file as the file commands take it: a shell has already made of "~" what it makes.
+proc ::vorkel::options::path {name} {
+  return [expr {[string match ~* $name] ? "./$name" : $name}]
+}
+
+# A text as a complaint shows it: on one line, and not without end.
+proc ::vorkel::options::shown {text} {
+  variable most_shown
+  if {[string length $text] > $most_shown} {
+    set text [string range $text 0 $most_shown-1]...
+  }
+  if {![regexp {[[:cntrl:]]} $text]} {
+    return $text
+  }
+  return [join [lmap letter [split $text ""] {
+    expr {[string is control $letter] ? [format \\u%04x [scan $letter %c]] : $letter}
+  }] ""]
+}
+
 # "; did you mean X?" for the name that is nearest to a mistyped one, or "" when none is near.
 proc ::vorkel::options::nearest {name names} {
+  variable most_shown
+  if {[string length $name] > $most_shown} {
+    return ""
+  }
   set best ""
   # One slip, or two in a long name.
   set least [expr {[string length $name] > 8 ? 3 : [string length $name] > 2 ? 2 : 0}]

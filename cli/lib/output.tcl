@@ -3,14 +3,16 @@
 
 package provide vorkel::output 1.1
 package require vorkel::colour 1.1
+package require vorkel::options 1.1
 
 namespace eval ::vorkel::output {}
 
-# Writes a text to a file, or to standard output when its name is "". A reader of standard
-# output that has gone away is no failure. A file that cannot be written is wrong usage, and one
-# that was there before is then as it was.
+# Writes a text to a file, or to standard output when its name is "" or "-". A reader of standard
+# output that has gone away is no failure; that it takes nothing else, such as on a full disk, is
+# thrown as {VORKEL UNWRITTEN}. A file that cannot be written is wrong usage, and one that was
+# there before is then as it was.
 proc ::vorkel::output::write {text {file ""}} {
-  if {$file ne ""} {
+  if {$file ni {"" -}} {
     WriteFile $text $file
     return
   }
@@ -20,7 +22,16 @@ proc ::vorkel::output::write {text {file ""}} {
   } trap {POSIX EPIPE} {} {
     # What is left in the buffer would fail again when the program ends.
     catch {close stdout}
+  } on error {reason options} {
+    catch {close stdout}
+    throw {VORKEL UNWRITTEN} "standard output cannot be written: [Cause $reason $options]"
   }
+}
+
+# Why something cannot be written.
+proc ::vorkel::output::Cause {reason options} {
+  set cause [lindex [dict get $options -errorcode] 2]
+  return [expr {$cause eq "" ? $reason : $cause}]
 }
 
 # The text of answers in a format other than text: the writers stand in files of their own.
@@ -33,7 +44,7 @@ proc ::vorkel::output::format {format answers request} {
 # stands for. What is no plain file, such as /dev/null, has nothing to keep whole.
 proc ::vorkel::output::WriteFile {text file} {
   try {
-    set path [Target $file]
+    set path [Target [::vorkel::options::path $file]]
     if {[file exists $path] && [file type $path] ni {file directory}} {
       WriteTo $path $text {WRONLY}
       return
@@ -41,10 +52,13 @@ proc ::vorkel::output::WriteFile {text file} {
     if {[file isdirectory $path]} {
       throw {POSIX EISDIR} "it is a directory"
     }
+    if {[string match */ $file]} {
+      throw {POSIX ENOENT} "there is no such directory"
+    }
     if {[file exists $path] && ![file writable $path]} {
       throw {POSIX EACCES} "permission denied"
     }
-    set draft [file join [file dirname $path] .[file tail $path].[pid]]
+    set draft [file join [file dirname $path] .vorkel.[pid]]
     try {
       WriteTo $draft $text {WRONLY CREAT EXCL}
       if {[file exists $path]} {
@@ -56,11 +70,8 @@ proc ::vorkel::output::WriteFile {text file} {
       return -options $options $reason
     }
   } on error {reason options} {
-    set cause [lindex [dict get $options -errorcode] 2]
-    if {$cause eq ""} {
-      set cause $reason
-    }
-    throw {VORKEL USAGE} "-o: $file cannot be written: $cause"
+    throw {VORKEL USAGE} "-o: [::vorkel::options::shown $file] cannot be written:\
+      [Cause $reason $options]"
   }
 }
 

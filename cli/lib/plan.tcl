@@ -301,7 +301,12 @@ proc ::vorkel::plan::Hints {call winner} {
   set text ""
   if {![dict get $winner solved] || ![dict get $winner within]} {
     append text "hint: what stands in the way: [::vorkel::help::command explain $words]\n"
-    append text "hint: the best settings of all: [::vorkel::help::command best $words]\n"
+    # Only PLL and TSYN have a grid of settings.
+    if {"Loop" in [lmap primitive [dict get $call primitives] {
+      ::vorkel::engine::family $primitive
+    }]} {
+      append text "hint: the best settings of all: [::vorkel::help::command best $words]\n"
+    }
   }
   if {[dict get $winner solved] && [dict get $winner bandwidth] ne "" &&
       [dict get $call request inputJitter] == 0 && [dict get $winner maxJitter] ne ""} {

@@ -31,24 +31,35 @@ namespace eval ::vorkel::answer {
 
 # Answers to a request from all primitives of the device, or from those listed, with all variants
 # that what the user has set leaves open. The same settings come once. A primitive for which
-# nothing is found has one answer, which says why.
-proc ::vorkel::answer::all {request {primitives ""}} {
+# nothing is found has one answer, which says why. `tick` is a command prefix that is called
+# after each run of the engine; `runs` tells how many there are.
+proc ::vorkel::answer::all {request {primitives ""} {tick list}} {
   if {$primitives eq ""} {
     set primitives [dict get $request primitives]
   }
   set answers {}
   foreach primitive $primitives {
-    lappend answers {*}[Answers $request $primitive]
+    lappend answers {*}[Answers $request $primitive $tick]
   }
   return $answers
 }
 
-proc ::vorkel::answer::Answers {request primitive} {
+# How many runs of the engine the answers from these primitives take.
+proc ::vorkel::answer::runs {request primitives} {
+  set runs 0
+  foreach primitive $primitives {
+    incr runs [llength [Variants $request $primitive]]
+  }
+  return $runs
+}
+
+proc ::vorkel::answer::Answers {request primitive tick} {
   set seen {}
   set solved {}
   set unsolved {}
   foreach variant [Variants $request $primitive] {
     set answer [solve $request $primitive $variant]
+    {*}$tick
     if {![dict get $answer solved]} {
       lappend unsolved $answer
       continue

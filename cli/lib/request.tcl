@@ -3,6 +3,7 @@
 
 package provide vorkel::request 1.1
 package require vorkel::catalogue 1.1
+package require vorkel::command_options 1.1
 package require vorkel::engine 1.1
 package require vorkel::numbers 1.1
 package require vorkel::options 1.1
@@ -14,70 +15,21 @@ namespace eval ::vorkel::request {
   variable default_bandwidth OPTIMIZED
   variable default_tolerance 100
   variable formats {text json tcl sdc}
-  # All options of a request (see options.tcl).
-  variable options {
-    --in F[,F2]       "input frequency; F2 is that of a second input clock"
-    --out LIST        "frequencies of 1 to 7 outputs"
-    --phase LIST      "phase of each output, - where any will do"
-    --duty LIST       "duty cycle of each output, - or 0 where any will do"
-    --device NAME     "part name: DEVICE\[PACKAGE]\[-GRADE], or its beginning"
-    --primitive NAME  "PLL, TSYN, KRU_SP, KRU_CLKGEN or auto (default)"
-    --bandwidth NAME  "of the loop: LOW, HIGH or OPTIMIZED"
-    --low-bandwidth   ""  "short for --bandwidth LOW"
-    --prefer-max-vco  ""  "take the highest VCO"
-    --int-div0        ""  "a whole divider for output 0 of a TSYN"
-    --feedback        ""  "the feedback of a KRU_SP is connected"
-    --input-jitter PS "peak-to-peak jitter of the input clock, 0 by default"
-    --tolerance PPM   "how far a frequency may be off, 100 by default"
-    --exact           ""  "short for --tolerance 0"
-    --request FILE    "take from a file what no option says"
-    --format NAME     "text (default), json, tcl or sdc"
-    -o FILE           "write to a file instead of standard output"
-  }
-  # The options of the commands for one primitive, and what some of them say there.
-  variable loop_options {--in --out --phase --duty --device --bandwidth --low-bandwidth
-    --prefer-max-vco --int-div0 --input-jitter --tolerance --exact --request --format -o --trace}
-  variable kru_options {--in --out --phase --device --feedback --bandwidth --input-jitter
-    --tolerance --exact --request --format -o --trace}
-  variable loop_texts {
-    --bandwidth       NAME "LOW (lower limit for the PFD), HIGH or OPTIMIZED (default)"
-    --prefer-max-vco  ""   "with --phase or --duty: take the highest VCO"
-    --trace           ""   "print the steps of the search first"
-  }
-  variable kru_texts {
-    --in              F    "input frequency"
-    --out             LIST "frequencies of 1 to 6 outputs"
-    --feedback        ""   "kru: use the feedback, without which it has only CLKFX pins"
-    --bandwidth       NAME "accepted, but a KRU has no such setting"
-    --trace           ""   "print the steps of the search first"
-  }
-}
-
-# The options of the command for a primitive.
-proc ::vorkel::request::optionsOf {primitive} {
-  variable options
-  set family [string tolower [::vorkel::engine::family $primitive]]
-  variable ${family}_options
-  variable ${family}_texts
-  set texts [dict create]
-  foreach {name placeholder description} [concat $options [set ${family}_texts]] {
-    dict set texts $name [list $placeholder $description]
-  }
-  set table {}
-  foreach name [set ${family}_options] {
-    if {$name ne "--feedback" || $primitive eq "KRU_SP"} {
-      lappend table $name {*}[dict get $texts $name]
-    }
-  }
-  return $table
+  # The commands for one primitive.
+  variable commands {PLL pll TSYN tsyn KRU_SP kru KRU_CLKGEN clkgen}
 }
 
 # Reads the words of a command for all primitives: see request in options.tcl.
 proc ::vorkel::request::read {words {table {}}} {
-  variable options
-  set call [Call [concat $options $table] $words]
-  set primitive [Primitive [dict get $call given]]
-  set device [Device [dict get $call given] $primitive]
+  set command $::vorkel::options::command
+  if {$command eq ""} {
+    set command plan
+  }
+  set call [Call [concat [::vorkel::command_options::shared $command] $table] $words]
+  set given [dict get $call given]
+  set primitive [primitive [::vorkel::options::get $given --primitive auto] \
+    [Told $given --primitive]]
+  set device [Device $given $primitive]
   set primitives [dict get $device primitives]
   if {$primitive ne "auto"} {
     set primitives [list $primitive]
@@ -88,10 +40,16 @@ proc ::vorkel::request::read {words {table {}}} {
 # Reads the words of the command for a primitive, likewise. The request has one more key, trace,
 # a switch.
 proc ::vorkel::request::parse {primitive words} {
-  set call [Call [optionsOf $primitive] $words $primitive]
+  variable commands
+  set call [Call [::vorkel::command_options::shared [dict get $commands $primitive]] $words \
+    $primitive]
   set given [dict get $call given]
-  if {[dict exists $given --primitive] && [Primitive $given] ni [list auto $primitive]} {
-    throw {VORKEL USAGE} "the request is for a [Primitive $given], this command for a $primitive"
+  if {[dict exists $given --primitive]} {
+    set place [Told $given --primitive]
+    set asked [primitive [dict get $given --primitive] $place]
+    if {$asked ni [list auto $primitive]} {
+      throw {VORKEL USAGE} "$place: the request is for a $asked, this command for a $primitive"
+    }
   }
   set call [Complete $call [Device $given $primitive] \
     [dict create primitive $primitive primitives [list $primitive]]]
@@ -110,7 +68,8 @@ proc ::vorkel::request::Call {table words {primitive ""}} {
   }
   set format [::vorkel::options::get $given --format text]
   if {$format ni $formats} {
-    throw {VORKEL USAGE} "--format: \"$format\" must be text, json, tcl or sdc"
+    throw {VORKEL USAGE} "--format: \"[::vorkel::options::shown $format]\" must be\
+      [::vorkel::options::enumerate $formats or]"
   }
   set file [::vorkel::options::get $given -o ""]
   if {$file eq "" && [dict exists $given -o]} {
@@ -125,6 +84,14 @@ proc ::vorkel::request::Call {table words {primitive ""}} {
     tolerance [Tolerance $given] feedback [dict exists $given --feedback] \
     preferMaxVco [dict exists $given --prefer-max-vco] intDiv0 [dict exists $given --int-div0]]
   return [dict create request $request format $format file $file given $given words $words]
+}
+
+# How a complaint names an option: by the place in the request file when its value is from there.
+proc ::vorkel::request::Told {given name} {
+  if {[dict exists $given places $name]} {
+    return [dict get $given places $name]
+  }
+  return $name
 }
 
 # Adds the device to what was read, and what else the caller knows.
@@ -151,7 +118,11 @@ proc ::vorkel::request::WithFile {given} {
       }
     }
   }
-  return [dict merge $file $given]
+  set places [dict get $file places]
+  foreach name [dict keys $given] {
+    dict unset places $name
+  }
+  return [dict merge $file $given [dict create places $places]]
 }
 
 # Limits as doubles, so that arithmetic with them is that of real numbers; counts stay whole.
@@ -164,20 +135,29 @@ proc ::vorkel::request::Numbers {limits} {
 # The list of an option that must be there: 1 to as many frequencies as the primitive can have,
 # or the most able one when it is not given.
 proc ::vorkel::request::Frequencies {given name mostName primitive} {
-  set what [dict get {--in {input frequency} --out {output frequencies}} $name]
+  lassign [dict get {
+    --in {{input frequency} inputs {--in 100}}
+    --out {{output frequencies} outputs {--out 200,50}}
+  } $name] what entry example
   if {![dict exists $given $name]} {
-    throw {VORKEL USAGE} "$name is missing: the $what, such as\
-      [dict get {--in {--in 100} --out {--out 200,50}} $name]"
+    set missing "$name is missing"
+    if {[dict exists $given --request]} {
+      set missing "[dict get $given --request] has no $entry, and $missing"
+    }
+    throw {VORKEL USAGE} "$missing: the $what, such as $example"
   }
   set list [::vorkel::units::values [dict get $given $name] frequency $name]
   set counts [set ::vorkel::engine::$mostName]
   set most [tcl::mathfunc::max {*}[dict values $counts]]
+  set whose ""
   if {$primitive ne ""} {
     set most [dict get $counts $primitive]
+    set whose " of a $primitive"
   }
   if {[llength $list] > $most} {
     set frequencies [expr {$most == 1 ? "frequency" : "frequencies"}]
-    throw {VORKEL USAGE} "$name: at most $most $frequencies, not [llength $list]"
+    throw {VORKEL USAGE} "[Told $given $name]: at most $most $frequencies$whose,\
+      not [llength $list]"
   }
   return $list
 }
@@ -200,24 +180,31 @@ proc ::vorkel::request::PerOutput {given name kind count} {
   }
   set list [::vorkel::units::values [dict get $given $name] $kind $name 1]
   if {[llength $list] != $count} {
-    throw {VORKEL USAGE} "$name: [llength $list] in the list, but --out has $count"
+    throw {VORKEL USAGE} "$name: [llength $list] in the list, but there\
+      [expr {$count == 1 ? "is 1 output" : "are $count outputs"}]"
   }
   return $list
 }
 
 proc ::vorkel::request::Bandwidth {given} {
-  variable bandwidths
   variable default_bandwidth
   set low [dict exists $given --low-bandwidth]
-  set bandwidth [::vorkel::options::get $given --bandwidth \
-    [expr {$low ? "LOW" : $default_bandwidth}]]
-  if {$bandwidth ni $bandwidths} {
-    throw {VORKEL USAGE} "--bandwidth: \"$bandwidth\" must be LOW, HIGH or OPTIMIZED"
-  }
+  set bandwidth [bandwidth [::vorkel::options::get $given --bandwidth \
+    [expr {$low ? "LOW" : $default_bandwidth}]] [Told $given --bandwidth]]
   if {$low && $bandwidth ne "LOW"} {
     throw {VORKEL USAGE} "--low-bandwidth and --bandwidth $bandwidth contradict each other"
   }
   return $bandwidth
+}
+
+# A bandwidth by its name, in any case. `what` names it in a complaint.
+proc ::vorkel::request::bandwidth {name what} {
+  variable bandwidths
+  if {[string toupper $name] ni $bandwidths} {
+    throw {VORKEL USAGE} "$what: \"[::vorkel::options::shown $name]\" must be\
+      [::vorkel::options::enumerate $bandwidths or]"
+  }
+  return [string toupper $name]
 }
 
 proc ::vorkel::request::Tolerance {given} {
@@ -226,36 +213,46 @@ proc ::vorkel::request::Tolerance {given} {
   set tolerance [::vorkel::units::value [::vorkel::options::get $given --tolerance \
     [expr {$exact ? 0 : $default_tolerance}]] tolerance --tolerance]
   if {$exact && $tolerance != 0} {
+    if {[dict exists $given places --exact]} {
+      throw {VORKEL USAGE} "[Told $given --exact] contradicts the tolerance"
+    }
     throw {VORKEL USAGE} "--exact and --tolerance [dict get $given --tolerance] contradict each\
       other"
   }
   return $tolerance
 }
 
-# The primitive of --primitive, in any case.
-proc ::vorkel::request::Primitive {given} {
-  set name [::vorkel::options::get $given --primitive auto]
+# A primitive by its name, in any case, or auto. `what` names it in a complaint.
+proc ::vorkel::request::primitive {name what} {
   set known [dict keys $::vorkel::engine::most_outputs]
   if {[string tolower $name] eq "auto"} {
     return auto
   }
   if {[string toupper $name] ni $known} {
-    throw {VORKEL USAGE} "--primitive: \"$name\" must be auto, [join [lrange $known 0 end-1] {, }]\
-      or [lindex $known end]"
+    throw {VORKEL USAGE} "$what: \"[::vorkel::options::shown $name]\" must be\
+      [::vorkel::options::enumerate [concat auto $known] or]"
   }
   return [string toupper $name]
 }
 
 # The device that is asked for, which must have the primitive.
 proc ::vorkel::request::Device {given primitive} {
-  set device [::vorkel::catalogue::find \
-    [::vorkel::options::get $given --device $::vorkel::catalogue::defaultPart]]
+  set place [Told $given --device]
+  # Without a file the complaints name the device; that is enough.
+  set label [expr {$place eq "--device" ? "" : "$place: "}]
+  try {
+    set device [::vorkel::catalogue::find \
+      [::vorkel::options::get $given --device $::vorkel::catalogue::defaultPart]]
+  } trap {VORKEL USAGE} {reason} {
+    throw {VORKEL USAGE} $label$reason
+  }
   set primitives [dict get $device primitives]
   if {$primitive ne "auto" && $primitive ni $primitives} {
-    throw {VORKEL USAGE} "[dict get $device part] has no $primitive; it has [join $primitives {, }]"
+    throw {VORKEL USAGE} "$label[dict get $device part] has no $primitive; it has\
+      [join $primitives {, }]"
   }
   if {[llength $primitives] == 0} {
-    throw {VORKEL USAGE} "[dict get $device part] has the limits of no primitive"
+    throw {VORKEL USAGE} "$label[dict get $device part] has the limits of no primitive"
   }
   return $device
 }

@@ -3,17 +3,20 @@
 
 package provide vorkel::units 1.1
 package require vorkel::numbers 1.1
+package require vorkel::options 1.1
 
 namespace eval ::vorkel::units {
   variable number {[-+]?(?:[0-9]+\.?[0-9]*|\.[0-9]+)(?:[eE][-+]?[0-9]+)?}
   # For each kind of value: the unit of a number without one, examples, what a value must be (a
   # check of numbers.tcl), and its units. A unit is written in any case. It has what to do with
-  # the number: multiply it, divide it, or divide by it, as a period is made a frequency.
+  # the number: multiply it, divide it, or divide by it, as a period is made a frequency. A range
+  # is that of all that is shown in columns.
   variable kinds {
     frequency {unit MHz article "a frequency" examples "100, 148.5MHz, 100/3 or 8ns"
       check positive units {hz {/ 1e6} khz {/ 1e3} mhz {* 1.0} ghz {* 1e3}
         ps {by 1e6} ns {by 1e3} us {by 1.0} ms {by 1e-3}}
-      known "Hz, kHz, MHz and GHz, or ps, ns, us and ms for a period"}
+      known "Hz, kHz, MHz and GHz, or ps, ns, us and ms for a period"
+      range {1e-6 1e6} bounds "1 Hz to 1 THz"}
     phase {unit degrees article "a phase" examples "90, 90deg or -45"
       check turn units {deg {* 1.0} degree {* 1.0} degrees {* 1.0} ° {* 1.0}} known "deg"}
     duty {unit percent article "a duty cycle" examples "50, 50% or 33.3"
@@ -22,7 +25,8 @@ namespace eval ::vorkel::units {
       check jitter units {fs {/ 1e3} ps {* 1.0} ns {* 1e3} us {* 1e6}}
       known "fs, ps, ns and us"}
     tolerance {unit ppm article "a tolerance" examples "100, 100ppm or 0.01%"
-      check notNegative units {ppm {* 1.0} ppb {/ 1e3} % {* 1e4}} known "ppm, ppb and %"}
+      check notNegative units {ppm {* 1.0} ppb {/ 1e3} % {* 1e4}} known "ppm, ppb and %"
+      range {0 1e9} bounds "0 to 1000000000 ppm"}
   }
   # The entry of a list for an output that asks for nothing.
   variable none -
@@ -46,7 +50,7 @@ proc ::vorkel::units::values {text kind what {optional 0}} {
   foreach entry [split $text ,] {
     set entry [string trim $entry]
     if {$entry eq ""} {
-      throw {VORKEL USAGE} "$what: a number is missing in \"$text\""
+      throw {VORKEL USAGE} "$what: a number is missing in \"[::vorkel::options::shown $text]\""
     }
     if {$optional && $entry eq $none} {
       lappend values ""
@@ -75,42 +79,60 @@ proc ::vorkel::units::Parse {text kind what} {
   variable kinds
   variable number
   set facts [dict get $kinds $kind]
+  set shown [::vorkel::options::shown $text]
   set pattern "^\\s*($number)(?:\\s*/\\s*($number))?\\s*(\[^\\s0-9.\]\[^0-9\]*)?\$"
   if {![regexp -- $pattern $text -> first second unit]} {
-    throw {VORKEL USAGE} "$what: \"$text\" is not [dict get $facts article], such as\
+    throw {VORKEL USAGE} "$what: \"$shown\" is not [dict get $facts article], such as\
       [dict get $facts examples]"
   }
   set value [::vorkel::numbers::parse $first $what]
   if {$second ne ""} {
     set divisor [::vorkel::numbers::parse $second $what]
     if {$divisor == 0.0} {
-      throw {VORKEL USAGE} "$what: \"$text\" divides by 0"
+      throw {VORKEL USAGE} "$what: \"$shown\" divides by 0"
     }
     set value [expr {$value / $divisor}]
   }
   set demand [::vorkel::numbers::[dict get $facts check] $value]
   if {$demand ne ""} {
-    throw {VORKEL USAGE} "$what: $text must be $demand"
+    throw {VORKEL USAGE} "$what: $shown must be $demand"
   }
-  set rule {* 1.0}
   set unit [string trim $unit]
-  if {$unit ne ""} {
-    set name [string tolower $unit]
-    if {![dict exists $facts units $name]} {
-      throw {VORKEL USAGE} "$what: unknown unit \"$unit\" in \"$text\"; the units of\
-        [dict get $facts article] are [dict get $facts known]"
-    }
-    set rule [dict get $facts units $name]
-  }
+  set rule [Rule $kind $unit $shown $what]
   set value [Convert $value $rule]
   set demand [::vorkel::numbers::[dict get $facts check] $value]
   if {$demand ne "" && $kind eq "jitter"} {
-    throw {VORKEL USAGE} "$what: $text must be $demand"
+    throw {VORKEL USAGE} "$what: $shown must be $demand"
+  }
+  if {[dict exists $facts range]} {
+    lassign [dict get $facts range] lowest highest
+    if {$value < $lowest || $value > $highest} {
+      throw {VORKEL USAGE} "$what: $shown is out of range: [dict get $facts article] is from\
+        [dict get $facts bounds]"
+    }
   }
   if {$demand ne "" || abs($value) > $::vorkel::numbers::largest} {
-    throw {VORKEL USAGE} "$what: $text is out of any range"
+    throw {VORKEL USAGE} "$what: $shown is out of any range"
   }
   return [list $value $unit $rule]
+}
+
+# What a unit does with the number before it.
+proc ::vorkel::units::Rule {kind unit shown what} {
+  variable kinds
+  if {$unit eq ""} {
+    return {* 1.0}
+  }
+  set facts [dict get $kinds $kind]
+  # In a locale without UTF-8 the bytes of a degree sign come as letters of their own.
+  foreach name [list $unit [encoding convertfrom utf-8 [encoding convertto iso8859-1 $unit]]] {
+    set name [string tolower $name]
+    if {[dict exists $facts units $name]} {
+      return [dict get $facts units $name]
+    }
+  }
+  throw {VORKEL USAGE} "$what: unknown unit \"[::vorkel::options::shown $unit]\" in \"$shown\"; the\
+    units of [dict get $facts article] are [dict get $facts known]"
 }
 
 proc ::vorkel::units::Convert {value rule} {
