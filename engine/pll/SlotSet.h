@@ -18,6 +18,28 @@ class SlotSet {
   void Insert(int slot) { Word(slot) |= Bit(slot); }
   void Erase(int slot) { Word(slot) &= ~Bit(slot); }
   void Clear() { words_.fill(0); }
+  void Remove(const SlotSet& others) {
+    for (std::size_t word = 0; word < kWords; ++word) words_[word] &= ~others.words_[word];
+  }
+
+  // The same with the slots `first` to `last`, of which there are none when `first` is above
+  // `last`. `visit` gets those that were in the set.
+  void InsertRange(int first, int last) {
+    VisitWords(first, last, [&](std::size_t word, std::uint64_t bits) { words_[word] |= bits; });
+  }
+  template <typename Visit>
+  void EraseRange(int first, int last, Visit visit) {
+    VisitWords(first, last, [&](std::size_t word, std::uint64_t bits) {
+      for (bits &= words_[word]; bits != 0; bits &= bits - 1) {
+        visit(static_cast<int>(word * 64) + std::countr_zero(bits));
+      }
+    });
+    EraseRange(first, last);
+  }
+  void EraseRange(int first, int last) {
+    VisitWords(first, last, [&](std::size_t word, std::uint64_t bits) { words_[word] &= ~bits; });
+  }
+
   bool Contains(int slot) const {
     return (words_[static_cast<std::size_t>(slot) / 64] & Bit(slot)) != 0;
   }
@@ -69,6 +91,19 @@ class SlotSet {
   static constexpr std::size_t kWords = (kSlots + 63) / 64;
 
   static std::uint64_t Bit(int slot) { return std::uint64_t{1} << (slot % 64); }
+  // The words in which slots of the range have bits, and these bits.
+  template <typename Visit>
+  static void VisitWords(int first, int last, Visit visit) {
+    if (first > last) return;
+    const auto lastWord = static_cast<std::size_t>(last) / 64;
+    std::uint64_t bits = ~std::uint64_t{0} << (first % 64);
+    for (auto word = static_cast<std::size_t>(first) / 64; word < lastWord; ++word) {
+      visit(word, bits);
+      bits = ~std::uint64_t{0};
+    }
+    visit(lastWord, bits & (~std::uint64_t{0} >> (63 - last % 64)));
+  }
+
   std::uint64_t& Word(int slot) { return words_[static_cast<std::size_t>(slot) / 64]; }
 
   std::array<std::uint64_t, kWords> words_{};

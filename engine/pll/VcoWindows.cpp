@@ -5,7 +5,6 @@
 #include <limits>
 
 #include "engine/pll/MultiplierSearch.h"
-#include "engine/pll/OutputDividers.h"
 
 namespace Ip::Pll {
 
@@ -28,9 +27,11 @@ void Append(VcoWindows& windows, const VcoWindow& window) {
   }
 }
 
-// Where an M and a D are found: for each M the values of D before rounding that the VCO range,
-// the PFD range and the bounds of D leave, as far as they lie near a whole number.
-VcoWindows WindowsOfMAndD(const VorkelImp& imp, const Run& run) {
+}  // namespace
+
+// For each M the values of D before rounding that the VCO range, the PFD range and the bounds of
+// D leave, as far as they lie near a whole number.
+VcoWindows FindVcoWindows(const VorkelImp& imp, const Run& run) {
   const double inFreq = run.inFreq;
   const PllLimits& limits = imp.pllLimits;
   const double pfdMax = PfdMaximum(imp);
@@ -54,47 +55,6 @@ VcoWindows WindowsOfMAndD(const VorkelImp& imp, const Run& run) {
             [](const VcoWindow& a, const VcoWindow& b) { return a.low < b.low; });
   VcoWindows windows;
   for (const VcoWindow& window : found) Append(windows, window);
-  return windows;
-}
-
-}  // namespace
-
-void Intersect(const VcoWindows& a, const VcoWindows& b, VcoWindows& common) {
-  common.clear();
-  for (std::size_t i = 0, j = 0; i < a.size() && j < b.size();) {
-    Append(common, {std::max(a[i].low, b[j].low), std::min(a[i].high, b[j].high)});
-    a[i].high < b[j].high ? ++i : ++j;
-  }
-}
-
-void FindOutputWindows(const VorkelImp& imp, int n, int tolerance, VcoWindows& windows) {
-  const double f = imp.requests.reqOutFreq[static_cast<std::size_t>(n)];
-  const OutputRange range = RangeOfOutput(imp.pllLimits, n);
-  windows.clear();
-  // A negative request, -0 among them, takes a divider of 1 and keeps every tolerance.
-  if (std::signbit(f) && std::isfinite(f)) Append(windows, Widened(range.min, range.max));
-  if (!(f > 0.0) || !std::isfinite(f)) return;
-  const double slowest = f * (1.0 - Tolerance(tolerance));
-  const double fastest = f * (1.0 + Tolerance(tolerance));
-  for (double divider = 1.0; divider <= kLargestDivider; divider += 1.0) {
-    // Ratios that round to the divider, frequencies within the tolerance, the output range.
-    const double low = std::max({divider == 1.0 ? 0.0 : (divider - 0.5) * f, divider * slowest,
-                                 divider * range.min});
-    const double high = std::min({divider == kLargestDivider ? kNoLimit : (divider + 0.5) * f,
-                                  divider * fastest, divider * range.max});
-    Append(windows, Widened(low, high));
-  }
-}
-
-VcoWindows FindVcoWindows(const VorkelImp& imp, const Run& run) {
-  VcoWindows windows = WindowsOfMAndD(imp, run);
-  VcoWindows ofOutput;
-  VcoWindows common;
-  for (int n = 1; n < run.count && !windows.empty(); ++n) {
-    FindOutputWindows(imp, n, kTolerances - 1, ofOutput);
-    Intersect(windows, ofOutput, common);
-    windows.swap(common);
-  }
   return windows;
 }
 

@@ -1,6 +1,5 @@
-// The VCO frequencies that can take part in a solution: those that have an M and a D, and a
-// divider for every output after output 0. They form narrow windows, which depend on the
-// request and the limits but not on the fudge.
+// The VCO frequencies that have an M and a D. They form narrow windows, which depend on the input
+// clock and the limits but not on the fudge.
 //
 // Example: 100 MHz in, VCO 600 to 1440 MHz, PFD 10 to 500 MHz. M = 6 and D = 1 give the window
 // 599.70 to 600.30 MHz, M = 61 and D = 10 the window 609.97 to 610.03 MHz; between windows no
@@ -32,13 +31,6 @@ using VcoWindows = std::vector<VcoWindow>;
 
 // The windows of a run whose VCO range is prepared and whose primitive is that of the process.
 VcoWindows FindVcoWindows(const VorkelImp& imp, const Run& run);
-
-// Those in which output n, not output 0, has a divider within a tolerance of that number. The
-// result is put into `windows`.
-void FindOutputWindows(const VorkelImp& imp, int n, int tolerance, VcoWindows& windows);
-
-// What two lists of windows have in common, put into `common`.
-void Intersect(const VcoWindows& a, const VcoWindows& b, VcoWindows& common);
 
 }  // namespace Ip::Pll
 

@@ -99,6 +99,56 @@ TYPED_TEST(SlotSetTest, ACopyIsASetOfItsOwn) {
   EXPECT_THAT(SlotsOf(copy), ElementsAre(TypeParam::kSize - 1));
 }
 
+TYPED_TEST(SlotSetTest, RemovesAnotherSet) {
+  typename TypeParam::Set set;
+  typename TypeParam::Set others;
+  for (const int slot : {0, 1, 63, 64, TypeParam::kSize - 1}) set.Insert(slot);
+  for (const int slot : {1, 2, 64, TypeParam::kSize - 1}) others.Insert(slot);
+  set.Remove(others);
+  EXPECT_THAT(SlotsOf(set), ElementsAre(0, 63));
+}
+
+TYPED_TEST(SlotSetTest, ARangeThatEndsBeforeItBeginsIsEmpty) {
+  typename TypeParam::Set set;
+  set.InsertRange(5, 4);
+  set.InsertRange(0, -1);
+  set.InsertRange(TypeParam::kSize, TypeParam::kSize - 1);
+  EXPECT_TRUE(set.IsEmpty());
+  set.Insert(4);
+  set.EraseRange(5, 4);
+  set.EraseRange(5, 4, [](int) { FAIL(); });
+  EXPECT_THAT(SlotsOf(set), ElementsAre(4));
+}
+
+TYPED_TEST(SlotSetTest, ErasesARangeAndTellsWhatWasThere) {
+  typename TypeParam::Set set;
+  for (const int slot : {3, 4, 9, 63, 64}) set.Insert(slot);
+  std::vector<int> erased;
+  set.EraseRange(4, 63, [&](int slot) { erased.push_back(slot); });
+  EXPECT_THAT(erased, ElementsAre(4, 9, 63));
+  EXPECT_THAT(SlotsOf(set), ElementsAre(3, 64));
+}
+
+TYPED_TEST(SlotSetTest, RangesBehaveAsTheirSlots) {
+  std::mt19937 random(54321);
+  std::uniform_int_distribution<int> anySlot(0, TypeParam::kSize - 1);
+  typename TypeParam::Set set;
+  std::set<int> model;
+  for (int step = 0; step < 500; ++step) {
+    const int first = anySlot(random);
+    const int last = anySlot(random);
+    if (random() % 2 == 0) {
+      set.InsertRange(first, last);
+      for (int slot = first; slot <= last; ++slot) model.insert(slot);
+    } else {
+      set.EraseRange(first, last);
+      for (int slot = first; slot <= last; ++slot) model.erase(slot);
+    }
+    ASSERT_EQ(SlotsOf(set), std::vector<int>(model.begin(), model.end()))
+        << first << " to " << last;
+  }
+}
+
 TYPED_TEST(SlotSetTest, BehavesAsASortedSet) {
   std::mt19937 random(12345);
   std::uniform_int_distribution<int> anySlot(0, TypeParam::kSize - 1);
