@@ -1,5 +1,6 @@
 #include "tests/compare/RequestGenerator.h"
 
+#include <algorithm>
 #include <cmath>
 #include <cstdlib>
 #include <vector>
@@ -202,6 +203,28 @@ Case DrawInfeasible(Random& random) {
   return drawn;
 }
 
+// A low output 0 has many candidates, and only those below the largest divider times the lowest
+// output serve that one. The others rank before them wherever they fit an output before it better.
+Case DrawLowOutput(Random& random) {
+  Case drawn;
+  DrawOptions(drawn.request, random);
+  drawn.request.count = random.Int(3, 5);
+  do {
+    drawn.limits = DrawLimits(drawn.request.prim, random);
+  } while (drawn.limits.vcoMax < 1.5 * drawn.limits.vcoMin);
+  const double lowest = std::max(drawn.limits.clkoutMin, drawn.limits.vcoMin / 128.0);
+  const int low = random.Int(1, drawn.request.count - 1);
+  std::vector<std::string> outputs = {Frequency(random.Real(5, 20), random)};
+  for (int n = 1; n < drawn.request.count; ++n) {
+    const bool isLow = n == low;
+    outputs.push_back(
+        Frequency(isLow ? lowest * random.Real(1, 1.4) : random.Pick(kOutputs), random));
+  }
+  drawn.request.outFreqs = Join(outputs);
+  DrawPhasesAndDutyCycles(drawn.request, random);
+  return drawn;
+}
+
 Case DrawWild(Random& random) {
   static const std::vector<std::string> odd = {
       "0",   "-0",  "-100", "1e308", "1e-308", "inf",  "-inf", "nan",  "0x64", "abc",
@@ -236,6 +259,7 @@ const char* KindName(Kind kind) {
     case Kind::kShifted: return "Shifted";
     case Kind::kRangeEnds: return "RangeEnds";
     case Kind::kInfeasible: return "Infeasible";
+    case Kind::kLowOutput: return "LowOutput";
     case Kind::kWild: return "Wild";
   }
   return "";
@@ -251,6 +275,7 @@ Case DrawCase(Kind kind, Random& random) {
     }
     case Kind::kRangeEnds: return DrawRangeEnds(random);
     case Kind::kInfeasible: return DrawInfeasible(random);
+    case Kind::kLowOutput: return DrawLowOutput(random);
     case Kind::kWild: return DrawWild(random);
   }
   return {};

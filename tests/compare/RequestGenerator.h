@@ -18,6 +18,7 @@ enum class Kind {
   kShifted,      // made from a setting, then output 0 moved: needs a fudge
   kRangeEnds,    // limits that lie exactly on what the request needs
   kInfeasible,   // nothing serves it: the search goes through all fudges
+  kLowOutput,    // an output so low that only the lower VCO frequencies serve it
   kWild,         // zero, negative, huge, inf, nan, text, short and long lists, odd counts
 };
 const char* KindName(Kind kind);

@@ -139,7 +139,8 @@ TEST_P(PassFilterProperty, LeavesOutNoPassThatSucceeds) {
 
 INSTANTIATE_TEST_SUITE_P(Kinds, PassFilterProperty,
                          testing::Values(Kind::kCommon, Kind::kConstructed, Kind::kShifted,
-                                         Kind::kRangeEnds, Kind::kInfeasible, Kind::kWild),
+                                         Kind::kRangeEnds, Kind::kInfeasible, Kind::kLowOutput,
+                                         Kind::kWild),
                          [](const testing::TestParamInfo<Kind>& parameter) {
                            return KindName(parameter.param);
                          });
