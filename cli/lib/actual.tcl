@@ -1,10 +1,9 @@
 # What the hardware makes of its settings: exact ratios of frequencies, phases and duty cycles.
 
 package provide vorkel::actual 1.1
+package require vorkel::hardware 1.1
 
 namespace eval ::vorkel::actual {
-  # M and the divider of output 0 can have eighths.
-  variable fraction 8
   # The steps of PHASE_SHIFT of a KRU in 360 degrees.
   variable shift_steps 255
   # The VCO has eight phases, so an output moves by eighths of a VCO period: degrees of a VCO
@@ -28,9 +27,8 @@ proc ::vorkel::actual::reduce {multiply divide} {
 
 # The ratio of an output of a PLL or a TSYN to the input. m and divider may have eighths.
 proc ::vorkel::actual::loopRatio {m d divider} {
-  variable fraction
-  return [reduce [expr {round($m * $fraction)}] \
-    [expr {round($d) * round($divider * $fraction)}]]
+  set parts $::vorkel::hardware::fraction
+  return [reduce [expr {round($m * $parts)}] [expr {round($d) * round($divider * $parts)}]]
 }
 
 # The ratio of a pin of a KRU to the input. `settings` is a dict of m, d, divide (that of CLKDV

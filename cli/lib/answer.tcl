@@ -77,7 +77,7 @@ proc ::vorkel::answer::solve {request primitive {variant {}}} {
     dict unset variant name
   }
   set request [dict merge $request $variant]
-  set refusal [Refusal $request $primitive]
+  set refusal [refusal $request $primitive]
   if {$refusal ne ""} {
     return [unsolved $primitive $name $refusal]
   }
@@ -133,7 +133,7 @@ proc ::vorkel::answer::Setting {settings name default} {
 }
 
 # Why a primitive cannot be asked at all, or "". The engine would leave out what is too much.
-proc ::vorkel::answer::Refusal {request primitive} {
+proc ::vorkel::answer::refusal {request primitive} {
   set inputs [llength [dict get $request inputs]]
   set outputs [llength [dict get $request outputs]]
   set most_inputs [dict get $::vorkel::engine::most_inputs $primitive]
@@ -178,6 +178,15 @@ proc ::vorkel::answer::isAsked {request what} {
   return 0
 }
 
+# The indices of the outputs of a request.
+proc ::vorkel::answer::indices {request} {
+  set indices {}
+  foreach output [dict get $request outputs] {
+    lappend indices [llength $indices]
+  }
+  return $indices
+}
+
 # An entry of each requested output, `default` for one that is empty.
 proc ::vorkel::answer::Column {request key default} {
   return [lmap output [dict get $request outputs] {
@@ -195,7 +204,7 @@ proc ::vorkel::answer::Evaluate {request job solution source variant} {
   set primitive [dict get $job primitive]
   set timing [::vorkel::timing::of $job $solution]
   set outputs {}
-  foreach output [${family}Outputs $request $job $solution] \
+  foreach output [${family}Outputs $request $solution] \
       asked [dict get $request outputs] jitter [dict get $timing jitters] {
     lappend outputs [Judge $request [dict merge [dict create index [llength $outputs]] $output \
       [dict create requested [dict get $asked freq] reqPhase [dict get $asked phase] \
@@ -258,16 +267,24 @@ proc ::vorkel::answer::Judge {request output} {
 proc ::vorkel::answer::allowance {key tolerance} {
   variable phase_tolerance
   variable duty_tolerance
-  return [dict get [dict create ppm $tolerance phaseError $phase_tolerance \
-    dutyError $duty_tolerance] $key]
+  switch -- $key {
+    ppm { return $tolerance }
+    phaseError { return $phase_tolerance }
+    dutyError { return $duty_tolerance }
+  }
+}
+
+# Whether the error under a key of an output is no larger than it may be.
+proc ::vorkel::answer::isAllowed {key error {tolerance ""}} {
+  variable rounding
+  return [expr {abs($error) <= [allowance $key $tolerance] + $rounding}]
 }
 
 # The errors of an output that are larger than they may be.
 proc ::vorkel::answer::Offs {output tolerance} {
-  variable rounding
   return [lmap key {ppm phaseError dutyError} {
     set error [dict get $output $key]
-    if {$error eq "" || abs($error) <= [allowance $key $tolerance] + $rounding} continue
+    if {$error eq "" || [isAllowed $key $error $tolerance]} continue
     set key
   }]
 }
@@ -287,7 +304,7 @@ proc ::vorkel::answer::LoopSettings {request solution} {
 
 # The outputs of a PLL or a TSYN. A phase and a duty cycle that the engine has chosen are told
 # in three decimals; the step that they mean is taken.
-proc ::vorkel::answer::LoopOutputs {request job solution} {
+proc ::vorkel::answer::LoopOutputs {request solution} {
   set input [lindex [dict get $request inputs] 0]
   set m [dict get $solution m]
   set first [dict get [lindex [dict get $solution outputs] 0] divider]
@@ -341,7 +358,7 @@ proc ::vorkel::answer::KruSettings {request solution} {
 }
 
 # The outputs of a KRU.
-proc ::vorkel::answer::KruOutputs {request job solution} {
+proc ::vorkel::answer::KruOutputs {request solution} {
   set input [lindex [dict get $request inputs] 0]
   set shift [Setting $solution phaseShift 0]
   return [lmap pin [dict get $solution pins] {

@@ -2,7 +2,7 @@
 
 package provide vorkel::best 1.1
 package require vorkel::answer 1.1
-package require vorkel::colour 1.1
+package require vorkel::cells 1.1
 package require vorkel::engine 1.1
 package require vorkel::grid 1.1
 package require vorkel::help 1.1
@@ -14,14 +14,13 @@ package require vorkel::report 1.1
 package require vorkel::table 1.1
 
 namespace eval ::vorkel::best {
+  namespace path ::vorkel::cells
   # Options beside those of a request (see options.tcl).
   variable options {
-    --front N         "trade-offs to show, 6 by default"
+    --front N "trade-offs to show, the best settings as the first; 6 by default"
   }
   variable default_front 6
   variable most_front 1000
-  # How many steps of the search a run of the engine counts as where progress is shown.
-  variable run_steps 10
   # What the answers are.
   variable best_variant "best of the grid"
   variable tradeoff_variant "trade-off"
@@ -31,15 +30,12 @@ namespace eval ::vorkel::best {
 # is that of the best settings.
 proc ::vorkel::best::run {words} {
   variable options
-  variable best_variant
   variable tradeoff_variant
   set call [::vorkel::options::request $words $options]
   set request [dict get $call request]
   set primitives [Primitives $call]
   set most [Most [dict get $call given]]
-  if {[dict get $call file] ne ""} {
-    ::vorkel::colour::off
-  }
+  ::vorkel::output::into [dict get $call file]
   lassign [Search $request $primitives] points engine
   set all [::vorkel::grid::order $request [concat {*}[dict values $points]]]
   if {[llength $all] == 0} {
@@ -70,10 +66,7 @@ proc ::vorkel::best::run {words} {
 
 # The primitives to search: those with a grid of M, D and dividers.
 proc ::vorkel::best::Primitives {call} {
-  set primitives [lmap primitive [dict get $call primitives] {
-    if {[::vorkel::engine::family $primitive] ne "Loop"} continue
-    set primitive
-  }]
+  set primitives [::vorkel::engine::ofFamily Loop [dict get $call primitives]]
   if {[llength $primitives] > 0} {
     return $primitives
   }
@@ -91,7 +84,7 @@ proc ::vorkel::best::Most {given} {
   variable most_front
   set text [::vorkel::options::get $given --front $default_front]
   if {![regexp {^[0-9]{1,4}$} $text] || [scan $text %d] > $most_front} {
-    throw {VORKEL USAGE} "--front: \"$text\" must be a whole number from 0 to $most_front"
+    throw {VORKEL USAGE} "--front: \"[::vorkel::options::shown $text]\" must be a whole number from 0 to $most_front"
   }
   return [scan $text %d]
 }
@@ -99,7 +92,7 @@ proc ::vorkel::best::Most {given} {
 # The points of each primitive, a dict from primitive to list, the best first; and, if there are
 # any, what the engine has for each, a list. A terminal sees how far this has come.
 proc ::vorkel::best::Search {request primitives} {
-  variable run_steps
+  set run_steps $::vorkel::grid::run_steps
   set steps [expr {[::vorkel::answer::runs $request $primitives] * $run_steps}]
   foreach primitive $primitives {
     incr steps [::vorkel::grid::steps $request $primitive]
@@ -140,21 +133,7 @@ proc ::vorkel::best::BestOfEach {request points winner} {
 proc ::vorkel::best::Unsolved {call primitives} {
   throw {VORKEL UNSOLVED} "no setting of [join $primitives { or }] of\
     [dict get $call request device] has everything in the device's ranges\nhint:\
-    [::vorkel::help::command explain [Plain [dict get $call words]]]"
-}
-
-# The words without the options that only this command has.
-proc ::vorkel::best::Plain {words} {
-  set plain {}
-  while {[llength $words] > 0} {
-    set words [lassign $words word]
-    if {$word eq "--front"} {
-      set words [lrange $words 1 end]
-    } elseif {![string match --front=* $word]} {
-      lappend plain $word
-    }
-  }
-  return $plain
+    [::vorkel::help::command explain [dict get $call words]]"
 }
 
 # The report. `left` is how many trade-offs there are beside those that are shown.
@@ -181,20 +160,17 @@ proc ::vorkel::best::Beside {answers} {
   set columns {{left source} {left primitive} {left loop} {right M} {right D} {right {VCO MHz}}
     {right {worst ppm}} {right {jitter ps}} {left mark}}
   set rows {}
-  set roles {}
   foreach answer $answers {
     set source [dict get $answer source]
     if {![dict get $answer solved]} {
       lappend rows [list $source [dict get $answer primitive] - - - - - - none]
-      lappend roles off
       continue
     }
     lappend rows [list $source [dict get $answer primitive] [dict get $answer bandwidth] \
-      {*}[Loop $answer] [format %.6g [dict get $answer settings VCO]] [Ppm $answer] \
-      [Jitter $answer] [Mark $answer]]
-    lappend roles [Role $answer [expr {[llength $rows] == 1}]]
+      {*}[Loop $answer] [vco $answer] [ppm $answer] \
+      [jitter $answer] [mark $answer]]
   }
-  return [::vorkel::table::render $columns $rows $roles]
+  return [::vorkel::table::render $columns $rows [roles $answers]]
 }
 
 # The trade-offs as text: the winner and those behind it.
@@ -223,45 +199,20 @@ proc ::vorkel::best::Tradeoffs {answers} {
       ::vorkel::numbers::short [dict get $output divider] 3
     }]
     lappend rows [list [dict get $answer primitive] [dict get $answer bandwidth] \
-      {*}[Loop $answer] [Ppm $answer] [Jitter $answer] [join $dividers ,] [Mark $answer]]
+      {*}[Loop $answer] [ppm $answer] [jitter $answer] \
+      [join $dividers ,] [mark $answer]]
   }
-  set roles [lmap answer $answers {Role $answer 0}]
   set widths [lmap line [split [::vorkel::table::render $columns $rows] \n] {string length $line}]
   if {[tcl::mathfunc::max {*}$widths] > $::vorkel::table::line_width} {
     set columns [lrange $columns 0 end-1]
     set rows [lmap row $rows {lrange $row 0 end-1}]
   }
-  return [::vorkel::table::render $columns $rows $roles]
+  return [::vorkel::table::render $columns $rows [roles $answers]]
 }
 
 proc ::vorkel::best::Loop {answer} {
   return [list [::vorkel::numbers::short [dict get $answer settings M] 3] \
     [dict get $answer settings D]]
-}
-
-# The largest error of a frequency, in at most nine characters.
-proc ::vorkel::best::Ppm {answer} {
-  set ppm [dict get $answer worstPpm]
-  if {$ppm >= 1e6} {
-    return [format %.3g $ppm]
-  }
-  return [::vorkel::numbers::fixed $ppm 2]
-}
-
-proc ::vorkel::best::Jitter {answer} {
-  set jitter [dict get $answer maxJitter]
-  return [expr {$jitter eq "" ? "-" : [::vorkel::numbers::fixed $jitter 3]}]
-}
-
-proc ::vorkel::best::Mark {answer} {
-  return [expr {[dict get $answer within] ? "" : "OFF"}]
-}
-
-proc ::vorkel::best::Role {answer first} {
-  if {![dict get $answer within]} {
-    return off
-  }
-  return [expr {$first ? "good" : ""}]
 }
 
 # What makes the winner the best.
@@ -298,8 +249,8 @@ proc ::vorkel::best::Gain {winner answers} {
   set least [dict get $winner worstPpm]
   set name [dict get $engine primitive]
   if {$reached > $least + 0.005} {
-    return "The engine's best answer, of a $name, is [Ppm $engine] ppm off, this one\
-      [Ppm $winner] ppm."
+    return "The engine's best answer, of a $name, is [ppm $engine] ppm off, this\
+      one [ppm $winner] ppm."
   }
   if {[dict get $engine within] == [dict get $winner within] && $reached <= $least + 0.005} {
     return "The engine's best answer, of a $name, has frequencies as near as that."
@@ -312,6 +263,5 @@ proc ::vorkel::best::Hint {call winner} {
   if {[dict get $winner within]} {
     return ""
   }
-  return "hint: what would work: [::vorkel::help::command explain \
-    [Plain [dict get $call words]]]\n"
+  return "hint: what would work: [::vorkel::help::command explain [dict get $call words]]\n"
 }

@@ -74,7 +74,7 @@ proc ::vorkel::catalogue::Resolve {device rest} {
   set grade [Member $description grade $grade [expr {$dash ne ""}]]
   set limits [dict get $description limits $grade]
   return [dict create device $device package $package grade $grade part "$device$package-$grade" \
-    primitives [Primitives $limits] limits $limits description $description]
+    primitives [primitivesOf $limits] limits $limits description $description]
 }
 
 # The package or grade (`kind`) of a device: the one named, or the default. A device may do
@@ -109,7 +109,7 @@ proc ::vorkel::catalogue::primitives {} {
 }
 
 # The primitives whose limits are all there, in the host's order.
-proc ::vorkel::catalogue::Primitives {limits} {
+proc ::vorkel::catalogue::primitivesOf {limits} {
   return [lmap primitive [primitives] {
     set missing [lmap keyword [keywordsOf $primitive] {
       if {[dict exists $limits [lindex $keyword 0]]} continue

@@ -12,7 +12,6 @@ package require vorkel::output 1.1
 package require vorkel::table 1.1
 
 namespace eval ::vorkel::check {
-  variable options {}
   variable good 0
   variable bad 2
   variable most_mistakes 20
@@ -40,12 +39,9 @@ namespace eval ::vorkel::check {
 
 # Writes what the file that is named gives a device; its mistakes go to standard error.
 proc ::vorkel::check::run {words} {
-  variable options
   variable good
   variable bad
-  set given [::vorkel::options::parse $options $words]
-  ::vorkel::options::refuseOperands $given 1
-  set operands [dict get $given operands]
+  set operands [::vorkel::options::operands $words 1]
   if {[llength $operands] == 0} {
     throw {VORKEL USAGE} "the device file is missing: check FILE, such as check my_device.toml"
   }
@@ -320,7 +316,7 @@ proc ::vorkel::check::Warnings {path grade limits lines} {
     append text [::vorkel::table::prose "$place: warning: " "grade $grade: $low,\
       [dict get $limits $low], is above $high, [dict get $limits $high]: there is no $what"]
   }
-  if {[llength [::vorkel::catalogue::Primitives $limits]] == 0} {
+  if {[llength [::vorkel::catalogue::primitivesOf $limits]] == 0} {
     append text [::vorkel::table::prose "$path: warning: " "grade $grade has all limits of no\
       primitive: nothing can be planned for it"]
   }

@@ -29,7 +29,7 @@ proc ::vorkel::colour::paint {role text} {
   return $sequence$text[::term::ansi::code::ctrl::sda_reset]
 }
 
-# Text for a file has no colour, wherever standard output goes.
+# From here on there is no colour, wherever standard output goes.
 proc ::vorkel::colour::off {} {
   variable wanted
   set wanted 0

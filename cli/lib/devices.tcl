@@ -6,7 +6,6 @@ package require vorkel::options 1.1
 package require vorkel::table 1.1
 
 namespace eval ::vorkel::devices {
-  variable options {}
   variable label_width 10
   # So many grades stand beside each other.
   variable most_grades 5
@@ -15,10 +14,7 @@ namespace eval ::vorkel::devices {
 # Answers the list of all devices, or all limits of the device, or of the grade, that a part
 # name, or its beginning, stands for.
 proc ::vorkel::devices::run {words} {
-  variable options
-  set given [::vorkel::options::parse $options $words]
-  ::vorkel::options::refuseOperands $given 1
-  set operands [dict get $given operands]
+  set operands [::vorkel::options::operands $words 1]
   if {[llength $operands] == 0} {
     return [All]
   }
@@ -97,7 +93,7 @@ proc ::vorkel::devices::One {part} {
     append text [::vorkel::table::labelled $label_width $label $value]
   }
   set there [concat {*}[lmap grade $grades {
-    ::vorkel::catalogue::Primitives [dict get $limits $grade]
+    ::vorkel::catalogue::primitivesOf [dict get $limits $grade]
   }]]
   foreach primitive [::vorkel::catalogue::primitives] {
     if {$primitive ni $there} continue

@@ -39,6 +39,14 @@ proc ::vorkel::engine::family {primitive} {
   return [expr {[string match KRU_* $primitive] ? "Kru" : "Loop"}]
 }
 
+# Those of some primitives that are of a family.
+proc ::vorkel::engine::ofFamily {family primitives} {
+  return [lmap primitive $primitives {
+    if {[family $primitive] ne $family} continue
+    set primitive
+  }]
+}
+
 # Solves a request (see request.tcl). Answers a dict; LoopChosen and KruChosen tell what is in
 # it. Without a configuration it throws {VORKEL UNSOLVED} with the engine's sentence; a device
 # whose limits cannot be read is wrong usage.

@@ -1,5 +1,5 @@
 # Which limits of a KRU_SP or a KRU_CLKGEN stand in the way of a request. The findings are those
-# of explain_loop.tcl.
+# of explain_text.tcl.
 
 package provide vorkel::explain_kru 1.1
 package require vorkel::actual 1.1
@@ -7,9 +7,12 @@ package require vorkel::answer 1.1
 package require vorkel::catalogue 1.1
 package require vorkel::explain_loop 1.1
 package require vorkel::explain_pins 1.1
+package require vorkel::explain_text 1.1
+package require vorkel::explain_walk 1.1
 package require vorkel::numbers 1.1
 
 namespace eval ::vorkel::explain_kru {
+  namespace path ::vorkel::explain_text
   # The pins that have ranges of their own, and those that a KRU_CLKGEN has for output 0.
   variable ranged {KRU_SP {CLK0 CLK90 CLK2X CLKDV CLKFX} KRU_CLKGEN CLKFX}
 }
@@ -37,7 +40,7 @@ proc ::vorkel::explain_kru::Part {request indices} {
 }
 
 # Whether the engine has an answer within the tolerance.
-proc ::vorkel::explain_kru::works {request primitive} {
+proc ::vorkel::explain_kru::Works {request primitive} {
   foreach answer [::vorkel::answer::all $request [list $primitive]] {
     if {[dict get $answer within]} {
       return 1
@@ -49,7 +52,7 @@ proc ::vorkel::explain_kru::works {request primitive} {
 # What pins make within the tolerance of a frequency, whatever their ranges: lists of the
 # distance, the frequency, the pin and how it is made, the nearest first.
 proc ::vorkel::explain_kru::Fitting {request primitive frequency} {
-  set allowed [expr {$frequency * ([dict get $request tolerance] * 1e-6 + 1e-12)}]
+  set allowed [expr {$frequency * [::vorkel::explain_walk::allowed $request]}]
   set rows {}
   foreach {place value} [::vorkel::explain_pins::places $request $primitive $frequency] {
     set distance [expr {abs($value - $frequency)}]
@@ -60,7 +63,7 @@ proc ::vorkel::explain_kru::Fitting {request primitive frequency} {
   return [lsort -real -index 0 $rows]
 }
 
-proc ::vorkel::explain_kru::inRange {request primitive pin frequency} {
+proc ::vorkel::explain_kru::IsInRange {request primitive pin frequency} {
   lassign [::vorkel::explain_pins::pinRange $request $primitive $pin] lowest highest
   return [expr {$frequency >= $lowest * (1 - 1e-9) && $frequency <= $highest * (1 + 1e-9)}]
 }
@@ -68,7 +71,7 @@ proc ::vorkel::explain_kru::inRange {request primitive pin frequency} {
 # Those of some pins whose range holds a frequency.
 proc ::vorkel::explain_kru::Holding {request primitive pins frequency} {
   return [lmap pin $pins {
-    if {![inRange $request $primitive $pin $frequency]} continue
+    if {![IsInRange $request $primitive $pin $frequency]} continue
     set pin
   }]
 }
@@ -79,7 +82,7 @@ proc ::vorkel::explain_kru::Alone {request primitive output index} {
   if {$clkgen && $index > 0} {
     return [Follower $request $output $index]
   }
-  if {[works [Part $request $index] $primitive]} {
+  if {[Works [Part $request $index] $primitive]} {
     return {}
   }
   variable ranged
@@ -115,7 +118,7 @@ proc ::vorkel::explain_kru::Alone {request primitive output index} {
   }
   set plain [Part $request $index]
   dict set plain outputs [list [dict replace $output phase "" duty ""]]
-  if {![works $plain $primitive]} {
+  if {![Works $plain $primitive]} {
     foreach row $fitting {
       if {[lindex $row 2] in $pins} break
     }
@@ -142,21 +145,21 @@ proc ::vorkel::explain_kru::NoRatio {request primitive index} {
     set pins "CLK0 is the input, CLK2X doubles it, CLKDV divides it by 2 to 17, $pins; the input\
       can be halved before that"
   }
-  return [::vorkel::explain_loop::Finding "pin frequency" $index "no pin makes\
-    [::vorkel::explain_loop::MHz $frequency] MHz: $pins.\
-    [::vorkel::explain_loop::NearestMade $request $primitive $index]"]
+  return [finding "pin frequency" $index "no pin makes\
+    [number $frequency] MHz: $pins.\
+    [::vorkel::explain_loop::nearestMade $request $primitive $index]"]
 }
 
 # The frequency is in the range of none of some pins. `whose` says what these are.
 proc ::vorkel::explain_kru::NoRange {request primitive frequency index pins whose} {
   set ranges [lmap pin $pins {
     lassign [::vorkel::explain_pins::pinRange $request $primitive $pin] lowest highest
-    string cat "$pin only from [::vorkel::explain_loop::MHz $lowest] to\
-      [::vorkel::explain_loop::MHz $highest] MHz"
+    string cat "$pin only from [number $lowest] to\
+      [number $highest] MHz"
   }]
-  set text "[::vorkel::explain_loop::MHz $frequency] MHz is out of the range of $whose:\
+  set text "[number $frequency] MHz is out of the range of $whose:\
     [join $ranges {; }]"
-  return [::vorkel::explain_loop::Finding "pin range" $index \
+  return [finding "pin range" $index \
     $text[Narrowed $request $primitive $frequency $pins]]
 }
 
@@ -167,11 +170,11 @@ proc ::vorkel::explain_kru::Narrowed {request primitive frequency pins} {
   }
   foreach pin $pins {
     lassign [::vorkel::catalogue::pinRange $pin 0 [dict get $request limits]] lowest highest
-    lassign [dict get $::vorkel::explain_pins::searched $pin] low high
+    lassign [dict get $::vorkel::catalogue::clkgen_ranges $pin] low high
     if {($frequency > $high && $highest > $high) || ($frequency < $low && $lowest < $low)} {
-      return ". The device has $pin from [::vorkel::explain_loop::MHz $lowest] to\
-        [::vorkel::explain_loop::MHz $highest] MHz, but the engine looks for a $primitive only\
-        from [::vorkel::explain_loop::MHz $low] to [::vorkel::explain_loop::MHz $high] MHz"
+      return ". The device has $pin from [number $lowest] to\
+        [number $highest] MHz, but the engine looks for a $primitive only\
+        from [number $low] to [number $high] MHz"
     }
   }
   return ""
@@ -180,19 +183,19 @@ proc ::vorkel::explain_kru::Narrowed {request primitive frequency pins} {
 # The engine does not use the tolerance that is allowed.
 proc ::vorkel::explain_kru::Inexact {primitive frequency index row} {
   lassign $row distance value pin how
-  return [::vorkel::explain_loop::Finding "the engine" $index "$pin could make\
-    [::vorkel::explain_loop::MHz $value] MHz ($how,\
-    [::vorkel::explain_loop::change $value $frequency]), but the engine\
+  return [finding "the engine" $index "$pin could make\
+    [number $value] MHz ($how,\
+    [change $value $frequency]), but the engine\
     takes settings of a $primitive only where they make the frequency almost exactly"]
 }
 
 # What a pin that could make an output has for phases.
 proc ::vorkel::explain_kru::NoPhase {request primitive output index pins} {
-  set frequency [::vorkel::explain_loop::MHz [dict get $output freq]]
+  set frequency [number [dict get $output freq]]
   set phase [dict get $output phase]
   if {$primitive eq "KRU_CLKGEN"} {
-    return [::vorkel::explain_loop::Finding "pin phase" $index "output 0 is on CLKFX, at 0 degrees\
-      whatever is asked for; [::vorkel::explain_loop::MHz $phase] degrees is for other outputs, of\
+    return [finding "pin phase" $index "output 0 is on CLKFX, at 0 degrees\
+      whatever is asked for; [number $phase] degrees is for other outputs, of\
       which CLKFX180 has 180"]
   }
   set known {CLK0 {0 180} CLK90 {90 270} CLK2X {0 180} CLKDV 0 CLKFX {0 180}}
@@ -204,29 +207,29 @@ proc ::vorkel::explain_kru::NoPhase {request primitive output index pins} {
     if {![dict get $answer solved]} continue
     set made [lindex [dict get $answer outputs] 0]
     if {"phaseError" in [dict get $made offs]} {
-      return [::vorkel::explain_loop::Finding "phase grid" $index "PHASE_SHIFT moves all pins in\
+      return [finding "phase grid" $index "PHASE_SHIFT moves all pins in\
         steps of 360 / $::vorkel::actual::shift_steps =\
         [::vorkel::numbers::short [expr {360.0 / $::vorkel::actual::shift_steps}] 3] degrees: next\
-        to [::vorkel::explain_loop::MHz $phase] degrees it makes\
+        to [number $phase] degrees it makes\
         [::vorkel::numbers::short [dict get $made phase] 3], off by\
         [::vorkel::numbers::short [expr {abs([dict get $made phaseError])}] 3] with\
         $::vorkel::answer::phase_tolerance allowed"]
     }
   }
-  return [::vorkel::explain_loop::Finding "pin phase" $index "the pins that make $frequency MHz\
-    have no phase of [::vorkel::explain_loop::MHz $phase] degrees: [join $texts {; }]"]
+  return [finding "pin phase" $index "the pins that make $frequency MHz\
+    have no phase of [number $phase] degrees: [join $texts {; }]"]
 }
 
 # Why an output of a KRU_CLKGEN cannot follow output 0, if so.
 proc ::vorkel::explain_kru::Follower {request output index} {
   set fx_divides $::vorkel::explain_pins::fx_divides
-  if {[works [Part $request [list 0 $index]] KRU_CLKGEN]} {
+  if {[Works [Part $request [list 0 $index]] KRU_CLKGEN]} {
     return {}
   }
   set frequency [dict get $output freq]
   set first [dict get [lindex [dict get $request outputs] 0] freq]
-  set text "[::vorkel::explain_loop::MHz $frequency] MHz"
-  set allowed [expr {[dict get $request tolerance] * 1e-6 + 1e-12}]
+  set text "[number $frequency] MHz"
+  set allowed [::vorkel::explain_walk::allowed $request]
   set divide ""
   foreach candidate [list 1 {*}$fx_divides] {
     if {abs($first / $candidate / $frequency - 1) <= $allowed} {
@@ -234,16 +237,16 @@ proc ::vorkel::explain_kru::Follower {request output index} {
     }
   }
   if {$divide eq ""} {
-    return [list [::vorkel::explain_loop::Finding "pin frequency" $index "$text is neither that of\
-      output 0, [::vorkel::explain_loop::MHz $first] MHz, for CLKFX and CLKFX180, nor that divided\
+    return [list [finding "pin frequency" $index "$text is neither that of\
+      output 0, [number $first] MHz, for CLKFX and CLKFX180, nor that divided\
       by [join [lrange $fx_divides 0 end-1] {, }] or [lindex $fx_divides end] for CLKFXDV"]]
   }
   # Whatever else there is may be for want of output 0.
-  if {![works [Part $request 0] KRU_CLKGEN]} {
+  if {![Works [Part $request 0] KRU_CLKGEN]} {
     return {}
   }
   set pin [expr {$divide == 1 ? "CLKFX" : "CLKFXDV"}]
-  if {![inRange $request KRU_CLKGEN $pin $frequency]} {
+  if {![IsInRange $request KRU_CLKGEN $pin $frequency]} {
     return [list [NoRange $request KRU_CLKGEN $frequency $index [list $pin] \
       "the pin that could make it"]]
   }
@@ -251,54 +254,51 @@ proc ::vorkel::explain_kru::Follower {request output index} {
   if {$phase ne "" && $phase != 0} {
     set known [expr {$divide == 1 ? "CLKFX has 0 degrees and CLKFX180 180" :
       "CLKFXDV has 0 degrees only"}]
-    return [list [::vorkel::explain_loop::Finding "pin phase" $index "$text is a frequency of $pin,\
-      but [::vorkel::explain_loop::MHz $phase] degrees is none of its phases: $known"]]
+    return [list [finding "pin phase" $index "$text is a frequency of $pin,\
+      but [number $phase] degrees is none of its phases: $known"]]
   }
-  return [list [::vorkel::explain_loop::Finding "the engine" $index "$pin could make $text, but the\
+  return [list [finding "the engine" $index "$pin could make $text, but the\
     engine finds no M and D for it that are near enough"]]
 }
 
 # Outputs that are possible each by itself, or beside output 0.
 proc ::vorkel::explain_kru::Together {request primitive} {
-  set indices {}
-  foreach output [dict get $request outputs] {
-    lappend indices [llength $indices]
-  }
-  if {[works [Part $request $indices] $primitive]} {
+  set indices [::vorkel::answer::indices $request]
+  if {[Works [Part $request $indices] $primitive]} {
     return {}
   }
   foreach index $indices {
     set others [lsearch -all -inline -not -exact $indices $index]
     # Whatever follows output 0 of a KRU_CLKGEN is nothing without it.
     if {$primitive eq "KRU_CLKGEN" && $index == 0} continue
-    if {[llength $others] > 0 && ![works [Part $request $others] $primitive]} {
+    if {[llength $others] > 0 && ![Works [Part $request $others] $primitive]} {
       set indices $others
     }
   }
   if {$primitive eq "KRU_CLKGEN"} {
-    return [list [::vorkel::explain_loop::Finding "outputs together" $indices "each can be made\
+    return [list [finding "outputs together" $indices "each can be made\
       beside output 0, but one M, one D and one divide of CLKFXDV must serve them all"]]
   }
   set plain $request
   dict set plain outputs [lmap index $indices {
     dict replace [lindex [dict get $request outputs] $index] phase "" duty ""
   }]
-  set phases [works $plain $primitive]
+  set phases [Works $plain $primitive]
   set offsets [lsort -unique [lmap index $indices {
     set phase [Phase [lindex [dict get $request outputs] $index]]
     ::vorkel::numbers::short [expr {fmod($phase, 90.0)}] 3
   }]]
   if {$phases && [llength $offsets] > 1} {
-    return [list [::vorkel::explain_loop::Finding "pin phase" $indices "one PHASE_SHIFT moves all\
+    return [list [finding "pin phase" $indices "one PHASE_SHIFT moves all\
       outputs, on top of the 0, 90, 180 and 270 degrees of the pins; these phases would need\
       [join $offsets { and }] degrees of it"]]
   }
   if {$phases} {
-    return [list [::vorkel::explain_loop::Finding "pin phase" $indices "no pins have these phases\
+    return [list [finding "pin phase" $indices "no pins have these phases\
       together: beside one PHASE_SHIFT for all, the pins at the input frequency have 0, 90, 180 and\
       270 degrees, CLK2X and CLKFX 0 and 180, CLKDV 0"]]
   }
-  return [list [::vorkel::explain_loop::Finding "outputs together" $indices "each can be made\
+  return [list [finding "outputs together" $indices "each can be made\
     alone, but one CLKIN_DIVIDE_BY_2, one M and D of CLKFX and one divide of CLKDV must serve\
     them all"]]
 }

@@ -15,6 +15,7 @@ package require vorkel::catalogue 1.1
 package require vorkel::engine 1.1
 package require vorkel::explain_pins 1.1
 package require vorkel::explain_walk 1.1
+package require vorkel::hardware 1.1
 
 namespace eval ::vorkel::explain_ladder {
   # What differs by less than this part is the same but for the rounding of the arithmetic.
@@ -120,7 +121,7 @@ proc ::vorkel::explain_ladder::LoopRungs {search} {
 proc ::vorkel::explain_ladder::LoopNext {search place} {
   set divider [lindex $place 3]
   set fractional [dict get $search fractional]
-  set step [expr {$fractional ? 1.0 / $::vorkel::actual::fraction : 1}]
+  set step [expr {$fractional ? 1.0 / $::vorkel::hardware::fraction : 1}]
   if {[dict get $search side] eq "below"} {
     set divider [AtLeast [expr {$divider + $step}] $fractional]
   } else {
@@ -138,26 +139,26 @@ proc ::vorkel::explain_ladder::AtLeast {quotient fractional} {
   if {!$fractional || $quotient <= 2} {
     return [expr {ceil($quotient)}]
   }
-  return [expr {ceil($quotient * $::vorkel::actual::fraction) / $::vorkel::actual::fraction}]
+  return [expr {ceil($quotient * $::vorkel::hardware::fraction) / $::vorkel::hardware::fraction}]
 }
 
 # The largest divider that is no larger than a quotient; 0 when there is none.
 proc ::vorkel::explain_ladder::AtMost {quotient fractional} {
-  set most $::vorkel::explain_walk::largest_divider
+  set most $::vorkel::hardware::largest_divider
   if {$quotient >= $most} {
     return $most
   }
   if {!$fractional || $quotient < 2} {
     return [expr {floor($quotient)}]
   }
-  return [expr {floor($quotient * $::vorkel::actual::fraction) / $::vorkel::actual::fraction}]
+  return [expr {floor($quotient * $::vorkel::hardware::fraction) / $::vorkel::hardware::fraction}]
 }
 
 # The rung of a VCO at a divider, or the next one of the same VCO that has the phase and the duty
 # cycle; "" when the VCO has none in the range.
 proc ::vorkel::explain_ladder::LoopRung {search pair divider} {
   set step [expr {[dict get $search side] eq "below" ? 1 : -1}]
-  while {$divider >= 1 && $divider <= $::vorkel::explain_walk::largest_divider} {
+  while {$divider >= 1 && $divider <= $::vorkel::hardware::largest_divider} {
     set value [expr {[lindex $pair 0] / $divider}]
     if {![IsBetween $value [dict get $search lowest] [dict get $search highest]]} {
       return ""

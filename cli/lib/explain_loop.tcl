@@ -1,29 +1,21 @@
 # Which limits of a PLL or a TSYN stand in the way of a request.
-#
-# A finding is a dict: kind (see explain.tcl), outputs (a list of indices, empty when it is the
-# input clocks'), and text, a sentence with the numbers.
+# A finding is a dict; explain_text.tcl tells what is in it.
 
 package provide vorkel::explain_loop 1.1
+package require vorkel::actual 1.1
+package require vorkel::answer 1.1
 package require vorkel::catalogue 1.1
 package require vorkel::explain_ladder 1.1
+package require vorkel::explain_text 1.1
 package require vorkel::explain_walk 1.1
+package require vorkel::hardware 1.1
 package require vorkel::numbers 1.1
+package require vorkel::options 1.1
 
 namespace eval ::vorkel::explain_loop {
+  namespace path ::vorkel::explain_text
   # As many VCO frequencies are told one by one.
   variable most_named 4
-}
-
-proc ::vorkel::explain_loop::Finding {kind outputs text} {
-  return [dict create kind $kind outputs $outputs text $text]
-}
-
-# A number in up to six decimals, or as it is short when that would be very long or nothing.
-proc ::vorkel::explain_loop::MHz {value} {
-  if {abs($value) >= 1e9 || ($value != 0 && abs($value) < 1e-6)} {
-    return [format %.6g $value]
-  }
-  return [::vorkel::numbers::short $value 6]
 }
 
 # The findings; none when there are settings for all that is asked.
@@ -63,12 +55,13 @@ proc ::vorkel::explain_loop::Inputs {request primitive} {
   foreach input $inputs {
     lassign [::vorkel::explain_walk::dividersOf $input $pfd] first last
     if {$first > $last} {
-      lappend findings [Finding "PFD range" {} "the PFD runs at the input divided by D, and must\
-        have [MHz [lindex $pfd 0]] to [MHz [lindex $pfd 1]] MHz$narrow: [PfdMiss $input $pfd]"]
+      lappend findings [finding "PFD range" {} "the PFD runs at the input divided by D, and must\
+        have [number [lindex $pfd 0]] to [number [lindex $pfd 1]] MHz$narrow:\
+        [PfdMiss $input $pfd]"]
     } elseif {[llength [::vorkel::explain_walk::pairs $request $primitive [list $input]]] == 0} {
-      lappend findings [Finding "VCO range" {} "the VCO must have [MHz [lindex $vco 0]] to\
-        [MHz [lindex $vco 1]] MHz, and [MHz $input] MHz x M / D, with M up to\
-        $::vorkel::explain_walk::largest_m and D from $first to $last, never has"]
+      lappend findings [finding "VCO range" {} "the VCO must have [number [lindex $vco 0]] to\
+        [number [lindex $vco 1]] MHz, and [number $input] MHz x M / D, with M up to\
+        $::vorkel::hardware::largest_m and D from $first to $last, never has"]
     }
   }
   if {[llength $findings] == 0 && [llength [::vorkel::explain_walk::pairs $request $primitive \
@@ -81,14 +74,14 @@ proc ::vorkel::explain_loop::Inputs {request primitive} {
 proc ::vorkel::explain_loop::PfdMiss {input range} {
   lassign $range lowest highest
   if {$input < $lowest} {
-    return "even with D = 1 it has only the [MHz $input] MHz of the input"
+    return "even with D = 1 it has only the [number $input] MHz of the input"
   }
-  set most $::vorkel::explain_walk::largest_d
+  set most $::vorkel::hardware::largest_d
   if {$input / double($most) > $highest} {
-    return "even with D = $most it has [MHz [expr {$input / double($most)}]] MHz from an input of\
-      [MHz $input] MHz"
+    return "even with D = $most it has [number [expr {$input / double($most)}]] MHz from an input\
+      of [number $input] MHz"
   }
-  return "no whole D divides the [MHz $input] MHz of the input into that"
+  return "no whole D divides the [number $input] MHz of the input into that"
 }
 
 # Two input clocks of which each would do.
@@ -96,16 +89,17 @@ proc ::vorkel::explain_loop::Apart {inputs vco pfd} {
   lassign [lsort -real $inputs] slow fast
   set times [expr {double($fast) / $slow}]
   set span [expr {[lindex $vco 1] / [lindex $vco 0]}]
-  set text "the same M and D serve both input clocks. [MHz $fast] MHz is\
-    [::vorkel::numbers::short $times 3] times [MHz $slow] MHz"
+  set text "the same M and D serve both input clocks. [number $fast] MHz is\
+    [::vorkel::numbers::short $times 3] times [number $slow] MHz"
   if {$times > $span} {
-    append text ", but the highest VCO, [MHz [lindex $vco 1]] MHz, is only\
-      [::vorkel::numbers::short $span 3] times the lowest, [MHz [lindex $vco 0]] MHz"
+    append text ", but the highest VCO, [number [lindex $vco 1]] MHz, is only\
+      [::vorkel::numbers::short $span 3] times the lowest, [number [lindex $vco 0]] MHz"
   } else {
-    append text "; no M and D keep the VCO in [MHz [lindex $vco 0]] to [MHz [lindex $vco 1]] MHz\
-      and the PFD in [MHz [lindex $pfd 0]] to [MHz [lindex $pfd 1]] MHz with both"
+    append text "; no M and D keep the VCO in [number [lindex $vco 0]] to\
+      [number [lindex $vco 1]] MHz and the PFD in [number [lindex $pfd 0]] to\
+      [number [lindex $pfd 1]] MHz with both"
   }
-  return [Finding "inputs too far apart" {} $text]
+  return [finding "inputs too far apart" {} $text]
 }
 
 # An output that no input clock could help.
@@ -114,20 +108,20 @@ proc ::vorkel::explain_loop::Range {request primitive output index} {
   set limits [dict get $request limits]
   lassign [::vorkel::catalogue::outputRange $primitive $limits $index] lowest highest
   if {$frequency < $lowest || $frequency > $highest} {
-    set side [expr {$frequency < $lowest ? "below the lowest, [MHz $lowest]" :
-      "above the highest, [MHz $highest]"}]
-    return [list [Finding "output range" $index "[MHz $frequency] MHz is $side MHz"]]
+    set side [expr {$frequency < $lowest ? "below the lowest, [number $lowest]" :
+      "above the highest, [number $highest]"}]
+    return [list [finding "output range" $index "[number $frequency] MHz is $side MHz"]]
   }
   lassign [::vorkel::catalogue::vcoRange $primitive $limits] slow fast
-  set most $::vorkel::explain_walk::largest_divider
+  set most $::vorkel::hardware::largest_divider
   set allowed [expr {1 + [dict get $request tolerance] * 1e-6}]
   if {$frequency * $most * $allowed < $slow} {
     set needed [expr {int(ceil($slow / $frequency))}]
-    return [list [Finding "divider range" $index "to make [MHz $frequency] MHz of the lowest VCO,\
-      [MHz $slow] MHz, the divider would have to be $needed; the largest is $most"]]
+    return [list [finding "divider range" $index "to make [number $frequency] MHz of the lowest\
+      VCO, [number $slow] MHz, the divider would have to be $needed; the largest is $most"]]
   }
   set fractional [expr {$index == 0 && [::vorkel::explain_walk::isFractional $request $primitive]}]
-  set steps [expr {$fractional ? $::vorkel::actual::fraction : 1}]
+  set steps [expr {$fractional ? $::vorkel::hardware::fraction : 1}]
   set below [expr {floor($fast * $allowed / $frequency * $steps) / $steps}]
   # There is no divider between 1 and 2.
   if {$below < 2} {
@@ -138,10 +132,10 @@ proc ::vorkel::explain_loop::Range {request primitive output index} {
     set parts [lmap divider [list $below $above] {
       if {$divider < 1} continue
       string cat "[::vorkel::numbers::short $divider 3] needs a VCO of " \
-        "[MHz [expr {$divider * $frequency}]] MHz"
+        "[number [expr {$divider * $frequency}]] MHz"
     }]
-    return [list [Finding "VCO range" $index "for [MHz $frequency] MHz a divider of\
-      [join $parts {, one of }], and the range of the VCO is [MHz $slow] to [MHz $fast] MHz"]]
+    return [list [finding "VCO range" $index "for [number $frequency] MHz a divider of\
+      [join $parts {, one of }], and the range of the VCO is [number $slow] to [number $fast] MHz"]]
   }
   return {}
 }
@@ -158,7 +152,7 @@ proc ::vorkel::explain_loop::Alone {request primitive output index pairs fractio
     }
   }
   switch -- $level {
-    0 { return [list [Grid $request $primitive $output $index $pairs $fractional]] }
+    0 { return [list [Grid $request $primitive $output $index $fractional]] }
     1 { return [list [Phase $output $index [Dividers $output $serving]]] }
     2 { return [list [Duty $request $output $index [Dividers $output $serving]]] }
   }
@@ -173,19 +167,19 @@ proc ::vorkel::explain_loop::Dividers {output pairs} {
 }
 
 # M and D do not make the VCO that the output needs.
-proc ::vorkel::explain_loop::Grid {request primitive output index pairs fractional} {
+proc ::vorkel::explain_loop::Grid {request primitive output index fractional} {
   set frequency [dict get $output freq]
   set limits [dict get $request limits]
   set input [lindex [dict get $request inputs] 0]
   set whole [expr {$fractional ? "a divider in eighths" : "a whole number"}]
-  set text "[MHz $frequency] MHz is the VCO divided by $whole"
+  set text "[number $frequency] MHz is the VCO divided by $whole"
   if {!$fractional} {
     append text [NamedVcos $frequency [::vorkel::catalogue::vcoRange $primitive $limits]]
   }
-  append text ", but [MHz $input] MHz x M / D makes no such VCO:\
+  append text ", but [number $input] MHz x M / D makes no such VCO:\
     [MostM $primitive], and D ends at [LargestD $request $primitive].\
-    [NearestMade $request $primitive $index]"
-  return [Finding "M and D" $index $text[NoObstacle $output \
+    [nearestMade $request $primitive $index]"
+  return [finding "M and D" $index $text[NoObstacle $output \
     [::vorkel::catalogue::vcoRange $primitive $limits]]]
 }
 
@@ -200,7 +194,7 @@ proc ::vorkel::explain_loop::NoObstacle {output range} {
   set divider [expr {max(1, int(ceil($lowest / $frequency)))}]
   for {} {$divider * $frequency <= $highest} {incr divider} {
     if {[::vorkel::explain_walk::phaseServes $output $divider]} {
-      return ". The phase is not in the way: a divider of $divider has [MHz $phase] degrees"
+      return ". The phase is not in the way: a divider of $divider has [number $phase] degrees"
     }
   }
   return ""
@@ -213,31 +207,30 @@ proc ::vorkel::explain_loop::NamedVcos {frequency range} {
   set vcos {}
   for {set n [expr {max(1, int(ceil($lowest / $frequency)))}]} {$n * $frequency <= $highest} \
       {incr n} {
-    lappend vcos [MHz [expr {$n * $frequency}]]
+    lappend vcos [number [expr {$n * $frequency}]]
   }
   if {[llength $vcos] == 0 || [llength $vcos] > $most_named} {
     return ""
   }
-  return " (a VCO of [Either $vcos] MHz)"
+  return " (a VCO of [::vorkel::options::enumerate $vcos or] MHz)"
 }
 
 proc ::vorkel::explain_loop::MostM {primitive} {
-  set most $::vorkel::explain_walk::largest_m
-  set gap [dict get $::vorkel::explain_walk::m_gap $primitive]
-  return [expr {[llength $gap] == 0 ? "M ends at $most" : "M is 1 or\
-    [expr {[lindex $gap end] + 1}] to $most"}]
+  set most $::vorkel::hardware::largest_m
+  set smallest [dict get $::vorkel::hardware::smallest_m $primitive]
+  return [expr {$smallest == 1 ? "M ends at $most" : "M is 1 or $smallest to $most"}]
 }
 
 proc ::vorkel::explain_loop::LargestD {request primitive} {
   set range [::vorkel::catalogue::pfdRange $primitive [dict get $request limits] \
     [dict get $request bandwidth]]
-  set last $::vorkel::explain_walk::largest_d
+  set last $::vorkel::hardware::largest_d
   set text $last
   foreach input [dict get $request inputs] {
     set high [lindex [::vorkel::explain_walk::dividersOf $input $range] 1]
     if {$high < $last} {
       set last $high
-      set text "$high, as the PFD needs [MHz [lindex $range 0]] MHz"
+      set text "$high, as the PFD needs [number [lindex $range 0]] MHz"
     }
   }
   return $text
@@ -245,7 +238,7 @@ proc ::vorkel::explain_loop::LargestD {request primitive} {
 
 # The nearest frequencies below and above that a primitive makes in the range of an output,
 # whatever the other outputs are, as a sentence without its full stop.
-proc ::vorkel::explain_loop::NearestMade {request primitive index} {
+proc ::vorkel::explain_loop::nearestMade {request primitive index} {
   set near {}
   foreach side {below above} {
     set search [::vorkel::explain_ladder::search $request $primitive $index $side 1]
@@ -256,7 +249,7 @@ proc ::vorkel::explain_loop::NearestMade {request primitive index} {
   }
   set frequency [dict get [lindex [dict get $request outputs] $index] freq]
   set texts [lmap rung [lsort -real -index 0 $near] {
-    string cat "[MHz [lindex $rung 1]] MHz ([How $request $rung],\
+    string cat "[number [lindex $rung 1]] MHz ([How $request $rung],\
       [change [lindex $rung 1] $frequency])"
   }]
   switch -- [llength $texts] {
@@ -273,29 +266,8 @@ proc ::vorkel::explain_loop::How {request rung} {
     return "[lindex $place 0]: [lindex $place 1]"
   }
   lassign $place vco m d divider
-  return "[MHz [lindex [dict get $request inputs] 0]] x $m / $d /\
+  return "[number [lindex [dict get $request inputs] 0]] x $m / $d /\
     [::vorkel::numbers::short $divider 3]"
-}
-
-# How far a frequency is from another one.
-proc ::vorkel::explain_loop::change {value frequency} {
-  return [far [expr {($value / $frequency - 1) * 1e6}]]
-}
-
-# An error in ppm as text, in percent when it is much.
-proc ::vorkel::explain_loop::far {ppm} {
-  if {abs($ppm) >= 1e4} {
-    return "[format %+.3g [expr {$ppm / 1e4}]] %"
-  }
-  return "[format %+.2f $ppm] ppm"
-}
-
-# "a", "a or b", "a, b or c".
-proc ::vorkel::explain_loop::Either {names {word or}} {
-  if {[llength $names] < 2} {
-    return [join $names]
-  }
-  return "[join [lrange $names 0 end-1] {, }] $word [lindex $names end]"
 }
 
 # Text for a list of dividers: all of them, or the ends.
@@ -304,7 +276,7 @@ proc ::vorkel::explain_loop::Named {dividers} {
   if {[llength $dividers] > $most_named} {
     return "[lindex $dividers 0] to [lindex $dividers end]"
   }
-  return [Either $dividers]
+  return [::vorkel::options::enumerate $dividers or]
 }
 
 # No divider that makes the frequency has a step at the phase.
@@ -320,10 +292,10 @@ proc ::vorkel::explain_loop::Phase {output index dividers} {
     }
   }
   lassign $best error made divider step
-  return [Finding "phase grid" $index "the phase moves in steps of\
-    [MHz $::vorkel::actual::phase_step] degrees of the VCO, 45 / N behind a divider N.\
-    [MHz [dict get $output freq]] MHz has a divider of [Named $dividers]; its step nearest to\
-    [MHz $phase] degrees is [::vorkel::numbers::short $made 3], with N = $divider in steps of\
+  return [finding "phase grid" $index "the phase moves in steps of\
+    [number $::vorkel::actual::phase_step] degrees of the VCO, 45 / N behind a divider N.\
+    [number [dict get $output freq]] MHz has a divider of [Named $dividers]; its step nearest to\
+    [number $phase] degrees is [::vorkel::numbers::short $made 3], with N = $divider in steps of\
     [::vorkel::numbers::short $step 3], off by [::vorkel::numbers::short $error 3] with\
     $::vorkel::answer::phase_tolerance allowed"]
 }
@@ -339,7 +311,7 @@ proc ::vorkel::explain_loop::Duty {request output index dividers} {
     # What counters without an end would do.
     set free [::vorkel::actual::dutyOnStep $duty $divider $divider]
     set row [list [expr {abs($made - $duty)}] $made $divider \
-      [expr {abs($free - $duty) <= $::vorkel::answer::duty_tolerance + 1e-6}]]
+      [::vorkel::answer::isAllowed dutyError [expr {$free - $duty}]]]
     if {$best eq "" || [lindex $row 0] < [lindex $best 0]} {
       set best $row
     }
@@ -347,27 +319,24 @@ proc ::vorkel::explain_loop::Duty {request output index dividers} {
   }
   lassign $best error made divider
   set near "the nearest is [::vorkel::numbers::short $made 3] %, with N = $divider"
-  set head "[MHz [dict get $output freq]] MHz has a divider N of [Named $dividers]"
+  set head "[number [dict get $output freq]] MHz has a divider N of [Named $dividers]"
   if {1 in $counted} {
     set low [expr {100.0 * max(1, $divider - $most) / $divider}]
     set high [expr {100.0 * min($divider - 0.5, $most + 0.5) / $divider}]
-    return [Finding "high and low count" $index "$head, which holds its output high or low for at\
+    return [finding "high and low count" $index "$head, which holds its output high or low for at\
       most $most VCO periods: with N = $divider that is a duty cycle of\
       [::vorkel::numbers::short $low 3] to [::vorkel::numbers::short $high 3] %, not\
-      [MHz $duty] %; $near"]
+      [number $duty] %; $near"]
   }
-  return [Finding "duty grid" $index "$head and counts its high time in half VCO periods, at least\
-    one whole, so that [MHz $duty] % is none of its steps: $near, off by\
+  return [finding "duty grid" $index "$head and counts its high time in half VCO periods, at least\
+    one whole, so that [number $duty] % is none of its steps: $near, off by\
     [::vorkel::numbers::short $error 3] points with $::vorkel::answer::duty_tolerance allowed"]
 }
 
 # Outputs of which each can be made, but not with the others.
 proc ::vorkel::explain_loop::Together {request primitive pairs} {
   set masks [::vorkel::explain_walk::masks $request $primitive $pairs]
-  set indices {}
-  foreach mask $masks {
-    lappend indices [llength $indices]
-  }
+  set indices [::vorkel::answer::indices $request]
   if {[::vorkel::explain_walk::serving $masks $indices] != 0} {
     return {}
   }
@@ -378,22 +347,22 @@ proc ::vorkel::explain_loop::Together {request primitive pairs} {
       set indices $others
     }
   }
-  return [list [Finding "outputs together" $indices [Conflict $request $primitive $indices]]]
+  return [list [finding "outputs together" $indices [Conflict $request $primitive $indices]]]
 }
 
 proc ::vorkel::explain_loop::Conflict {request primitive indices} {
   set outputs [dict get $request outputs]
   set input [lindex [dict get $request inputs] 0]
-  set names [lmap index $indices {MHz [dict get [lindex $outputs $index] freq]}]
+  set names [lmap index $indices {number [dict get [lindex $outputs $index] freq]}]
   set text "each can be made alone, but [join $names { and }] MHz need one VCO that serves all of\
     them. "
   set range [::vorkel::catalogue::vcoRange $primitive [dict get $request limits]]
-  set common [Common $request $primitive $indices $range]
+  set common [commonVcos $request $primitive $indices $range]
   if {[llength $common] == 0} {
-    return [append text "None from [MHz [lindex $range 0]] to [MHz [lindex $range 1]] MHz, whatever\
-      the input clock, is [Multiple $request $primitive $indices]"]
+    return [append text "None from [number [lindex $range 0]] to [number [lindex $range 1]] MHz,\
+      whatever the input clock, is [Multiple $request $primitive $indices]"]
   }
-  return [append text "That is one of [Vcos $common], and [MHz $input] MHz x M / D makes none of\
+  return [append text "That is one of [Vcos $common], and [number $input] MHz x M / D makes none of\
     these: [MostM $primitive], and D ends at [LargestD $request $primitive]"]
 }
 
@@ -418,13 +387,13 @@ proc ::vorkel::explain_loop::Multiple {request primitive indices} {
 }
 
 # The VCO frequencies in the range that would serve these outputs.
-proc ::vorkel::explain_loop::Common {request primitive indices range} {
+proc ::vorkel::explain_loop::commonVcos {request primitive indices range} {
   lassign $range lowest highest
   set fractional [::vorkel::explain_walk::isFractional $request $primitive]
   set seed [lindex [dict get $request outputs] [lindex $indices 0]]
-  set steps [expr {$fractional && [lindex $indices 0] == 0 ? $::vorkel::actual::fraction : 1}]
+  set steps [expr {$fractional && [lindex $indices 0] == 0 ? $::vorkel::hardware::fraction : 1}]
   set vcos {}
-  set most [expr {$::vorkel::explain_walk::largest_divider * $steps}]
+  set most [expr {$::vorkel::hardware::largest_divider * $steps}]
   for {set n $steps} {$n <= $most} {incr n} {
     set vco [expr {[dict get $seed freq] * double($n) / $steps}]
     if {$vco < $lowest || $vco > $highest || ($n > $steps && $n < 2 * $steps)} continue
@@ -446,7 +415,7 @@ proc ::vorkel::explain_loop::Common {request primitive indices range} {
 
 proc ::vorkel::explain_loop::Vcos {vcos} {
   variable most_named
-  set names [lmap vco [lrange $vcos 0 [expr {$most_named - 1}]] {MHz $vco}]
+  set names [lmap vco [lrange $vcos 0 [expr {$most_named - 1}]] {number $vco}]
   set more [expr {[llength $vcos] > $most_named ? " and [expr {[llength $vcos] - $most_named}]\
     more" : ""}]
   return "[join $names {, }] MHz$more"

@@ -4,11 +4,12 @@
 package provide vorkel::explain_nearest 1.1
 package require vorkel::actual 1.1
 package require vorkel::answer 1.1
+package require vorkel::catalogue 1.1
 package require vorkel::engine 1.1
-package require vorkel::explain_kru 1.1
 package require vorkel::explain_ladder 1.1
 package require vorkel::explain_loop 1.1
 package require vorkel::explain_walk 1.1
+package require vorkel::hardware 1.1
 package require vorkel::numbers 1.1
 package require vorkel::progress 1.1
 package require vorkel::units 1.1
@@ -33,6 +34,8 @@ namespace eval ::vorkel::explain_nearest {
   variable budget 1500
   variable deadline 0
   variable stopped 0
+  # The VCO frequencies that serve all outputs, by primitive, outputs and range.
+  variable vcos
   # What stands nearer to an output than what is told of a PLL or a TSYN: settings make it, but the
   # engine does not take them. For each output a list of texts.
   variable passed {}
@@ -65,15 +68,15 @@ proc ::vorkel::explain_nearest::isLate {} {
 # the engine has an answer, which is off.
 proc ::vorkel::explain_nearest::proof {request primitive} {
   set widths [list [dict get $request bandwidth]]
-  if {[::vorkel::engine::family $primitive] eq "Loop" && !([dict exists $request bandwidthAsked] &&
-      [dict get $request bandwidthAsked])} {
+  if {[::vorkel::engine::family $primitive] eq "Loop" &&
+      ![dict get $request bandwidthAsked]} {
     lappend widths LOW
   }
   dict set request bandwidthAsked 1
   foreach width $widths {
     set solved 0
     dict set request bandwidth $width
-    foreach variant [::vorkel::answer::Variants $request $primitive] {
+    foreach variant [::vorkel::answer::variants $request $primitive] {
       set answer [::vorkel::answer::solve $request $primitive $variant]
       if {[dict get $answer within]} {
         return $answer
@@ -87,8 +90,8 @@ proc ::vorkel::explain_nearest::proof {request primitive} {
 
 # A frequency as it can be given to the program: in up to six decimals if these are exact, else
 # as a quotient.
-proc ::vorkel::explain_nearest::spell {frequency input ratio} {
-  set text [plainMHz $frequency]
+proc ::vorkel::explain_nearest::Spell {frequency input ratio} {
+  set text [PlainMHz $frequency]
   if {abs([::vorkel::numbers::short $frequency 6] - $frequency) <= 1e-13 * $frequency} {
     return $text
   }
@@ -141,7 +144,7 @@ proc ::vorkel::explain_nearest::Working {request primitive index side count} {
   variable most_tried
   variable stopped
   variable passed
-  if {[isLate] || [::vorkel::answer::Refusal $request $primitive] ne ""} {
+  if {[isLate] || [::vorkel::answer::refusal $request $primitive] ne ""} {
     return {}
   }
   set input [lindex [dict get $request inputs] 0]
@@ -156,7 +159,7 @@ proc ::vorkel::explain_nearest::Working {request primitive index side count} {
       set stopped 1
       break
     }
-    set text [spell [lindex $rung 1] $input [::vorkel::explain_ladder::ratio $search $rung]]
+    set text [Spell [lindex $rung 1] $input [::vorkel::explain_ladder::ratio $search $rung]]
     set frequency [::vorkel::units::value $text frequency nearest]
     if {[proof [With $request $index $frequency] $primitive] ne ""} {
       lappend told [dict create text $text frequency $frequency primitives [list $primitive]]
@@ -189,7 +192,7 @@ proc ::vorkel::explain_nearest::Makers {request primitives known} {
 # Whether a request is worth a run of the engine: of a PLL or a TSYN it is when a pair of M and D
 # serves all outputs.
 proc ::vorkel::explain_nearest::CouldMake {request primitive} {
-  if {[::vorkel::answer::Refusal $request $primitive] ne ""} {
+  if {[::vorkel::answer::refusal $request $primitive] ne ""} {
     return 0
   }
   if {[::vorkel::engine::family $primitive] ne "Loop"} {
@@ -204,8 +207,7 @@ proc ::vorkel::explain_nearest::sets {request primitives} {
   variable most_sets_tried
   variable most_sets
   set candidates {}
-  foreach primitive $primitives {
-    if {[::vorkel::engine::family $primitive] ne "Loop"} continue
+  foreach primitive [::vorkel::engine::ofFamily Loop $primitives] {
     foreach pair [::vorkel::explain_walk::pairs $request $primitive [dict get $request inputs]] {
       set candidate [Moved $request $primitive $pair]
       if {$candidate ne ""} {
@@ -258,11 +260,11 @@ proc ::vorkel::explain_nearest::Moved {request primitive pair} {
     }
     lassign $best ppm made divider
     if {$ppm <= [dict get $request tolerance] + 1e-6} {
-      lappend texts [spell $frequency $input {1 1}]
+      lappend texts [Spell $frequency $input {1 1}]
       continue
     }
     set worst [expr {max($worst, $ppm)}]
-    lappend texts [spell $made $input [::vorkel::actual::loopRatio $m $d $divider]]
+    lappend texts [Spell $made $input [::vorkel::actual::loopRatio $m $d $divider]]
   }
   return [list $worst $texts]
 }
@@ -274,7 +276,7 @@ proc ::vorkel::explain_nearest::oscillators {request primitives texts} {
   set told {}
   foreach text $texts {
     if {[isLate]} break
-    set plain [plainMHz [::vorkel::units::value $text frequency --oscillators]]
+    set plain [PlainMHz [::vorkel::units::value $text frequency --oscillators]]
     set input [::vorkel::units::value $plain frequency --oscillators]
     set changed [dict replace $request inputs [lreplace [dict get $request inputs] 0 0 $input]]
     set serving {}
@@ -292,7 +294,7 @@ proc ::vorkel::explain_nearest::oscillators {request primitives texts} {
 }
 
 # A frequency in MHz, in as many digits as it takes to be that one.
-proc ::vorkel::explain_nearest::plainMHz {frequency} {
+proc ::vorkel::explain_nearest::PlainMHz {frequency} {
   set text [::vorkel::numbers::short $frequency 6]
   if {abs($text - $frequency) <= 1e-13 * $frequency} {
     return $text
@@ -307,10 +309,7 @@ proc ::vorkel::explain_nearest::CouldBe {request primitive} {
     return 1
   }
   set limits [dict get $request limits]
-  set indices {}
-  foreach output [dict get $request outputs] {
-    lappend indices [llength $indices]
-  }
+  set indices [::vorkel::answer::indices $request]
   set range [::vorkel::catalogue::vcoRange $primitive $limits]
   set input [lindex [dict get $request inputs] 0]
   lassign [::vorkel::explain_walk::dividersOf $input [::vorkel::catalogue::pfdRange $primitive \
@@ -318,7 +317,7 @@ proc ::vorkel::explain_nearest::CouldBe {request primitive} {
   foreach vco [Vcos $request $primitive $indices $range] {
     for {set d $first} {$d <= $last} {incr d} {
       set m [expr {$vco * $d / $input}]
-      if {$m > $::vorkel::explain_walk::largest_m + 0.5} break
+      if {$m > $::vorkel::hardware::largest_m + 0.5} break
       if {abs($m - round($m)) < 1e-9 * $m} {
         return 1
       }
@@ -332,7 +331,7 @@ proc ::vorkel::explain_nearest::Vcos {request primitive indices range} {
   variable vcos
   set key [list $primitive [dict get $request outputs] $range]
   if {![info exists vcos($key)]} {
-    set vcos($key) [::vorkel::explain_loop::Common $request $primitive $indices $range]
+    set vcos($key) [::vorkel::explain_loop::commonVcos $request $primitive $indices $range]
   }
   return $vcos($key)
 }

@@ -15,16 +15,13 @@ namespace eval ::vorkel::explain_pins {
   variable largest {KRU_SP 32 KRU_CLKGEN 256}
   variable smallest_m 2
   variable fx_divides {2 4 8 16 32}
-  # The ranges in which the engine looks for a KRU_CLKGEN, MHz, whatever those of the device.
-  variable searched {CLKFX {5 374.532} CLKFXDV {0.156 187.266}}
 }
 
-# The range of a pin of a KRU, MHz.
+# The range of a pin of a KRU, MHz. That of a KRU_CLKGEN is as far as the engine looks for it.
 proc ::vorkel::explain_pins::pinRange {request primitive pin} {
-  variable searched
   lassign [::vorkel::catalogue::pinRange $pin 0 [dict get $request limits]] lowest highest
   if {$primitive eq "KRU_CLKGEN"} {
-    lassign [dict get $searched $pin] low high
+    lassign [dict get $::vorkel::catalogue::clkgen_ranges $pin] low high
     set lowest [expr {max($lowest, $low)}]
     set highest [expr {min($highest, $high)}]
   }
@@ -141,7 +138,7 @@ proc ::vorkel::explain_pins::isDutyOf {output place} {
   if {$pin eq "CLKDV"} {
     set made [::vorkel::actual::pinDuty CLKDV [lindex $how end]]
   }
-  return [expr {abs($made - $duty) <= $::vorkel::answer::duty_tolerance + 1e-6}]
+  return [::vorkel::answer::isAllowed dutyError [expr {$made - $duty}]]
 }
 
 # How far the frequency of a pin without M and D can be from what is asked for: the engine takes

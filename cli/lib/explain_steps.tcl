@@ -19,7 +19,7 @@ proc ::vorkel::explain_steps::nearest {request primitives index what} {
   set asked [dict get [lindex [dict get $request outputs] $index] $what]
   set told [dict create]
   foreach primitive $primitives {
-    if {[::vorkel::answer::Refusal $request $primitive] ne ""} continue
+    if {[::vorkel::answer::refusal $request $primitive] ne ""} continue
     set family [::vorkel::engine::family $primitive]
     set candidates [lmap value [${family}Values $request $primitive $index $what] {
       list [expr {abs($value - $asked)}] [::vorkel::numbers::short $value 6]
@@ -80,7 +80,7 @@ proc ::vorkel::explain_steps::LoopValues {request primitive index what} {
 # The dividers that make the frequency of an output beside the others.
 proc ::vorkel::explain_steps::Dividers {request primitive index} {
   set frequency [dict get [lindex [dict get $request outputs] $index] freq]
-  set allowed [expr {[dict get $request tolerance] * 1e-6 + 1e-12}]
+  set allowed [::vorkel::explain_walk::allowed $request]
   set found {}
   foreach pair [::vorkel::explain_walk::beside $request $primitive $index] {
     set vco [lindex $pair 0]

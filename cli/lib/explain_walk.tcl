@@ -5,15 +5,11 @@ package provide vorkel::explain_walk 1.1
 package require vorkel::actual 1.1
 package require vorkel::answer 1.1
 package require vorkel::catalogue 1.1
+package require vorkel::hardware 1.1
 
 namespace eval ::vorkel::explain_walk {
-  # The ranges of the settings, as the engine has them. M of a TSYN has a gap.
-  variable largest_m 64
-  variable largest_d 80
-  variable largest_divider 128
-  variable m_gap {PLL {} TSYN {2 3 4}}
-  # From so many outputs on the divider of output 0 of a TSYN is whole.
-  variable whole_outputs 6
+  # For each primitive the last request with its pairs and masks.
+  variable known
   # The part of a frequency or of a limit that is only the rounding of the arithmetic.
   variable rounding 1e-12
 }
@@ -21,11 +17,11 @@ namespace eval ::vorkel::explain_walk {
 # The smallest and the largest D that keep the phase-frequency detector in its range with an
 # input clock. There is none when the first is the larger one.
 proc ::vorkel::explain_walk::dividersOf {input range} {
-  variable largest_d
   variable rounding
   lassign $range lowest highest
   return [list [expr {max(1, int(ceil(min(1e6, $input / $highest * (1 - $rounding)))))}] \
-    [expr {min($largest_d, int(floor(min(1e6, $input / $lowest * (1 + $rounding)))))}]]
+    [expr {min($::vorkel::hardware::largest_d,
+      int(floor(min(1e6, $input / $lowest * (1 + $rounding)))))}]]
 }
 
 # The pairs of M and D with a VCO in its range and a phase-frequency detector in its range, for
@@ -36,7 +32,7 @@ proc ::vorkel::explain_walk::pairs {request primitive inputs} {
   set range [::vorkel::catalogue::pfdRange $primitive $limits [dict get $request bandwidth]]
   set vcoRange [::vorkel::catalogue::vcoRange $primitive $limits]
   set first 1
-  set last $::vorkel::explain_walk::largest_d
+  set last $::vorkel::hardware::largest_d
   foreach input $inputs {
     lassign [dividersOf $input $range] low high
     set first [expr {max($first, $low)}]
@@ -46,8 +42,6 @@ proc ::vorkel::explain_walk::pairs {request primitive inputs} {
 }
 
 proc ::vorkel::explain_walk::Within {primitive inputs vcoRange first last} {
-  variable largest_m
-  variable m_gap
   variable rounding
   lassign $vcoRange lowest highest
   set lowest [expr {$lowest * (1 - $rounding)}]
@@ -55,14 +49,15 @@ proc ::vorkel::explain_walk::Within {primitive inputs vcoRange first last} {
   set slow [tcl::mathfunc::min {*}$inputs]
   set fast [tcl::mathfunc::max {*}$inputs]
   set input [expr {double([lindex $inputs 0])}]
-  set gap [dict get $m_gap $primitive]
+  set smallest [dict get $::vorkel::hardware::smallest_m $primitive]
   set pairs {}
   set seen [dict create]
   for {set d $first} {$d <= $last} {incr d} {
     set from [expr {max(1, int(min(1e6, ceil($lowest * $d / $slow))))}]
-    set to [expr {min($largest_m, int(min(1e6, floor($highest * $d / $fast))))}]
+    set to [expr {min($::vorkel::hardware::largest_m,
+      int(min(1e6, floor($highest * $d / $fast))))}]
     for {set m $from} {$m <= $to} {incr m} {
-      if {$m in $gap} continue
+      if {$m > 1 && $m < $smallest} continue
       set vco [expr {$input * $m / $d}]
       if {![dict exists $seen $vco]} {
         dict set seen $vco 1
@@ -76,9 +71,7 @@ proc ::vorkel::explain_walk::Within {primitive inputs vcoRange first last} {
 # Whether output 0 can have a divider with eighths: that of a TSYN can, but then nothing moves
 # the phase or the duty cycle of any output.
 proc ::vorkel::explain_walk::isFractional {request primitive} {
-  variable whole_outputs
-  if {$primitive ne "TSYN" || [dict get $request intDiv0] ||
-      [llength [dict get $request outputs]] >= $whole_outputs} {
+  if {![::vorkel::hardware::hasFractions $request $primitive]} {
     return 0
   }
   foreach output [dict get $request outputs] {
@@ -91,23 +84,28 @@ proc ::vorkel::explain_walk::isFractional {request primitive} {
 
 # The dividers next to a quotient of VCO and output, of an output that can have eighths or not.
 proc ::vorkel::explain_walk::dividersAt {quotient fractional} {
-  variable largest_divider
-  set steps [expr {$fractional && $quotient >= 2 ? $::vorkel::actual::fraction : 1}]
+  set steps [expr {$fractional && $quotient >= 2 ? $::vorkel::hardware::fraction : 1}]
   set below [expr {floor($quotient * $steps) / $steps}]
   set dividers {}
   foreach divider [list $below [expr {$below + 1.0 / $steps}]] {
-    if {$divider >= 1 && $divider <= $largest_divider} {
+    if {$divider >= 1 && $divider <= $::vorkel::hardware::largest_divider} {
       lappend dividers [expr {$divider == round($divider) ? round($divider) : $divider}]
     }
   }
   return $dividers
 }
 
+# How far a frequency may be off, as a fraction of it.
+proc ::vorkel::explain_walk::allowed {request} {
+  variable rounding
+  return [expr {[dict get $request tolerance] * 1e-6 + $rounding}]
+}
+
 # How far a VCO serves an output: 0, 1 when the frequency is within its tolerance, 2 when the
 # phase is so too, 3 when the duty cycle is so too.
 proc ::vorkel::explain_walk::level {request output vco fractional} {
   set frequency [dict get $output freq]
-  set allowed [expr {[dict get $request tolerance] * 1e-6 + 1e-12}]
+  set allowed [allowed $request]
   set best 0
   foreach divider [dividersAt [expr {$vco / $frequency}] $fractional] {
     if {abs($vco / $divider / $frequency - 1) > $allowed} continue
@@ -125,9 +123,8 @@ proc ::vorkel::explain_walk::phaseServes {output divider} {
   if {$phase eq "" || $divider != round($divider)} {
     return 1
   }
-  set error [::vorkel::actual::phaseDifference \
-    [::vorkel::actual::phaseOnStep $phase $divider] $phase]
-  return [expr {abs($error) <= $::vorkel::answer::phase_tolerance + 1e-6}]
+  return [::vorkel::answer::isAllowed phaseError [::vorkel::actual::phaseDifference \
+    [::vorkel::actual::phaseOnStep $phase $divider] $phase]]
 }
 
 proc ::vorkel::explain_walk::dutyServes {request output divider} {
@@ -136,7 +133,7 @@ proc ::vorkel::explain_walk::dutyServes {request output divider} {
     return 1
   }
   set made [::vorkel::actual::dutyOnStep $duty $divider [dict get $request limits O_MAX_HT_LT]]
-  return [expr {abs($made - $duty) <= $::vorkel::answer::duty_tolerance + 1e-6}]
+  return [::vorkel::answer::isAllowed dutyError [expr {$made - $duty}]]
 }
 
 # For each output a whole number whose bit n tells that pair n serves it in all.
@@ -178,11 +175,8 @@ proc ::vorkel::explain_walk::beside {request primitive index} {
       [expr {$single ? 0 : [masks $request $primitive $pairs]}]]
   }
   lassign $known($primitive) -> pairs masks
-  set others {}
-  foreach mask $masks {
-    lappend others [llength $others]
-  }
-  set common [serving $masks [lsearch -all -inline -not -exact $others $index]]
+  set others [lsearch -all -inline -not -exact [::vorkel::answer::indices $request] $index]
+  set common [serving $masks $others]
   set kept {}
   foreach pair $pairs {
     if {$common & 1} {

@@ -36,7 +36,7 @@ proc ::vorkel::format::sdc {answers request} {
     set n 0
     foreach input $inputs {
       append text [sdc_writer::Generated $output [incr n] $input [llength $inputs] \
-        [sdc_writer::Pin $answer $output]]
+        [sdc_writer::Pin $output]]
     }
     append text [sdc_writer::Uncertainty $output [llength $inputs]]
   }
@@ -188,7 +188,7 @@ proc ::vorkel::format::sdc_writer::Name {output n inputs} {
 }
 
 # The pin of the primitive at which an output is.
-proc ::vorkel::format::sdc_writer::Pin {answer output} {
+proc ::vorkel::format::sdc_writer::Pin {output} {
   set pin [dict get $output pin]
   return [expr {$pin eq "" ? "CLKOUT[dict get $output index]" : $pin}]
 }

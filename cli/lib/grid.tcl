@@ -1,8 +1,8 @@
 # The whole grid of settings of a PLL or a TSYN, searched for those nearest to a request.
 #
-# The grid is what the hardware has. M is from 1 to 64, on a TSYN 1 or from 5; D is whole, from 1
-# to 80; dividers are from 1 to 128. M and dividers are whole, only a TSYN with up to 5 outputs and
-# without --int-div0 has an M in eighths and a divider of output 0 that is 1 or in eighths from 2.
+# The grid is what the hardware has (hardware.tcl): every M, whole D and divider. M and dividers are
+# whole, only a TSYN with up to 5 outputs and without --int-div0 has an M in eighths and a divider
+# of output 0 that is 1 or in eighths from 2.
 # A setting counts when VCO and PFD with each input clock and each output, also output 0, are in
 # the device's ranges. Nothing on the grid is left out: grid_loops.tcl tells how M and D are gone
 # through, and grid_dividers.tcl how the dividers are.
@@ -24,39 +24,31 @@ package require vorkel::actual 1.1
 package require vorkel::answer 1.1
 package require vorkel::grid_dividers 1.1
 package require vorkel::grid_loops 1.1
+package require vorkel::hardware 1.1
 package require vorkel::timing 1.1
 
 namespace eval ::vorkel::grid {
-  # Outputs from which on M and the divider of output 0 of a TSYN are whole.
-  variable outputs_with_whole_settings 6
+  # About as many steps of this search take as long as a run of the engine.
+  variable run_steps 10
   # Where in a point something stands.
   variable place {class 0 ppm 1 phase 2 duty 3 jitter 4 vco 5 d 6 m 7 bandwidth 8 primitive 9
     dividers 10}
 }
 
 # The best settings of a primitive, a list of one answer, or of none when no setting has
-# everything in the device's ranges.
-proc ::vorkel::grid::best {request primitive {variant ""}} {
-  set points [order $request [points $request $primitive]]
+# everything in the device's ranges. `tick` is that of points.
+proc ::vorkel::grid::best {request primitive {variant ""} {tick list}} {
+  set points [order $request [points $request $primitive $tick]]
   if {[llength $points] == 0} {
     return {}
   }
   return [list [answer $request [lindex $points 0] $variant]]
 }
 
-# The trade-offs of a primitive between the largest error of a frequency and the jitter, a list of
-# answers: the best one, and then each one whose jitter is less than that of all with a smaller
-# error.
-proc ::vorkel::grid::front {request primitive {variant ""}} {
-  return [lmap point [tradeoffs [order $request [points $request $primitive]]] {
-    answer $request $point $variant
-  }]
-}
-
 # The answer that a point is.
 proc ::vorkel::grid::answer {request point {variant ""}} {
   foreach key {d m bandwidth primitive dividers} {
-    set $key [of $point $key]
+    set $key [Of $point $key]
   }
   dict set request bandwidth $bandwidth
   return [::vorkel::answer::fromSettings $request $primitive [dict create M $m D $d] $dividers \
@@ -64,7 +56,7 @@ proc ::vorkel::grid::answer {request point {variant ""}} {
 }
 
 # What stands in a point under a name.
-proc ::vorkel::grid::of {point name} {
+proc ::vorkel::grid::Of {point name} {
   variable place
   return [lindex $point [dict get $place $name]]
 }
@@ -82,18 +74,20 @@ proc ::vorkel::grid::order {request points} {
   return $points
 }
 
-# The front of ordered points, as front tells. Only points of the class of the best are on it: a
-# lower jitter does not make up for a phase that is not as asked for.
+# The trade-offs between the largest error of a frequency and the jitter among ordered points: the
+# best one, and then each one whose jitter is less than that of all with a smaller error. Only
+# points of the class of the best are there: a lower jitter does not make up for a phase that is not
+# as asked for.
 proc ::vorkel::grid::tradeoffs {points} {
   if {[llength $points] == 0} {
     return {}
   }
-  set class [of [lindex $points 0] class]
-  set least [of [lindex $points 0] jitter]
+  set class [Of [lindex $points 0] class]
+  set least [Of [lindex $points 0] jitter]
   set front [list [lindex $points 0]]
   foreach point [lrange $points 1 end] {
-    if {[of $point class] == $class && [of $point jitter] < $least} {
-      set least [of $point jitter]
+    if {[Of $point class] == $class && [Of $point jitter] < $least} {
+      set least [Of $point jitter]
       lappend front $point
     }
   }
@@ -115,7 +109,7 @@ proc ::vorkel::grid::Sorted {points names} {
 proc ::vorkel::grid::points {request primitive {tick list}} {
   set points {}
   foreach search [Searches $request $primitive] {
-    if {[llength $points] > 0 && [of [lindex $points 0] class] < [dict get $search class]} {
+    if {[llength $points] > 0 && [Of [lindex $points 0] class] < [dict get $search class]} {
       # Whatever it has comes behind these.
       for {set step 0} {$step < [Size $search]} {incr step} {
         {*}$tick
@@ -146,7 +140,8 @@ proc ::vorkel::grid::steps {request primitive} {
 #   group    see grid_loops.tcl
 proc ::vorkel::grid::Searches {request primitive} {
   set whole $::vorkel::grid_dividers::whole
-  set parts [expr {[HasFractions $request $primitive] ? $::vorkel::grid_dividers::eighths : $whole}]
+  set parts [expr {[::vorkel::hardware::hasFractions $request $primitive] ?
+    $::vorkel::hardware::fraction : $whole}]
   if {![::vorkel::answer::isAsked $request phase] && ![::vorkel::answer::isAsked $request duty]} {
     set kinds [list [list 0 plain $parts]]
   } else {
@@ -170,13 +165,6 @@ proc ::vorkel::grid::Searches {request primitive} {
 
 proc ::vorkel::grid::Size {search} {
   return [llength [dict get $search group rows]]
-}
-
-# Whether M and the divider of output 0 may be fractions.
-proc ::vorkel::grid::HasFractions {request primitive} {
-  variable outputs_with_whole_settings
-  return [expr {$primitive eq "TSYN" && ![dict get $request intDiv0] &&
-    [llength [dict get $request outputs]] < $outputs_with_whole_settings}]
 }
 
 # The points that a search finds.
@@ -210,7 +198,7 @@ proc ::vorkel::grid::Found {request primitive search tick} {
 # divider.
 proc ::vorkel::grid::Timed {request points} {
   variable place
-  if {[llength $points] == 0 || ![::vorkel::timing::HasCalculator [dict get $request device]]} {
+  if {[llength $points] == 0 || ![::vorkel::timing::hasCalculator [dict get $request device]]} {
     return $points
   }
   set input [lindex [dict get $request inputs] 0]
@@ -219,7 +207,7 @@ proc ::vorkel::grid::Timed {request points} {
     $handle SetDevice [dict get $request device]
     return [lmap point $points {
       # A refusal is a sentence.
-      catch {$handle GetPLLPkToPkJitter $input [of $point m] [of $point d] [of $point bandwidth] 1 \
+      catch {$handle GetPLLPkToPkJitter $input [Of $point m] [Of $point d] [Of $point bandwidth] 1 \
         [dict get $request inputJitter]} jitter
       if {[string is double -strict $jitter]} {
         lset point [dict get $place jitter] $jitter

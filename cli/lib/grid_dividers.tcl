@@ -6,7 +6,6 @@
 # 1 and 2, or whole. A target is a dict of what an output is to be:
 #   freq        MHz
 #   phase duty  as asked for, or ""
-#   tolerance   ppm
 #   range       of its frequency, MHz
 #   most        how many VCO periods a divider can be high or low for
 #   moved       whether phase and duty cycle have steps; else they are 0 degrees and 50 percent
@@ -21,11 +20,11 @@ package provide vorkel::grid_dividers 1.1
 package require vorkel::actual 1.1
 package require vorkel::answer 1.1
 package require vorkel::catalogue 1.1
+package require vorkel::hardware 1.1
 package require vorkel::notes 1.1
 
 namespace eval ::vorkel::grid_dividers {
-  variable largest_divider 128
-  variable eighths 8
+  # The parts of a divider that is whole.
   variable whole 1
 }
 
@@ -42,7 +41,6 @@ proc ::vorkel::grid_dividers::targets {request primitive class shape parts} {
     lassign [::vorkel::catalogue::outputRange $primitive $limits $index] lowest highest
     set target [dict create freq [expr {double([dict get $output freq])}] \
       phase [dict get $output phase] duty [dict get $output duty] \
-      tolerance [dict get $request tolerance] \
       range [list [expr {$lowest - $::vorkel::notes::rounding}] \
         [expr {$highest + $::vorkel::notes::rounding}]] \
       most [dict get $limits O_MAX_HT_LT] moved [expr {$shape eq "moved"}] \
@@ -50,7 +48,7 @@ proc ::vorkel::grid_dividers::targets {request primitive class shape parts} {
     set counts [Counts [dict get $target parts]]
     if {$class == 0 && $shape eq "moved"} {
       set counts [lmap count $counts {
-        if {![IsAllowed [Shape $target $count] $target]} continue
+        if {![AreAllowed [Shape $target $count]]} continue
         set count
       }]
     }
@@ -73,8 +71,8 @@ proc ::vorkel::grid_dividers::fixedClass {request} {
   variable whole
   foreach output [dict get $request outputs] {
     set target [dict create phase [dict get $output phase] duty [dict get $output duty] moved 0 \
-      tolerance [dict get $request tolerance] parts $whole]
-    if {![IsAllowed [Shape $target $whole] $target]} {
+      parts $whole]
+    if {![AreAllowed [Shape $target $whole]]} {
       return 1
     }
   }
@@ -134,9 +132,9 @@ proc ::vorkel::grid_dividers::choose {input vco ratio targets} {
 
 # The counts that are dividers.
 proc ::vorkel::grid_dividers::Counts {parts} {
-  variable largest_divider
+  set end [expr {$::vorkel::hardware::largest_divider * $parts}]
   set counts [list $parts]
-  for {set count [expr {2 * $parts}]} {$count <= $largest_divider * $parts} {incr count} {
+  for {set count [expr {2 * $parts}]} {$count <= $end} {incr count} {
     lappend counts $count
   }
   return $counts
@@ -144,8 +142,7 @@ proc ::vorkel::grid_dividers::Counts {parts} {
 
 # A target with the tables for what counts are to be looked at.
 proc ::vorkel::grid_dividers::Tables {target counts} {
-  variable largest_divider
-  set end [expr {$largest_divider * [dict get $target parts]}]
+  set end [expr {$::vorkel::hardware::largest_divider * [dict get $target parts]}]
   set below {}
   set above {}
   set last 0
@@ -236,10 +233,9 @@ proc ::vorkel::grid_dividers::Shape {target count} {
 }
 
 # Whether the errors of phase and duty cycle are within their tolerance.
-proc ::vorkel::grid_dividers::IsAllowed {errors target} {
+proc ::vorkel::grid_dividers::AreAllowed {errors} {
   foreach error $errors key {phaseError dutyError} {
-    if {$error > [::vorkel::answer::allowance $key [dict get $target tolerance]] +
-        $::vorkel::answer::rounding} {
+    if {![::vorkel::answer::isAllowed $key $error]} {
       return 0
     }
   }

@@ -12,13 +12,10 @@ package require vorkel::actual 1.1
 package require vorkel::answer 1.1
 package require vorkel::catalogue 1.1
 package require vorkel::grid_dividers 1.1
+package require vorkel::hardware 1.1
 package require vorkel::notes 1.1
 
 namespace eval ::vorkel::grid_loops {
-  variable largest_m 64
-  # Between 1 and this a TSYN has no M.
-  variable smallest_tsyn_m 5
-  variable largest_d 80
   # Errors of frequencies, as fractions, are worked out here in a quick way. Two that are more
   # apart than this are so after all rounding, too; one millionth of a ppm is the last digit that
   # counts.
@@ -32,12 +29,8 @@ namespace eval ::vorkel::grid_loops {
 proc ::vorkel::grid_loops::groups {request primitive parts} {
   set limits [dict get $request limits]
   set inputs [dict get $request inputs]
-  set bandwidths [list [dict get $request bandwidth]]
-  if {!([dict exists $request bandwidthAsked] && [dict get $request bandwidthAsked])} {
-    set bandwidths $::vorkel::answer::bandwidths
-  }
   set alike [dict create]
-  foreach bandwidth $bandwidths {
+  foreach bandwidth [::vorkel::answer::widths $request] {
     dict lappend alike [::vorkel::catalogue::pfdRange $primitive $limits $bandwidth] $bandwidth
   }
   set vcos [Wide [::vorkel::catalogue::vcoRange $primitive $limits]]
@@ -52,9 +45,8 @@ proc ::vorkel::grid_loops::groups {request primitive parts} {
 }
 
 proc ::vorkel::grid_loops::Rows {inputs vcos pfds primitive parts} {
-  variable largest_d
   set rows {}
-  for {set d 1} {$d <= $largest_d} {incr d} {
+  for {set d 1} {$d <= $::vorkel::hardware::largest_d} {incr d} {
     if {![AreInside $inputs 1 $d $pfds]} continue
     set spans [Spans $inputs $vcos $d $primitive $parts]
     if {[llength $spans] > 0} {
@@ -66,11 +58,9 @@ proc ::vorkel::grid_loops::Rows {inputs vcos pfds primitive parts} {
 
 # The spans of M that go with a D.
 proc ::vorkel::grid_loops::Spans {inputs vcos d primitive parts} {
-  variable largest_m
-  variable smallest_tsyn_m
   lassign $vcos lowest highest
   set first $parts
-  set end [expr {$largest_m * $parts}]
+  set end [expr {$::vorkel::hardware::largest_m * $parts}]
   set last $end
   foreach input $inputs {
     # One further out, as these quotients are rounded; VCOs tell what is inside.
@@ -85,8 +75,9 @@ proc ::vorkel::grid_loops::Spans {inputs vcos d primitive parts} {
     incr last -1
   }
   set spans [list [list $first $last]]
-  if {$primitive eq "TSYN"} {
-    set spans [list [list [expr {max($first, $smallest_tsyn_m * $parts)}] $last] \
+  set smallest [dict get $::vorkel::hardware::smallest_m $primitive]
+  if {$smallest > 1} {
+    set spans [list [list [expr {max($first, $smallest * $parts)}] $last] \
       [list $first [expr {min($last, $parts)}]]]
   }
   return [lmap span $spans {

@@ -49,8 +49,9 @@ namespace eval ::vorkel::help {
     --input-jitter jitter "50, 50ps, 0.05ns; ps without a unit"
     --tolerance tolerance "100, 100ppm, 0.01%; ppm without a unit"
     --in        lists
-      "24,27,33.3MHz are 24, 27 and 33.3 MHz: each entry has a unit of its own, or is in MHz.\
-      8,16ns is refused, because 8 could be meant in ns; write 8ns,16ns."
+      "each entry has a unit of its own or none: 24,27,33.3MHz are 24, 27 and 33.3 MHz. One\
+      without a unit beside one that is not in MHz, as in 8,16ns, is refused, because 8 could be\
+      meant in ns; write 8ns,16ns."
   }
   # What else there is to say of a command.
   variable remarks {
@@ -109,9 +110,7 @@ proc ::vorkel::help::usage {{command ""}} {
 
 # The help of the command help: for the whole program or for one command.
 proc ::vorkel::help::run {words} {
-  set given [::vorkel::options::parse {} $words]
-  ::vorkel::options::refuseOperands $given 1
-  set operands [dict get $given operands]
+  set operands [::vorkel::options::operands $words 1]
   if {[llength $operands] == 0} {
     return [All]
   }

@@ -30,14 +30,14 @@ proc ::vorkel::kru_notes::on {answer} {
   if {[dict get $answer primitive] eq "KRU_CLKGEN" && $phase ne "" && $phase != 0} {
     lappend notes "output 0 is at phase 0: a KRU_CLKGEN has it on CLKFX whatever its phase"
   }
-  if {[dict exists $request bandwidthAsked] && [dict get $request bandwidthAsked]} {
+  if {[dict get $request bandwidthAsked]} {
     lappend notes "--bandwidth changes nothing: a KRU has no such setting"
   }
   set jitter [dict get $request inputJitter]
   set timing [dict get $answer timing]
   if {$jitter > 0 && [::vorkel::timing::isKnown $timing]} {
     lappend notes "the jitter of each output is with all of the input's,\
-      [::vorkel::numbers::short $jitter 3] ps, which passes through a KRU"
+      [::vorkel::numbers::short $jitter 6] ps, which passes through a KRU"
   }
   return [list {*}$notes {*}[::vorkel::notes::refusals $timing]]
 }

@@ -3,6 +3,7 @@
 package provide vorkel::kru_report 1.1
 package require vorkel::actual 1.1
 package require vorkel::numbers 1.1
+package require vorkel::report 1.1
 
 namespace eval ::vorkel::kru_report {}
 

@@ -94,7 +94,7 @@ proc ::vorkel::main::Show {call words} {
 
 proc ::vorkel::main::Version {words} {
   variable version
-  ::vorkel::options::refuseOperands [::vorkel::options::parse {} $words]
+  ::vorkel::options::operands $words 0
   return "vorkel $version\n"
 }
 

@@ -4,6 +4,7 @@
 # rather than the one that M and D give, which can lie just outside the range.
 
 package provide vorkel::notes 1.1
+package require vorkel::answer 1.1
 package require vorkel::catalogue 1.1
 package require vorkel::colour 1.1
 package require vorkel::numbers 1.1

@@ -24,33 +24,7 @@ proc ::vorkel::numbers::parse {text what} {
   return $value
 }
 
-# A number that `check` accepts, as it is written. `check` is a command prefix that is called
-# with the value and answers "" or what the number must be.
-proc ::vorkel::numbers::parseOne {text what check} {
-  set demand [{*}$check [parse $text $what]]
-  if {$demand ne ""} {
-    throw {VORKEL USAGE} "$what: $text must be $demand"
-  }
-  return $text
-}
-
-# The entries of a comma-separated list, each a number that `check` accepts.
-proc ::vorkel::numbers::parseList {text what check} {
-  set entries {}
-  foreach entry [split $text ,] {
-    set entry [string trim $entry]
-    if {$entry eq ""} {
-      throw {VORKEL USAGE} "$what: a number is missing in \"$text\""
-    }
-    lappend entries [parseOne $entry $what $check]
-  }
-  if {[llength $entries] == 0} {
-    throw {VORKEL USAGE} "$what: the list is empty"
-  }
-  return $entries
-}
-
-# Checks for parseOne and parseList.
+# Checks of units.tcl: each answers "" or what a value must be.
 proc ::vorkel::numbers::positive {value} {
   return [expr {$value > 0.0 ? "" : "greater than 0"}]
 }
@@ -76,10 +50,6 @@ proc ::vorkel::numbers::turn {value} {
   return [expr {abs($value) <= 360.0 ? "" : "between -360 and 360"}]
 }
 
-proc ::vorkel::numbers::any {value} {
-  return ""
-}
-
 # A number with up to `decimals` decimals, without trailing zeros and never "-0".
 proc ::vorkel::numbers::short {value decimals} {
   set text [fixed $value $decimals]
@@ -96,4 +66,9 @@ proc ::vorkel::numbers::fixed {value decimals} {
     set text [string range $text 1 end]
   }
   return $text
+}
+
+# A time in ps, as all of them are shown.
+proc ::vorkel::numbers::ps {value} {
+  return [fixed $value 3]
 }

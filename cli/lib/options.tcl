@@ -107,6 +107,13 @@ proc ::vorkel::options::refuseOperands {given {most 0}} {
   }
 }
 
+# The words of a command that takes no options, of which `most` are allowed.
+proc ::vorkel::options::operands {words most} {
+  set given [parse {} $words]
+  refuseOperands $given $most
+  return [dict get $given operands]
+}
+
 # The value of an option, or `default` when it was not given.
 proc ::vorkel::options::get {given name default} {
   if {[dict exists $given $name]} {

@@ -7,6 +7,13 @@ package require vorkel::options 1.1
 
 namespace eval ::vorkel::output {}
 
+# Is told before a text is made where it goes: in a file it has no colour.
+proc ::vorkel::output::into {file} {
+  if {$file ni {"" -}} {
+    ::vorkel::colour::off
+  }
+}
+
 # Writes a text to a file, or to standard output when its name is "" or "-". A reader of standard
 # output that has gone away is no failure; that it takes nothing else, such as on a full disk, is
 # thrown as {VORKEL UNWRITTEN}. A file that cannot be written is wrong usage, and one that was

@@ -2,14 +2,18 @@
 
 package provide vorkel::plan 1.1
 package require vorkel::answer 1.1
+package require vorkel::cells 1.1
+package require vorkel::engine 1.1
 package require vorkel::help 1.1
 package require vorkel::numbers 1.1
 package require vorkel::options 1.1
 package require vorkel::output 1.1
+package require vorkel::progress 1.1
 package require vorkel::report 1.1
 package require vorkel::table 1.1
 
 namespace eval ::vorkel::plan {
+  namespace path ::vorkel::cells
   # The variant of the settings that the search over the whole grid has found.
   variable grid_variant "grid, not engine"
 }
@@ -18,8 +22,7 @@ namespace eval ::vorkel::plan {
 proc ::vorkel::plan::run {words} {
   set call [Read $words]
   set request [dict get $call request]
-  set ranked [::vorkel::answer::rank \
-    [::vorkel::answer::all $request [dict get $call primitives]]]
+  set ranked [lindex [Search $call] 0]
   set winner [lindex $ranked 0]
   if {![dict get $winner solved]} {
     Unsolved $call $ranked
@@ -48,9 +51,9 @@ proc ::vorkel::plan::compare {words} {
       use plan, best or the command of a primitive"
   }
   set request [dict get $call request]
-  set engine [::vorkel::answer::rank \
-    [::vorkel::answer::all $request [dict get $call primitives]]]
-  set ranked [::vorkel::answer::rank [concat $engine [Grid $call]]]
+  package require vorkel::grid 1.1
+  lassign [Search $call [::vorkel::engine::ofFamily Loop [dict get $call primitives]]] engine grid
+  set ranked [::vorkel::answer::rank [concat $engine $grid]]
   # Settings that are off do not make up for the lack of an answer.
   if {![dict get [lindex $engine 0] solved] && ![dict get [lindex $ranked 0] within]} {
     Unsolved $call $engine
@@ -60,7 +63,7 @@ proc ::vorkel::plan::compare {words} {
   } else {
     set text [Ranking $ranked]
     append text [Refusals $ranked]
-    if {[lsearch -exact [lmap answer $ranked {dict get $answer source}] grid] >= 0} {
+    if {[llength $grid] > 0} {
       append text "\n" [::vorkel::table::prose "" "A row \"$::vorkel::plan::grid_variant\" is\
         not an answer of the engine: it is the best of all settings that the device allows.\
         best shows it whole."]
@@ -73,9 +76,7 @@ proc ::vorkel::plan::compare {words} {
 
 proc ::vorkel::plan::Read {words} {
   set call [::vorkel::options::request $words]
-  if {[dict get $call file] ne ""} {
-    ::vorkel::colour::off
-  }
+  ::vorkel::output::into [dict get $call file]
   return $call
 }
 
@@ -84,28 +85,35 @@ proc ::vorkel::plan::Unsolved {call answers} {
   set request [dict get $call request]
   set text "no primitive of [dict get $request device] has a configuration for this"
   foreach answer $answers {
-    append text "\n[dict get $answer primitive]: [dict get $answer reason]"
+    append text \n [string trimright [::vorkel::table::prose "[dict get $answer primitive]: " \
+      [dict get $answer reason]] \n]
   }
   append text "\nhint: [::vorkel::help::command explain [dict get $call words]]"
   throw {VORKEL UNSOLVED} $text
 }
 
-# The best settings of the whole grid, a list of answers, for the primitives that have one.
-proc ::vorkel::plan::Grid {call} {
+# The engine's answers, the best first, and the best settings of the whole grid of some primitives,
+# which is searched only for `loops`. A terminal sees how far this has come.
+proc ::vorkel::plan::Search {call {loops {}}} {
   variable grid_variant
-  set answers {}
-  if {[llength [package versions vorkel::grid]] == 0} {
-    return {}
+  set request [dict get $call request]
+  set primitives [dict get $call primitives]
+  set run_steps [expr {[llength $loops] > 0 ? $::vorkel::grid::run_steps : 1}]
+  set steps [expr {[::vorkel::answer::runs $request $primitives] * $run_steps}]
+  foreach primitive $loops {
+    incr steps [::vorkel::grid::steps $request $primitive]
   }
-  package require vorkel::grid 1.1
-  foreach primitive [dict get $call primitives] {
-    if {[::vorkel::engine::family $primitive] ne "Loop"} continue
-    foreach answer [::vorkel::grid::best [dict get $call request] $primitive] {
-      dict set answer variant $grid_variant
-      lappend answers $answer
-    }
+  ::vorkel::progress::start $steps "asking the primitives"
+  try {
+    set engine [::vorkel::answer::rank [::vorkel::answer::all $request $primitives \
+      [list ::vorkel::progress::step $run_steps]]]
+    set grid [concat {*}[lmap primitive $loops {
+      ::vorkel::grid::best $request $primitive $grid_variant ::vorkel::progress::step
+    }]]
+    return [list $engine $grid]
+  } finally {
+    ::vorkel::progress::finish
   }
-  return $answers
 }
 
 # The first answer of each primitive.
@@ -138,15 +146,15 @@ proc ::vorkel::plan::Contest {best} {
     } elseif {$jitter eq "" || $least eq ""} {
       set result ""
     } else {
-      set result "[::vorkel::numbers::fixed [expr {$jitter - $least}] 3] ps more"
+      set result "[::vorkel::numbers::ps [expr {$jitter - $least}]] ps more"
     }
     if {[llength $rows] == 0 && ![dict get $answer within]} {
       set result "winner, but OFF"
     }
-    lappend rows [list [dict get $answer primitive] [Dash [dict get $answer variant]] \
-      [Dash [dict get $answer bandwidth]] [Ppm $answer] [Dash $jitter] $result]
+    lappend rows [list [dict get $answer primitive] [dash [dict get $answer variant]] \
+      [dash [dict get $answer bandwidth]] [ppm $answer] [jitter $answer] $result]
   }
-  return [::vorkel::table::render $columns $rows [Roles $best]]
+  return [::vorkel::table::render $columns $rows [roles $best]]
 }
 
 # The table of all answers that are solved.
@@ -158,43 +166,11 @@ proc ::vorkel::plan::Ranking {ranked} {
   foreach answer $ranked {
     if {![dict get $answer solved]} continue
     lappend shown $answer
-    set vco -
-    if {[dict exists $answer settings VCO]} {
-      set vco [format %.6g [dict get $answer settings VCO]]
-    }
     lappend rows [list [llength $shown] [dict get $answer primitive] \
-      [Dash [dict get $answer variant]] [Dash [dict get $answer bandwidth]] $vco [Ppm $answer] \
-      [Dash [dict get $answer maxJitter]] [expr {[dict get $answer within] ? "" : "OFF"}]]
+      [dash [dict get $answer variant]] [dash [dict get $answer bandwidth]] [vco $answer] \
+      [ppm $answer] [jitter $answer] [mark $answer]]
   }
-  return [::vorkel::table::render $columns $rows [Roles $shown]]
-}
-
-proc ::vorkel::plan::Roles {answers} {
-  set roles {}
-  foreach answer $answers {
-    if {[dict get $answer within]} {
-      lappend roles [expr {[llength $roles] == 0 ? "good" : ""}]
-    } else {
-      lappend roles off
-    }
-  }
-  return $roles
-}
-
-proc ::vorkel::plan::Dash {text} {
-  if {$text eq ""} {
-    return -
-  }
-  return $text
-}
-
-# The worst error of an answer, in at most nine characters.
-proc ::vorkel::plan::Ppm {answer} {
-  set ppm [dict get $answer worstPpm]
-  if {$ppm >= 1e6} {
-    return [format %.3g $ppm]
-  }
-  return [::vorkel::numbers::fixed $ppm 2]
+  return [::vorkel::table::render $columns $rows [roles $shown]]
 }
 
 # Why the first of the best answers of each primitive is before the others.
@@ -215,10 +191,7 @@ proc ::vorkel::plan::Why {best ranked} {
     set text "of [Names $within], whose outputs are all $limit, $name\
       [Advantage $winner [lindex $within 1] "the [dict get [lindex $within 1] primitive]"]"
   }
-  set variants [Within [lmap answer $ranked {
-    if {[dict get $answer primitive] ne $name} continue
-    set answer
-  }]]
+  set variants [Within [::vorkel::answer::ofPrimitive $ranked $name]]
   if {[llength $variants] > 1} {
     append text ". Of its [llength $variants] settings, [Described $winner]\
       [Advantage $winner [lindex $variants 1] "the next"]"
@@ -252,8 +225,7 @@ proc ::vorkel::plan::Within {answers} {
 }
 
 proc ::vorkel::plan::Names {answers} {
-  set names [lmap answer $answers {dict get $answer primitive}]
-  return "[join [lrange $names 0 end-1] {, }] and [lindex $names end]"
+  return [::vorkel::options::enumerate [lmap answer $answers {dict get $answer primitive}]]
 }
 
 # The variant and the bandwidth of an answer, in words.
@@ -270,15 +242,16 @@ proc ::vorkel::plan::Advantage {winner other whose} {
   set jitter [dict get $winner maxJitter]
   set more [dict get $other maxJitter]
   if {$jitter ne "" && $more ne "" && $jitter < $more} {
-    return "has the least jitter, $jitter ps; $whose has $more ps"
+    return "has the least jitter, [::vorkel::numbers::ps $jitter] ps; $whose has\
+      [::vorkel::numbers::ps $more] ps"
   }
   if {$jitter ne "" && $more eq ""} {
-    return "has a jitter that is known, $jitter ps"
+    return "has a jitter that is known, [::vorkel::numbers::ps $jitter] ps"
   }
   set same [expr {$jitter eq "" ? "without a known jitter" : "with the same jitter"}]
   if {[dict exists $winner settings VCO] && [dict exists $other settings VCO] &&
       [dict get $winner settings VCO] < [dict get $other settings VCO]} {
-    return "$same has the lowest VCO, [format %.6g [dict get $winner settings VCO]] MHz"
+    return "$same has the lowest VCO, [vco $winner] MHz"
   }
   return "$same comes first"
 }
@@ -302,9 +275,7 @@ proc ::vorkel::plan::Hints {call winner} {
   if {![dict get $winner solved] || ![dict get $winner within]} {
     append text "hint: what stands in the way: [::vorkel::help::command explain $words]\n"
     # Only PLL and TSYN have a grid of settings.
-    if {"Loop" in [lmap primitive [dict get $call primitives] {
-      ::vorkel::engine::family $primitive
-    }]} {
+    if {[llength [::vorkel::engine::ofFamily Loop [dict get $call primitives]]] > 0} {
       append text "hint: the best settings of all: [::vorkel::help::command best $words]\n"
     }
   }

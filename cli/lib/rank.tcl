@@ -1,6 +1,7 @@
 # All that the primitives of a device make of a request, and which of it is the best.
 
 package provide vorkel::rank 1.1
+package require vorkel::engine 1.1
 
 namespace eval ::vorkel::answer {
   # The searches that a primitive is worth (see solve). A PLL or a TSYN that is asked for no
@@ -48,7 +49,7 @@ proc ::vorkel::answer::all {request {primitives ""} {tick list}} {
 proc ::vorkel::answer::runs {request primitives} {
   set runs 0
   foreach primitive $primitives {
-    incr runs [llength [Variants $request $primitive]]
+    incr runs [llength [variants $request $primitive]]
   }
   return $runs
 }
@@ -57,7 +58,7 @@ proc ::vorkel::answer::Answers {request primitive tick} {
   set seen {}
   set solved {}
   set unsolved {}
-  foreach variant [Variants $request $primitive] {
+  foreach variant [variants $request $primitive] {
     set answer [solve $request $primitive $variant]
     {*}$tick
     if {![dict get $answer solved]} {
@@ -79,16 +80,21 @@ proc ::vorkel::answer::Answers {request primitive tick} {
   return [list $answer]
 }
 
-# The variants for a primitive that do not contradict what the user has set.
-proc ::vorkel::answer::Variants {request primitive} {
-  variable searches
+# The bandwidths of a loop that a request leaves open.
+proc ::vorkel::answer::widths {request} {
   variable bandwidths
+  if {[dict get $request bandwidthAsked]} {
+    return [list [dict get $request bandwidth]]
+  }
+  return $bandwidths
+}
+
+# The variants for a primitive that do not contradict what the user has set.
+proc ::vorkel::answer::variants {request primitive} {
+  variable searches
   set variants {}
   set loop [expr {[::vorkel::engine::family $primitive] eq "Loop"}]
-  set widths [list [dict get $request bandwidth]]
-  if {$loop && !([dict exists $request bandwidthAsked] && [dict get $request bandwidthAsked])} {
-    set widths $bandwidths
-  }
+  set widths [expr {$loop ? [widths $request] : [list [dict get $request bandwidth]]}]
   foreach search [dict get $searches $primitive] {
     if {[Contradicts $request $search $loop]} continue
     foreach width $widths {
@@ -110,6 +116,14 @@ proc ::vorkel::answer::Contradicts {request search loop} {
   }
   return [expr {[dict exists $search smallest] && ([isAsked $request phase] ||
     [isAsked $request duty])}]
+}
+
+# Those of some answers that are of a primitive.
+proc ::vorkel::answer::ofPrimitive {answers primitive} {
+  return [lmap answer $answers {
+    if {[dict get $answer primitive] ne $primitive} continue
+    set answer
+  }]
 }
 
 # What makes an answer the same as another.

@@ -4,6 +4,8 @@
 # remainder, so its own figures can lie beside them; they are shown where they do.
 
 package provide vorkel::report 1.1
+package require vorkel::cells 1.1
+package require vorkel::engine 1.1
 package require vorkel::kru_report 1.1
 package require vorkel::notes 1.1
 package require vorkel::numbers 1.1
@@ -28,7 +30,7 @@ proc ::vorkel::report::render {answer} {
   }
   set error [dict get $answer phaseError]
   if {$error ne ""} {
-    lappend pairs {phase error} "$error ps"
+    lappend pairs {phase error} "[::vorkel::numbers::ps $error] ps"
   }
   set text [::vorkel::table::pairs $pairs]\n[Outputs $answer]
   set shapes [Shapes $answer]
@@ -56,7 +58,7 @@ proc ::vorkel::report::Summary {answer} {
     M [::vorkel::numbers::short $m 3] D $d]
   if {[::vorkel::timing::isKnown [dict get $answer timing]]} {
     lappend pairs bandwidth [dict get $answer bandwidth] \
-      {input jitter} "[::vorkel::numbers::short [dict get $answer inputJitter] 3] ps"
+      {input jitter} "[::vorkel::numbers::short [dict get $answer inputJitter] 6] ps"
   }
   return $pairs
 }
@@ -98,7 +100,7 @@ proc ::vorkel::report::Outputs {answer} {
       [::vorkel::numbers::fixed [dict get $output actual] $decimals] \
       [::vorkel::numbers::fixed [dict get $output ppm] 2]]
     if {$known} {
-      lappend row [Cell [dict get $output jitter] 3]
+      lappend row [::vorkel::cells::ps [dict get $output jitter]]
     }
     if {$marks} {
       lappend row [Mark $output $frequency_errors]
@@ -175,16 +177,16 @@ proc ::vorkel::report::IsOther {outputs key usual} {
 # What was asked for, what comes out, and the difference; "-" where nothing was asked for.
 proc ::vorkel::report::Asked {output requested actual error} {
   return [lmap key [list $requested $actual $error] {
-    Cell [dict get $output $key] 3
+    Cell [dict get $output $key]
   }]
 }
 
-# A number in a table, "-" for none.
-proc ::vorkel::report::Cell {value decimals} {
+# A phase or a duty cycle in a table, "-" for none.
+proc ::vorkel::report::Cell {value} {
   if {$value eq ""} {
     return -
   }
-  return [::vorkel::numbers::fixed $value $decimals]
+  return [::vorkel::numbers::fixed $value 3]
 }
 
 # The mark of an output some of whose errors is larger than it may be.

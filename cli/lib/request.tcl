@@ -5,7 +5,6 @@ package provide vorkel::request 1.1
 package require vorkel::catalogue 1.1
 package require vorkel::command_options 1.1
 package require vorkel::engine 1.1
-package require vorkel::numbers 1.1
 package require vorkel::options 1.1
 package require vorkel::units 1.1
 

@@ -16,9 +16,7 @@ proc ::vorkel::synthesis::run {primitive words} {
   if {[dict get $request trace] && [dict get $call format] ne "text"} {
     throw {VORKEL USAGE} "--trace goes with --format text only"
   }
-  if {[dict get $call file] ne ""} {
-    ::vorkel::colour::off
-  }
+  ::vorkel::output::into [dict get $call file]
   set answer [::vorkel::answer::solve $request $primitive]
   if {![dict get $answer solved]} {
     throw {VORKEL UNSOLVED} [dict get $answer reason]

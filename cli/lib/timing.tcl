@@ -18,7 +18,7 @@ namespace eval ::vorkel::timing {
 proc ::vorkel::timing::of {request solution} {
   set part [dict get $request part]
   set questions [Questions $request $solution]
-  if {![HasCalculator $part]} {
+  if {![hasCalculator $part]} {
     return [Nothing $questions "$part has no calculator coefficients"]
   }
   set figures [dict create jitters {} phaseError "" refusals {}]
@@ -39,7 +39,7 @@ proc ::vorkel::timing::of {request solution} {
 
 # Whether a part has a calculator. Without one the engine complains of each question on the
 # standard error of the process, where no script can keep it from appearing.
-proc ::vorkel::timing::HasCalculator {part} {
+proc ::vorkel::timing::hasCalculator {part} {
   variable calculators
   if {![dict exists $calculators $part]} {
     set device [::vorkel::catalogue::resolve $part]

@@ -16,7 +16,7 @@ namespace eval ::vorkel::units {
       check positive units {hz {/ 1e6} khz {/ 1e3} mhz {* 1.0} ghz {* 1e3}
         ps {by 1e6} ns {by 1e3} us {by 1.0} ms {by 1e-3}}
       known "Hz, kHz, MHz and GHz, or ps, ns, us and ms for a period"
-      range {1e-6 1e6} bounds "1 Hz to 1 THz"}
+      range {1e-6 1e6} bounds "1 Hz to 1000 GHz"}
     phase {unit degrees article "a phase" examples "90, 90deg or -45"
       check turn units {deg {* 1.0} degree {* 1.0} degrees {* 1.0} ° {* 1.0}} known "deg"}
     duty {unit percent article "a duty cycle" examples "50, 50% or 33.3"
@@ -39,8 +39,8 @@ proc ::vorkel::units::value {text kind what} {
 }
 
 # The values of a text with commas between them. With `optional` an entry may be "-"; it is ""
-# in the answer. Where a period or a multiple is written with some entry, one without a unit
-# would be a trap: who writes "8,16 ns" means both.
+# in the answer. Where some entry is in another unit than numbers without one, an entry without a
+# unit would be a trap: who writes "8,16 ns" means both.
 proc ::vorkel::units::values {text kind what {optional 0}} {
   variable kinds
   variable none
@@ -61,15 +61,17 @@ proc ::vorkel::units::values {text kind what {optional 0}} {
     if {$unit eq ""} {
       set bare $entry
     } elseif {$rule ne {* 1.0}} {
-      set strange $entry
+      set strange [list $entry $unit]
     }
   }
   if {[llength $values] == 0} {
     throw {VORKEL USAGE} "$what: the list is empty"
   }
   if {$bare ne "" && $strange ne ""} {
-    throw {VORKEL USAGE} "$what: is \"$bare\" beside \"$strange\" meant in\
-      [dict get $kinds $kind unit]? Write the unit of each"
+    lassign $strange other unit
+    set usual [dict get $kinds $kind unit]
+    throw {VORKEL USAGE} "$what: \"$bare\" has no unit, and beside \"$other\" it could be in\
+      $usual or in $unit; write $bare$usual or $bare$unit"
   }
   return $values
 }
