@@ -37,7 +37,7 @@ struct PtrHandleBase::Visible {
     explicit Running(Visible* visible) : visible_(visible) { ++visible_->running_; }
     ~Running() {
       --visible_->running_;
-      visible_->Settle();
+      if (visible_->command_ == nullptr) visible_->Settle();
     }
     Running(const Running&) = delete;
     Running& operator=(const Running&) = delete;

@@ -39,7 +39,6 @@ class WordList {
   // `objv` must outlive the list. `objc` is at least 1; objv[0], the word by which the script
   // called `self`, is not looked at.
   WordList(const Handle* self, int objc, Tcl_Obj* const objv[]);
-  ~WordList();
   WordList(const WordList&) = delete;
   WordList& operator=(const WordList&) = delete;
 
@@ -48,10 +47,9 @@ class WordList {
  private:
   static constexpr std::size_t kInlineWords = 16;
 
-  std::size_t word_count_;  // not counting the handle that is called
-  WordHandle* words_;
   const Handle** handles_;
-  // The places of the two arrays above: inline, or for long calls on the heap.
+  // The places of the words and of the array above: inline, or for long calls on the heap. The
+  // words own nothing, so they end with their places, without their destructors.
   alignas(WordHandle) std::array<std::byte, kInlineWords * sizeof(WordHandle)> inline_words_;
   std::array<const Handle*, kInlineWords> inline_handles_;
   std::unique_ptr<std::byte[]> heap_words_;
