@@ -94,10 +94,10 @@ INSTANTIATE_TEST_SUITE_P(
     Kinds, PllCompare,
     testing::Values(Load{Kind::kCommon, 800, 8, 20000, 60, 3},
                     Load{Kind::kConstructed, 1500, 4, 40000, 60, 2},
-                    Load{Kind::kShifted, 400, 16, 15000, 120, 5},
+                    Load{Kind::kShifted, 400, 16, 15000, 200, 5},
                     Load{Kind::kRangeEnds, 600, 4, 15000, 30, 3},
-                    Load{Kind::kInfeasible, 100, 12, 4000, 60, 6},
-                    Load{Kind::kLowOutput, 200, 6, 5000, 60, 4},
+                    Load{Kind::kInfeasible, 100, 12, 4000, 200, 6},
+                    Load{Kind::kLowOutput, 200, 6, 5000, 150, 4},
                     Load{Kind::kWild, 800, 4, 15000, 20, 3}),
     [](const testing::TestParamInfo<Load>& parameter) {
       return KindName(parameter.param.kind);
