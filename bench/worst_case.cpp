@@ -24,8 +24,9 @@ namespace {
 
 using compare::Kind;
 
-constexpr Kind kKinds[] = {Kind::kCommon,     Kind::kConstructed, Kind::kShifted, Kind::kRangeEnds,
-                           Kind::kInfeasible, Kind::kLowOutput,   Kind::kWild};
+constexpr Kind kKinds[] = {Kind::kCommon,      Kind::kConstructed,  Kind::kShifted,
+                           Kind::kRangeEnds,   Kind::kMeetingEnds,  Kind::kRoundFigures,
+                           Kind::kInfeasible,  Kind::kLowOutput,    Kind::kWild};
 constexpr int kRequestsOfKind = 20'000;
 constexpr unsigned kSeedsOfKind = 1'000'003;
 

@@ -17,8 +17,15 @@ constexpr double kLargestOutFreq0 = 1e9;
 // errors to be bounded.
 constexpr double kSmallestFrequency = 1e-200;
 
+// An M and a D need a VCO and an input frequency on the same side of 0. Nobody has clocks below it;
+// the filter works above only.
+bool IsBelowZero(const VorkelImp& imp, const Run& run) {
+  return run.inFreq < 0.0 && imp.pll.minAdjVco < 0.0;
+}
+
 bool CanSucceed(const VorkelImp& imp, const Run& run, const VcoRanking& ranking) {
-  // M and D need a VCO above 0. Fudges end at 11 MHz and dividers begin at 1.
+  if (IsBelowZero(imp, run)) return true;
+  // Fudges end at 11 MHz and dividers begin at 1.
   const double outFreq0 = imp.requests.reqOutFreq[0];
   if (!(outFreq0 >= -11.0 && outFreq0 - 11.0 <= imp.pll.maxAdjVco)) return false;
   // So small an input frequency needs as small a VCO; but output 0 shifted by a fudge is 0, or
@@ -35,7 +42,8 @@ bool CanSucceed(const VorkelImp& imp, const Run& run, const VcoRanking& ranking)
 // (MHz; the step is negative in downward attempts) for output 0.
 class PassFilter::Attempts {
  public:
-  Attempts(double first, double step, int count) : first_(first), perMHz_(1.0 / step), count_(count) {
+  Attempts(double first, double step, int count)
+      : first_(first), perMHz_(1.0 / step), count_(count) {
     const double last = first + step * (count - 1);
     const double around = std::fabs(step);
     slowest_ = std::min(first, last) - around;
@@ -53,15 +61,15 @@ class PassFilter::Attempts {
 
   // The attempts with an output 0 from `low` to `high` MHz; those that may have it, and those that
   // have it for certain. None when `first` is above `last`.
-  struct Run {
+  struct Span {
     int first;
     int last;
   };
-  struct Runs {
-    Run possible;
-    Run sure;
+  struct Spans {
+    Span possible;
+    Span sure;
   };
-  Runs Between(double low, double high) const {
+  Spans Between(double low, double high) const {
     const double a = (low - first_) * perMHz_;
     const double b = (high - first_) * perMHz_;
     const double begin = std::min(a, b);
@@ -98,7 +106,7 @@ PassFilter::PassFilter(const VorkelImp& imp, const Run& run, double fudgeStep)
       steps_(HasIntegerDiv0(imp, run)),
       ranking_(RankVcos(imp, run)),
       hopeless_(!CanSucceed(imp, run, ranking_)),
-      applies_(std::fabs(outFreq0_) <= kLargestOutFreq0) {}
+      applies_(std::fabs(outFreq0_) <= kLargestOutFreq0 && !IsBelowZero(imp, run)) {}
 
 bool PassFilter::MaySucceed(double fudge) {
   if (!applies_) return true;
@@ -124,7 +132,7 @@ void PassFilter::WorkOutAttempts(const Attempts& attempts, const Attempts* next)
   undecided.InsertRange(0, chunk_ - 1);
   undecided.Remove(maybe_);
   AttemptSet putOut;                 // by what is in the ranking up to here
-  AttemptSet untouched = undecided;  // surely without a candidate in it
+  AttemptSet untouched = undecided;  // surely without a candidate in it so far
   ToleranceKey key = 0;
   for (const RankedRange& range : ranking_) {
     if (range.key != key) {
@@ -133,24 +141,24 @@ void PassFilter::WorkOutAttempts(const Attempts& attempts, const Attempts* next)
       if (undecided.IsEmpty()) return;
     }
     if (range.kind == RankedRange::Kind::kAccepted) {
-      VisitSteps(range, attempts, [&](int, const Attempts::Runs& runs) {
-        undecided.EraseRange(runs.possible.first, runs.possible.last, [&](int attempt) {
+      VisitSteps(range, attempts, [&](int, const Attempts::Spans& spans) {
+        undecided.EraseRange(spans.possible.first, spans.possible.last, [&](int attempt) {
           // What the attempt before has left may put it out.
           if (key <= left_[static_cast<std::size_t>(attempt)]) maybe_.Insert(attempt);
         });
       });
       continue;
     }
-    VisitSteps(range, attempts, [&](int step, const Attempts::Runs& runs) {
-      putOut.InsertRange(runs.sure.first, runs.sure.last);
+    VisitSteps(range, attempts, [&](int step, const Attempts::Spans& spans) {
+      putOut.InsertRange(spans.sure.first, spans.sure.last);
       if (next == nullptr) return;
       if (range.kind == RankedRange::Kind::kUnserved) {
         const int first = next->FirstBelow(imp_.pll.minAdjVco / steps_[step]);
-        untouched.EraseRange(std::max(first, runs.sure.first), runs.sure.last, [&](int attempt) {
+        untouched.EraseRange(std::max(first, spans.sure.first), spans.sure.last, [&](int attempt) {
           left_[static_cast<std::size_t>(attempt)] = key;
         });
       }
-      untouched.EraseRange(runs.possible.first, runs.possible.last);
+      untouched.EraseRange(spans.possible.first, spans.possible.last);
     });
   }
 }
@@ -163,8 +171,8 @@ void PassFilter::VisitSteps(const RankedRange& range, const Attempts& attempts,
   for (int step = steps_.Below(range.low / attempts.Fastest()); step < steps_.Count(); ++step) {
     const double divider = steps_[step];
     if (attempts.Slowest() * divider > range.high) return;
-    const Attempts::Runs runs = attempts.Between(range.low / divider, range.high / divider);
-    if (runs.possible.first <= runs.possible.last) visit(step, runs);
+    const Attempts::Spans spans = attempts.Between(range.low / divider, range.high / divider);
+    if (spans.possible.first <= spans.possible.last) visit(step, spans);
   }
 }
 

@@ -8,9 +8,9 @@
 //
 // An attempt succeeds only if a candidate that the divider search keeps has an M and a D. What
 // the divider search does with a VCO frequency depends on no fudge: VcoRanking has the
-// frequencies, in ranges, in the order in which it prefers them. The first range of the ranking
-// that has a candidate of the attempt decides. Its candidates put out all that come after; if
-// none of them can have an M, a D and all dividers, the attempt fails.
+// frequencies, in ranges, in the order in which it prefers them. The first key of the ranking that
+// a candidate of the attempt has decides. The candidates with that key put out all others; if none
+// of them can have an M, a D and all dividers, the attempt fails.
 //
 // The ranges are not looked up for each attempt, but the attempts for each range: a range [low,
 // high] and a divider step s are met by the fudges that bring output 0 into [low / s, high / s],
@@ -19,21 +19,24 @@
 //
 // Example: 100 MHz in, PLL, outputs 197 and 70 MHz, VCO 400 to 1080 MHz. Of the candidates 591,
 // 788 and 985 MHz, only 985 MHz is within one percent of a multiple of 70 MHz, as is 5 times any
-// output 0 from 194.04 to 197.96 MHz. M and D accept only 979.902 to 980.098 MHz of that, 100 x
-// 49 / 5 and its surroundings, or an output 0 from 195.98 to 196.02 MHz. So the upward attempts are
-// a "no" up to a fudge of 0.96 MHz at least, the downward ones up to 0.98; at 0.981 there is a
-// "maybe".
+// output 0 from 194.04 to 197.96 MHz. The nearest window that M and D leave there is 979.902 to
+// 980.098 MHz, 100 x 49 / 5 and its surroundings, or an output 0 from 195.98 to 196.02 MHz. So the
+// upward attempts are a "no" up to a fudge of 0.96 MHz at least, the downward ones up to 0.98; at
+// 0.981 there is a "maybe".
 //
-// The upward and the downward attempt of a pass have one candidate table. If the divider search of
-// the upward attempt ends because an output has no divider, what it then had takes part in the
-// downward one where no new candidate takes its slot. It still lacks the divider, so it can only
-// put out others. The filter counts on that, too: it notes the keys of what is left.
+// The upward and the downward attempt of a pass have one candidate table. An upward attempt that
+// fails because an output has no divider leaves in it the candidates that it then had. They still
+// lack the divider; and where they have a smaller key than all new ones, they put these out, and
+// the downward attempt fails at the same output. The filter notes what is left if it is certain:
+// that no candidate of the upward attempt has a smaller key, and that no new one takes the slot,
+// since the VCO of the step is then below the VCO range.
 //
-// Why a "no" is safe. A range counts as met where it may succeed if it is met at all, with a
-// margin around it, and where it puts out others only if it is met inside a margin. The margin
-// is a hundred times what all roundings, in the ends of the ranges, here and in the search, can
-// come to. What lies inside the margins of a range that is not accepted makes it unsure what is
-// left for the downward attempt, and then nothing is taken to be left.
+// Why a "no" is safe. The ranges are met with a margin, a hundred times what all roundings in
+// their ends, here and in the search can come to. A range where an attempt may succeed is met
+// where a candidate may lie in it, margins included; one that puts others out is met only where a
+// candidate lies in it for certain, within its margins; and for certain there is no candidate with
+// a smaller key where none is even in the margins of the ranges with smaller keys. A point puts
+// out nothing: nothing lies there for certain.
 //
 // Tested by pass_filter_test.cpp, and by comparing whole answers with a plain search.
 #ifndef VORKEL_ENGINE_PLL_PASSFILTER_H_

@@ -13,30 +13,56 @@ namespace Ip::Pll {
 namespace {
 
 constexpr int kKeyBits = 5;  // for tolerance numbers 0 to kTolerances
-constexpr ToleranceKey kDigit = (1u << kKeyBits) - 1;
-static_assert(kTolerances < kDigit && kKeyBits * (MAX_OUTPUTS - 1) < 32);
+static_assert(kTolerances < (1 << kKeyBits) && kKeyBits * (MAX_OUTPUTS - 1) < 32);
 
 constexpr double kNoLimit = std::numeric_limits<double>::infinity();
 
-// What two frequencies that are computed in different ways may differ by, relative.
+// What two frequencies that are computed in different ways may differ by, relative; and the bounds
+// that leave room for both of them.
 constexpr double kRounding = 1e-12;
+constexpr double kSlack = 4.0 * kRounding;
 
-// No VCO below it, in MHz, has an M and a D; so its key does not matter.
+bool AreClose(double a, double b) { return std::fabs(a - b) <= kRounding * std::fabs(b); }
+
+// No candidate lies below it, in MHz, and above 0: output 0, shifted by a fudge, is 0 or as large
+// as the rounding of the fudge at least.
 constexpr double kSmallestVco = 1e-200;
 
-// A stretch of VCO frequencies, MHz, with one key.
+// A stretch of VCO frequencies, MHz, with one key; or a point.
 struct Stretch {
   double low;
   double high;
   ToleranceKey key;
   bool isServed;
+
+  void AppendDigit(int digit) {
+    key = key << kKeyBits | static_cast<ToleranceKey>(isServed ? digit : 0);
+    isServed = isServed && digit < kTolerances;
+  }
 };
 using Stretches = std::vector<Stretch>;
 
-// Visits the upper ends, in rising order, of the stretches of output n alone, and their digits.
-// Some have the same end or the same digit as the one before.
+// Visits the ends, in rising order, of the stretches that a divider of an output makes, with the
+// digit below each end. `f` is the requested frequency and `end`, the last of them, the VCO at which
+// the next divider takes over, MHz.
 template <typename Visit>
-void VisitDigits(const VorkelImp& imp, int n, Visit visit) {
+void VisitDivider(double divider, double f, const OutputRange& range, double end, Visit visit) {
+  const double served = std::min(divider * range.max, end);
+  visit(std::min(divider * range.min, end), kTolerances);
+  for (int t = 1 - kTolerances; t < kTolerances; ++t) {
+    if (t == 0) continue;
+    const double x = divider * f * (t < 0 ? 1.0 - Tolerance(-t) : 1.0 + Tolerance(t));
+    visit(std::min(x, served), t < 0 ? 1 - t : t);
+    if (x <= served * (1.0 + kRounding)) continue;
+    if (served == end) return;
+    break;
+  }
+  visit(end, kTolerances);
+}
+
+// The same for all dividers of output n that the VCO range can need. The last end is infinite.
+template <typename Visit>
+void VisitEnds(const VorkelImp& imp, int n, Visit visit) {
   const double f = imp.requests.reqOutFreq[static_cast<std::size_t>(n)];
   const OutputRange range = RangeOfOutput(imp.pllLimits, n);
   if (range.min <= range.max && std::isfinite(f)) {
@@ -48,114 +74,114 @@ void VisitDigits(const VorkelImp& imp, int n, Visit visit) {
       const double first = std::floor(imp.pll.minAdjVco / f) - 1.0;
       for (double divider = std::clamp(first, 1.0, kLargestDivider);
            divider <= kLargestDivider && (divider - 1.0) * f <= imp.pll.maxAdjVco; divider += 1.0) {
-        const double end = divider == kLargestDivider ? kNoLimit : (divider + 0.5) * f;
-        const double served = std::min(divider * range.max, end);
-        visit(std::min(divider * range.min, end), kTolerances);
-        for (int digit = kTolerances - 1; digit >= 1; --digit) {
-          visit(std::min(divider * f * (1.0 - Tolerance(digit)), served), digit + 1);
-        }
-        for (int digit = 1; digit < kTolerances; ++digit) {
-          visit(std::min(divider * f * (1.0 + Tolerance(digit)), served), digit);
-        }
-        visit(end, kTolerances);
+        VisitDivider(divider, f, range,
+                     divider == kLargestDivider ? kNoLimit : (divider + 0.5) * f, visit);
       }
     }
   }
   visit(kNoLimit, kTolerances);
 }
 
-// Appends the digit of output n to the keys and cuts the stretches where it changes.
-Stretches CutByOutput(const VorkelImp& imp, int n, const Stretches& stretches) {
+// Appends the digit of output n to the keys and cuts the stretches where it changes. Where ends
+// meet goes to `points`.
+Stretches CutByOutput(const VorkelImp& imp, int n, const Stretches& stretches,
+                      std::vector<double>& points) {
   Stretches cut;
   cut.reserve(2 * stretches.size());
   auto stretch = stretches.begin();
   double low = stretch->low;
-  VisitDigits(imp, n, [&](double high, int digit) {
+  VisitEnds(imp, n, [&](double high, int digit) {
+    if (AreClose(high, low)) points.push_back(low);
     while (stretch != stretches.end() && low < high) {
-      const double end = std::min(high, stretch->high);
-      const bool isServed = stretch->isServed && digit < kTolerances;
-      const ToleranceKey key =
-          stretch->key << kKeyBits | static_cast<ToleranceKey>(stretch->isServed ? digit : 0);
-      if (!cut.empty() && cut.back().key == key) {
-        cut.back().high = end;
+      if (AreClose(high, stretch->high)) points.push_back(high);
+      Stretch piece = {low, std::min(high, stretch->high), stretch->key, stretch->isServed};
+      piece.AppendDigit(digit);
+      low = piece.high;
+      if (low == stretch->high) ++stretch;
+      if (!cut.empty() && cut.back().key == piece.key) {
+        cut.back().high = piece.high;
       } else {
-        cut.push_back({low, end, key, isServed});
+        cut.push_back(piece);
       }
-      low = end;
-      if (end == stretch->high) ++stretch;
     }
   });
   return cut;
 }
 
-// The VCO range in stretches; none when it is empty.
-Stretches FindStretches(const VorkelImp& imp, int count) {
+// The VCO range in stretches, none when it is empty; and where ends meet.
+Stretches FindStretches(const VorkelImp& imp, int count, std::vector<double>& points) {
   const double low = std::max(imp.pll.minAdjVco, kSmallestVco);
-  if (!(low <= imp.pll.maxAdjVco)) return {};
+  if (!(low <= imp.pll.maxAdjVco && std::isfinite(low))) return {};
   Stretches stretches = {{low, imp.pll.maxAdjVco, 0, true}};
-  for (int n = 1; n < count; ++n) stretches = CutByOutput(imp, n, stretches);
+  for (int n = 1; n < count; ++n) stretches = CutByOutput(imp, n, stretches, points);
   return stretches;
 }
 
-// The multiples, MHz, of the outputs after output 0 that lie in the VCO range, rising.
-std::vector<double> FindMultiples(const VorkelImp& imp, int count) {
-  std::vector<double> multiples;
+// Adds the multiples, MHz, of the outputs after output 0 that lie in the VCO range.
+void AddMultiples(const VorkelImp& imp, int count, std::vector<double>& points) {
   for (int n = 1; n < count; ++n) {
     const double f = imp.requests.reqOutFreq[static_cast<std::size_t>(n)];
     if (!(f > 0.0 && std::isfinite(f))) continue;
     const double first = std::floor(imp.pll.minAdjVco / f);
     for (double divider = std::max(first, 1.0); divider <= kLargestDivider; divider += 1.0) {
       if (divider * f > imp.pll.maxAdjVco * (1.0 + kRounding)) break;
-      multiples.push_back(divider * f);
+      points.push_back(divider * f);
     }
   }
-  std::sort(multiples.begin(), multiples.end());
-  multiples.erase(std::unique(multiples.begin(), multiples.end()), multiples.end());
-  return multiples;
 }
 
-// The smallest key that a VCO in the stretch and at the point can have.
-ToleranceKey KeyOfPoint(const VorkelImp& imp, int count, const Stretch& stretch, double point) {
-  ToleranceKey key = stretch.key;
-  for (int n = count - 1, shift = 0; n >= 1; --n, shift += kKeyBits) {
-    const double ratio = point / imp.requests.reqOutFreq[static_cast<std::size_t>(n)];
-    const bool isMultiple = std::fabs(ratio - std::round(ratio)) <= kRounding * ratio;
-    if (isMultiple && (key >> shift & kDigit) == 1) key &= ~(kDigit << shift);
+// The smallest digit of an output that a VCO has which may be the point, but for rounding.
+int DigitOfPoint(double point, double f, const OutputRange& range) {
+  const OutputRange wide = {range.min - kSlack * std::fabs(range.min),
+                            range.max + kSlack * std::fabs(range.max)};
+  int digit = kTolerances;
+  for (const double vco : {point * (1.0 - kRounding), point * (1.0 + kRounding)}) {
+    const OutputFit fit = FitOutput(vco, f, wide);
+    const bool isMultiple = fit.tolerance == 1 && fit.diff <= kSlack * f;
+    digit = std::min(digit, isMultiple ? 0 : fit.tolerance);
   }
-  return key;
+  return digit;
+}
+
+Stretch MakePoint(const VorkelImp& imp, int count, double point) {
+  Stretch made = {point, point, 0, true};
+  for (int n = 1; n < count; ++n) {
+    made.AppendDigit(DigitOfPoint(point, imp.requests.reqOutFreq[static_cast<std::size_t>(n)],
+                                  RangeOfOutput(imp.pllLimits, n)));
+  }
+  return made;
+}
+
+// The stretches and the points, rising.
+Stretches FindStretchesAndPoints(const VorkelImp& imp, int count) {
+  std::vector<double> points;
+  Stretches all = FindStretches(imp, count, points);
+  if (all.empty()) return all;
+  AddMultiples(imp, count, points);
+  std::sort(points.begin(), points.end());
+  points.erase(std::unique(points.begin(), points.end()), points.end());
+  for (const double point : points) all.push_back(MakePoint(imp, count, point));
+  std::sort(all.begin(), all.end(),
+            [](const Stretch& a, const Stretch& b) { return a.low < b.low; });
+  return all;
 }
 
 }  // namespace
 
 VcoRanking RankVcos(const VorkelImp& imp, const Run& run) {
-  using Kind = RankedRange::Kind;
   VcoRanking ranking;
   const VcoWindows windows = FindVcoWindows(imp, run);
   if (windows.empty()) return ranking;
-  const std::vector<double> multiples = FindMultiples(imp, run.count);
-
   auto window = windows.begin();
-  auto multiple = multiples.begin();
-  for (const Stretch& stretch : FindStretches(imp, run.count)) {
-    const Kind kind = stretch.isServed ? Kind::kServed : Kind::kUnserved;
-    ranking.push_back({stretch.low, stretch.high, stretch.key, kind});
+  for (const Stretch& stretch : FindStretchesAndPoints(imp, run.count)) {
+    using Kind = RankedRange::Kind;
+    ranking.push_back({stretch.low, stretch.high, stretch.key,
+                       stretch.isServed ? Kind::kServed : Kind::kUnserved});
+    if (!stretch.isServed) continue;
     while (window != windows.end() && window->high < stretch.low) ++window;
-    auto accepted = window;
-    auto add = [&](double low, double high, ToleranceKey key) {
-      while (accepted != windows.end() && accepted->high < low) ++accepted;
-      for (auto w = accepted; stretch.isServed && w != windows.end() && w->low <= high; ++w) {
-        ranking.push_back({std::max(low, w->low), std::min(high, w->high), key, Kind::kAccepted});
-      }
-    };
-    add(stretch.low, stretch.high, stretch.key);
-
-    accepted = window;
-    while (multiple != multiples.end() && *multiple < stretch.low * (1.0 - kRounding)) ++multiple;
-    for (auto point = multiple; point != multiples.end(); ++point) {
-      if (*point > stretch.high * (1.0 + kRounding)) break;
-      const ToleranceKey key = KeyOfPoint(imp, run.count, stretch, *point);
-      ranking.push_back({*point, *point, key, kind});
-      add(*point, *point, key);
+    for (auto w = window; w != windows.end() && w->low <= stretch.high; ++w) {
+      ranking.push_back({std::max(stretch.low, w->low), std::min(stretch.high, w->high),
+                         stretch.key, Kind::kAccepted});
     }
   }
   std::sort(ranking.begin(), ranking.end(), [](const RankedRange& a, const RankedRange& b) {

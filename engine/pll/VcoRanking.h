@@ -12,11 +12,16 @@
 // little; so it keeps tolerance number 5. The stretch goes from 399 MHz, where 5 percent are
 // missing, to 403.2 MHz, where it is 4.
 //
-// Only the multiples of an output keep its tolerance 0. The stretches are as if they kept 1, and
-// the multiples are in the ranking as points beside them.
+// An end has the key of a stretch beside it, but a VCO at which ends meet - of one output, of two,
+// or of an output and the VCO range - can have a smaller key than the stretches on both sides,
+// since tolerances and ranges include their ends. And only the multiples of an output keep its
+// tolerance 0; the stretches are as if they kept 1. Such VCOs are points of the ranking, each with
+// the smallest key that it can have. Example: outputs 1 and 2 of 3.125 and 400 MHz, as low and as
+// high as the device allows: 400 MHz, 128 times the one and once the other, is the only VCO for
+// both.
 //
-// The ends of stretches are off by some 1e-15 of the frequency. Whoever uses them has to allow for
-// that. The ends of what has an M and a D are outer bounds already.
+// The ends of stretches and the points are off by some 1e-15 of the frequency. Whoever uses them
+// has to allow for that. The ends of what has an M and a D are outer bounds already.
 //
 // Tested by vco_ranking_test.cpp.
 #ifndef VORKEL_ENGINE_PLL_VCORANKING_H_
@@ -36,12 +41,10 @@ using ToleranceKey = std::uint32_t;
 // A range of VCO frequencies, MHz, with both ends.
 struct RankedRange {
   enum class Kind : std::uint8_t {
-    kAccepted,  // part of a stretch, or a point, with dividers for all outputs, an M and a D
+    kAccepted,  // part of a stretch, or a point, that may have an M, a D and all dividers
     kServed,    // a whole stretch, or a point, with dividers for all outputs
     kUnserved,  // likewise, but some output has no divider
   };
-
-  bool IsPoint() const { return low == high; }
 
   double low;
   double high;
@@ -49,7 +52,8 @@ struct RankedRange {
   Kind kind;
 };
 
-// Sorted by key, then by kind, then rising. Without a range that is accepted, no candidate at all is.
+// Sorted by key, then by kind, then rising. Without a range that is accepted, no VCO above 0 has an
+// M, a D and all dividers.
 using VcoRanking = std::vector<RankedRange>;
 
 // The ranking for a run whose VCO range is prepared and whose primitive is that of the process.

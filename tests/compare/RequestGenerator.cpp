@@ -35,23 +35,26 @@ std::string Join(const std::vector<std::string>& words) {
   return list;
 }
 
-plain::PllLimits DrawLimits(int prim, Random& random) {
+// Limits as devices have them, fast and slow ones.
+plain::PllLimits DeviceLimits(int prim, bool fast) {
+  const bool tsyn = prim == plain::kPrimTsyn;
   plain::PllLimits limits;
-  if (random.OneIn(3)) {
-    // Limits as devices have them.
-    const bool tsyn = prim == plain::kPrimTsyn;
-    limits.vcoMin = tsyn ? 600 : 400;
-    limits.vcoMax = tsyn ? 1440 : 1080;
-    limits.clkoutMin = tsyn ? 4.6875 : 3.125;
-    limits.clkoutMax = tsyn ? 800 : 400;
-    limits.pfdMin = tsyn ? 10 : 19;
-    limits.pfdMax = 500;
-    limits.clkoutMaxIo = 1080;
-    limits.maxHighLowCount = 64;
-    limits.vcoTarget = 1000;
-    limits.maxPfdLowB = 300;
-    return limits;
-  }
+  limits.vcoMin = tsyn ? 600 : 400;
+  limits.vcoMax = tsyn ? (fast ? 1440 : 1200) : (fast ? 1080 : 1000);
+  limits.clkoutMin = tsyn ? 4.6875 : 3.125;
+  limits.clkoutMax = tsyn ? (fast ? 800 : 700) : (fast ? 400 : 375);
+  limits.pfdMin = tsyn ? 10 : 19;
+  limits.pfdMax = fast ? 500 : (tsyn ? 450 : 400);
+  limits.clkoutMaxIo = fast ? 1080 : 1000;
+  limits.maxHighLowCount = 64;
+  limits.vcoTarget = 1000;
+  limits.maxPfdLowB = 300;
+  return limits;
+}
+
+plain::PllLimits DrawLimits(int prim, Random& random) {
+  if (random.OneIn(3)) return DeviceLimits(prim, true);
+  plain::PllLimits limits;
   limits.vcoMin = std::round(random.Real(100, 900));
   limits.vcoMax = limits.vcoMin + std::round(random.Real(0, 1200));
   limits.clkoutMin = random.OneIn(2) ? random.Real(0.5, 30) : std::round(random.Real(1, 30));
@@ -176,6 +179,67 @@ Case DrawRangeEnds(Random& random) {
   return drawn;
 }
 
+// Limits and requests such that at one VCO frequency, which a fudge brings about, several outputs
+// are at an end of their range or of a tolerance, or half way between two dividers.
+Case DrawMeetingEnds(Random& random) {
+  Case drawn;
+  DrawOptions(drawn.request, random);
+  plain::PllRequest& request = drawn.request;
+  request.count = random.Int(2, 5);
+  request.inFreq2 = 0;
+  plain::PllLimits& limits = drawn.limits;
+  limits = DrawLimits(request.prim, random);
+  const double f0 = std::round(random.Real(5000, 200000)) / 1000;
+  double fudge = 0.0;
+  for (int k = random.Int(1, 200); k > 0; --k) fudge += 0.001;
+  if (random.OneIn(2)) fudge = 0.0 - fudge;
+  const double vco = (fudge + f0) * random.Int(2, 20);
+  request.inFreq = vco * random.Int(1, 8) / random.Int(5, 64);
+  limits.pfdMin = 1;
+  limits.pfdMax = limits.maxPfdLowB = limits.clkoutMaxIo = 10000;
+  limits.vcoMin = random.OneIn(3) ? vco : std::min(limits.vcoMin, 0.8 * vco);
+  limits.vcoMax = random.OneIn(4) ? vco : std::max(limits.vcoMax, 1.2 * vco);
+  int divider = 1;
+  std::vector<std::string> outputs = {Number("%.17g", f0)};
+  for (int n = 1; n < request.count; ++n) {
+    divider = random.Int(1, 40);
+    double frequency = vco / divider;
+    switch (random.Int(0, 4)) {
+      case 0: frequency /= 1 + 0.01 * random.Int(1, 26); break;
+      case 1: frequency /= 1 - 0.01 * random.Int(1, 26); break;
+      case 2: frequency = vco / (divider + 0.5); break;
+      case 3: frequency *= random.Real(0.8, 1.2); break;
+      default: break;
+    }
+    outputs.push_back(Number("%.17g", frequency));
+  }
+  request.outFreqs = Join(outputs);
+  if (random.OneIn(2)) limits.clkoutMax = vco / divider;
+  if (random.OneIn(3)) limits.clkoutMaxIo = vco / random.Int(1, 20);
+  if (random.OneIn(2)) limits.clkoutMin = vco / random.Int(1, 40);
+  if (random.OneIn(6)) limits.clkoutMin = limits.clkoutMax;
+  DrawPhasesAndDutyCycles(request, random);
+  return drawn;
+}
+
+Case DrawRoundFigures(Random& random) {
+  static const std::vector<double> round = {
+      3.125, 4.6875, 6.25, 5,   10,  25,  33.333, 50,  62.5, 75,  93.75, 100,  125, 150,
+      187.5, 200,    250,  300, 350, 375, 400,    500, 600,  700, 800,   1000, 1080};
+  Case drawn;
+  DrawOptions(drawn.request, random);
+  drawn.limits = DeviceLimits(drawn.request.prim, random.OneIn(2));
+  drawn.request.count = random.Int(2, 5);
+  drawn.request.inFreq = random.Pick(kInputs);
+  const double shift = 0.001 * random.Int(1, random.OneIn(2) ? 10 : 1500);
+  std::vector<std::string> outputs = {
+      Number("%.3f", random.Pick(round) + (random.OneIn(2) ? shift : -shift))};
+  for (int n = 1; n < drawn.request.count; ++n) outputs.push_back(Number("%g", random.Pick(round)));
+  drawn.request.outFreqs = Join(outputs);
+  DrawPhasesAndDutyCycles(drawn.request, random);
+  return drawn;
+}
+
 Case DrawInfeasible(Random& random) {
   Case drawn = DrawConstructed(random, 0.0);
   drawn.request.inFreq2 = 0;
@@ -258,6 +322,8 @@ const char* KindName(Kind kind) {
     case Kind::kConstructed: return "Constructed";
     case Kind::kShifted: return "Shifted";
     case Kind::kRangeEnds: return "RangeEnds";
+    case Kind::kMeetingEnds: return "MeetingEnds";
+    case Kind::kRoundFigures: return "RoundFigures";
     case Kind::kInfeasible: return "Infeasible";
     case Kind::kLowOutput: return "LowOutput";
     case Kind::kWild: return "Wild";
@@ -274,6 +340,8 @@ Case DrawCase(Kind kind, Random& random) {
       return DrawConstructed(random, random.Real(-most, most));
     }
     case Kind::kRangeEnds: return DrawRangeEnds(random);
+    case Kind::kMeetingEnds: return DrawMeetingEnds(random);
+    case Kind::kRoundFigures: return DrawRoundFigures(random);
     case Kind::kInfeasible: return DrawInfeasible(random);
     case Kind::kLowOutput: return DrawLowOutput(random);
     case Kind::kWild: return DrawWild(random);

@@ -17,6 +17,8 @@ enum class Kind {
   kConstructed,  // made from a setting: solved at a fudge of 0, or nearly so
   kShifted,      // made from a setting, then output 0 moved: needs a fudge
   kRangeEnds,    // limits that lie exactly on what the request needs
+  kMeetingEnds,  // several limits that lie exactly on one VCO frequency
+  kRoundFigures,  // round figures beside the round limits of devices
   kInfeasible,   // nothing serves it: the search goes through all fudges
   kLowOutput,    // an output so low that only the lower VCO frequencies serve it
   kWild,         // zero, negative, huge, inf, nan, text, short and long lists, odd counts

@@ -86,8 +86,8 @@ bool CheckRequest(const Case& drawn, int checked, Random& random, Ip::VorkelImp&
 
 // 100 MHz into a PLL with a VCO of 400 to 1080 MHz; 197 and 70 MHz asked for. 5 x 197 = 985 MHz
 // is within one percent of 14 x 70 MHz, and 591 and 788 MHz are not; so it is for all output-0
-// frequencies from 194.04 to 197.96 MHz. In that range M and D accept 979.902 to 980.098 MHz (100
-// x 49 / 5) only: output 0 from 195.9804 to 196.0196 MHz.
+// frequencies from 194.04 to 197.96 MHz. From 980 MHz on, M and D accept nothing there but 979.902
+// to 980.098 MHz (100 x 49 / 5): output 0 from 195.9804 to 196.0196 MHz.
 TEST(PassFilter, FindsTheOnlyFudgesOfAnExample) {
   const plain::PllLimits limits = {.vcoMin = 400, .vcoMax = 1080, .clkoutMin = 3.125,
                                    .clkoutMax = 400, .pfdMin = 19, .pfdMax = 500,
@@ -139,7 +139,8 @@ TEST_P(PassFilterProperty, LeavesOutNoPassThatSucceeds) {
 
 INSTANTIATE_TEST_SUITE_P(Kinds, PassFilterProperty,
                          testing::Values(Kind::kCommon, Kind::kConstructed, Kind::kShifted,
-                                         Kind::kRangeEnds, Kind::kInfeasible, Kind::kLowOutput,
+                                         Kind::kRangeEnds, Kind::kMeetingEnds,
+                                         Kind::kRoundFigures, Kind::kInfeasible, Kind::kLowOutput,
                                          Kind::kWild),
                          [](const testing::TestParamInfo<Kind>& parameter) {
                            return KindName(parameter.param);

@@ -90,12 +90,72 @@ TEST_P(PllCompare, ProductAnswersAsThePlainSearch) {
   }
 }
 
+// Requests that a single VCO frequency serves, or serves best, where it is at an end of the range
+// of one output and at one of another, of the VCO range or of a divider. 1000 MHz, say, is twice
+// 500 MHz and 2.5 times 400 MHz, the highest outputs.
+TEST(PllCompare, ProductAnswersAsThePlainSearchWhereEndsMeet) {
+  const plain::PllLimits slow = {.vcoMin = 400, .vcoMax = 1000, .clkoutMin = 3.125,
+                                 .clkoutMax = 375, .pfdMin = 19, .pfdMax = 400,
+                                 .clkoutMaxIo = 1000, .maxHighLowCount = 64, .vcoTarget = 0,
+                                 .maxPfdLowB = 300};
+  plain::PllLimits fast = slow;
+  fast.vcoMax = fast.clkoutMaxIo = 1080;
+  fast.clkoutMax = 400;
+  fast.pfdMax = 500;
+  auto with = [&](double plain::PllLimits::*limit, double value, plain::PllLimits limits) {
+    limits.*limit = value;
+    return limits;
+  };
+  using L = plain::PllLimits;
+  const struct {
+    plain::PllLimits limits;
+    const char* outFreqs;
+    int count;
+    double inFreq;
+  } requests[] = {
+      {fast, "100.25 3.125 400", 3, 100},
+      {fast, "80.25 3.125 400", 3, 25},
+      {fast, "4.698 100 500", 3, 125},
+      {slow, "62.501 500 400", 3, 250},
+      {slow, "74.445 187.5 500 62.5", 4, 100},
+      {slow, "8.725 75 500 300 350", 5, 250},
+      // Output range of one value; the VCO range ends at, or is, the value of an output's end.
+      {with(&L::clkoutMin, 100, with(&L::clkoutMax, 100, with(&L::clkoutMaxIo, 100, fast))),
+       "100.25 100", 2, 100},
+      {with(&L::vcoMax, 480, with(&L::clkoutMax, 100, fast)), "100.25 50 100", 3, 100},
+      {with(&L::vcoMin, 330, with(&L::vcoMax, 400, with(&L::clkoutMin, 100, fast))),
+       "100.25 100", 2, 100},
+      {with(&L::vcoMax, 400, with(&L::clkoutMax, 100, fast)), "100.25 50 100", 3, 100},
+      {with(&L::vcoMin, 396, with(&L::vcoMax, 450,
+            with(&L::clkoutMin, 10, with(&L::clkoutMax, 100, fast)))),
+       "100.25 50 110 10", 4, 100},
+      // Both below 0.
+      {with(&L::vcoMin, -500, with(&L::vcoMax, -500, with(&L::pfdMin, -1000, fast))), "-100.001",
+       1, -100},
+  };
+  PllPair pair;
+  int shifted = 0;
+  for (const auto& request : requests) {
+    Case drawn;
+    drawn.limits = request.limits;
+    drawn.request.prim = plain::kPrimPll;
+    drawn.request.outFreqs = request.outFreqs;
+    drawn.request.count = request.count;
+    drawn.request.inFreq = request.inFreq;
+    EXPECT_EQ(pair.FirstDifference(drawn, false), "") << Describe(drawn);
+    if (pair.Answer().code == plain::kSolved && pair.Answer().fudge != 0.0) ++shifted;
+  }
+  EXPECT_EQ(shifted, 12);  // all of them need a fudge
+}
+
 INSTANTIATE_TEST_SUITE_P(
     Kinds, PllCompare,
     testing::Values(Load{Kind::kCommon, 800, 8, 20000, 60, 3},
                     Load{Kind::kConstructed, 1500, 4, 40000, 60, 2},
                     Load{Kind::kShifted, 400, 16, 15000, 200, 5},
                     Load{Kind::kRangeEnds, 600, 4, 15000, 30, 3},
+                    Load{Kind::kMeetingEnds, 300, 6, 10000, 60, 4},
+                    Load{Kind::kRoundFigures, 300, 6, 10000, 60, 4},
                     Load{Kind::kInfeasible, 100, 12, 4000, 200, 6},
                     Load{Kind::kLowOutput, 200, 6, 5000, 150, 4},
                     Load{Kind::kWild, 800, 4, 15000, 20, 3}),

@@ -20,6 +20,8 @@ namespace {
 
 using Kind = RankedRange::Kind;
 
+bool IsPoint(const RankedRange& range) { return range.low == range.high; }
+
 // 100 MHz into a TSYN with a VCO of 600 to 1440 MHz, a PFD of 10 to 500 MHz and outputs of 4.6875
 // to 800 MHz.
 class VcoRankingTest : public testing::Test {
@@ -61,7 +63,7 @@ class VcoRankingTest : public testing::Test {
   static std::vector<RankedRange> Stretches(const VcoRanking& ranking) {
     std::vector<RankedRange> stretches;
     for (const RankedRange& range : ranking) {
-      if (range.kind != Kind::kAccepted && !range.IsPoint()) stretches.push_back(range);
+      if (range.kind != Kind::kAccepted && !IsPoint(range)) stretches.push_back(range);
     }
     return stretches;
   }
@@ -136,7 +138,7 @@ TEST_F(VcoRankingTest, MultiplesAreThereAsPointsWithTheirZeros) {
   auto keysAt = [&](double vco, Kind kind) {
     std::vector<ToleranceKey> keys;
     for (const RankedRange& range : ranking) {
-      if (range.IsPoint() && range.low == vco && range.kind == kind) keys.push_back(range.key);
+      if (IsPoint(range) && range.low == vco && range.kind == kind) keys.push_back(range.key);
     }
     return keys;
   };
@@ -184,24 +186,57 @@ TEST_F(VcoRankingTest, StretchesHaveTheKeysOfTheFits) {
   }
 }
 
-// The exact key of a multiple is never below that of its point.
+// The fits have no smaller key than a point has.
 TEST_F(VcoRankingTest, PointsHaveLowerBoundsOfTheKeysOfTheFits) {
-  const char* const outFreqs = "100 62.5 12.5 33.3 148.5";
-  const VcoRanking ranking = Rank(outFreqs, 5);
   int points = 0;
-  for (const RankedRange& range : ranking) {
-    if (!range.IsPoint() || range.kind == Kind::kAccepted) continue;
-    ++points;
-    const ToleranceKey key = KeyByFit(range.low, 5, false);
-    EXPECT_TRUE(std::any_of(ranking.begin(), ranking.end(), [&](const RankedRange& other) {
-      return other.IsPoint() && other.low == range.low && other.key <= key;
-    })) << range.low;
-    // It keeps tolerance 0 on some output, but for what rounding does to 33.3 MHz.
-    bool hasZero = false;
-    for (int shift = 0; shift < 20; shift += 5) hasZero |= (range.key >> shift & 31u) == 0;
-    EXPECT_TRUE(hasZero) << range.low;
+  for (const char* outFreqs : {"100 62.5 12.5 33.3 148.5", "100 4.6875 600 800 75"}) {
+    for (const RankedRange& range : Rank(outFreqs, 5)) {
+      if (!IsPoint(range) || range.kind == Kind::kAccepted) continue;
+      ++points;
+      for (const double vco : {engine_test::Below(range.low), range.low,
+                               engine_test::Above(range.low)}) {
+        EXPECT_LE(range.key, KeyByFit(vco, 5, false)) << vco << " for " << outFreqs;
+      }
+    }
   }
   EXPECT_GT(points, 80);
+}
+
+// The highest output is 450 MHz. Below 900 MHz, half way between the dividers 1 and 2 of 600 MHz,
+// the output would be the VCO itself, and above 900 MHz half of it is too high. At 900 MHz it is
+// 450 MHz, 25 percent below the request.
+TEST_F(VcoRankingTest, AVcoWhereTwoEndsOfAnOutputMeetIsAPoint) {
+  Rank("100 600", 2);
+  imp_.pllLimits.clkoutMax = 450.0;
+  const Pll::Run run = {100.0, 2, kTsyn, trace_};
+  const VcoRanking ranking = RankVcos(imp_, run);
+  int served = 0;
+  for (const RankedRange& range : ranking) {
+    if (range.kind == Kind::kUnserved) continue;
+    ++served;
+    EXPECT_EQ(range.low, 900.0);
+    EXPECT_EQ(range.high, 900.0);
+    EXPECT_EQ(range.key, 25u);
+  }
+  EXPECT_EQ(served, 2);  // as it is, and accepted: 100 x 9
+}
+
+// The highest output is 300 MHz, the VCO goes from 600 to 700 MHz. Half of the lowest VCO is 300
+// MHz; half of the others is too high.
+TEST_F(VcoRankingTest, AVcoWhereAnEndMeetsTheVcoRangeIsAPoint) {
+  Rank("100 300", 2);
+  imp_.pllLimits.clkoutMax = 300.0;
+  imp_.pll.maxAdjVco = 700.0;
+  const Pll::Run run = {100.0, 2, kTsyn, trace_};
+  int served = 0;
+  for (const RankedRange& range : RankVcos(imp_, run)) {
+    if (range.kind == Kind::kUnserved) continue;
+    ++served;
+    EXPECT_EQ(range.low, 600.0);
+    EXPECT_EQ(range.high, 600.0);
+    EXPECT_EQ(range.key, 0u);
+  }
+  EXPECT_EQ(served, 2);  // as it is, and accepted: 100 x 6
 }
 
 // A VCO with dividers is accepted by the M and D search where the ranking says so.
@@ -214,7 +249,7 @@ TEST_F(VcoRankingTest, AcceptedRangesAreThoseOfTheMAndDSearch) {
     const bool served = (key & 31u) != 27u && key >> 5 != 27u;
     double distance = 1e300;  // to the nearest accepted range with the key
     for (const RankedRange& range : ranking) {
-      if (range.kind != Kind::kAccepted || range.IsPoint() || range.key != key) continue;
+      if (range.kind != Kind::kAccepted || IsPoint(range) || range.key != key) continue;
       distance = std::min(distance, std::max({range.low - vco, vco - range.high, 0.0}));
     }
     if (served && Accepted(vco, 27.0)) {
