@@ -37,23 +37,67 @@ _vorkel_values() {
       }'
 }
 
+# The part names that go on from a word: the devices, or, where the word is already one or longer,
+# that device with its packages and grades: _vorkel_parts PROGRAM WORD.
+_vorkel_parts() {
+  local program=$1 word=$2 name package grade packages grades
+  "$program" devices 2>/dev/null | awk '/^$/ { exit } /^[^ ]/ && NR > 1 { print $1 }' |
+    while read -r name; do
+      printf '%s\n' "$name"
+      [[ $word == "$name"* ]] || continue
+      packages=$(_vorkel_choices "$program" "$name" packages)
+      grades=$(_vorkel_choices "$program" "$name" grades)
+      for package in '' $packages; do
+        printf '%s\n' "$name$package"
+        [[ $word == "$name$package"-* ]] || continue
+        for grade in $grades; do
+          printf '%s\n' "$name$package-$grade"
+        done
+      done
+    done | sort -u
+}
+
+# The packages or the grades of a device: _vorkel_choices PROGRAM DEVICE packages|grades.
+_vorkel_choices() {
+  "$1" devices "$2" 2>/dev/null </dev/null |
+    awk -v label="$3" '
+      /^[^ ]/ { inside = 0 }
+      /^$/ { exit }
+      $1 == label { inside = 1; $1 = "" }
+      inside { text = text " " $0 }
+      END { sub(/\(.*/, "", text); gsub(/,/, " ", text); print text }'
+}
+
 _vorkel() {
-  local program=$1 word=$2 previous=$3 command=${COMP_WORDS[1]} words=
+  local program=$1 word=$2 previous=$3 command=${COMP_WORDS[1]} words='' prefix=''
   COMPREPLY=()
+  # Bash takes --option=value apart at the "=", if COMP_WORDBREAKS has it.
+  if [[ $previous == = ]]; then
+    previous=${COMP_WORDS[COMP_CWORD - 2]}
+  elif [[ ${COMP_WORDS[COMP_CWORD]} == = ]]; then
+    word=
+  elif [[ $word == --*=* ]]; then
+    prefix=${word%%=*}=
+    previous=${word%%=*}
+    word=${word#*=}
+  fi
   if ((COMP_CWORD == 1)); then
     words=$(_vorkel_listed "$program" Commands help)
   elif [[ $word == -* && $previous != -* ]]; then
     words=$(_vorkel_options "$program" "$command")
+  elif ((COMP_CWORD == 2)) && [[ $previous == "$command" ]]; then
+    case $command in
+      check) _vorkel_files "$word" ''; return ;;
+      devices) words=$(_vorkel_parts "$program" "$word") ;;
+      help) words=$(_vorkel_listed "$program" Commands help) ;;
+    esac
   else
     case $previous in
-      -o | --request | check) mapfile -t COMPREPLY < <(compgen -f -- "$word"); return ;;
+      -o | --request) _vorkel_files "$word" "$prefix"; return ;;
       --format | --bandwidth | --primitive)
         words=$(_vorkel_values "$program" "$command" "$previous")
         ;;
-      --device | devices)
-        words=$("$program" devices 2>/dev/null | awk '/^$/ { exit } /^[^ ]/ && NR > 1 { print $1 }')
-        ;;
-      help) words=$(_vorkel_listed "$program" Commands help) ;;
+      --device) words=$(_vorkel_parts "$program" "$word") ;;
       *)
         if [[ $word == -* ]]; then
           words=$(_vorkel_options "$program" "$command")
@@ -61,7 +105,14 @@ _vorkel() {
         ;;
     esac
   fi
-  mapfile -t COMPREPLY < <(compgen -W "$words" -- "$word")
+  mapfile -t COMPREPLY < <(compgen -P "$prefix" -W "$words" -- "$word")
+}
+
+# Offers the files that a word begins: _vorkel_files WORD PREFIX. A folder goes on with a slash;
+# with a prefix bash does not see that it is one, and leaves the end to the user.
+_vorkel_files() {
+  mapfile -t COMPREPLY < <(compgen -P "$2" -f -- "$1")
+  compopt -o "$([[ -n $2 ]] && printf nospace || printf filenames)" 2>/dev/null || true
 }
 
 complete -F _vorkel vorkel ./vorkel

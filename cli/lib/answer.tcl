@@ -1,6 +1,6 @@
 # Answers: what a primitive makes of a request, with the error of everything that was asked for.
 #
-# A request is a dict that names no primitive (see request.tcl):
+# A request is a dict (see request.tcl):
 #   device, part   the part name as the engine takes it (both keys have it)
 #   inputs         one or two input clocks, MHz
 #   outputs        for each output a dict: freq (MHz), phase (degrees or ""), duty (percent or "")
@@ -12,6 +12,7 @@
 #   tolerance      ppm that a frequency may be off
 #   limits         the limits of the device's grade, from keyword to number
 #   primitives     those that the device has
+#   primitive      only where the user has named one to plan, compare or best: that one
 #
 # An answer is a dict:
 #   primitive      PLL, TSYN, KRU_SP or KRU_CLKGEN
@@ -40,9 +41,13 @@
 #     reqDuty, duty, dutyError
 #                  percent, likewise
 #     jitter       ps, peak to peak, or "" when it is not known; with that of the input
-#     offs         those of ppm, phaseError and dutyError that are larger than they may be
-#     within       whether frequency, phase and duty cycle are as asked for: offs is empty
-#   violations     sentences on what is outside the device's limits
+#     actual2      MHz, what the settings make of the second input; "" without one
+#     outside      sentences on what of it is outside the device's limits
+#     offs         those of ppm, phaseError and dutyError that are larger than they may be, and
+#                  range and range2 when it is outside the device's limits, the latter with the
+#                  second input
+#     within       whether it is as asked for and in the device's range: offs is empty
+#   violations     sentences on what is outside the device's limits, those of the outputs too
 #   within         whether all outputs are within and there are no violations
 #   worstPpm       the largest |ppm|
 #   maxJitter      the largest jitter, ps, or "" when it is not known of all outputs
@@ -54,6 +59,7 @@ package provide vorkel::answer 1.1
 package require vorkel::actual 1.1
 package require vorkel::engine 1.1
 package require vorkel::kru_notes 1.1
+package require vorkel::kru_phases 1.1
 package require vorkel::notes 1.1
 package require vorkel::rank 1.1
 package require vorkel::timing 1.1
@@ -82,12 +88,36 @@ proc ::vorkel::answer::solve {request primitive {variant {}}} {
     return [unsolved $primitive $name $refusal]
   }
   set job [Job $request $primitive]
+  if {[dict get $job family] eq "Kru"} {
+    return [SolveKru $request $job $name]
+  }
+  return [Solve $request $job $name]
+}
+
+# What the engine makes of a job.
+proc ::vorkel::answer::Solve {request job name} {
   try {
     set solution [::vorkel::engine::solve $job]
   } trap {VORKEL UNSOLVED} {sentence} {
-    return [unsolved $primitive $name $sentence]
+    return [unsolved [dict get $job primitive] $name $sentence]
   }
   return [Evaluate $request $job $solution engine $name]
+}
+
+# The same of a KRU: the first answer that is within its tolerances, of all phases that stand for
+# those of the request, or else the best.
+proc ::vorkel::answer::SolveKru {request job name} {
+  variable phase_tolerance
+  set answers {}
+  foreach phases [::vorkel::kru_phases::lists $request [dict get $job primitive] \
+      $phase_tolerance] {
+    set answer [Solve $request [dict replace $job phases $phases] $name]
+    if {[dict get $answer within]} {
+      return $answer
+    }
+    lappend answers $answer
+  }
+  return [lindex [rank $answers] 0]
 }
 
 # The answer that given settings are. PLL, TSYN: `settings` has M and D, and `places` the
@@ -203,12 +233,19 @@ proc ::vorkel::answer::Evaluate {request job solution source variant} {
   set family [dict get $job family]
   set primitive [dict get $job primitive]
   set timing [::vorkel::timing::of $job $solution]
+  set places [Setting $solution pins ""]
   set outputs {}
   foreach output [${family}Outputs $request $solution] \
       asked [dict get $request outputs] jitter [dict get $timing jitters] {
-    lappend outputs [Judge $request [dict merge [dict create index [llength $outputs]] $output \
+    set output [Judge $request [dict merge [dict create index [llength $outputs]] $output \
       [dict create requested [dict get $asked freq] reqPhase [dict get $asked phase] \
         reqDuty [dict get $asked duty] jitter $jitter]]]
+    if {$family eq "Kru"} {
+      set outside [::vorkel::kru_notes::ofOutput $request $places $output]
+    } else {
+      set outside [::vorkel::notes::ofOutput $request $primitive $output]
+    }
+    lappend outputs [Confine $output $outside]
   }
   set answer [dict create primitive $primitive source $source variant $variant solved 1 \
     reason "" settings [${family}Settings $request $solution] \
@@ -263,6 +300,18 @@ proc ::vorkel::answer::Judge {request output} {
   return $output
 }
 
+# Adds what of an output is outside the device's limits, a dict from a key of `offs` to sentences.
+proc ::vorkel::answer::Confine {output outside} {
+  dict set output outside [concat {*}[dict values $outside]]
+  dict for {key sentences} $outside {
+    if {[llength $sentences] > 0} {
+      dict lappend output offs $key
+      dict set output within 0
+    }
+  }
+  return $output
+}
+
 # How large the error under a key of an output may be.
 proc ::vorkel::answer::allowance {key tolerance} {
   variable phase_tolerance
@@ -305,7 +354,7 @@ proc ::vorkel::answer::LoopSettings {request solution} {
 # The outputs of a PLL or a TSYN. A phase and a duty cycle that the engine has chosen are told
 # in three decimals; the step that they mean is taken.
 proc ::vorkel::answer::LoopOutputs {request solution} {
-  set input [lindex [dict get $request inputs] 0]
+  lassign [dict get $request inputs] input second
   set m [dict get $solution m]
   set first [dict get [lindex [dict get $solution outputs] 0] divider]
   set fractional [expr {$m != round($m) || $first != round($first)}]
@@ -329,6 +378,7 @@ proc ::vorkel::answer::LoopOutputs {request solution} {
     }
     lappend outputs [dict create pin "" divider $divider \
       actual [::vorkel::actual::frequency $input $ratio] \
+      actual2 [expr {$second eq "" ? "" : [::vorkel::actual::frequency $second $ratio]}] \
       search [Setting $output frequency ""] ratio $ratio phase $phase duty $duty]
   }
   return $outputs
@@ -363,7 +413,8 @@ proc ::vorkel::answer::KruOutputs {request solution} {
   set shift [Setting $solution phaseShift 0]
   return [lmap pin [dict get $solution pins] {
     set ratio [::vorkel::actual::pinRatio $pin $solution]
-    dict create pin $pin divider "" actual [::vorkel::actual::frequency $input $ratio] search "" \
+    dict create pin $pin divider "" actual [::vorkel::actual::frequency $input $ratio] actual2 "" \
+      search "" \
       ratio $ratio phase [::vorkel::actual::pinPhase $pin $shift] \
       duty [::vorkel::actual::pinDuty $pin [dict get $solution divide]]
   }]

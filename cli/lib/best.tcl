@@ -19,8 +19,9 @@ namespace eval ::vorkel::best {
   variable options {
     --front N "trade-offs to show, the best settings as the first; 6 by default"
   }
-  variable default_front 6
   variable most_front 1000
+  # ppm. With a larger error there is nothing near what is asked for.
+  variable far 1e5
   # What the answers are.
   variable best_variant "best of the grid"
   variable tradeoff_variant "trade-off"
@@ -33,15 +34,18 @@ proc ::vorkel::best::run {words} {
   variable tradeoff_variant
   set call [::vorkel::options::request $words $options]
   set request [dict get $call request]
+  if {[dict get $call primitive] ne "auto"} {
+    dict set request primitive [dict get $call primitive]
+  }
   set primitives [Primitives $call]
   set most [Most [dict get $call given]]
   ::vorkel::output::into [dict get $call file]
   lassign [Search $request $primitives] points engine
-  set all [::vorkel::grid::order $request [concat {*}[dict values $points]]]
-  if {[llength $all] == 0} {
+  set front [::vorkel::grid::front $request $points]
+  if {[llength $front] == 0} {
     Unsolved $call $primitives
   }
-  set grid [BestOfEach $request $points [lindex $all 0]]
+  set grid [BestOfEach $request $points [lindex $front 0]]
   set winner [lindex $grid 0]
   set format [dict get $call format]
   if {$format eq "sdc"} {
@@ -49,12 +53,12 @@ proc ::vorkel::best::run {words} {
     set text [::vorkel::output::format $format [list $winner] $request]
   } else {
     # The first trade-off is the winner itself.
-    set front [::vorkel::grid::tradeoffs $all]
     set shown [lmap point [lrange $front 1 [expr {$most - 1}]] {
       ::vorkel::grid::answer $request $point $tradeoff_variant
     }]
     if {$format eq "text"} {
-      set text [Text $grid $engine $shown [expr {[llength $front] - 1 - [llength $shown]}] $most]
+      set text [Text $grid $engine $shown [expr {[llength $front] - 1 - [llength $shown]}] $most \
+        [Calmer $request $front $most]]
       append text [Hint $call $winner]
     } else {
       set text [::vorkel::output::format $format [concat $grid $shown $engine] $request]
@@ -80,11 +84,11 @@ proc ::vorkel::best::Primitives {call} {
 
 # How many trade-offs to show, the best settings among them.
 proc ::vorkel::best::Most {given} {
-  variable default_front
   variable most_front
-  set text [::vorkel::options::get $given --front $default_front]
+  set text [::vorkel::options::get $given --front $::vorkel::grid::default_front]
   if {![regexp {^[0-9]{1,4}$} $text] || [scan $text %d] > $most_front} {
-    throw {VORKEL USAGE} "--front: \"[::vorkel::options::shown $text]\" must be a whole number from 0 to $most_front"
+    throw {VORKEL USAGE} "--front: \"[::vorkel::options::shown $text]\" must be a\
+      whole number from 0 to $most_front"
   }
   return [scan $text %d]
 }
@@ -99,11 +103,7 @@ proc ::vorkel::best::Search {request primitives} {
   }
   ::vorkel::progress::start $steps "searching all settings"
   try {
-    set points [dict create]
-    foreach primitive $primitives {
-      dict set points $primitive [::vorkel::grid::order $request \
-        [::vorkel::grid::points $request $primitive ::vorkel::progress::step]]
-    }
+    set points [::vorkel::grid::search $request $primitives ::vorkel::progress::step]
     if {[llength [concat {*}[dict values $points]]] == 0} {
       return [list $points {}]
     }
@@ -136,12 +136,37 @@ proc ::vorkel::best::Unsolved {call primitives} {
     [::vorkel::help::command explain [dict get $call words]]"
 }
 
-# The report. `left` is how many trade-offs there are beside those that are shown.
-proc ::vorkel::best::Text {grid engine shown left most} {
+# A sentence on the trade-off that has the least jitter within all tolerances, behind the best
+# settings; "" when there is none. The trade-offs show the first `most`.
+proc ::vorkel::best::Calmer {request front most} {
+  set place [::vorkel::grid::calmest $request $front]
+  if {$place < 1} {
+    return ""
+  }
+  set answer [::vorkel::grid::answer $request [lindex $front $place]]
+  set text " With less jitter, a [dict get $answer primitive] is also\
+    within [Allowed $request]: [ppm $answer] ppm with [jitter $answer] ps"
+  if {$place >= $most} {
+    append text ", which --front [expr {$place + 1}] shows"
+  }
+  return $text.
+}
+
+# What a setting has to be within.
+proc ::vorkel::best::Allowed {request} {
+  if {[::vorkel::answer::isAsked $request phase] || [::vorkel::answer::isAsked $request duty]} {
+    return "all tolerances"
+  }
+  return "[::vorkel::numbers::short [dict get $request tolerance] 6] ppm"
+}
+
+# The report. `left` is how many trade-offs there are beside those that are shown, `calmer` a
+# sentence on one of them.
+proc ::vorkel::best::Text {grid engine shown left most calmer} {
   set winner [lindex $grid 0]
   set text [::vorkel::report::render $winner]
   append text "\n" [Beside [concat $grid $engine]]
-  append text "\n" [::vorkel::table::prose "why: " [Why $winner [concat $grid $engine]]]
+  append text "\n" [::vorkel::table::prose "why: " [Why $winner [concat $grid $engine]]$calmer]
   if {$most > 0} {
     append text "\n" [Front $winner $shown $left $most]
   }
@@ -170,7 +195,7 @@ proc ::vorkel::best::Beside {answers} {
       {*}[Loop $answer] [vco $answer] [ppm $answer] \
       [jitter $answer] [mark $answer]]
   }
-  return [::vorkel::table::render $columns $rows [roles $answers]]
+  return [render $columns $rows $answers]
 }
 
 # The trade-offs as text: the winner and those behind it.
@@ -202,12 +227,13 @@ proc ::vorkel::best::Tradeoffs {answers} {
       {*}[Loop $answer] [ppm $answer] [jitter $answer] \
       [join $dividers ,] [mark $answer]]
   }
-  set widths [lmap line [split [::vorkel::table::render $columns $rows] \n] {string length $line}]
+  set plain [regsub -all {\033\[[0-9;]*m} [::vorkel::table::render $columns $rows] {}]
+  set widths [lmap line [split $plain \n] {string length $line}]
   if {[tcl::mathfunc::max {*}$widths] > $::vorkel::table::line_width} {
     set columns [lrange $columns 0 end-1]
     set rows [lmap row $rows {lrange $row 0 end-1}]
   }
-  return [::vorkel::table::render $columns $rows [roles $answers]]
+  return [render $columns $rows $answers]
 }
 
 proc ::vorkel::best::Loop {answer} {
@@ -217,6 +243,7 @@ proc ::vorkel::best::Loop {answer} {
 
 # What makes the winner the best.
 proc ::vorkel::best::Why {winner answers} {
+  variable far
   set request [dict get $winner request]
   set asked [expr {[::vorkel::answer::isAsked $request phase] ||
     [::vorkel::answer::isAsked $request duty]}]
@@ -232,7 +259,11 @@ proc ::vorkel::best::Why {winner answers} {
       "; only settings with everything within its tolerance count, as there are such" :
       "; none has everything within its tolerance"}]
   }
-  return "$text. [Gain $winner $answers]"
+  append text ". [Gain $winner $answers]"
+  if {[dict get $winner worstPpm] > $far} {
+    append text " No setting comes near what is asked for; explain tells why."
+  }
+  return $text
 }
 
 # What the search has gained over the engine's best answer.
@@ -245,18 +276,20 @@ proc ::vorkel::best::Gain {winner answers} {
     return "The engine finds none."
   }
   set engine [lindex $engine 0]
-  set reached [dict get $engine worstPpm]
-  set least [dict get $winner worstPpm]
-  set name [dict get $engine primitive]
-  if {$reached > $least + 0.005} {
-    return "The engine's best answer, of a $name, is [ppm $engine] ppm off, this\
-      one [ppm $winner] ppm."
+  set text "The engine's best answer, of a [dict get $engine primitive],"
+  set more [expr {[dict get $engine worstPpm] - [dict get $winner worstPpm]}]
+  if {$more > 0.005} {
+    return "$text is [ppm $engine] ppm off, this one [ppm $winner] ppm."
   }
-  if {[dict get $engine within] == [dict get $winner within] && $reached <= $least + 0.005} {
-    return "The engine's best answer, of a $name, has frequencies as near as that."
+  set near [expr {$more < -0.005 ? "is nearer in frequency, [ppm $engine] ppm off" :
+    "has frequencies as near as that"}]
+  if {[llength [dict get $engine violations]] > 0} {
+    return "$text $near, but is outside of the device's range."
   }
-  return "The engine's best answer, of a $name, is nearer in frequency, but not within all\
-    tolerances."
+  if {![dict get $engine within] && ([dict get $winner within] || $more < -0.005)} {
+    return "$text $near, but is not within all tolerances."
+  }
+  return "$text $near."
 }
 
 proc ::vorkel::best::Hint {call winner} {

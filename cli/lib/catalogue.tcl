@@ -20,14 +20,14 @@ proc ::vorkel::catalogue::names {} {
   return [::Vorkel::Devices names]
 }
 
-# A device as the host describes it. A device file that cannot be read is wrong usage; the
+# A device as the host describes it. A device file that cannot be read is {VORKEL USAGE FILE}; the
 # message tells file, line and column.
 proc ::vorkel::catalogue::describe {device} {
   ::vorkel::engine::load
   try {
     return [::Vorkel::Devices describe $device]
   } on error {message} {
-    throw {VORKEL USAGE} $message
+    throw {VORKEL USAGE FILE} $message
   }
 }
 

@@ -1,7 +1,9 @@
-# What a row of a table of answers says of one.
+# What a row of a table of answers says of one, and how such a table is coloured.
 
 package provide vorkel::cells 1.1
+package require vorkel::colour 1.1
 package require vorkel::numbers 1.1
+package require vorkel::table 1.1
 
 namespace eval ::vorkel::cells {}
 
@@ -49,15 +51,16 @@ proc ::vorkel::cells::mark {answer} {
   return [expr {[dict get $answer within] ? "" : "OFF"}]
 }
 
-# The colours of the rows of some answers, of which the first is the best.
-proc ::vorkel::cells::roles {answers} {
-  set roles {}
-  foreach answer $answers {
-    if {![dict get $answer within]} {
-      lappend roles off
-    } else {
-      lappend roles [expr {[llength $roles] == 0 ? "good" : ""}]
+# A table of some answers, of which the first is the best: its row is coloured when it is as asked
+# for. Of the others only the marks, which are last in their rows, are: to be off can be a fair
+# price for something else.
+proc ::vorkel::cells::render {columns rows answers} {
+  set roles [list [expr {[dict get [lindex $answers 0] within] ? "good" : ""}]]
+  set lines [split [::vorkel::table::render $columns $rows $roles] \n]
+  return [join [lmap line $lines {
+    if {[regexp {^(.* )((?:winner, but )?OFF)$} $line -> rest mark]} {
+      set line $rest[::vorkel::colour::paint off $mark]
     }
-  }
-  return $roles
+    set line
+  }] \n]
 }

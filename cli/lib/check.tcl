@@ -1,12 +1,14 @@
 # The command check: what is wrong with a device file, and what it leaves out.
 #
 # The host reads the file as it would a device of its own, so that what is good here is good
-# there. It stops at the first mistake. So that a user sees more than one at a time, a copy is
-# read again without the line of the mistake, where nothing else can depend on that line.
+# there. It stops at the first mistake. So that a user sees more than one at a time, the copy that
+# it reads is mended, where that cannot be seen in the rest of the file, and read again.
 
 package provide vorkel::check 1.1
 package require vorkel::catalogue 1.1
+package require vorkel::device_repair 1.1
 package require vorkel::engine 1.1
+package require vorkel::limits 1.1
 package require vorkel::options 1.1
 package require vorkel::output 1.1
 package require vorkel::table 1.1
@@ -15,26 +17,9 @@ namespace eval ::vorkel::check {
   variable good 0
   variable bad 2
   variable most_mistakes 20
+  # So often a copy is mended, at most.
+  variable most_rounds 100
   variable largest_file 1000000
-  # Limits that go together: what is to be the lower one, the higher one, and what there is
-  # none of when they are the wrong way round.
-  variable pairs {
-    VCOCLK_FREQ_MIN VCOCLK_FREQ_MAX "VCO frequency"
-    CLKPFD_FREQ_MIN CLKPFD_FREQ_MAX "PFD frequency"
-    CLKOUT_FREQ_MIN_GCLK CLKOUT_FREQ_MAX_GCLK "output frequency"
-    CLKOUT_FREQ_MIN_GCLK CLKOUT_FREQ_MAX_IOCLK "frequency of output 1"
-    TSYN_VCOCLK_FREQ_MIN TSYN_VCOCLK_FREQ_MAX "VCO frequency"
-    TSYN_VCOCLK_FREQ_MIN TSYN_VCOCLK_FREQ_TARGET "VCO frequency that is recommended"
-    TSYN_VCOCLK_FREQ_TARGET TSYN_VCOCLK_FREQ_MAX "VCO frequency that is recommended"
-    TSYN_CLKOUT_FREQ_MIN TSYN_CLKOUT_FREQ_MAX "output frequency"
-    TSYN_CLKPFD_FREQ_MIN TSYN_CLKPFD_FREQ_MAX "PFD frequency"
-    TSYN_CLKPFD_FREQ_MIN TSYN_CLKPFD_FREQ_MAX_LBW "PFD frequency with a narrow loop"
-  }
-  # Mistakes without which the rest of a file means the same.
-  variable separate {
-    {^unknown (keyword|coefficient|key) }
-    {^"\w+" must be a (finite positive )?number}
-  }
 }
 
 # Writes what the file that is named gives a device; its mistakes go to standard error.
@@ -49,10 +34,12 @@ proc ::vorkel::check::run {words} {
   set text [Contents $path]
   lassign [Read $path $text] mistakes description
   if {[llength $mistakes] > 0} {
-    foreach mistake $mistakes {
-      # Nobody may be listening.
-      catch {puts stderr $mistake}
+    set warnings ""
+    if {$description ne ""} {
+      set warnings [Warnings $path $description [Lines $text]]
     }
+    # Nobody may be listening.
+    catch {puts -nonewline stderr "[join $mistakes \n]\n$warnings"}
     return $bad
   }
   ::vorkel::output::write [Report $path $text $description]
@@ -107,32 +94,35 @@ proc ::vorkel::check::IsDevice {name} {
     [dict get $device file], and devices [dict get $device name] shows its limits"
 }
 
-# The mistakes of a device file, each a line that begins with file, line and column, and what
-# the host says of the device when there is none.
+# The mistakes of a device file in the order of their places, each a line that begins with file,
+# line and column, and what the host says of the device, without what is wrong; "" when it says
+# nothing.
 proc ::vorkel::check::Read {path text} {
   variable most_mistakes
+  variable most_rounds
+  set copy [::vorkel::device_repair::begin [file rootname [file tail $path]] $text]
   set mistakes {}
-  set removed {}
-  while {[llength $mistakes] < $most_mistakes} {
+  set description ""
+  for {set round 0} {$round < $most_rounds && [llength $mistakes] < $most_mistakes} {incr round} {
     try {
-      set description [Describe [file tail $path] $text]
-      return [list $mistakes $description]
+      set description [Describe [file tail $path] [::vorkel::device_repair::text $copy]]
+      break
     } trap {VORKEL USAGE} {complaint} {
-      set located [regexp {^.*?:(\d+):(\d+): (.*)$} $complaint -> line column reason]
-      if {!$located} {
-        lappend mistakes "$path: $complaint"
+      if {![regexp {^.*?:(\d+):(\d+): (.*)$} $complaint -> line column reason]} {
+        lappend mistakes [list 0 0 "$path: $complaint"]
         break
       }
-      if {![FollowsFrom $reason $removed]} {
-        lappend mistakes "$path:$line:$column: $reason[Nearest $reason]"
+      if {![::vorkel::device_repair::isFollowing $copy $line $reason]} {
+        set place [list [::vorkel::device_repair::line $copy $line] $column]
+        lappend mistakes [list {*}$place "$path:[join $place :]: $reason[Nearest $reason]"]
       }
-      set name [Separate $reason $text $line]
-      if {$name eq ""} break
-      lappend removed $name
-      set text [WithoutLine $text $line]
+      set mended [::vorkel::device_repair::mend $copy $line $reason]
+      if {$mended eq $copy} break
+      set copy $mended
     }
   }
-  return [list $mistakes {}]
+  set mistakes [lsort -integer -index 0 [lsort -integer -index 1 $mistakes]]
+  return [list [lmap mistake $mistakes {lindex $mistake 2}] $description]
 }
 
 # What the host says of a device file with such a name and text. Its folder is the current one
@@ -174,34 +164,6 @@ proc ::vorkel::check::Scratch {} {
   return $folder
 }
 
-# The name in a mistake whose line can be left out, or "": the line must be an entry that ends
-# on it.
-proc ::vorkel::check::Separate {reason text line} {
-  variable separate
-  foreach pattern $separate {
-    if {[regexp $pattern $reason] && [regexp {"(\w+)"} $reason -> name] &&
-        [regexp {^\s*(\w+|"\w+")\s*=\s*([^\s\[\{"'#][^\[\{"'#]*|"[^"\\]*"\s*)(#.*)?$} \
-          [lindex [split $text \n] $line-1]]} {
-      return $name
-    }
-  }
-  return ""
-}
-
-# Whether a mistake is there only because a line was left out.
-proc ::vorkel::check::FollowsFrom {reason removed} {
-  foreach name $removed {
-    if {[regexp "the (coefficient|key) \"$name\" is missing" $reason]} {
-      return 1
-    }
-  }
-  return 0
-}
-
-proc ::vorkel::check::WithoutLine {text line} {
-  return [join [lreplace [split $text \n] $line-1 $line-1 ""] \n]
-}
-
 # "; did you mean X?" for an unknown keyword that is nearly another one.
 proc ::vorkel::check::Nearest {reason} {
   if {![regexp {^unknown keyword "(.*)"$} $reason -> name]} {
@@ -214,7 +176,6 @@ proc ::vorkel::check::Nearest {reason} {
 # What a file without mistakes gives: for each grade the primitives, what each keyword that is
 # not there costs, and limits that contradict each other.
 proc ::vorkel::check::Report {path text description} {
-  set lines [Lines $text]
   set report "$path: device [dict get $description name], packages\
     [join [dict get $description packages] {, }]\n"
   foreach kind {package grade} {
@@ -223,10 +184,13 @@ proc ::vorkel::check::Report {path text description} {
         have the $kind"]
     }
   }
-  set warnings ""
+  set warnings [Warnings $path $description [Lines $text]]
   dict for {grade limits} [dict get $description limits] {
     append report "\n[Grade $grade $limits [Calculator $description $grade]]"
-    append warnings [Warnings $path $grade $limits $lines]
+    if {[llength [::vorkel::catalogue::primitivesOf $limits]] == 0} {
+      append warnings [::vorkel::table::prose "$path: warning: " "grade $grade has all limits of\
+        no primitive: nothing can be planned for it"]
+    }
   }
   if {$warnings ne ""} {
     append report \n $warnings
@@ -252,6 +216,7 @@ proc ::vorkel::check::Grade {grade limits calculator} {
   set columns [list [list left "grade $grade"] {right keywords} {left {}}]
   set rows {}
   set begun {}
+  set doubts [::vorkel::limits::doubts $limits]
   foreach primitive [::vorkel::catalogue::primitives] {
     lassign [Count $primitive $limits] there needed own
     set result [expr {$there == $needed ? "yes" : $own == 0 ? "left out" : "NO"}]
@@ -261,6 +226,16 @@ proc ::vorkel::check::Grade {grade limits calculator} {
     if {$result eq "yes" && $calculator ne ""} {
       set group [expr {[::vorkel::engine::family $primitive] eq "Kru" ? "KRU" : "LOOP"}]
       append result [expr {[dict get $calculator $group] ? ", with" : ", without"}] " jitter"
+    }
+    foreach doubt $doubts {
+      if {$primitive in [dict get $doubt lost] && $result ne "NO"} {
+        set result "NO, there is no [dict get $doubt none]"
+        break
+      }
+    }
+    if {[string match yes* $result] &&
+        $primitive in [concat {*}[lmap doubt $doubts {dict get $doubt touched}]]} {
+      append result "; see below"
     }
     lappend rows [list $primitive "$there of $needed" $result]
   }
@@ -303,38 +278,20 @@ proc ::vorkel::check::Missing {limits begun} {
   return "\n[::vorkel::table::fitted {{left missing} {left unit} {left costs}} $rows]"
 }
 
-# Limits that contradict each other, a line each, with the line of the first.
-proc ::vorkel::check::Warnings {path grade limits lines} {
+# What is doubtful about the limits of a device, a line each, with the line of its keyword.
+proc ::vorkel::check::Warnings {path description lines} {
   set text ""
-  foreach {low high what} [Pairs] {
-    if {![dict exists $limits $low] || ![dict exists $limits $high] ||
-        [dict get $limits $low] <= [dict get $limits $high]} continue
-    set place $path
-    if {[dict exists $lines $grade $low]} {
-      append place : [dict get $lines $grade $low]
+  dict for {grade limits} [dict get $description limits] {
+    foreach doubt [::vorkel::limits::doubts $limits] {
+      set place $path
+      if {[dict exists $lines $grade [dict get $doubt keyword]]} {
+        append place : [dict get $lines $grade [dict get $doubt keyword]]
+      }
+      append text [::vorkel::table::prose "$place: warning: " \
+        "grade $grade: [dict get $doubt sentence]"]
     }
-    append text [::vorkel::table::prose "$place: warning: " "grade $grade: $low,\
-      [dict get $limits $low], is above $high, [dict get $limits $high]: there is no $what"]
-  }
-  if {[llength [::vorkel::catalogue::primitivesOf $limits]] == 0} {
-    append text [::vorkel::table::prose "$path: warning: " "grade $grade has all limits of no\
-      primitive: nothing can be planned for it"]
   }
   return $text
-}
-
-# The variable pairs, and the shortest and longest periods of the pins of a KRU.
-proc ::vorkel::check::Pairs {} {
-  variable pairs
-  set all $pairs
-  foreach keyword [::Vorkel::Devices keywords] {
-    set name [lindex $keyword 0]
-    if {[regexp {^D_KRU_([^_]+)_.*_MINPERIOD$} $name -> pin]} {
-      # The longest period of a pin is the same for both feedbacks.
-      lappend all $name [string map {_2X_ _1X_ MINPERIOD MAXPERIOD} $name] "period of $pin"
-    }
-  }
-  return $all
 }
 
 # The lines of the keywords in the tables of the grades, as files are commonly written: a dict

@@ -19,7 +19,9 @@ namespace eval ::vorkel::command_options {
   # several words, the description begins with them, up to a semicolon; the completion relies on
   # it. An option that commands describe differently has several entries.
   variable table {
-    --in F[,F2] loops "input frequency; F2 is that of a second input clock"
+    --in F[,F2] loops
+      "input frequency; F2 is that of a second input clock, with which all must stay in range;\
+      errors are for the first"
     --in F krus "input frequency"
     --out LIST loops "frequencies of 1 to 7 outputs"
     --out LIST krus "frequencies of 1 to 6 outputs"
@@ -31,7 +33,7 @@ namespace eval ::vorkel::command_options {
     --bandwidth NAME finding "LOW, HIGH or OPTIMIZED; of the loop, all by default"
     --bandwidth NAME loop "LOW (lower limit for the PFD), HIGH or OPTIMIZED (default)"
     --low-bandwidth "" loops "short for --bandwidth LOW"
-    --prefer-max-vco "" asking "take the highest VCO"
+    --prefer-max-vco "" asking "of PLL and TSYN only the variants that look for the largest VCO"
     --prefer-max-vco "" best "the highest VCO comes before the least jitter"
     --prefer-max-vco "" loop "with --phase or --duty: take the highest VCO"
     --int-div0 "" {plan explain} "a whole divider for output 0 of a TSYN"
@@ -46,7 +48,8 @@ namespace eval ::vorkel::command_options {
     --format NAME written "text (default), json, tcl or sdc"
     --format NAME compare "text (default), json or tcl"
     -o FILE any "write to a file; - is standard output"
-    --trace "" single "print the steps of the search first; text format only"
+    --trace "" single "print first what the engine itself tells of its search, a line\
+      for each step; text format only"
   }
   # Why some commands have no use for an option, and what to do.
   variable reasons {
@@ -108,6 +111,11 @@ proc ::vorkel::command_options::reason {command option} {
   return ""
 }
 
+# Whether an option has no value.
+proc ::vorkel::command_options::isFlag {option} {
+  return [expr {[lindex [Entry $option] 1] eq ""}]
+}
+
 # The words of a call that another command takes, too: without the options that it does not have,
 # and without those that say where the output goes and what it looks like.
 proc ::vorkel::command_options::kept {command words} {
@@ -116,7 +124,7 @@ proc ::vorkel::command_options::kept {command words} {
     set words [lassign $words word]
     set name [regsub {^(--[^=]*)=.*$} $word {\1}]
     set value {}
-    if {$name eq $word && [lindex [Entry $name] 1] ne ""} {
+    if {$name eq $word && [string match -* $name] && ![isFlag $name]} {
       set words [lassign $words value]
       set value [list $value]
     }

@@ -2,6 +2,9 @@
 
 package provide vorkel::devices 1.1
 package require vorkel::catalogue 1.1
+package require vorkel::explain_pins 1.1
+package require vorkel::hardware 1.1
+package require vorkel::limits 1.1
 package require vorkel::options 1.1
 package require vorkel::table 1.1
 
@@ -9,35 +12,60 @@ namespace eval ::vorkel::devices {
   variable label_width 10
   # So many grades stand beside each other.
   variable most_grades 5
+  # Behind a range whose ends are the wrong way round.
+  variable mark " !"
 }
 
 # Answers the list of all devices, or all limits of the device, or of the grade, that a part
 # name, or its beginning, stands for.
 proc ::vorkel::devices::run {words} {
   set operands [::vorkel::options::operands $words 1]
+  TellFolders
   if {[llength $operands] == 0} {
     return [All]
   }
   return [One [lindex $operands 0]]
 }
 
+# Says on standard error which folders of VORKEL_DEVICES there are not: the host passes over them.
+proc ::vorkel::devices::TellFolders {} {
+  if {![info exists ::env(VORKEL_DEVICES)]} return
+  foreach folder [lsort -unique [split $::env(VORKEL_DEVICES) :]] {
+    if {$folder ne "" && ![file isdirectory [::vorkel::options::path $folder]]} {
+      # Nobody may be listening.
+      catch {
+        puts stderr "vorkel: warning: VORKEL_DEVICES names [::vorkel::options::shown $folder],\
+          which is no folder"
+      }
+    }
+  }
+}
+
 # One row for each primitive of each device, in its default grade. A device whose file cannot
 # be read does not hide the others.
 proc ::vorkel::devices::All {} {
   set rows {}
-  set unreadable ""
+  set troubles ""
   foreach name [::vorkel::catalogue::names] {
     try {
-      lappend rows {*}[Rows $name]
+      set device [::vorkel::catalogue::resolve $name]
+      lappend rows {*}[Rows $device]
+      append troubles [Doubts "$name, " [dict get $device grade] [dict get $device limits]]
     } trap {VORKEL USAGE} {reason} {
-      append unreadable "\n$name cannot be used: $reason\n"
+      append troubles [::vorkel::table::prose "$name cannot be used: " $reason]
     }
   }
   set columns {{left device} {left grade} {left primitive} {left {VCO MHz}} {left {PFD MHz}}
     {left {outputs MHz}} {left {output 1}}}
   set text [::vorkel::table::render $columns $rows]
-  append text $unreadable
+  if {$troubles ne ""} {
+    append text \n $troubles
+  }
   append text "\nThe grade is the device's default; devices NAME shows all limits.\n"
+  if {[lsearch -index 2 $rows PLL] >= 0} {
+    append text [::vorkel::table::paragraph "The last column is the highest frequency of output 1\
+      of a PLL, which can drive an I/O clock."]
+  }
   if {[lsearch -index 2 $rows KRU_CLKGEN] >= 0} {
     lassign [::vorkel::catalogue::clkgenRange] lowest highest
     append text [::vorkel::table::paragraph "The engine looks for a KRU_CLKGEN from $lowest\
@@ -46,10 +74,19 @@ proc ::vorkel::devices::All {} {
   return $text
 }
 
-proc ::vorkel::devices::Rows {name} {
-  set device [::vorkel::catalogue::resolve $name]
+# What is doubtful about the limits of a grade, a line each.
+proc ::vorkel::devices::Doubts {whose grade limits} {
+  set text ""
+  foreach doubt [::vorkel::limits::doubts $limits] {
+    append text [::vorkel::table::prose "warning: " "${whose}grade $grade:\
+      [dict get $doubt sentence]"]
+  }
+  return $text
+}
+
+proc ::vorkel::devices::Rows {device} {
   set limits [dict get $device limits]
-  set label [list $name [dict get $device grade]]
+  set label [list [dict get $device device] [dict get $device grade]]
   return [lmap primitive [dict get $device primitives] {
     set row [list {*}$label $primitive \
       [Span [::vorkel::catalogue::vcoRange $primitive $limits]] \
@@ -63,11 +100,12 @@ proc ::vorkel::devices::Rows {name} {
 
 # A range as text, "-" for none.
 proc ::vorkel::devices::Span {range} {
+  variable mark
   if {$range eq ""} {
     return -
   }
   lassign $range lowest highest
-  return [format "%.6g - %.6g" $lowest $highest]
+  return [format "%.6g - %.6g%s" $lowest $highest [expr {$lowest > $highest ? $mark : ""}]]
 }
 
 # Output 1 of a PLL may drive an I/O clock, which runs faster.
@@ -95,12 +133,21 @@ proc ::vorkel::devices::One {part} {
   set there [concat {*}[lmap grade $grades {
     ::vorkel::catalogue::primitivesOf [dict get $limits $grade]
   }]]
+  set counted 0
   foreach primitive [::vorkel::catalogue::primitives] {
     if {$primitive ni $there} continue
-    append text \n [Limits $primitive $grades $limits]
+    append text \n [Limits $primitive $grades $limits] [Note [Settings $primitive]]
+    if {$primitive in {PLL TSYN} && !$counted} {
+      set counted 1
+      append text [CountNote]
+    }
     if {$primitive eq "KRU_CLKGEN"} {
       append text [ClkgenNote]
     }
+  }
+  set doubts [join [lmap grade $grades {Doubts "" $grade [dict get $limits $grade]}] ""]
+  if {$doubts ne ""} {
+    append text \n $doubts
   }
   return $text
 }
@@ -127,12 +174,55 @@ proc ::vorkel::devices::Choice {description kind} {
     ([expr {$default eq "" ? "no default" : "default $default"}])"
 }
 
+# The settings that a primitive has on every device. CLKDV has no 8.5, though 7.5, and ends at 17.
+proc ::vorkel::devices::Settings {primitive} {
+  namespace upvar ::vorkel::hardware smallest_m smallest_m largest_m largest_m \
+    largest_d largest_d largest_divider largest_divider fraction fraction \
+    whole_outputs whole_outputs
+  namespace upvar ::vorkel::explain_pins smallest_m pin_smallest_m largest pin_largest \
+    fx_divides fx_divides
+  switch -- $primitive {
+    PLL {
+      return "M is [dict get $smallest_m PLL] to $largest_m, D 1 to $largest_d and each output\
+        divider 1 to $largest_divider, at most twice O_MAX_HT_LT; all are whole. Output 1 can drive\
+        an I/O clock and goes up to CLKOUT_FREQ_MAX_IOCLK, the others to CLKOUT_FREQ_MAX_GCLK."
+    }
+    TSYN {
+      return "M is 1 or [dict get $smallest_m TSYN] to $largest_m, D 1 to $largest_d and each\
+        output divider 1 to $largest_divider, at most twice O_MAX_HT_LT. With fewer than\
+        $whole_outputs outputs, M and the divider of output 0 can go in steps of 1/$fraction, the\
+        divider from 2 on; the engine's search takes whole M, best takes all."
+    }
+    KRU_SP {
+      return "M of CLKFX is $pin_smallest_m to [dict get $pin_largest KRU_SP], D 1 to\
+        [dict get $pin_largest KRU_SP]. CLKDV divides by 2 to 8 in steps of 0.5, or by 9 to 17."
+    }
+    KRU_CLKGEN {
+      return "M of CLKFX is $pin_smallest_m to [dict get $pin_largest KRU_CLKGEN], D 1 to\
+        [dict get $pin_largest KRU_CLKGEN]. CLKFXDV divides CLKFX by\
+        [::vorkel::options::enumerate $fx_divides or]."
+    }
+  }
+  return ""
+}
+
+proc ::vorkel::devices::Note {sentence} {
+  return [::vorkel::table::prose "note: " $sentence]
+}
+
+# What the limit of a count means.
+proc ::vorkel::devices::CountNote {} {
+  return [Note "O_MAX_HT_LT is the largest number of VCO cycles for which an output divider can\
+    hold its output high or low. The further a divider is above it, the nearer to 50 % are the duty\
+    cycles that it has."]
+}
+
 # What holds where a KRU_CLKGEN is planned.
 proc ::vorkel::devices::ClkgenNote {} {
   set ranges [lmap {pin range} $::vorkel::catalogue::clkgen_ranges {
     string cat [join $range { to }] " MHz on $pin"
   }]
-  return [::vorkel::table::prose "note: " "the engine does not read these limits to find a\
+  return [Note "the engine does not read these limits to find a\
     KRU_CLKGEN: on every device it takes outputs from [join $ranges { and from }]. clkgen, plan\
     and compare mark an answer that is then outside the limits above, with exit status 3."]
 }

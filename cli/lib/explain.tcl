@@ -11,6 +11,7 @@
 #   pin frequency, pin range, pin phase
 #                         of a KRU
 #   outputs together      each is possible, but not with the others
+#   M in eighths          the hardware has them, but they do not help
 #   the engine            the hardware could, but the engine does not answer so
 
 package provide vorkel::explain 1.1
@@ -18,9 +19,11 @@ package require vorkel::answer 1.1
 package require vorkel::colour 1.1
 package require vorkel::engine 1.1
 package require vorkel::explain_advice 1.1
+package require vorkel::explain_grid 1.1
 package require vorkel::explain_kru 1.1
 package require vorkel::explain_loop 1.1
 package require vorkel::explain_nearest 1.1
+package require vorkel::explain_swap 1.1
 package require vorkel::explain_text 1.1
 package require vorkel::help 1.1
 package require vorkel::notes 1.1
@@ -62,12 +65,15 @@ proc ::vorkel::explain::run {words} {
 proc ::vorkel::explain::Explanation {call texts} {
   set answers [::vorkel::answer::rank [::vorkel::answer::all [dict get $call request] \
     [dict get $call primitives]]]
-  set findings [Findings $call $answers]
+  set found [::vorkel::explain_grid::look [dict get $call request] [dict get $call primitives] \
+    $answers]
+  set findings [Findings $call $answers $found]
   set text [Head $call]\n
-  append text [Verdict $call $findings $answers] [Reasons $findings] \
-    [::vorkel::explain_advice::nearest $call $findings $answers] \
+  append text [Verdict $call $findings $answers $found] [Reasons $findings] \
+    [::vorkel::explain_swap::advice $call $answers] \
+    [::vorkel::explain_advice::nearest $call $findings $answers $found] \
     [::vorkel::explain_advice::inputs $call $texts [dict get [lindex $answers 0] within]] \
-    [Hints $call $answers]
+    [Hints $call $answers $found]
   return $text
 }
 
@@ -82,36 +88,38 @@ proc ::vorkel::explain::Oscillators {call} {
   return [lmap entry [split $list ,] {string trim $entry}]
 }
 
-# For each primitive that does not do what is asked, its findings: a dict.
-proc ::vorkel::explain::Findings {call answers} {
+# For each primitive that does not do what is asked, its findings: a dict. `found` is what
+# explain_grid.tcl has found.
+proc ::vorkel::explain::Findings {call answers {found {}}} {
   set request [dict get $call request]
   set findings [dict create]
   foreach primitive [dict get $call primitives] {
     set best [lindex [::vorkel::answer::ofPrimitive $answers $primitive] 0]
     if {[dict get $best within]} continue
-    dict set findings $primitive [Why $request $primitive $best]
+    dict set findings $primitive [Why $request $primitive $best $found]
   }
   return $findings
 }
 
 # The findings for one primitive, whose best answer it is.
-proc ::vorkel::explain::Why {request primitive answer} {
+proc ::vorkel::explain::Why {request primitive answer found} {
   set refusal [::vorkel::answer::refusal $request $primitive]
   if {$refusal ne ""} {
     return [list [finding "number of clocks" {} \
       [string tolower [string trimright $refusal .] 0 0]]]
   }
   if {[::vorkel::engine::family $primitive] eq "Kru"} {
-    set found [::vorkel::explain_kru::findings $request $primitive]
+    set findings [::vorkel::explain_kru::findings $request $primitive]
     set moved [Duties $request]
     if {[llength $moved] > 0} {
-      lappend found [finding "duty grid" $moved "a KRU has no setting for the duty cycle"]
+      lappend findings [finding "duty grid" $moved "a KRU has no setting for the duty cycle"]
     }
   } else {
-    set found [::vorkel::explain_loop::findings $request $primitive]
+    set findings [::vorkel::explain_grid::completed $request $primitive \
+      [::vorkel::explain_loop::findings $request $primitive] $found]
   }
-  if {[llength $found] > 0} {
-    return $found
+  if {[llength $findings] > 0} {
+    return $findings
   }
   return [list [Engine $answer]]
 }
@@ -191,7 +199,7 @@ proc ::vorkel::explain::Asked {output} {
 }
 
 # Whether it is possible, and else how near the best answer is.
-proc ::vorkel::explain::Verdict {call findings answers} {
+proc ::vorkel::explain::Verdict {call findings answers found} {
   set able [lmap primitive [dict get $call primitives] {
     if {[dict exists $findings $primitive]} continue
     set primitive
@@ -201,15 +209,32 @@ proc ::vorkel::explain::Verdict {call findings answers} {
     return [::vorkel::colour::paint good [::vorkel::table::prose "" "Possible:\
       [::vorkel::options::enumerate $able] $verb all of it."]]
   }
+  set settings [::vorkel::explain_grid::winner [dict get $call request] $found]
+  if {$settings ne "" && [dict get $settings within]} {
+    return [::vorkel::colour::paint good [::vorkel::table::prose "" \
+      [::vorkel::explain_grid::possible $settings]]]
+  }
   set best [lindex $answers 0]
   set whom [expr {[llength [dict get $call primitives]] == 1 ?
     "the [lindex [dict get $call primitives] 0]" : "every primitive"}]
-  set text "Not possible: something stands in the way of $whom."
+  set how [expr {[IsOnlyEngine $findings] ? " with the engine's search" : ""}]
+  set text "Not possible$how: something stands in the way of $whom."
   if {[dict get $best solved]} {
     append text " The engine's nearest answer is that of the [dict get $best primitive]:\
       [join [list {*}[::vorkel::notes::errors $best] {*}[dict get $best violations]] {; }]."
   }
+  append text [::vorkel::explain_grid::nearer $settings $best]
   return [::vorkel::colour::paint off [::vorkel::table::prose "" $text]]
+}
+
+# Whether some primitive could do all that is asked, but for the engine.
+proc ::vorkel::explain::IsOnlyEngine {findings} {
+  foreach found [dict values $findings] {
+    if {[lsort -unique [lmap finding $found {dict get $finding kind}]] eq {{the engine}}} {
+      return 1
+    }
+  }
+  return 0
 }
 
 # A paragraph for each finding.
@@ -230,7 +255,8 @@ proc ::vorkel::explain::Reasons {findings} {
   return $text
 }
 
-proc ::vorkel::explain::Hints {call answers} {
+proc ::vorkel::explain::Hints {call answers found} {
+  set settings [::vorkel::explain_grid::winner [dict get $call request] $found]
   set text ""
   if {$::vorkel::explain_nearest::stopped} {
     append text \n [::vorkel::table::prose "note: " "the search for what works was cut short; there\
@@ -238,6 +264,10 @@ proc ::vorkel::explain::Hints {call answers} {
   }
   if {[dict get [lindex $answers 0] within]} {
     append text "\nhint: the settings: [::vorkel::help::command plan [dict get $call words]]\n"
+  } elseif {$settings ne ""} {
+    set which [expr {[dict get $settings within] ? "the settings" :
+      "the nearest settings of all"}]
+    append text "\nhint: $which: [::vorkel::help::command best [dict get $call words]]\n"
   }
   return $text
 }

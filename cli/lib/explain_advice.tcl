@@ -2,6 +2,8 @@
 
 package provide vorkel::explain_advice 1.1
 package require vorkel::answer 1.1
+package require vorkel::explain_calls 1.1
+package require vorkel::explain_grid 1.1
 package require vorkel::explain_nearest 1.1
 package require vorkel::explain_steps 1.1
 package require vorkel::explain_text 1.1
@@ -14,8 +16,9 @@ namespace eval ::vorkel::explain_advice {
   variable most_outputs 3
 }
 
-# The nearest requests for the outputs that something stands in the way of.
-proc ::vorkel::explain_advice::nearest {call findings answers} {
+# The nearest requests for the outputs that something stands in the way of. `found` is what
+# explain_grid.tcl has found.
+proc ::vorkel::explain_advice::nearest {call findings answers found} {
   variable most_outputs
   set request [dict get $call request]
   set primitives [dict get $call primitives]
@@ -42,10 +45,12 @@ proc ::vorkel::explain_advice::nearest {call findings answers} {
   set left [lrange $offenders [llength $tried] end]
   set text ""
   if {[llength $rows] > 0} {
-    append text \n [Table $rows $primitives]
+    append text \n [Table $rows $primitives] [First $call {*}[lrange [lindex $rows 0] 0 1]]
   }
   if {$helped == 0} {
-    append text [Together [::vorkel::explain_nearest::sets $request $primitives] $tried]
+    append text [Together $call [::vorkel::explain_nearest::sets $request $primitives] \
+      [::vorkel::explain_nearest::gridSet $request [::vorkel::explain_grid::winner $request \
+        $found]] $tried]
   }
   if {[llength $moved] > 0} {
     append text \n
@@ -74,16 +79,24 @@ proc ::vorkel::explain_advice::Outputs {indices} {
 proc ::vorkel::explain_advice::Rows {request primitives index} {
   return [lmap near [::vorkel::explain_nearest::frequencies $request $primitives $index] {
     list $index [Spelled $near] [far [dict get $near ppm]] \
-      [join [dict get $near primitives] {, }]
+      [join [dict get $near labels] {, }]
   }]
+}
+
+# A call with the frequency of a row.
+proc ::vorkel::explain_advice::First {call index spelled} {
+  set outputs [dict get $call request outputs]
+  set texts [lmap output $outputs {::vorkel::explain_nearest::PlainMHz [dict get $output freq]}]
+  lset texts $index [lindex [split $spelled] 0]
+  return "hint: the first of these: [::vorkel::explain_calls::command plan $call $outputs $texts]\n"
 }
 
 proc ::vorkel::explain_advice::Table {rows primitives} {
   set which [expr {[llength $primitives] == 1 ? "the nearest two below and above" :
     "the nearest below and above of each primitive"}]
   set columns {{right output} {left {MHz instead}} {right change} {left {made by}}}
-  set head [::vorkel::table::prose "" "frequencies nearby that work, all else as asked for;\
-    $which:"]
+  set head [::vorkel::table::prose "" "frequencies nearby that the engine's search makes, all else\
+    as asked for; $which:"]
   set table [::vorkel::table::render $columns $rows]
   foreach line [split $table \n] {
     if {[string length $line] > $::vorkel::table::line_width} {
@@ -101,7 +114,7 @@ proc ::vorkel::explain_advice::Steps {request primitives index} {
   foreach {what name unit} {phase phase degrees duty "duty cycle" %} {
     if {[dict get [lindex [dict get $request outputs] $index] $what] eq ""} continue
     foreach {text makers} [::vorkel::explain_steps::nearest $request $primitives $index $what] {
-      set whom [lmap maker $makers {string cat "the " $maker}]
+      set whom [lmap maker $makers {::vorkel::explain_calls::told $maker}]
       lappend sentences "output $index: a $name of $text $unit works on\
         [::vorkel::options::enumerate $whom]"
     }
@@ -110,30 +123,44 @@ proc ::vorkel::explain_advice::Steps {request primitives index} {
 }
 
 # Frequencies for all outputs at once, when to move those that were tried one at a time is in vain.
-proc ::vorkel::explain_advice::Together {sets tried} {
-  set vain "to move [Outputs $tried][expr {[llength $tried] > 1 ? ", one at a time," : " alone"}]\
-    does not help"
+# `beyond` is a set that only best finds the settings for, or "".
+proc ::vorkel::explain_advice::Together {call sets beyond tried} {
+  set one [expr {[llength $tried] > 1 ? ", one at a time," : " alone"}]
+  set vain "to move [Outputs $tried]$one is not enough for the engine's search"
   if {$::vorkel::explain_nearest::stopped || [dict size $::vorkel::explain_nearest::passed] > 0} {
     set vain ""
   }
-  if {[llength $sets] == 0} {
+  set nearer [expr {$beyond ne "" && ([llength $sets] == 0 ||
+    [dict get $beyond ppm] < [dict get [lindex $sets 0] ppm])}]
+  if {[llength $sets] == 0 && !$nearer} {
     return [expr {$vain eq "" ? "" : "\n[::vorkel::table::prose {} $vain]"}]
   }
   set text \n[::vorkel::table::prose "" \
     "[expr {$vain eq "" ? "" : "$vain; "}]moved together, these work:"]
-  foreach set $sets {
-    append text [::vorkel::table::prose "[dict get $set primitive]: " \
-      "--out [join [dict get $set texts] ,] (at most\
-      [far [dict get $set ppm]])"]
+  if {$nearer} {
+    append text [Set $beyond "[dict get $beyond primitive], which only best finds"]
   }
-  return $text
+  foreach set $sets {
+    append text [Set $set [::vorkel::explain_calls::label [dict get $set request] \
+      [dict get $set primitive]]]
+  }
+  set first [expr {$nearer ? $beyond : [lindex $sets 0]}]
+  return "${text}hint: the first of these: [::vorkel::explain_calls::command \
+    [expr {$nearer ? "best" : "plan"}] $call [dict get $call request outputs] \
+    [dict get $first texts]]\n"
 }
 
-# A frequency with what it is about when it is written as a quotient.
+proc ::vorkel::explain_advice::Set {set whose} {
+  return [::vorkel::table::prose "$whose: " "--out [join [dict get $set texts] ,] (at most\
+    [far [dict get $set ppm] 0])"]
+}
+
+# A frequency with what it is about when that takes a quotient or many digits.
 proc ::vorkel::explain_advice::Spelled {near} {
   set text [dict get $near text]
-  if {[string first / $text] >= 0} {
-    append text " = [number [dict get $near frequency]]"
+  set short [number [dict get $near frequency]]
+  if {$text ne $short} {
+    append text " = $short"
   }
   return $text
 }
@@ -152,7 +179,7 @@ proc ::vorkel::explain_advice::Offenders {findings} {
   return [lmap pair [lsort -integer -decreasing -index 1 $pairs] {lindex $pair 0}]
 }
 
-# The input clocks that would make everything exact. Where nothing is in the way, they are told
+# The input clocks that would make every frequency exact. Where nothing is in the way, they are told
 # only to who asks.
 proc ::vorkel::explain_advice::inputs {call texts possible} {
   set stock [expr {![dict exists $call given --oscillators]}]
@@ -168,16 +195,17 @@ proc ::vorkel::explain_advice::inputs {call texts possible} {
   set first [expr {[llength [dict get $call request inputs]] > 1 ?
     " in place of the first input clock" : ""}]
   if {[llength $found] == 0} {
-    return "\n[::vorkel::table::prose {} "None of the $what makes every output exact$first."]"
+    return "\n[::vorkel::table::prose {} "None of the $what makes every frequency exact$first with\
+      the engine's search."]"
   }
   set groups [dict create]
   foreach pair $found {
-    lassign $pair text primitives
-    dict lappend groups $primitives $text
+    lassign $pair text labels
+    dict lappend groups $labels $text
   }
-  set text \n[::vorkel::table::prose "" "$what that make every output exact$first, MHz:"]
-  dict for {primitives inputs} $groups {
-    append text [::vorkel::table::prose "[join $primitives {, }]: " [join $inputs {, }]]
+  set text \n[::vorkel::table::prose "" "$what that make every frequency exact$first, MHz:"]
+  dict for {labels inputs} $groups {
+    append text [::vorkel::table::prose "[join $labels {, }]: " [join $inputs {, }]]
   }
   return $text
 }

@@ -142,8 +142,9 @@ proc ::vorkel::explain_kru::NoRatio {request primitive index} {
   set pins "CLKFX makes input x M / D, with M from $::vorkel::explain_pins::smallest_m and D from\
     1 up to $most"
   if {$primitive eq "KRU_SP"} {
-    set pins "CLK0 is the input, CLK2X doubles it, CLKDV divides it by 2 to 17, $pins; the input\
-      can be halved before that"
+    set pins "CLK0 is the input, CLK2X doubles it, CLKDV divides it by 2 to 8 in halves\
+      or by 9 to 17 (behind a half its duty cycle is below 50 %), $pins; the input can be halved\
+      before that"
   }
   return [finding "pin frequency" $index "no pin makes\
     [number $frequency] MHz: $pins.\
@@ -285,8 +286,9 @@ proc ::vorkel::explain_kru::Together {request primitive} {
   }]
   set phases [Works $plain $primitive]
   set offsets [lsort -unique [lmap index $indices {
-    set phase [Phase [lindex [dict get $request outputs] $index]]
-    ::vorkel::numbers::short [expr {fmod($phase, 90.0)}] 3
+    set output [lindex [dict get $request outputs] $index]
+    if {[dict get $output phase] eq ""} continue
+    ::vorkel::numbers::short [expr {fmod([Phase $output], 90.0)}] 3
   }]]
   if {$phases && [llength $offsets] > 1} {
     return [list [finding "pin phase" $indices "one PHASE_SHIFT moves all\

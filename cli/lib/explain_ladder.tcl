@@ -11,11 +11,11 @@
 
 package provide vorkel::explain_ladder 1.1
 package require vorkel::actual 1.1
-package require vorkel::catalogue 1.1
 package require vorkel::engine 1.1
 package require vorkel::explain_pins 1.1
 package require vorkel::explain_walk 1.1
 package require vorkel::hardware 1.1
+package require vorkel::output_range 1.1
 
 namespace eval ::vorkel::explain_ladder {
   # What differs by less than this part is the same but for the rounding of the arithmetic.
@@ -31,8 +31,8 @@ proc ::vorkel::explain_ladder::search {request primitive index side {alone 0}} {
     output $output asked [dict get $output freq] alone $alone last "" rungs {} \
     family [::vorkel::engine::family $primitive]]
   if {[dict get $search family] eq "Loop"} {
-    lassign [::vorkel::catalogue::outputRange $primitive [dict get $request limits] $index] \
-      lowest highest
+    lassign [::vorkel::output_range::of $request $primitive $index] lowest highest
+    dict set search largest [::vorkel::hardware::largestDivider [dict get $request limits]]
     dict set search lowest $lowest
     dict set search highest $highest
     dict set search fractional [expr {$index == 0 &&
@@ -107,7 +107,7 @@ proc ::vorkel::explain_ladder::LoopRungs {search} {
       if {$side eq "below"} {
         set divider [AtLeast [expr {$quotient * (1 - $rounding)}] $fractional]
       } else {
-        set divider [AtMost [expr {$quotient * (1 + $rounding)}] $fractional]
+        set divider [AtMost $largest [expr {$quotient * (1 + $rounding)}] $fractional]
       }
       set rung [LoopRung $search $pair $divider]
       if {$rung ne ""} {
@@ -125,7 +125,7 @@ proc ::vorkel::explain_ladder::LoopNext {search place} {
   if {[dict get $search side] eq "below"} {
     set divider [AtLeast [expr {$divider + $step}] $fractional]
   } else {
-    set divider [AtMost [expr {$divider - $step}] $fractional]
+    set divider [AtMost [dict get $search largest] [expr {$divider - $step}] $fractional]
   }
   return [LoopRung $search [lrange $place 0 2] $divider]
 }
@@ -142,9 +142,8 @@ proc ::vorkel::explain_ladder::AtLeast {quotient fractional} {
   return [expr {ceil($quotient * $::vorkel::hardware::fraction) / $::vorkel::hardware::fraction}]
 }
 
-# The largest divider that is no larger than a quotient; 0 when there is none.
-proc ::vorkel::explain_ladder::AtMost {quotient fractional} {
-  set most $::vorkel::hardware::largest_divider
+# The largest divider up to `most` that is no larger than a quotient; 0 when there is none.
+proc ::vorkel::explain_ladder::AtMost {most quotient fractional} {
   if {$quotient >= $most} {
     return $most
   }
@@ -158,7 +157,7 @@ proc ::vorkel::explain_ladder::AtMost {quotient fractional} {
 # cycle; "" when the VCO has none in the range.
 proc ::vorkel::explain_ladder::LoopRung {search pair divider} {
   set step [expr {[dict get $search side] eq "below" ? 1 : -1}]
-  while {$divider >= 1 && $divider <= $::vorkel::hardware::largest_divider} {
+  while {$divider >= 1 && $divider <= [dict get $search largest]} {
     set value [expr {[lindex $pair 0] / $divider}]
     if {![IsBetween $value [dict get $search lowest] [dict get $search highest]]} {
       return ""

@@ -11,6 +11,7 @@ package require vorkel::explain_walk 1.1
 package require vorkel::hardware 1.1
 package require vorkel::numbers 1.1
 package require vorkel::options 1.1
+package require vorkel::output_range 1.1
 
 namespace eval ::vorkel::explain_loop {
   namespace path ::vorkel::explain_text
@@ -60,7 +61,7 @@ proc ::vorkel::explain_loop::Inputs {request primitive} {
         [PfdMiss $input $pfd]"]
     } elseif {[llength [::vorkel::explain_walk::pairs $request $primitive [list $input]]] == 0} {
       lappend findings [finding "VCO range" {} "the VCO must have [number [lindex $vco 0]] to\
-        [number [lindex $vco 1]] MHz, and [number $input] MHz x M / D, with M up to\
+        [number [lindex $vco 1]] MHz, and [number $input] MHz x M / D, with whole M up to\
         $::vorkel::hardware::largest_m and D from $first to $last, never has"]
     }
   }
@@ -95,7 +96,7 @@ proc ::vorkel::explain_loop::Apart {inputs vco pfd} {
     append text ", but the highest VCO, [number [lindex $vco 1]] MHz, is only\
       [::vorkel::numbers::short $span 3] times the lowest, [number [lindex $vco 0]] MHz"
   } else {
-    append text "; no M and D keep the VCO in [number [lindex $vco 0]] to\
+    append text "; no whole M and D keep the VCO in [number [lindex $vco 0]] to\
       [number [lindex $vco 1]] MHz and the PFD in [number [lindex $pfd 0]] to\
       [number [lindex $pfd 1]] MHz with both"
   }
@@ -112,13 +113,19 @@ proc ::vorkel::explain_loop::Range {request primitive output index} {
       "above the highest, [number $highest]"}]
     return [list [finding "output range" $index "[number $frequency] MHz is $side MHz"]]
   }
+  set second [SecondRange $request $primitive $frequency $index]
+  if {$second ne ""} {
+    return [list [finding "output range" $index $second]]
+  }
   lassign [::vorkel::catalogue::vcoRange $primitive $limits] slow fast
-  set most $::vorkel::hardware::largest_divider
+  set most [::vorkel::hardware::largestDivider $limits]
   set allowed [expr {1 + [dict get $request tolerance] * 1e-6}]
   if {$frequency * $most * $allowed < $slow} {
     set needed [expr {int(ceil($slow / $frequency))}]
+    set why [expr {$most < $::vorkel::hardware::largest_divider ? ", as its high and low times end\
+      at [dict get $limits O_MAX_HT_LT] VCO periods" : ""}]
     return [list [finding "divider range" $index "to make [number $frequency] MHz of the lowest\
-      VCO, [number $slow] MHz, the divider would have to be $needed; the largest is $most"]]
+      VCO, [number $slow] MHz, the divider would have to be $needed; the largest is $most$why"]]
   }
   set fractional [expr {$index == 0 && [::vorkel::explain_walk::isFractional $request $primitive]}]
   set steps [expr {$fractional ? $::vorkel::hardware::fraction : 1}]
@@ -138,6 +145,22 @@ proc ::vorkel::explain_loop::Range {request primitive output index} {
       [join $parts {, one of }], and the range of the VCO is [number $slow] to [number $fast] MHz"]]
   }
   return {}
+}
+
+# That an output leaves its range with the second input clock, or "".
+proc ::vorkel::explain_loop::SecondRange {request primitive frequency index} {
+  lassign [dict get $request inputs] first second
+  lassign [::vorkel::output_range::of $request $primitive $index \
+    [expr {$frequency * $::vorkel::explain_walk::rounding}]] lowest highest
+  if {$second eq "" || ($frequency >= $lowest && $frequency <= $highest)} {
+    return ""
+  }
+  lassign [::vorkel::catalogue::outputRange $primitive [dict get $request limits] $index] low high
+  set other [expr {double($frequency) * $second / $first}]
+  set side [expr {$other < $low ? "below the lowest, [number $low]" :
+    "above the highest, [number $high]"}]
+  return "[number $frequency] MHz from the first input is [number $other] MHz from the second,\
+    $side MHz"
 }
 
 # An output that cannot be made even when it is the only one.
@@ -170,14 +193,12 @@ proc ::vorkel::explain_loop::Dividers {output pairs} {
 proc ::vorkel::explain_loop::Grid {request primitive output index fractional} {
   set frequency [dict get $output freq]
   set limits [dict get $request limits]
-  set input [lindex [dict get $request inputs] 0]
   set whole [expr {$fractional ? "a divider in eighths" : "a whole number"}]
   set text "[number $frequency] MHz is the VCO divided by $whole"
   if {!$fractional} {
     append text [NamedVcos $frequency [::vorkel::catalogue::vcoRange $primitive $limits]]
   }
-  append text ", but [number $input] MHz x M / D makes no such VCO:\
-    [MostM $primitive], and D ends at [LargestD $request $primitive].\
+  append text ", but [Makes $request $primitive "no such VCO"].\
     [nearestMade $request $primitive $index]"
   return [finding "M and D" $index $text[NoObstacle $output \
     [::vorkel::catalogue::vcoRange $primitive $limits]]]
@@ -213,6 +234,15 @@ proc ::vorkel::explain_loop::NamedVcos {frequency range} {
     return ""
   }
   return " (a VCO of [::vorkel::options::enumerate $vcos or] MHz)"
+}
+
+# That M and D do not make a VCO that is needed, and what there is of them.
+proc ::vorkel::explain_loop::Makes {request primitive what} {
+  set whose [expr {[::vorkel::explain_walk::isSearchWhole $request $primitive] ?
+    "the engine's search, with whole M, makes $what of" : ""}]
+  set input "[number [lindex [dict get $request inputs] 0]] MHz x M / D"
+  return "[expr {$whose eq "" ? "$input makes $what" : "$whose $input"}]: [MostM $primitive],\
+    and D ends at [LargestD $request $primitive]"
 }
 
 proc ::vorkel::explain_loop::MostM {primitive} {
@@ -252,11 +282,13 @@ proc ::vorkel::explain_loop::nearestMade {request primitive index} {
     string cat "[number [lindex $rung 1]] MHz ([How $request $rung],\
       [change [lindex $rung 1] $frequency])"
   }]
+  set whose [expr {[::vorkel::explain_walk::isSearchWhole $request $primitive] ?
+    " that it makes" : ""}]
   switch -- [llength $texts] {
     0 { return "It makes nothing that is in range" }
-    1 { return "The nearest is [lindex $texts 0]" }
+    1 { return "The nearest$whose is [lindex $texts 0]" }
   }
-  return "The nearest are [join $texts { and }]"
+  return "The nearest$whose are [join $texts { and }]"
 }
 
 # How a rung of explain_ladder.tcl is made.
@@ -352,7 +384,6 @@ proc ::vorkel::explain_loop::Together {request primitive pairs} {
 
 proc ::vorkel::explain_loop::Conflict {request primitive indices} {
   set outputs [dict get $request outputs]
-  set input [lindex [dict get $request inputs] 0]
   set names [lmap index $indices {number [dict get [lindex $outputs $index] freq]}]
   set text "each can be made alone, but [join $names { and }] MHz need one VCO that serves all of\
     them. "
@@ -362,8 +393,8 @@ proc ::vorkel::explain_loop::Conflict {request primitive indices} {
     return [append text "None from [number [lindex $range 0]] to [number [lindex $range 1]] MHz,\
       whatever the input clock, is [Multiple $request $primitive $indices]"]
   }
-  return [append text "That is one of [Vcos $common], and [number $input] MHz x M / D makes none of\
-    these: [MostM $primitive], and D ends at [LargestD $request $primitive]"]
+  return [append text "That is one of [Vcos $common], and [Makes $request $primitive "none of\
+    these"]"]
 }
 
 # What a VCO that serves these outputs is.
@@ -393,7 +424,7 @@ proc ::vorkel::explain_loop::commonVcos {request primitive indices range} {
   set seed [lindex [dict get $request outputs] [lindex $indices 0]]
   set steps [expr {$fractional && [lindex $indices 0] == 0 ? $::vorkel::hardware::fraction : 1}]
   set vcos {}
-  set most [expr {$::vorkel::hardware::largest_divider * $steps}]
+  set most [expr {[::vorkel::hardware::largestDivider [dict get $request limits]] * $steps}]
   for {set n $steps} {$n <= $most} {incr n} {
     set vco [expr {[dict get $seed freq] * double($n) / $steps}]
     if {$vco < $lowest || $vco > $highest || ($n > $steps && $n < 2 * $steps)} continue

@@ -4,13 +4,15 @@
 package provide vorkel::explain_nearest 1.1
 package require vorkel::actual 1.1
 package require vorkel::answer 1.1
-package require vorkel::catalogue 1.1
 package require vorkel::engine 1.1
+package require vorkel::explain_calls 1.1
 package require vorkel::explain_ladder 1.1
 package require vorkel::explain_loop 1.1
 package require vorkel::explain_walk 1.1
+package require vorkel::grid 1.1
 package require vorkel::hardware 1.1
 package require vorkel::numbers 1.1
+package require vorkel::output_range 1.1
 package require vorkel::progress 1.1
 package require vorkel::units 1.1
 
@@ -34,6 +36,8 @@ namespace eval ::vorkel::explain_nearest {
   variable budget 1500
   variable deadline 0
   variable stopped 0
+  # The input clock can be a quotient with a divisor of up to this, such as 100/3 MHz or 7 ns.
+  variable largest_divisor 100
   # The VCO frequencies that serve all outputs, by primitive, outputs and range.
   variable vcos
   # What stands nearer to an output than what is told of a PLL or a TSYN: settings make it, but the
@@ -95,20 +99,25 @@ proc ::vorkel::explain_nearest::Spell {frequency input ratio} {
   if {abs([::vorkel::numbers::short $frequency 6] - $frequency) <= 1e-13 * $frequency} {
     return $text
   }
+  variable largest_divisor
   lassign $ratio multiply divide
-  set product [::vorkel::numbers::short [expr {double($input) * $multiply}] 6]
-  if {abs(double($product) / $divide - $frequency) <= 1e-13 * $frequency} {
-    if {$product == round($product)} {
-      lassign [::vorkel::actual::reduce [expr {round($product)}] $divide] product divide
+  for {set divisor 1} {$divisor <= $largest_divisor} {incr divisor} {
+    set product [::vorkel::numbers::short [expr {double($input) * $multiply * $divisor}] 6]
+    set whole [expr {$divide * $divisor}]
+    if {abs(double($product) / $whole - $frequency) <= 1e-13 * $frequency} {
+      if {$product == round($product)} {
+        lassign [::vorkel::actual::reduce [expr {round($product)}] $whole] product whole
+      }
+      return $product/$whole
     }
-    return $product/$divide
   }
   return $text
 }
 
 # The frequencies for an output that work with all else as asked for: the nearest below and above
 # of each primitive, the nearest of all first. Dicts of text (to be given to the program),
-# frequency (MHz), ppm (from what was asked) and primitives, all that make it.
+# frequency (MHz), ppm (from what was asked) and labels of all primitives that make it (see
+# explain_calls.tcl).
 proc ::vorkel::explain_nearest::frequencies {request primitives index} {
   variable told_of_one
   variable told_of_each
@@ -129,8 +138,10 @@ proc ::vorkel::explain_nearest::frequencies {request primitives index} {
   return [lsort -command ::vorkel::explain_nearest::Nearer [lmap near [dict values $told] {
     set frequency [dict get $near frequency]
     dict set near ppm [expr {($frequency / $asked - 1) * 1e6}]
-    dict set near primitives [Makers [With $request $index $frequency] $primitives \
-      [dict get $near primitives]]
+    set changed [With $request $index $frequency]
+    dict set near labels [lmap primitive [Makers $changed $primitives [dict get $near primitives]] {
+      ::vorkel::explain_calls::label $changed $primitive
+    }]
   }]]
 }
 
@@ -202,7 +213,8 @@ proc ::vorkel::explain_nearest::CouldMake {request primitive} {
 }
 
 # When no output can be moved alone: all frequencies that are in the way moved to those of one VCO.
-# Dicts of texts (one for each output), ppm (the largest change) and primitive, the nearest first.
+# Dicts of texts (one for each output), ppm (the largest change), primitive and request, the
+# nearest first.
 proc ::vorkel::explain_nearest::sets {request primitives} {
   variable most_sets_tried
   variable most_sets
@@ -223,11 +235,40 @@ proc ::vorkel::explain_nearest::sets {request primitives} {
     set outputs [lmap output [dict get $request outputs] text $texts {
       dict replace $output freq [::vorkel::units::value $text frequency nearest]
     }]
-    if {[proof [dict replace $request outputs $outputs] $primitive] ne ""} {
-      dict set told $texts [dict create texts $texts ppm $ppm primitive $primitive]
+    set changed [dict replace $request outputs $outputs]
+    if {[proof $changed $primitive] ne ""} {
+      dict set told $texts [dict create texts $texts ppm $ppm primitive $primitive request $changed]
     }
   }
   return [dict values $told]
+}
+
+# The same of what settings of the grid make, of which best is asked whether it finds them; "" when
+# it does not, or when nothing is to be moved. `answer` is what the grid has for the request, or "".
+proc ::vorkel::explain_nearest::gridSet {request answer} {
+  if {$answer eq "" || [isLate]} {
+    return ""
+  }
+  set primitive [dict get $answer primitive]
+  set input [lindex [dict get $request inputs] 0]
+  set worst 0.0
+  set outputs {}
+  set texts {}
+  foreach output [dict get $request outputs] made [dict get $answer outputs] {
+    if {"ppm" in [dict get $made offs]} {
+      set worst [expr {max($worst, abs([dict get $made ppm]))}]
+      lappend texts [Spell [dict get $made actual] $input [dict get $made ratio]]
+    } else {
+      lappend texts [Spell [dict get $output freq] $input {1 1}]
+    }
+    lappend outputs [dict replace $output freq [::vorkel::units::value [lindex $texts end] \
+      frequency nearest]]
+  }
+  set changed [dict replace $request outputs $outputs]
+  if {$worst == 0.0 || ![dict get [lindex [::vorkel::grid::best $changed $primitive] 0] within]} {
+    return ""
+  }
+  return [dict create texts $texts ppm $worst primitive $primitive request $changed]
 }
 
 # The largest change, ppm, and the frequencies as texts when all outputs take the nearest that a
@@ -241,10 +282,9 @@ proc ::vorkel::explain_nearest::Moved {request primitive pair} {
   foreach output [dict get $request outputs] {
     set index [llength $texts]
     set frequency [dict get $output freq]
-    lassign [::vorkel::catalogue::outputRange $primitive [dict get $request limits] $index] \
-      lowest highest
+    lassign [::vorkel::output_range::of $request $primitive $index] lowest highest
     set best ""
-    foreach divider [::vorkel::explain_walk::dividersAt [expr {$vco / $frequency}] \
+    foreach divider [::vorkel::explain_walk::dividersAt $request [expr {$vco / $frequency}] \
         [expr {$fractional && $index == 0}]] {
       set made [expr {$vco / $divider}]
       if {$made < $lowest || $made > $highest} continue
@@ -270,7 +310,8 @@ proc ::vorkel::explain_nearest::Moved {request primitive pair} {
 }
 
 # The input frequencies of a list that make every output exact: a list of the frequency in MHz,
-# as a text, and the primitives for each. Of two input clocks the first one is replaced.
+# as a text, and the labels of the primitives for each. Of two input clocks the first one is
+# replaced.
 proc ::vorkel::explain_nearest::oscillators {request primitives texts} {
   dict set request tolerance 0
   set told {}
@@ -282,7 +323,7 @@ proc ::vorkel::explain_nearest::oscillators {request primitives texts} {
     set serving {}
     foreach primitive $primitives {
       if {[CouldBe $changed $primitive] && [proof $changed $primitive] ne ""} {
-        lappend serving $primitive
+        lappend serving [::vorkel::explain_calls::label $changed $primitive]
       }
     }
     if {[llength $serving] > 0} {

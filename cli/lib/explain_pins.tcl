@@ -88,7 +88,9 @@ proc ::vorkel::explain_pins::canHaveOthers {request primitive index} {
   foreach output [dict get $request outputs] {
     incr other
     set phase [dict get $output phase]
-    lappend offsets [expr {$phase eq "" ? 0.0 : $phase}]
+    if {$phase ne ""} {
+      lappend offsets $phase
+    }
     # Output 0 of a KRU_CLKGEN is at 0 degrees, the others are there or at 180.
     if {$primitive eq "KRU_CLKGEN" && $phase ne "" &&
         [Off $phase 0 [expr {$other == 0 ? 360 : 180}]] > $::vorkel::answer::phase_tolerance} {

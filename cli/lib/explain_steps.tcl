@@ -4,6 +4,7 @@ package provide vorkel::explain_steps 1.1
 package require vorkel::actual 1.1
 package require vorkel::answer 1.1
 package require vorkel::engine 1.1
+package require vorkel::explain_calls 1.1
 package require vorkel::explain_nearest 1.1
 package require vorkel::explain_walk 1.1
 package require vorkel::numbers 1.1
@@ -14,7 +15,8 @@ namespace eval ::vorkel::explain_steps {
 }
 
 # The phases (degrees) or duty cycles (percent), as `what` says, that are nearest below and above
-# for each primitive: a dict from text to primitives, the nearest of all first.
+# for each primitive: a dict from text to labels of primitives (see explain_calls.tcl), the nearest
+# of all first.
 proc ::vorkel::explain_steps::nearest {request primitives index what} {
   set asked [dict get [lindex [dict get $request outputs] $index] $what]
   set told [dict create]
@@ -32,7 +34,8 @@ proc ::vorkel::explain_steps::nearest {request primitives index what} {
         lindex $pair 1
       }]]
       if {$text ne ""} {
-        dict lappend told $text $primitive
+        dict lappend told $text [::vorkel::explain_calls::label [With $request $index $what $text] \
+          $primitive]
       }
     }
   }
@@ -50,16 +53,20 @@ proc ::vorkel::explain_steps::First {request primitive index what values} {
   if {[llength $values] > $most_tried} {
     set ::vorkel::explain_nearest::stopped 1
   }
-  set outputs [dict get $request outputs]
   foreach value [lrange $values 0 $most_tried-1] {
     if {[::vorkel::explain_nearest::isLate]} break
-    lset outputs $index [dict replace [lindex [dict get $request outputs] $index] $what $value]
-    set changed [dict replace $request outputs $outputs]
-    if {[::vorkel::explain_nearest::proof $changed $primitive] ne ""} {
+    if {[::vorkel::explain_nearest::proof [With $request $index $what $value] $primitive] ne ""} {
       return $value
     }
   }
   return ""
+}
+
+# A request with another phase or duty cycle of an output.
+proc ::vorkel::explain_steps::With {request index what value} {
+  set outputs [dict get $request outputs]
+  lset outputs $index [dict replace [lindex $outputs $index] $what $value]
+  return [dict replace $request outputs $outputs]
 }
 
 # The steps next to what is asked for of all dividers that make the output and that leave the other
@@ -84,7 +91,7 @@ proc ::vorkel::explain_steps::Dividers {request primitive index} {
   set found {}
   foreach pair [::vorkel::explain_walk::beside $request $primitive $index] {
     set vco [lindex $pair 0]
-    foreach divider [::vorkel::explain_walk::dividersAt [expr {$vco / $frequency}] 0] {
+    foreach divider [::vorkel::explain_walk::dividersAt $request [expr {$vco / $frequency}] 0] {
       if {abs($vco / $divider / $frequency - 1) <= $allowed} {
         lappend found $divider
       }

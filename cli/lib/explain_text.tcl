@@ -25,10 +25,11 @@ proc ::vorkel::explain_text::change {value frequency} {
   return [far [expr {($value / $frequency - 1) * 1e6}]]
 }
 
-# An error in ppm as text, in percent when it is much.
-proc ::vorkel::explain_text::far {ppm} {
+# An error in ppm as text, in percent when it is much; with its sign, or without one.
+proc ::vorkel::explain_text::far {ppm {signed 1}} {
+  set flag [expr {$signed ? "+" : ""}]
   if {abs($ppm) >= 1e4} {
-    return "[format %+.3g [expr {$ppm / 1e4}]] %"
+    return "[format %${flag}.3g [expr {$ppm / 1e4}]] %"
   }
-  return "[format %+.2f $ppm] ppm"
+  return "[format %${flag}.2f $ppm] ppm"
 }

@@ -5,6 +5,7 @@ package provide vorkel::explain_walk 1.1
 package require vorkel::actual 1.1
 package require vorkel::answer 1.1
 package require vorkel::catalogue 1.1
+package require vorkel::grid_dividers 1.1
 package require vorkel::hardware 1.1
 
 namespace eval ::vorkel::explain_walk {
@@ -82,13 +83,21 @@ proc ::vorkel::explain_walk::isFractional {request primitive} {
   return 1
 }
 
+# Whether only the engine's search has whole M, while the hardware could take eighths of it: those
+# of a TSYN with few outputs, whose phases and duty cycles are those that a fraction leaves.
+proc ::vorkel::explain_walk::isSearchWhole {request primitive} {
+  return [expr {[::vorkel::hardware::hasFractions $request $primitive] &&
+    [::vorkel::grid_dividers::fixedClass $request] == 0}]
+}
+
 # The dividers next to a quotient of VCO and output, of an output that can have eighths or not.
-proc ::vorkel::explain_walk::dividersAt {quotient fractional} {
+proc ::vorkel::explain_walk::dividersAt {request quotient fractional} {
+  set largest [::vorkel::hardware::largestDivider [dict get $request limits]]
   set steps [expr {$fractional && $quotient >= 2 ? $::vorkel::hardware::fraction : 1}]
   set below [expr {floor($quotient * $steps) / $steps}]
   set dividers {}
   foreach divider [list $below [expr {$below + 1.0 / $steps}]] {
-    if {$divider >= 1 && $divider <= $::vorkel::hardware::largest_divider} {
+    if {$divider >= 1 && $divider <= $largest} {
       lappend dividers [expr {$divider == round($divider) ? round($divider) : $divider}]
     }
   }
@@ -107,7 +116,7 @@ proc ::vorkel::explain_walk::level {request output vco fractional} {
   set frequency [dict get $output freq]
   set allowed [allowed $request]
   set best 0
-  foreach divider [dividersAt [expr {$vco / $frequency}] $fractional] {
+  foreach divider [dividersAt $request [expr {$vco / $frequency}] $fractional] {
     if {abs($vco / $divider / $frequency - 1) > $allowed} continue
     set level 1
     if {[phaseServes $output $divider]} {

@@ -20,7 +20,8 @@ namespace eval ::vorkel::format::sdc_writer {
   variable width 78
 }
 
-# The constraints of the first answer.
+# The constraints of the first answer. Outputs on the same pin of a KRU are one clock: a second one
+# there would replace it or, added to it, have every path counted twice.
 proc ::vorkel::format::sdc {answers request} {
   set answer [lindex $answers 0]
   if {![dict get $answer solved]} {
@@ -31,12 +32,19 @@ proc ::vorkel::format::sdc {answers request} {
   foreach input $inputs {
     append text \n [sdc_writer::Input [incr n] $input [dict get $answer inputJitter]]
   }
+  set at [dict create]
   foreach output [dict get $answer outputs] {
     append text \n [sdc_writer::Comment [sdc_writer::Figures $output $inputs]]
     set n 0
+    set pin [sdc_writer::Pin $output]
+    if {[dict exists $at $pin]} {
+      append text [sdc_writer::Comment "Output [dict get $output index] is on the pin $pin, too:\
+        its clock is [dict get $at $pin]."]
+      continue
+    }
+    dict set at $pin [sdc_writer::Name $output 1 [llength $inputs]]
     foreach input $inputs {
-      append text [sdc_writer::Generated $output [incr n] $input [llength $inputs] \
-        [sdc_writer::Pin $output]]
+      append text [sdc_writer::Generated $output [incr n] $input [llength $inputs] $pin]
     }
     append text [sdc_writer::Uncertainty $output [llength $inputs]]
   }

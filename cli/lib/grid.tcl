@@ -3,9 +3,9 @@
 # The grid is what the hardware has (hardware.tcl): every M, whole D and divider. M and dividers are
 # whole, only a TSYN with up to 5 outputs and without --int-div0 has an M in eighths and a divider
 # of output 0 that is 1 or in eighths from 2.
-# A setting counts when VCO and PFD with each input clock and each output, also output 0, are in
-# the device's ranges. Nothing on the grid is left out: grid_loops.tcl tells how M and D are gone
-# through, and grid_dividers.tcl how the dividers are.
+# A setting counts when VCO, PFD and each output, also output 0, are in the device's ranges with
+# each input clock, and the counters of the dividers go so far. Nothing on the grid is left out:
+# grid_loops.tcl tells how M and D are gone through, and grid_dividers.tcl how the dividers are.
 #
 # A point is what an M, a D and a bandwidth can do, a list of
 #   class      0 when phases and duty cycles are asked for and all is within its tolerance, 1 when
@@ -30,19 +30,49 @@ package require vorkel::timing 1.1
 namespace eval ::vorkel::grid {
   # About as many steps of this search take as long as a run of the engine.
   variable run_steps 10
+  # As many trade-offs, the best settings as the first, are shown to who does not say how many.
+  variable default_front 6
   # Where in a point something stands.
   variable place {class 0 ppm 1 phase 2 duty 3 jitter 4 vco 5 d 6 m 7 bandwidth 8 primitive 9
     dividers 10}
 }
 
 # The best settings of a primitive, a list of one answer, or of none when no setting has
-# everything in the device's ranges. `tick` is that of points.
-proc ::vorkel::grid::best {request primitive {variant ""} {tick list}} {
-  set points [order $request [points $request $primitive $tick]]
+# everything in the device's ranges.
+proc ::vorkel::grid::best {request primitive {variant ""}} {
+  set points [dict get [search $request [list $primitive]] $primitive]
   if {[llength $points] == 0} {
     return {}
   }
   return [list [answer $request [lindex $points 0] $variant]]
+}
+
+# The points of some primitives, a dict from primitive to list, the best first. `tick` is that of
+# points.
+proc ::vorkel::grid::search {request primitives {tick list}} {
+  set found [dict create]
+  foreach primitive $primitives {
+    dict set found $primitive [order $request [points $request $primitive $tick]]
+  }
+  return $found
+}
+
+# The trade-offs of what a search has found, over all its primitives.
+proc ::vorkel::grid::front {request found} {
+  return [tradeoffs [order $request [concat {*}[dict values $found]]]]
+}
+
+# The place among trade-offs of the one with the least jitter that has everything within its
+# tolerance; -1 when there is none.
+proc ::vorkel::grid::calmest {request front} {
+  set place -1
+  foreach point $front {
+    if {[Of $point class] == 0 &&
+        [::vorkel::answer::isAllowed ppm [Of $point ppm] [dict get $request tolerance]]} {
+      incr place
+    }
+  }
+  return $place
 }
 
 # The answer that a point is.

@@ -6,10 +6,11 @@
 # 1 and 2, or whole. A target is a dict of what an output is to be:
 #   freq        MHz
 #   phase duty  as asked for, or ""
-#   range       of its frequency, MHz
+#   range       of its frequency with the first input clock, MHz
 #   most        how many VCO periods a divider can be high or low for
 #   moved       whether phase and duty cycle have steps; else they are 0 degrees and 50 percent
 #   parts       of which its divider is counted
+#   largest     the largest divider
 #   end         the largest count
 #   below above lists with, at the place of each count up to one behind the largest, the nearest
 #               count from there down and up that is to be looked at; 0, and one behind the
@@ -22,6 +23,7 @@ package require vorkel::answer 1.1
 package require vorkel::catalogue 1.1
 package require vorkel::hardware 1.1
 package require vorkel::notes 1.1
+package require vorkel::output_range 1.1
 
 namespace eval ::vorkel::grid_dividers {
   # The parts of a divider that is whole.
@@ -38,14 +40,13 @@ proc ::vorkel::grid_dividers::targets {request primitive class shape parts} {
   set targets {}
   foreach output [dict get $request outputs] {
     set index [llength $targets]
-    lassign [::vorkel::catalogue::outputRange $primitive $limits $index] lowest highest
     set target [dict create freq [expr {double([dict get $output freq])}] \
       phase [dict get $output phase] duty [dict get $output duty] \
-      range [list [expr {$lowest - $::vorkel::notes::rounding}] \
-        [expr {$highest + $::vorkel::notes::rounding}]] \
+      range [::vorkel::output_range::of $request $primitive $index $::vorkel::notes::rounding] \
       most [dict get $limits O_MAX_HT_LT] moved [expr {$shape eq "moved"}] \
-      parts [expr {$index == 0 ? $parts : $whole}]]
-    set counts [Counts [dict get $target parts]]
+      parts [expr {$index == 0 ? $parts : $whole}] \
+      largest [::vorkel::hardware::largestDivider $limits]]
+    set counts [Counts $target]
     if {$class == 0 && $shape eq "moved"} {
       set counts [lmap count $counts {
         if {![AreAllowed [Shape $target $count]]} continue
@@ -58,7 +59,7 @@ proc ::vorkel::grid_dividers::targets {request primitive class shape parts} {
     return [list $targets $targets]
   }
   set first [lindex $targets 0]
-  set fractions [lmap count [Counts $parts] {
+  set fractions [lmap count [Counts $first] {
     if {$count % $parts == 0} continue
     set count
   }]
@@ -130,9 +131,10 @@ proc ::vorkel::grid_dividers::choose {input vco ratio targets} {
   return [list {*}$worst $dividers]
 }
 
-# The counts that are dividers.
-proc ::vorkel::grid_dividers::Counts {parts} {
-  set end [expr {$::vorkel::hardware::largest_divider * $parts}]
+# The counts that are dividers of a target.
+proc ::vorkel::grid_dividers::Counts {target} {
+  set parts [dict get $target parts]
+  set end [expr {[dict get $target largest] * $parts}]
   set counts [list $parts]
   for {set count [expr {2 * $parts}]} {$count <= $end} {incr count} {
     lappend counts $count
@@ -142,7 +144,7 @@ proc ::vorkel::grid_dividers::Counts {parts} {
 
 # A target with the tables for what counts are to be looked at.
 proc ::vorkel::grid_dividers::Tables {target counts} {
-  set end [expr {$::vorkel::hardware::largest_divider * [dict get $target parts]}]
+  set end [expr {[dict get $target largest] * [dict get $target parts]}]
   set below {}
   set above {}
   set last 0

@@ -15,6 +15,13 @@ namespace eval ::vorkel::hardware {
   variable whole_outputs 6
 }
 
+# The largest divider of a device. A divider holds its output high and then low, each for at most
+# as many VCO periods as its counters go to; a divider of 1 does not count.
+proc ::vorkel::hardware::largestDivider {limits} {
+  variable largest_divider
+  return [expr {int(max(1, min($largest_divider, 2 * [dict get $limits O_MAX_HT_LT])))}]
+}
+
 # Whether M and the divider of output 0 may be fractions for a request.
 proc ::vorkel::hardware::hasFractions {request primitive} {
   variable whole_outputs

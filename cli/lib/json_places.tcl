@@ -156,7 +156,7 @@ proc ::vorkel::json_places::Seen {text place} {
   }
   package require vorkel::options 1.1
   regexp -start $place {\A(?:[[:alnum:]_.+-]+|.)} $text word
-  return "\"[::vorkel::options::shown $word]\""
+  return [expr {$word eq "\"" ? "'\"'" : "\"[::vorkel::options::shown $word]\""}]
 }
 
 proc ::vorkel::json_places::Fail {place reason} {

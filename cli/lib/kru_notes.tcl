@@ -13,13 +13,14 @@ namespace eval ::vorkel::kru_notes {}
 # What of the configuration of an answer (see answer.tcl) is outside the device's range, as
 # sentences.
 proc ::vorkel::kru_notes::violations {answer} {
-  set violations {}
-  set pins [lmap output [dict get $answer outputs] {dict get $output pin}]
-  foreach output [dict get $answer outputs] pin $pins {
-    lappend violations {*}[::vorkel::notes::outside "output [dict get $output index]" \
-      [dict get $output actual] {*}[Range $pin $pins [dict get $answer request limits]]]
-  }
-  return $violations
+  return [concat {*}[lmap output [dict get $answer outputs] {dict get $output outside}]]
+}
+
+# What of an output is outside the device's range, as that of notes.tcl. `pins` are those of all
+# outputs.
+proc ::vorkel::kru_notes::ofOutput {request pins output} {
+  return [dict create range [::vorkel::notes::outside "output [dict get $output index]" \
+    [dict get $output actual] {*}[Range [dict get $output pin] $pins [dict get $request limits]]]]
 }
 
 # The other notes on an answer, as sentences.

@@ -44,6 +44,10 @@ proc ::vorkel::main::run {words} {
   } trap {VORKEL UNSOLVED} {sentence} {
     Complain $sentence
     return $unsolved
+  } trap {VORKEL USAGE FILE} {reason} {
+    # The words were right: how they are used is no help.
+    Complain "vorkel: $reason"
+    return $wrong_usage
   } trap {VORKEL USAGE} {reason} {
     package require vorkel::help 1.1
     Complain "vorkel: $reason\n[::vorkel::help::usage [lindex $words 0]]"

@@ -7,6 +7,7 @@ package provide vorkel::notes 1.1
 package require vorkel::answer 1.1
 package require vorkel::catalogue 1.1
 package require vorkel::colour 1.1
+package require vorkel::hardware 1.1
 package require vorkel::numbers 1.1
 package require vorkel::table 1.1
 
@@ -16,6 +17,8 @@ namespace eval ::vorkel::notes {
   variable rounding 5e-7
   # The engine prints 3 decimals. What differs by no more than their rounding agrees.
   variable visible 0.0006
+  # What is said behind what runs at another frequency with the second input clock.
+  variable second " with the second input"
   # What the errors of an output are those of, and their units.
   variable error_words {
     ppm {frequency ppm} phaseError {phase degrees} dutyError {{duty cycle} {percent points}}
@@ -25,25 +28,41 @@ namespace eval ::vorkel::notes {
 # What of the configuration of an answer (see answer.tcl) is outside the device's range, as
 # sentences.
 proc ::vorkel::notes::violations {answer} {
+  variable second
   set primitive [dict get $answer primitive]
   set request [dict get $answer request]
   set limits [dict get $request limits]
   set m [dict get $answer settings M]
   set d [dict get $answer settings D]
+  set violations {}
   set vcoRange [::vorkel::catalogue::vcoRange $primitive $limits]
   set pfdRange [::vorkel::catalogue::pfdRange $primitive $limits [dict get $answer bandwidth]]
-  set violations {}
-  foreach input [dict get $request inputs] suffix {"" " with the second input"} {
+  foreach input [dict get $request inputs] suffix [list "" $second] {
     if {$input eq ""} continue
     lappend violations {*}[outside "the VCO$suffix" [expr {double($input) * $m / $d}] $vcoRange]
     lappend violations {*}[outside "the PFD$suffix" [expr {double($input) / $d}] $pfdRange]
   }
   foreach output [dict get $answer outputs] {
-    set index [dict get $output index]
-    lappend violations {*}[outside "output $index" [dict get $output actual] \
-      [::vorkel::catalogue::outputRange $primitive $limits $index]]
+    lappend violations {*}[dict get $output outside]
   }
   return $violations
+}
+
+# What of an output is outside the device's range: a dict from the key that `offs` of the output
+# has for it to a list of sentences.
+proc ::vorkel::notes::ofOutput {request primitive output} {
+  variable second
+  set index [dict get $output index]
+  set limits [dict get $request limits]
+  set range [::vorkel::catalogue::outputRange $primitive $limits $index]
+  set sentences [outside "output $index" [dict get $output actual] $range]
+  set divider [dict get $output divider]
+  if {$divider > [::vorkel::hardware::largestDivider $limits]} {
+    lappend sentences "output $index: divider [::vorkel::numbers::short $divider 3] needs a high or\
+      low time above [dict get $limits O_MAX_HT_LT] VCO periods, the device's most"
+  }
+  return [dict create range $sentences \
+    range2 [outside "output $index$second" [dict get $output actual2] $range]]
 }
 
 # The other notes on an answer, as sentences.
@@ -59,6 +78,9 @@ proc ::vorkel::notes::on {answer} {
     }
   }
   set notes [Search $answer]
+  if {[llength [dict get $request inputs]] > 1 && [isVcoOff $answer]} {
+    set notes [linsert $notes 0 "the search took the VCO as [dict get $answer searchVco] MHz"]
+  }
   set m [dict get $answer settings M]
   set fractions {}
   if {$m != round($m)} {
@@ -71,13 +93,23 @@ proc ::vorkel::notes::on {answer} {
     lappend notes "with a fractional [join $fractions { and }] all phases are 0 and all duty\
       cycles 50 %; --int-div0 avoids it"
   }
-  if {[dict get $request preferMaxVco] && !$asked && !$closest} {
+  # That is so of the engine; the search over the grid has an order of its own.
+  if {[dict get $request preferMaxVco] && !$asked && !$closest &&
+      [dict get $answer source] eq "engine"} {
     lappend notes "--prefer-max-vco counts only with --phase or --duty"
   }
   if {[dict get $request intDiv0] && $primitive eq "PLL"} {
     lappend notes "--int-div0 changes nothing: all dividers of a PLL are whole numbers"
   }
   return [list {*}$notes {*}[refusals [dict get $answer timing]]]
+}
+
+# Whether the engine counted with a VCO that can be seen to differ from that of its settings.
+proc ::vorkel::notes::isVcoOff {answer} {
+  variable visible
+  set counted [dict get $answer searchVco]
+  return [expr {$counted ne "" &&
+    abs($counted - [dict get $answer settings VCO]) > $visible}]
 }
 
 # A list of one sentence when the engine counted with frequencies that can be seen to differ from
@@ -111,14 +143,16 @@ proc ::vorkel::notes::errors {answer} {
   variable error_words
   set errors {}
   foreach output [dict get $answer outputs] {
-    if {[dict get $output within]} continue
     set parts [lmap key [dict get $output offs] {
+      if {![dict exists $error_words $key]} continue
       lassign [dict get $error_words $key] what unit
       set allowed [::vorkel::answer::allowance $key [dict get $answer request tolerance]]
       string cat "$what is off by [Figure [dict get $output $key]] $unit, with " \
         "[::vorkel::numbers::short $allowed 6] allowed"
     }]
-    lappend errors "output [dict get $output index]: the [join $parts {; the }]"
+    if {[llength $parts] > 0} {
+      lappend errors "output [dict get $output index]: the [join $parts {; the }]"
+    }
   }
   return $errors
 }

@@ -6,14 +6,15 @@
 #
 # with the words after its name and a table of options of its own, in the form that `parse`
 # takes: name, placeholder and description of each, flat. Anything wrong is thrown as
-# {VORKEL USAGE}, which the program makes a complaint and exit status 2. The answer is a dict:
+# {VORKEL USAGE}, which the program makes a complaint and exit status 2; {VORKEL USAGE FILE} is
+# what is wrong inside a file. The answer is a dict:
 #   request     the request, see answer.tcl
 #   primitive   that of --primitive: PLL, TSYN, KRU_SP, KRU_CLKGEN, or auto, the default
 #   primitives  a list: the one of --primitive, or those of the device
 #   format      text (the default), json, tcl or sdc
 #   file        the file of -o, or "" for standard output
 #   given       the options that were given, from name to value; those of `table` among them
-#   words       the words, to be shown in a hint
+#   words       the words, or others that ask the same, to be shown in a hint
 #
 # ::vorkel::output::write TEXT FILE then writes what the command has to say.
 

@@ -31,7 +31,11 @@ proc ::vorkel::output::write {text {file ""}} {
     catch {close stdout}
   } on error {reason options} {
     catch {close stdout}
-    throw {VORKEL UNWRITTEN} "standard output cannot be written: [Cause $reason $options]"
+    set cause [Cause $reason $options]
+    if {[lindex [dict get $options -errorcode] 1] eq "EBADF"} {
+      set cause "it is closed"
+    }
+    throw {VORKEL UNWRITTEN} "standard output cannot be written: $cause"
   }
 }
 

@@ -4,30 +4,38 @@ package provide vorkel::plan 1.1
 package require vorkel::answer 1.1
 package require vorkel::cells 1.1
 package require vorkel::engine 1.1
+package require vorkel::grid 1.1
+package require vorkel::grid_words 1.1
 package require vorkel::help 1.1
 package require vorkel::numbers 1.1
 package require vorkel::options 1.1
 package require vorkel::output 1.1
+package require vorkel::plan_refusals 1.1
 package require vorkel::progress 1.1
 package require vorkel::report 1.1
 package require vorkel::table 1.1
 
 namespace eval ::vorkel::plan {
   namespace path ::vorkel::cells
-  # The variant of the settings that the search over the whole grid has found.
+  # The variants of the settings that the search over the whole grid has found: the nearest ones,
+  # those that have less jitter and are still within all tolerances, and those that are the
+  # engine's as well.
   variable grid_variant "grid, not engine"
+  variable calm_variant "grid, calmer"
+  variable common_variant "engine and grid"
 }
 
-# Writes the report on the best answer and why it is the best; the exit status is its.
+# Writes the report on the engine's best answer and why it is the best; the exit status is its.
 proc ::vorkel::plan::run {words} {
   set call [Read $words]
   set request [dict get $call request]
-  set ranked [lindex [Search $call] 0]
+  set text [expr {[dict get $call format] eq "text"}]
+  lassign [Search $call [expr {$text ? [Loops $call] : {}}]] ranked found
   set winner [lindex $ranked 0]
   if {![dict get $winner solved]} {
-    Unsolved $call $ranked
+    Unsolved $call $ranked [expr {$text ? $found : [::vorkel::grid::search $request [Loops $call]]}]
   }
-  if {[dict get $call format] ne "text"} {
+  if {!$text} {
     set text [::vorkel::output::format [dict get $call format] [list $winner] $request]
   } else {
     set text [::vorkel::report::render $winner]
@@ -36,14 +44,15 @@ proc ::vorkel::plan::run {words} {
       append text \n [Contest $best]
     }
     append text \n [::vorkel::table::prose "why: " [Why $best $ranked]] \
-      [Refusals $ranked] [Hints $call $winner]
+      [::vorkel::plan_refusals::text $request $ranked] \
+      [Hints $call $ranked [Better $call $winner $found]]
   }
   ::vorkel::output::write $text [dict get $call file]
   return [::vorkel::answer::status $winner]
 }
 
 # Writes the whole ranking, with the best that the whole grid of settings has. The exit status
-# is that of the engine's best answer.
+# is that of the first row.
 proc ::vorkel::plan::compare {words} {
   set call [Read $words]
   if {[dict get $call format] eq "sdc"} {
@@ -51,54 +60,53 @@ proc ::vorkel::plan::compare {words} {
       use plan, best or the command of a primitive"
   }
   set request [dict get $call request]
-  package require vorkel::grid 1.1
-  lassign [Search $call [::vorkel::engine::ofFamily Loop [dict get $call primitives]]] engine grid
-  set ranked [::vorkel::answer::rank [concat $engine $grid]]
-  # Settings that are off do not make up for the lack of an answer.
-  if {![dict get [lindex $engine 0] solved] && ![dict get [lindex $ranked 0] within]} {
-    Unsolved $call $engine
+  lassign [Search $call [Loops $call]] engine found
+  set ranked [::vorkel::answer::rank [Joined $engine [OfGrid $request $found]]]
+  if {![dict get [lindex $ranked 0] solved]} {
+    Unsolved $call $engine $found
   }
   if {[dict get $call format] ne "text"} {
     set text [::vorkel::output::format [dict get $call format] $ranked $request]
   } else {
     set text [Ranking $ranked]
-    append text [Refusals $ranked]
-    if {[llength $grid] > 0} {
-      append text "\n" [::vorkel::table::prose "" "A row \"$::vorkel::plan::grid_variant\" is\
-        not an answer of the engine: it is the best of all settings that the device allows.\
-        best shows it whole."]
-    }
-    append text [Hints $call [lindex $engine 0]]
+    append text [::vorkel::plan_refusals::text $request $ranked] [Legend $ranked] \
+      [GridHint $call $ranked $found] [Hints $call $ranked {}]
   }
   ::vorkel::output::write $text [dict get $call file]
-  return [::vorkel::answer::status [lindex $engine 0]]
+  return [::vorkel::answer::status [lindex $ranked 0]]
 }
 
 proc ::vorkel::plan::Read {words} {
   set call [::vorkel::options::request $words]
+  if {[dict get $call primitive] ne "auto"} {
+    dict set call request primitive [dict get $call primitive]
+  }
   ::vorkel::output::into [dict get $call file]
   return $call
 }
 
-# Ends the command when no primitive has a configuration.
-proc ::vorkel::plan::Unsolved {call answers} {
-  set request [dict get $call request]
-  set text "no primitive of [dict get $request device] has a configuration for this"
-  foreach answer $answers {
-    append text \n [string trimright [::vorkel::table::prose "[dict get $answer primitive]: " \
-      [dict get $answer reason]] \n]
-  }
-  append text "\nhint: [::vorkel::help::command explain [dict get $call words]]"
-  throw {VORKEL UNSOLVED} $text
+# The primitives that have a grid of settings.
+proc ::vorkel::plan::Loops {call} {
+  return [::vorkel::engine::ofFamily Loop [dict get $call primitives]]
 }
 
-# The engine's answers, the best first, and the best settings of the whole grid of some primitives,
-# which is searched only for `loops`. A terminal sees how far this has come.
-proc ::vorkel::plan::Search {call {loops {}}} {
-  variable grid_variant
+# Ends the command when no primitive has a configuration.
+proc ::vorkel::plan::Unsolved {call answers found} {
+  set request [dict get $call request]
+  set words [dict get $call words]
+  set text "no primitive of [dict get $request device] has a configuration for this\n"
+  append text [::vorkel::plan_refusals::text $request $answers]
+  set better [Better $call [lindex $answers 0] $found]
+  append text "hint: [::vorkel::help::command explain $words]\n" [Beyond $better]
+  throw {VORKEL UNSOLVED} [string trimright $text \n]
+}
+
+# The engine's answers, the best first, and the points of the whole grid of some primitives
+# (see search of grid.tcl). A terminal sees how far this has come.
+proc ::vorkel::plan::Search {call loops} {
   set request [dict get $call request]
   set primitives [dict get $call primitives]
-  set run_steps [expr {[llength $loops] > 0 ? $::vorkel::grid::run_steps : 1}]
+  set run_steps $::vorkel::grid::run_steps
   set steps [expr {[::vorkel::answer::runs $request $primitives] * $run_steps}]
   foreach primitive $loops {
     incr steps [::vorkel::grid::steps $request $primitive]
@@ -107,13 +115,81 @@ proc ::vorkel::plan::Search {call {loops {}}} {
   try {
     set engine [::vorkel::answer::rank [::vorkel::answer::all $request $primitives \
       [list ::vorkel::progress::step $run_steps]]]
-    set grid [concat {*}[lmap primitive $loops {
-      ::vorkel::grid::best $request $primitive $grid_variant ::vorkel::progress::step
-    }]]
-    return [list $engine $grid]
+    return [list $engine [::vorkel::grid::search $request $loops ::vorkel::progress::step]]
   } finally {
     ::vorkel::progress::finish
   }
+}
+
+# What of the grid ranks before the engine's best answer: a list of a call that shows it, and the
+# settings; nothing when there is none.
+proc ::vorkel::plan::Better {call winner found} {
+  set request [dict get $call request]
+  set front [::vorkel::grid::front $request $found]
+  set better [::vorkel::grid_words::better $request $front $winner]
+  if {[llength $better] == 0} {
+    return {}
+  }
+  return [list [::vorkel::grid_words::command $request $front [dict get $call words]] {*}$better]
+}
+
+# The best settings of the grid of each primitive; where these are within all tolerances and others
+# that are so, too, have less jitter, those as well.
+proc ::vorkel::plan::OfGrid {request found} {
+  variable grid_variant
+  variable calm_variant
+  set answers {}
+  dict for {primitive points} $found {
+    set front [::vorkel::grid::tradeoffs $points]
+    if {[llength $front] == 0} continue
+    lappend answers [::vorkel::grid::answer $request [lindex $front 0] $grid_variant]
+    set calmest [::vorkel::grid::calmest $request $front]
+    if {$calmest > 0} {
+      lappend answers [::vorkel::grid::answer $request [lindex $front $calmest] $calm_variant]
+    }
+  }
+  return $answers
+}
+
+# The engine's answers and those of the grid; what is both is there once.
+proc ::vorkel::plan::Joined {engine grid} {
+  variable common_variant
+  foreach answer $grid {
+    set place 0
+    foreach other $engine {
+      if {[dict get $other solved] && [::vorkel::answer::isSame $answer $other]} break
+      incr place
+    }
+    if {$place < [llength $engine]} {
+      lset engine $place [dict replace [lindex $engine $place] variant $common_variant]
+    } else {
+      lappend engine $answer
+    }
+  }
+  return $engine
+}
+
+# What the names of the variants that have to do with the grid mean.
+proc ::vorkel::plan::Legend {ranked} {
+  variable grid_variant
+  variable calm_variant
+  variable common_variant
+  set meanings [list \
+    $grid_variant "no answer of the engine, but the nearest settings of all that the primitive\
+      has, as best finds them" \
+    $calm_variant "likewise those with the least jitter of all that are within the tolerance" \
+    $common_variant "the engine's answer, which is also that of the search over all settings"]
+  set text ""
+  set shown [lmap answer $ranked {dict get $answer variant}]
+  foreach {variant meaning} $meanings {
+    if {$variant in $shown} {
+      append text [::vorkel::table::prose "$variant: " $meaning]
+    }
+  }
+  if {$text eq ""} {
+    return ""
+  }
+  return \n$text
 }
 
 # The first answer of each primitive.
@@ -154,13 +230,13 @@ proc ::vorkel::plan::Contest {best} {
     lappend rows [list [dict get $answer primitive] [dash [dict get $answer variant]] \
       [dash [dict get $answer bandwidth]] [ppm $answer] [jitter $answer] $result]
   }
-  return [::vorkel::table::render $columns $rows [roles $best]]
+  return [render $columns $rows $best]
 }
 
 # The table of all answers that are solved.
 proc ::vorkel::plan::Ranking {ranked} {
   set columns {{right #} {left primitive} {left variant} {left loop} {right {VCO MHz}}
-    {right {worst ppm}} {right {jitter ps}} {left mark}}
+    {right {worst ppm}} {right {jitter ps}}}
   set rows {}
   set shown {}
   foreach answer $ranked {
@@ -170,7 +246,9 @@ proc ::vorkel::plan::Ranking {ranked} {
       [dash [dict get $answer variant]] [dash [dict get $answer bandwidth]] [vco $answer] \
       [ppm $answer] [jitter $answer] [mark $answer]]
   }
-  return [::vorkel::table::render $columns $rows [roles $shown]]
+  # Where the numbers of the rows take another column, there is no room for more than OFF.
+  lappend columns [list left [expr {[llength $shown] > 9 ? "off" : "mark"}]]
+  return [render $columns $rows $shown]
 }
 
 # Why the first of the best answers of each primitive is before the others.
@@ -178,17 +256,19 @@ proc ::vorkel::plan::Why {best ranked} {
   set winner [lindex $best 0]
   set name [dict get $winner primitive]
   set tolerance [::vorkel::numbers::short [dict get $winner request tolerance] 6]
-  set limit [expr {$tolerance == 0 ? "exact" : "within $tolerance ppm"}]
+  set near [expr {$tolerance == 0 ? "have exact frequencies" : "are within $tolerance ppm"}]
+  set limit [expr {$tolerance == 0 ? "all $near" : "are all within $tolerance ppm"}]
   if {![dict get $winner within]} {
-    return [WhyNothing $winner]
+    return [WhyNothing $winner $best]
   }
   set within [Within $best]
   if {[llength $best] == 1} {
-    set text "all outputs of the $name are $limit"
+    set text "all outputs of the $name $near"
   } elseif {[llength $within] == 1} {
-    set text "$name is the only primitive whose outputs are all $limit"
+    set text "$name is the only primitive [expr {[IsRivalled $winner $best] ?
+      "with everything as asked for and in the device's range" : "whose outputs $limit"}]"
   } else {
-    set text "of [Names $within], whose outputs are all $limit, $name\
+    set text "of [Names $within], whose outputs $limit, $name\
       [Advantage $winner [lindex $within 1] "the [dict get [lindex $within 1] primitive]"]"
   }
   set variants [Within [::vorkel::answer::ofPrimitive $ranked $name]]
@@ -199,21 +279,56 @@ proc ::vorkel::plan::Why {best ranked} {
   return $text.
 }
 
+# Whether the frequencies of another answer, which is not as asked for, are all as near as they must
+# be.
+proc ::vorkel::plan::IsRivalled {winner best} {
+  set tolerance [dict get $winner request tolerance]
+  foreach answer $best {
+    if {[dict get $answer solved] && ![dict get $answer within] &&
+        [::vorkel::answer::isAllowed ppm [dict get $answer worstPpm] $tolerance]} {
+      return 1
+    }
+  }
+  return 0
+}
+
 # The same when not even it is as asked for.
-proc ::vorkel::plan::WhyNothing {winner} {
-  set text "nothing is as asked for"
+proc ::vorkel::plan::WhyNothing {winner best} {
   if {[llength [dict get $winner violations]] > 0} {
-    append text " and in the device's range"
-  } else {
-    set offs [lsort -unique [concat {*}[lmap output [dict get $winner outputs] {
-      dict get $output offs
-    }]]]
-    set what [expr {"ppm" in $offs ? "frequencies" :
-      "phaseError" in $offs ? "phases" : "duty cycles"}]
-    append text "; of what there is, the [dict get $winner primitive] has the $what that are\
-      nearest"
+    return "nothing is as asked for and in the device's range."
+  }
+  set name [dict get $winner primitive]
+  set equal [list $winner]
+  set decided ""
+  set lead "of what there is"
+  foreach answer [lrange $best 1 end] {
+    if {![dict get $answer solved]} continue
+    set by [::vorkel::answer::decided $winner $answer]
+    if {$by in {jitter vco ""}} {
+      lappend equal $answer
+      if {[llength $equal] == 2} {
+        set decided $by
+      }
+    } elseif {$by eq "class"} {
+      set lead "of what is in the device's range"
+    }
+  }
+  if {[llength $equal] == 1} {
+    return "nothing is as asked for; $lead, the $name has the [Nearest $winner] that are nearest."
+  }
+  set text "nothing is as asked for; $lead, [Names $equal] come equally near, and the $name "
+  switch -- $decided {
+    jitter { append text "has the least jitter, [jitter $winner] ps" }
+    vco { append text "has, with the same jitter, the lowest VCO, [vco $winner] MHz" }
+    default { append text "comes first, with all else the same" }
   }
   return $text.
+}
+
+# What of an answer that is off is to be as near as it can be.
+proc ::vorkel::plan::Nearest {answer} {
+  set offs [concat {*}[lmap output [dict get $answer outputs] {dict get $output offs}]]
+  return [expr {"ppm" in $offs ? "frequencies" : "phaseError" in $offs ? "phases" : "duty cycles"}]
 }
 
 # Those answers that are within their tolerance.
@@ -256,33 +371,51 @@ proc ::vorkel::plan::Advantage {winner other whose} {
   return "$same comes first"
 }
 
-# A line for each primitive without a configuration.
-proc ::vorkel::plan::Refusals {ranked} {
-  set text ""
-  foreach answer $ranked {
-    if {![dict get $answer solved]} {
-      append text [::vorkel::table::prose "[dict get $answer primitive]: " \
-        [dict get $answer reason]]
-    }
-  }
-  return $text
-}
-
-# What the user may want to do next.
-proc ::vorkel::plan::Hints {call winner} {
+# What the user may want to do next. `better` is what Better has.
+proc ::vorkel::plan::Hints {call ranked better} {
   set words [dict get $call words]
+  set first [lindex $ranked 0]
+  set refused [::vorkel::plan_refusals::names $ranked]
   set text ""
-  if {![dict get $winner solved] || ![dict get $winner within]} {
+  if {![dict get $first within]} {
     append text "hint: what stands in the way: [::vorkel::help::command explain $words]\n"
     # Only PLL and TSYN have a grid of settings.
-    if {[llength [::vorkel::engine::ofFamily Loop [dict get $call primitives]]] > 0} {
+    if {[llength $better] == 0 && [llength [Loops $call]] > 0 &&
+        [dict get $first source] ne "grid"} {
       append text "hint: the best settings of all: [::vorkel::help::command best $words]\n"
     }
+  } elseif {[llength $refused] > 0} {
+    append text "hint: more on [::vorkel::options::enumerate $refused]:\
+      [::vorkel::help::command explain $words]\n"
   }
-  if {[dict get $winner solved] && [dict get $winner bandwidth] ne "" &&
-      [dict get $call request inputJitter] == 0 && [dict get $winner maxJitter] ne ""} {
+  append text [Beyond $better]
+  if {[dict get $first solved] && [dict get $first bandwidth] ne "" &&
+      [dict get $call request inputJitter] == 0 && [dict get $first maxJitter] ne ""} {
     append text [::vorkel::table::prose "hint: " "this is for an input clock without jitter;\
       --input-jitter PS tells that of yours, which can make another bandwidth the best"]
   }
   return $text
+}
+
+# The call that shows the settings of the grid whole when these rank first.
+proc ::vorkel::plan::GridHint {call ranked found} {
+  if {[dict get [lindex $ranked 0] source] ne "grid"} {
+    return ""
+  }
+  set request [dict get $call request]
+  return "hint: the settings of the grid: [::vorkel::grid_words::command $request \
+    [::vorkel::grid::front $request $found] [dict get $call words]]\n"
+}
+
+# What Better has, in words.
+proc ::vorkel::plan::Beyond {better} {
+  if {[llength $better] == 0} {
+    return ""
+  }
+  set settings [lassign $better command]
+  set parts [lmap answer $settings {
+    string cat "a [dict get $answer primitive] within [::vorkel::grid_words::figures $answer]"
+  }]
+  return "[::vorkel::table::prose "hint: " "settings that the engine's search does not find rank\
+    before this: [join $parts {, and }]"]hint: these settings: $command\n"
 }

@@ -5,7 +5,7 @@ package provide vorkel::plan_data 1.1
 
 namespace eval ::vorkel::plan_data {
   # Counts up when a program that reads the data could fail to understand it.
-  variable version 1
+  variable version 2
   # A frequency that is off beyond what a double can count is told as the largest one.
   variable largest 1.7976931348623157e308
 }
@@ -19,11 +19,15 @@ proc ::vorkel::plan_data::of {answers request} {
 
 # A request with the names of a request file. As there, what was not asked for is left out.
 proc ::vorkel::plan_data::Request {request} {
-  set data [dict create device [dict get $request device] \
+  set data [dict create device [dict get $request device]]
+  if {[dict exists $request primitive]} {
+    dict set data primitive [dict get $request primitive]
+  }
+  set data [dict merge $data [dict create \
     inputs [lmap input [dict get $request inputs] {number $input}] \
     outputs [lmap output [dict get $request outputs] {RequestedOutput $output}] \
     input_jitter [number [dict get $request inputJitter]] \
-    tolerance [number [dict get $request tolerance]]]
+    tolerance [number [dict get $request tolerance]]]]
   if {[dict get $request bandwidthAsked]} {
     dict set data bandwidth [dict get $request bandwidth]
   }
@@ -61,6 +65,12 @@ proc ::vorkel::plan_data::Answer {answer} {
     # PHASE_SHIFT and "phase offset" are named alike.
     dict set settings [string tolower [string map {{ } _} $name]] [number $value]
   }
+  if {[llength [dict get $answer request inputs]] > 1} {
+    set second [lindex [dict get $answer request inputs] 1]
+    dict set settings vco_second [number [expr {double($second) * [dict get $settings m] /
+      [dict get $settings d]}]]
+    dict set settings pfd_second [number [expr {double($second) / [dict get $settings d]}]]
+  }
   dict set data settings $settings
   dict set data bandwidth [dict get $answer bandwidth]
   foreach {name key} {
@@ -80,7 +90,7 @@ proc ::vorkel::plan_data::Output {output} {
   set data [dict create index [dict get $output index] pin [dict get $output pin] \
     divider [number [dict get $output divider]] multiply $multiply divide $divide]
   foreach {name key} {
-    requested requested actual actual search search error_ppm ppm
+    requested requested actual actual actual_second actual2 search search error_ppm ppm
     requested_phase reqPhase phase phase phase_error phaseError
     requested_duty reqDuty duty duty duty_error dutyError jitter jitter
   } {

@@ -126,7 +126,13 @@ proc ::vorkel::answer::ofPrimitive {answers primitive} {
   }]
 }
 
-# What makes an answer the same as another.
+# Whether two answers that are solved have the same settings and figures.
+proc ::vorkel::answer::isSame {one other} {
+  return [expr {[dict get $one primitive] eq [dict get $other primitive] &&
+    [Identity $one] eq [Identity $other]}]
+}
+
+# What makes an answer of a primitive the same as another.
 proc ::vorkel::answer::Identity {answer} {
   set places [lmap output [dict get $answer outputs] {
     list [dict get $output divider] [dict get $output pin] [dict get $output phase] \
@@ -163,12 +169,24 @@ proc ::vorkel::answer::Key {answer} {
   return [list $class {*}[Excess $answer] [expr {$jitter eq "" ? Inf : $jitter}] $vco]
 }
 
+# By what one answer ranks before another: class, ppm, phaseError, dutyError, jitter or vco; "" when
+# they are equal in all of it.
+proc ::vorkel::answer::decided {one other} {
+  foreach a [Key $one] b [Key $other] what {class ppm phaseError dutyError jitter vco} {
+    if {$a != $b} {
+      return $what
+    }
+  }
+  return ""
+}
+
 # The largest errors of a frequency, a phase and a duty cycle among those that are larger than
 # they may be; 0 where there is none. Rounded: what cannot be told apart decides nothing.
 proc ::vorkel::answer::Excess {answer} {
   set worst [dict create ppm 0.0 phaseError 0.0 dutyError 0.0]
   foreach output [dict get $answer outputs] {
     foreach key [dict get $output offs] {
+      if {![dict exists $worst $key]} continue
       dict set worst $key [expr {max([dict get $worst $key], abs([dict get $output $key]))}]
     }
   }

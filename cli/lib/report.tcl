@@ -15,8 +15,9 @@ package require vorkel::timing 1.1
 namespace eval ::vorkel::report {
   # Decimals of a frequency in MHz: down to 1 Hz.
   variable decimals 6
-  # The errors that each table shows, and so marks.
-  variable frequency_errors ppm
+  # What each table shows, and so marks.
+  variable frequency_errors {ppm range}
+  variable second_errors range2
   variable shape_errors {phaseError dutyError}
 }
 
@@ -33,6 +34,10 @@ proc ::vorkel::report::render {answer} {
     lappend pairs {phase error} "[::vorkel::numbers::ps $error] ps"
   }
   set text [::vorkel::table::pairs $pairs]\n[Outputs $answer]
+  set second [Second $answer]
+  if {$second ne ""} {
+    append text \n$second
+  }
   set shapes [Shapes $answer]
   if {$shapes ne ""} {
     append text \n$shapes
@@ -49,7 +54,8 @@ proc ::vorkel::report::Summary {answer} {
   set vcos [lmap input $inputs {expr {$input * $m / $d}}]
   set vco [Both $vcos]
   set counted [dict get $answer searchVco]
-  if {$counted ne "" && abs($counted - [lindex $vcos 0]) > $::vorkel::notes::visible} {
+  # With two input clocks there is no room for it; notes.tcl says it then.
+  if {[llength $inputs] == 1 && [::vorkel::notes::isVcoOff $answer]} {
     append vco " (the search took it as $counted)"
   }
   set pairs [list \
@@ -108,6 +114,31 @@ proc ::vorkel::report::Outputs {answer} {
     lappend rows $row
   }
   return [::vorkel::table::render $columns $rows [Roles $outputs $frequency_errors]]
+}
+
+# The table of the frequencies with the second input clock; "" without one. One table with the
+# above would be wider than a terminal.
+proc ::vorkel::report::Second {answer} {
+  variable decimals
+  variable second_errors
+  if {[llength [dict get $answer request inputs]] == 1} {
+    return ""
+  }
+  set outputs [dict get $answer outputs]
+  set columns {{right output} {right {MHz with the second input}}}
+  set marks [HasMarks $outputs $second_errors]
+  if {$marks} {
+    lappend columns {left mark}
+  }
+  set rows [lmap output $outputs {
+    set row [list [dict get $output index] \
+      [::vorkel::numbers::fixed [dict get $output actual2] $decimals]]
+    if {$marks} {
+      lappend row [Mark $output $second_errors]
+    }
+    set row
+  }]
+  return [::vorkel::table::render $columns $rows [Roles $outputs $second_errors]]
 }
 
 # The pin of an output, or its divider.
@@ -189,7 +220,7 @@ proc ::vorkel::report::Cell {value} {
   return [::vorkel::numbers::fixed $value 3]
 }
 
-# The mark of an output some of whose errors is larger than it may be.
+# The mark of an output with one of some keys among its `offs`.
 proc ::vorkel::report::Mark {output errors} {
   foreach key $errors {
     if {$key in [dict get $output offs]} {

@@ -47,7 +47,8 @@ proc ::vorkel::request::parse {primitive words} {
     set place [Told $given --primitive]
     set asked [primitive [dict get $given --primitive] $place]
     if {$asked ni [list auto $primitive]} {
-      throw {VORKEL USAGE} "$place: the request is for a $asked, this command for a $primitive"
+      throw [Fault $given --primitive] \
+        "$place: the request is for a $asked, this command for a $primitive"
     }
   }
   set call [Complete $call [Device $given $primitive] \
@@ -82,7 +83,37 @@ proc ::vorkel::request::Call {table words {primitive ""}} {
       jitter --input-jitter] \
     tolerance [Tolerance $given] feedback [dict exists $given --feedback] \
     preferMaxVco [dict exists $given --prefer-max-vco] intDiv0 [dict exists $given --int-div0]]
-  return [dict create request $request format $format file $file given $given words $words]
+  return [dict create request $request format $format file $file given $given \
+    words [Pasted $table $given $words]]
+}
+
+# Words that ask the same when they are pasted into a shell: what standard input or a pipe has said
+# is gone, and the options say it instead.
+proc ::vorkel::request::Pasted {table given words} {
+  if {![dict exists $given --request]} {
+    return $words
+  }
+  set path [dict get $given --request]
+  if {$path ne "-" && [file isfile [::vorkel::options::path $path]] &&
+      ![regexp {^/(dev|proc)/} $path]} {
+    return $words
+  }
+  set names [lmap {name placeholder description} $table {set name}]
+  # The file may say what this command has no option for, and another has.
+  lappend names {*}[lmap name [dict keys $given] {
+    if {$name in [list operands places --request {*}$names]} continue
+    set name
+  }]
+  set pasted {}
+  foreach name $names {
+    if {$name eq "--request" || ![dict exists $given $name]} continue
+    lappend pasted $name
+    if {![::vorkel::command_options::isFlag $name]} {
+      # Values of a file are doubles here.
+      lappend pasted [regsub -all {(^|,)(-?[0-9]+)\.0(?=,|$)} [dict get $given $name] {\1\2}]
+    }
+  }
+  return $pasted
 }
 
 # How a complaint names an option: by the place in the request file when its value is from there.
@@ -91,6 +122,11 @@ proc ::vorkel::request::Told {given name} {
     return [dict get $given places $name]
   }
   return $name
+}
+
+# What is thrown when the value of an option is wrong: that of a file says nothing of the words.
+proc ::vorkel::request::Fault {given name} {
+  return [expr {[dict exists $given places $name] ? {VORKEL USAGE FILE} : {VORKEL USAGE}}]
 }
 
 # Adds the device to what was read, and what else the caller knows.
@@ -143,7 +179,8 @@ proc ::vorkel::request::Frequencies {given name mostName primitive} {
     if {[dict exists $given --request]} {
       set missing "[dict get $given --request] has no $entry, and $missing"
     }
-    throw {VORKEL USAGE} "$missing: the $what, such as $example"
+    throw [expr {[dict exists $given --request] ? {VORKEL USAGE FILE} : {VORKEL USAGE}}] \
+      "$missing: the $what, such as $example"
   }
   set list [::vorkel::units::values [dict get $given $name] frequency $name]
   set counts [set ::vorkel::engine::$mostName]
@@ -155,7 +192,7 @@ proc ::vorkel::request::Frequencies {given name mostName primitive} {
   }
   if {[llength $list] > $most} {
     set frequencies [expr {$most == 1 ? "frequency" : "frequencies"}]
-    throw {VORKEL USAGE} "[Told $given $name]: at most $most $frequencies$whose,\
+    throw [Fault $given $name] "[Told $given $name]: at most $most $frequencies$whose,\
       not [llength $list]"
   }
   return $list
@@ -213,7 +250,7 @@ proc ::vorkel::request::Tolerance {given} {
     [expr {$exact ? 0 : $default_tolerance}]] tolerance --tolerance]
   if {$exact && $tolerance != 0} {
     if {[dict exists $given places --exact]} {
-      throw {VORKEL USAGE} "[Told $given --exact] contradicts the tolerance"
+      throw {VORKEL USAGE FILE} "[Told $given --exact] contradicts the tolerance"
     }
     throw {VORKEL USAGE} "--exact and --tolerance [dict get $given --tolerance] contradict each\
       other"
@@ -242,16 +279,16 @@ proc ::vorkel::request::Device {given primitive} {
   try {
     set device [::vorkel::catalogue::find \
       [::vorkel::options::get $given --device $::vorkel::catalogue::defaultPart]]
-  } trap {VORKEL USAGE} {reason} {
-    throw {VORKEL USAGE} $label$reason
+  } trap {VORKEL USAGE} {reason options} {
+    throw [expr {$label eq "" ? [dict get $options -errorcode] : {VORKEL USAGE FILE}}] $label$reason
   }
   set primitives [dict get $device primitives]
   if {$primitive ne "auto" && $primitive ni $primitives} {
-    throw {VORKEL USAGE} "$label[dict get $device part] has no $primitive; it has\
+    throw [Fault $given --device] "$label[dict get $device part] has no $primitive; it has\
       [join $primitives {, }]"
   }
   if {[llength $primitives] == 0} {
-    throw {VORKEL USAGE} "$label[dict get $device part] has the limits of no primitive"
+    throw [Fault $given --device] "$label[dict get $device part] has the limits of no primitive"
   }
   return $device
 }

@@ -37,9 +37,17 @@ namespace eval ::vorkel::request_file {
 
 # What a file says, as a dict from options to their values (see request.tcl); under the key
 # "places" a dict has for options where the file says so, for a complaint. "-" is standard input.
-# What is wrong is told with the name of the file and the line.
+# What is wrong in it is {VORKEL USAGE FILE}, and told with the name of the file and the line.
 proc ::vorkel::request_file::read {path} {
   set text [Contents $path]
+  try {
+    return [Said $text $path]
+  } trap {VORKEL USAGE} {reason} {
+    throw {VORKEL USAGE FILE} $reason
+  }
+}
+
+proc ::vorkel::request_file::Said {text path} {
   if {[string tolower [file extension $path]] eq ".json" || [regexp {^\s*[\{\[]} $text]} {
     package require vorkel::request_json 1.1
     return [::vorkel::request_json::read $text $path]

@@ -8,9 +8,9 @@ package require vorkel::options 1.1
 namespace eval ::vorkel::units {
   variable number {[-+]?(?:[0-9]+\.?[0-9]*|\.[0-9]+)(?:[eE][-+]?[0-9]+)?}
   # For each kind of value: the unit of a number without one, examples, what a value must be (a
-  # check of numbers.tcl), and its units. A unit is written in any case. It has what to do with
-  # the number: multiply it, divide it, or divide by it, as a period is made a frequency. A range
-  # is that of all that is shown in columns.
+  # check of numbers.tcl), and its units, which are written in any case (but see other_units). A
+  # unit has what to do with the number: multiply it, divide it, or divide by it, as a period is
+  # made a frequency. A range is that of all that is shown in columns.
   variable kinds {
     frequency {unit MHz article "a frequency" examples "100, 148.5MHz, 100/3 or 8ns"
       check positive units {hz {/ 1e6} khz {/ 1e3} mhz {* 1.0} ghz {* 1e3}
@@ -28,6 +28,10 @@ namespace eval ::vorkel::units {
       check notNegative units {ppm {* 1.0} ppb {/ 1e3} % {* 1e4}} known "ppm, ppb and %"
       range {0 1e9} bounds "0 to 1000000000 ppm"}
   }
+  # Units whose case says something else than what is nearly always meant: what they stand for
+  # and what to write. All capitals, or none, say nothing.
+  variable other_units {mHz {millihertz MHz} mHZ {millihertz MHz} Ps {petaseconds ps}
+    Ms {megaseconds ms}}
   # The entry of a list for an output that asks for nothing.
   variable none -
 }
@@ -122,10 +126,16 @@ proc ::vorkel::units::Parse {text kind what} {
 # What a unit does with the number before it.
 proc ::vorkel::units::Rule {kind unit shown what} {
   variable kinds
+  variable other_units
   if {$unit eq ""} {
     return {* 1.0}
   }
   set facts [dict get $kinds $kind]
+  if {[dict exists $other_units $unit] &&
+      [dict exists $facts units [string tolower [lindex [dict get $other_units $unit] 1]]]} {
+    lassign [dict get $other_units $unit] meaning right
+    throw {VORKEL USAGE} "$what: $unit in \"$shown\" is $meaning; write $right"
+  }
   # In a locale without UTF-8 the bytes of a degree sign come as letters of their own.
   foreach name [list $unit [encoding convertfrom utf-8 [encoding convertto iso8859-1 $unit]]] {
     set name [string tolower $name]

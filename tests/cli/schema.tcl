@@ -67,7 +67,32 @@ proc ::schema::fault {value schema root {where whole}} {
   foreach {rule operand} [lindex $schema 1] {
     lassign $operand operand_type operand
     switch -- $rule {
-      title - description - {$schema} - {$defs} - properties {}
+      title - description - {$schema} - {$defs} - then {}
+      properties {
+        if {$type ne "object"} continue
+        dict for {key rules} $operand {
+          if {![dict exists $content $key]} continue
+          set fault [fault [dict get $content $key] $rules $root $where.$key]
+          if {$fault ne ""} {
+            return $fault
+          }
+        }
+      }
+      if {
+        if {[fault $value [list $operand_type $operand] $root $where] ne ""} continue
+        set fault [fault $value [dict get [lindex $schema 1] then] $root $where]
+        if {$fault ne ""} {
+          return $fault
+        }
+      }
+      allOf {
+        foreach each $operand {
+          set fault [fault $value $each $root $where]
+          if {$fault ne ""} {
+            return $fault
+          }
+        }
+      }
       {$ref} {
         set name [lindex [split $operand /] end]
         set named [dict get [lindex [dict get [lindex $root 1] {$defs}] 1] $name]
@@ -117,13 +142,9 @@ proc ::schema::fault {value schema root {where whole}} {
       additionalProperties {
         # It is false throughout: the properties are all that there may be.
         set properties [lindex [dict get [lindex $schema 1] properties] 1]
-        dict for {key entry} $content {
+        foreach key [dict keys $content] {
           if {![dict exists $properties $key]} {
             return "$where has $key"
-          }
-          set fault [fault $entry [dict get $properties $key] $root $where.$key]
-          if {$fault ne ""} {
-            return $fault
           }
         }
       }
