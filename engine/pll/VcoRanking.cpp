@@ -43,8 +43,8 @@ struct Stretch {
 using Stretches = std::vector<Stretch>;
 
 // Visits the ends, in rising order, of the stretches that a divider of an output makes, with the
-// digit below each end. `f` is the requested frequency and `end`, the last of them, the VCO at which
-// the next divider takes over, MHz.
+// digit below each end. `f` is the requested frequency and `end`, the last of them, the VCO at
+// which the next divider takes over, MHz.
 template <typename Visit>
 void VisitDivider(double divider, double f, const OutputRange& range, double end, Visit visit) {
   const double served = std::min(divider * range.max, end);
