@@ -74,11 +74,16 @@ proc ::vorkel::actual::dutyOnStep {percent divider most} {
   return [expr {100.0 * max($lowest, min($highest, $halves)) / (2 * $divider)}]
 }
 
+# The phase from 0 to below 360 degrees that is the same as one.
+proc ::vorkel::actual::turned {degrees} {
+  return [expr {fmod(fmod($degrees, 360.0) + 360.0, 360.0)}]
+}
+
 # The phase of a pin of a KRU, degrees from 0 to 360, with PHASE_SHIFT.
 proc ::vorkel::actual::pinPhase {pin shift} {
   variable pin_phase
   variable shift_steps
-  return [expr {fmod([dict get $pin_phase $pin] + 360.0 * $shift / $shift_steps + 360.0, 360.0)}]
+  return [turned [expr {[dict get $pin_phase $pin] + 360.0 * $shift / $shift_steps}]]
 }
 
 # The duty cycle of a pin of a KRU, percent. A divide between whole numbers is one half period

@@ -182,7 +182,6 @@ proc ::vorkel::answer::Job {request primitive} {
   set family [::vorkel::engine::family $primitive]
   set phases [Column $request phase 0]
   set duties [Column $request duty 0]
-  set asked [expr {[isAsked $request phase] || [isAsked $request duty]}]
   set job [dict create primitive $primitive family $family part [dict get $request device] \
     inputs [dict get $request inputs] outputs [Column $request freq ""] phases $phases \
     inputJitter [dict get $request inputJitter] limits [dict get $request limits] \
@@ -192,13 +191,13 @@ proc ::vorkel::answer::Job {request primitive} {
     return $job
   }
   return [dict merge $job [dict create duties $duties \
-    closest [expr {$asked || [Setting $request closest 0]}] \
+    closest [expr {[isShapeAsked $request] || [Setting $request closest 0]}] \
     bandwidth [dict get $request bandwidth] \
     lowBandwidth [expr {[dict get $request bandwidth] eq "LOW"}] \
     preferMaxVco [dict get $request preferMaxVco] intDiv0 [dict get $request intDiv0]]]
 }
 
-# Whether a request asks for a phase or a duty cycle of some output.
+# Whether a request asks for something of some output: its phase or its duty cycle.
 proc ::vorkel::answer::isAsked {request what} {
   foreach output [dict get $request outputs] {
     if {[dict get $output $what] ne ""} {
@@ -206,6 +205,11 @@ proc ::vorkel::answer::isAsked {request what} {
     }
   }
   return 0
+}
+
+# Whether a request asks for a phase or a duty cycle of some output.
+proc ::vorkel::answer::isShapeAsked {request} {
+  return [expr {[isAsked $request phase] || [isAsked $request duty]}]
 }
 
 # The indices of the outputs of a request.

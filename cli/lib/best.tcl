@@ -96,12 +96,8 @@ proc ::vorkel::best::Most {given} {
 # The points of each primitive, a dict from primitive to list, the best first; and, if there are
 # any, what the engine has for each, a list. A terminal sees how far this has come.
 proc ::vorkel::best::Search {request primitives} {
-  set run_steps $::vorkel::grid::run_steps
-  set steps [expr {[::vorkel::answer::runs $request $primitives] * $run_steps}]
-  foreach primitive $primitives {
-    incr steps [::vorkel::grid::steps $request $primitive]
-  }
-  ::vorkel::progress::start $steps "searching all settings"
+  ::vorkel::progress::start [::vorkel::grid::stepsWithRuns $request $primitives $primitives] \
+    "searching all settings"
   try {
     set points [::vorkel::grid::search $request $primitives ::vorkel::progress::step]
     if {[llength [concat {*}[dict values $points]]] == 0} {
@@ -109,7 +105,7 @@ proc ::vorkel::best::Search {request primitives} {
     }
     set engine [lmap primitive $primitives {
       lindex [::vorkel::answer::rank [::vorkel::answer::all $request [list $primitive] \
-        [list ::vorkel::progress::step $run_steps]]] 0
+        [list ::vorkel::progress::step $::vorkel::grid::run_steps]]] 0
     }]
     return [list $points $engine]
   } finally {
@@ -154,7 +150,7 @@ proc ::vorkel::best::Calmer {request front most} {
 
 # What a setting has to be within.
 proc ::vorkel::best::Allowed {request} {
-  if {[::vorkel::answer::isAsked $request phase] || [::vorkel::answer::isAsked $request duty]} {
+  if {[::vorkel::answer::isShapeAsked $request]} {
     return "all tolerances"
   }
   return "[::vorkel::numbers::short [dict get $request tolerance] 6] ppm"
@@ -245,8 +241,7 @@ proc ::vorkel::best::Loop {answer} {
 proc ::vorkel::best::Why {winner answers} {
   variable far
   set request [dict get $winner request]
-  set asked [expr {[::vorkel::answer::isAsked $request phase] ||
-    [::vorkel::answer::isAsked $request duty]}]
+  set asked [::vorkel::answer::isShapeAsked $request]
   set order "smallest worst frequency error first, then "
   if {$asked} {
     append order "smallest phase error, then duty cycle error, then "

@@ -8,7 +8,7 @@ package provide vorkel::check 1.1
 package require vorkel::catalogue 1.1
 package require vorkel::device_repair 1.1
 package require vorkel::engine 1.1
-package require vorkel::limits 1.1
+package require vorkel::limit_doubts 1.1
 package require vorkel::options 1.1
 package require vorkel::output 1.1
 package require vorkel::table 1.1
@@ -216,7 +216,7 @@ proc ::vorkel::check::Grade {grade limits calculator} {
   set columns [list [list left "grade $grade"] {right keywords} {left {}}]
   set rows {}
   set begun {}
-  set doubts [::vorkel::limits::doubts $limits]
+  set doubts [::vorkel::limit_doubts::of $limits]
   foreach primitive [::vorkel::catalogue::primitives] {
     lassign [Count $primitive $limits] there needed own
     set result [expr {$there == $needed ? "yes" : $own == 0 ? "left out" : "NO"}]
@@ -282,7 +282,7 @@ proc ::vorkel::check::Missing {limits begun} {
 proc ::vorkel::check::Warnings {path description lines} {
   set text ""
   dict for {grade limits} [dict get $description limits] {
-    foreach doubt [::vorkel::limits::doubts $limits] {
+    foreach doubt [::vorkel::limit_doubts::of $limits] {
       set place $path
       if {[dict exists $lines $grade [dict get $doubt keyword]]} {
         append place : [dict get $lines $grade [dict get $doubt keyword]]

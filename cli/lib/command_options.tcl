@@ -33,7 +33,11 @@ namespace eval ::vorkel::command_options {
     --bandwidth NAME finding "LOW, HIGH or OPTIMIZED; of the loop, all by default"
     --bandwidth NAME loop "LOW (lower limit for the PFD), HIGH or OPTIMIZED (default)"
     --low-bandwidth "" loops "short for --bandwidth LOW"
-    --prefer-max-vco "" asking "of PLL and TSYN only the variants that look for the largest VCO"
+    --prefer-max-vco "" {plan explain}
+      "of PLL and TSYN only the variants that look for the largest VCO"
+    --prefer-max-vco "" compare
+      "of PLL and TSYN only the variants that look for the largest VCO, and on the grid the highest\
+      VCO before the least jitter"
     --prefer-max-vco "" best "the highest VCO comes before the least jitter"
     --prefer-max-vco "" loop "with --phase or --duty: take the highest VCO"
     --int-div0 "" {plan explain} "a whole divider for output 0 of a TSYN"

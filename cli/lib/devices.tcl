@@ -2,9 +2,8 @@
 
 package provide vorkel::devices 1.1
 package require vorkel::catalogue 1.1
-package require vorkel::explain_pins 1.1
 package require vorkel::hardware 1.1
-package require vorkel::limits 1.1
+package require vorkel::limit_doubts 1.1
 package require vorkel::options 1.1
 package require vorkel::table 1.1
 
@@ -77,7 +76,7 @@ proc ::vorkel::devices::All {} {
 # What is doubtful about the limits of a grade, a line each.
 proc ::vorkel::devices::Doubts {whose grade limits} {
   set text ""
-  foreach doubt [::vorkel::limits::doubts $limits] {
+  foreach doubt [::vorkel::limit_doubts::of $limits] {
     append text [::vorkel::table::prose "warning: " "${whose}grade $grade:\
       [dict get $doubt sentence]"]
   }
@@ -178,9 +177,8 @@ proc ::vorkel::devices::Choice {description kind} {
 proc ::vorkel::devices::Settings {primitive} {
   namespace upvar ::vorkel::hardware smallest_m smallest_m largest_m largest_m \
     largest_d largest_d largest_divider largest_divider fraction fraction \
-    whole_outputs whole_outputs
-  namespace upvar ::vorkel::explain_pins smallest_m pin_smallest_m largest pin_largest \
-    fx_divides fx_divides
+    whole_outputs whole_outputs kru_smallest_m kru_smallest_m kru_largest kru_largest \
+    clkgen_divides clkgen_divides
   switch -- $primitive {
     PLL {
       return "M is [dict get $smallest_m PLL] to $largest_m, D 1 to $largest_d and each output\
@@ -194,13 +192,13 @@ proc ::vorkel::devices::Settings {primitive} {
         divider from 2 on; the engine's search takes whole M, best takes all."
     }
     KRU_SP {
-      return "M of CLKFX is $pin_smallest_m to [dict get $pin_largest KRU_SP], D 1 to\
-        [dict get $pin_largest KRU_SP]. CLKDV divides by 2 to 8 in steps of 0.5, or by 9 to 17."
+      return "M of CLKFX is $kru_smallest_m to [dict get $kru_largest KRU_SP], D 1 to\
+        [dict get $kru_largest KRU_SP]. CLKDV divides by 2 to 8 in steps of 0.5, or by 9 to 17."
     }
     KRU_CLKGEN {
-      return "M of CLKFX is $pin_smallest_m to [dict get $pin_largest KRU_CLKGEN], D 1 to\
-        [dict get $pin_largest KRU_CLKGEN]. CLKFXDV divides CLKFX by\
-        [::vorkel::options::enumerate $fx_divides or]."
+      return "M of CLKFX is $kru_smallest_m to [dict get $kru_largest KRU_CLKGEN], D 1 to\
+        [dict get $kru_largest KRU_CLKGEN]. CLKFXDV divides CLKFX by\
+        [::vorkel::options::enumerate $clkgen_divides or]."
     }
   }
   return ""

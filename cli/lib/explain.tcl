@@ -38,7 +38,7 @@ namespace eval ::vorkel::explain {
   namespace path ::vorkel::explain_text
   # The options that only this command has.
   variable options {
-    --oscillators LIST "input frequencies to try instead of stock values"
+    --oscillators LIST "input frequencies to try instead of stock oscillators"
   }
 }
 
@@ -246,7 +246,7 @@ proc ::vorkel::explain::Reasons {findings} {
       set whom $primitive
       set outputs [dict get $finding outputs]
       if {[llength $outputs] > 0} {
-        append whom ", output[expr {[llength $outputs] > 1 ? "s" : ""}] [join $outputs {, }]"
+        append whom ", [outputs $outputs]"
       }
       append text [::vorkel::table::prose "$whom: " "[dict get $finding kind]: [dict get $finding \
         text]."]

@@ -64,15 +64,9 @@ proc ::vorkel::explain_advice::nearest {call findings answers found} {
   }
   if {[llength $left] > 0} {
     append text \n [::vorkel::table::prose "note: " "what would work instead of\
-      [Outputs $left] has not been searched"]
+      [outputs $left] has not been searched"]
   }
   return $text
-}
-
-# "output 1", "outputs 1, 2 and 3".
-proc ::vorkel::explain_advice::Outputs {indices} {
-  return "output[expr {[llength $indices] > 1 ? "s" : ""}]\
-    [::vorkel::options::enumerate $indices]"
 }
 
 # The frequencies that work for an output, as rows of a table.
@@ -86,7 +80,7 @@ proc ::vorkel::explain_advice::Rows {request primitives index} {
 # A call with the frequency of a row.
 proc ::vorkel::explain_advice::First {call index spelled} {
   set outputs [dict get $call request outputs]
-  set texts [lmap output $outputs {::vorkel::explain_nearest::PlainMHz [dict get $output freq]}]
+  set texts [lmap output $outputs {plainMHz [dict get $output freq]}]
   lset texts $index [lindex [split $spelled] 0]
   return "hint: the first of these: [::vorkel::explain_calls::command plan $call $outputs $texts]\n"
 }
@@ -126,7 +120,7 @@ proc ::vorkel::explain_advice::Steps {request primitives index} {
 # `beyond` is a set that only best finds the settings for, or "".
 proc ::vorkel::explain_advice::Together {call sets beyond tried} {
   set one [expr {[llength $tried] > 1 ? ", one at a time," : " alone"}]
-  set vain "to move [Outputs $tried]$one is not enough for the engine's search"
+  set vain "to move [outputs $tried]$one is not enough for the engine's search"
   if {$::vorkel::explain_nearest::stopped || [dict size $::vorkel::explain_nearest::passed] > 0} {
     set vain ""
   }
@@ -179,8 +173,8 @@ proc ::vorkel::explain_advice::Offenders {findings} {
   return [lmap pair [lsort -integer -decreasing -index 1 $pairs] {lindex $pair 0}]
 }
 
-# The input clocks that would make every frequency exact. Where nothing is in the way, they are told
-# only to who asks.
+# The input clocks with which the engine's search makes every frequency exact. Where nothing is in
+# the way, they are told only to who asks.
 proc ::vorkel::explain_advice::inputs {call texts possible} {
   set stock [expr {![dict exists $call given --oscillators]}]
   if {$stock && $possible} {
@@ -203,7 +197,8 @@ proc ::vorkel::explain_advice::inputs {call texts possible} {
     lassign $pair text labels
     dict lappend groups $labels $text
   }
-  set text \n[::vorkel::table::prose "" "$what that make every frequency exact$first, MHz:"]
+  set text \n[::vorkel::table::prose "" "$what that make every frequency exact$first with the\
+    engine's search, MHz:"]
   dict for {labels inputs} $groups {
     append text [::vorkel::table::prose "[join $labels {, }]: " [join $inputs {, }]]
   }

@@ -2,7 +2,6 @@
 
 package provide vorkel::explain_calls 1.1
 package require vorkel::answer 1.1
-package require vorkel::engine 1.1
 package require vorkel::help 1.1
 
 namespace eval ::vorkel::explain_calls {
@@ -26,8 +25,7 @@ proc ::vorkel::explain_calls::label {request primitive} {
     lassign $change key value
     if {[dict get $request $key] eq $value ||
         ($key eq "bandwidth" && [dict get $request bandwidthAsked]) ||
-        ($key eq "preferMaxVco" && ![::vorkel::answer::isAsked $request phase] &&
-          ![::vorkel::answer::isAsked $request duty])} continue
+        ($key eq "preferMaxVco" && ![::vorkel::answer::isShapeAsked $request])} continue
     lappend usable [list $option $change]
   }
   foreach some [Subsets $usable] {

@@ -6,7 +6,7 @@ package provide vorkel::explain_grid 1.1
 package require vorkel::answer 1.1
 package require vorkel::engine 1.1
 package require vorkel::explain_text 1.1
-package require vorkel::explain_walk 1.1
+package require vorkel::explain_vcos 1.1
 package require vorkel::grid 1.1
 package require vorkel::grid_words 1.1
 
@@ -53,7 +53,7 @@ proc ::vorkel::explain_grid::completed {request primitive findings found} {
       [::vorkel::grid_words::settings $best], [::vorkel::grid_words::figures $best], but the\
       engine's search does not find them: $why. best does"]]
   }
-  if {$best eq "" || ![::vorkel::explain_walk::isSearchWhole $request $primitive]} {
+  if {$best eq "" || ![::vorkel::explain_vcos::isSearchWhole $request $primitive]} {
     return $findings
   }
   foreach finding $findings {

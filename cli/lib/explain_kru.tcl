@@ -8,8 +8,10 @@ package require vorkel::catalogue 1.1
 package require vorkel::explain_loop 1.1
 package require vorkel::explain_pins 1.1
 package require vorkel::explain_text 1.1
-package require vorkel::explain_walk 1.1
+package require vorkel::explain_vcos 1.1
+package require vorkel::hardware 1.1
 package require vorkel::numbers 1.1
+package require vorkel::options 1.1
 
 namespace eval ::vorkel::explain_kru {
   namespace path ::vorkel::explain_text
@@ -52,7 +54,7 @@ proc ::vorkel::explain_kru::Works {request primitive} {
 # What pins make within the tolerance of a frequency, whatever their ranges: lists of the
 # distance, the frequency, the pin and how it is made, the nearest first.
 proc ::vorkel::explain_kru::Fitting {request primitive frequency} {
-  set allowed [expr {$frequency * [::vorkel::explain_walk::allowed $request]}]
+  set allowed [expr {$frequency * [::vorkel::explain_vcos::allowed $request]}]
   set rows {}
   foreach {place value} [::vorkel::explain_pins::places $request $primitive $frequency] {
     set distance [expr {abs($value - $frequency)}]
@@ -133,13 +135,13 @@ proc ::vorkel::explain_kru::Phase {output} {
   if {$phase eq ""} {
     return 0.0
   }
-  return [expr {fmod($phase + 360.0, 360.0)}]
+  return [::vorkel::actual::turned $phase]
 }
 
 proc ::vorkel::explain_kru::NoRatio {request primitive index} {
   set frequency [dict get [lindex [dict get $request outputs] $index] freq]
-  set most [dict get $::vorkel::explain_pins::largest $primitive]
-  set pins "CLKFX makes input x M / D, with M from $::vorkel::explain_pins::smallest_m and D from\
+  set most [dict get $::vorkel::hardware::kru_largest $primitive]
+  set pins "CLKFX makes input x M / D, with M from $::vorkel::hardware::kru_smallest_m and D from\
     1 up to $most"
   if {$primitive eq "KRU_SP"} {
     set pins "CLK0 is the input, CLK2X doubles it, CLKDV divides it by 2 to 8 in halves\
@@ -223,16 +225,16 @@ proc ::vorkel::explain_kru::NoPhase {request primitive output index pins} {
 
 # Why an output of a KRU_CLKGEN cannot follow output 0, if so.
 proc ::vorkel::explain_kru::Follower {request output index} {
-  set fx_divides $::vorkel::explain_pins::fx_divides
+  set divides $::vorkel::hardware::clkgen_divides
   if {[Works [Part $request [list 0 $index]] KRU_CLKGEN]} {
     return {}
   }
   set frequency [dict get $output freq]
   set first [dict get [lindex [dict get $request outputs] 0] freq]
   set text "[number $frequency] MHz"
-  set allowed [::vorkel::explain_walk::allowed $request]
+  set allowed [::vorkel::explain_vcos::allowed $request]
   set divide ""
-  foreach candidate [list 1 {*}$fx_divides] {
+  foreach candidate [list 1 {*}$divides] {
     if {abs($first / $candidate / $frequency - 1) <= $allowed} {
       set divide $candidate
     }
@@ -240,7 +242,7 @@ proc ::vorkel::explain_kru::Follower {request output index} {
   if {$divide eq ""} {
     return [list [finding "pin frequency" $index "$text is neither that of\
       output 0, [number $first] MHz, for CLKFX and CLKFX180, nor that divided\
-      by [join [lrange $fx_divides 0 end-1] {, }] or [lindex $fx_divides end] for CLKFXDV"]]
+      by [::vorkel::options::enumerate $divides or] for CLKFXDV"]]
   }
   # Whatever else there is may be for want of output 0.
   if {![Works [Part $request 0] KRU_CLKGEN]} {
@@ -293,7 +295,7 @@ proc ::vorkel::explain_kru::Together {request primitive} {
   if {$phases && [llength $offsets] > 1} {
     return [list [finding "pin phase" $indices "one PHASE_SHIFT moves all\
       outputs, on top of the 0, 90, 180 and 270 degrees of the pins; these phases would need\
-      [join $offsets { and }] degrees of it"]]
+      [::vorkel::options::enumerate $offsets] degrees of it"]]
   }
   if {$phases} {
     return [list [finding "pin phase" $indices "no pins have these phases\

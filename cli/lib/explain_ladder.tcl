@@ -13,7 +13,7 @@ package provide vorkel::explain_ladder 1.1
 package require vorkel::actual 1.1
 package require vorkel::engine 1.1
 package require vorkel::explain_pins 1.1
-package require vorkel::explain_walk 1.1
+package require vorkel::explain_vcos 1.1
 package require vorkel::hardware 1.1
 package require vorkel::output_range 1.1
 
@@ -36,7 +36,7 @@ proc ::vorkel::explain_ladder::search {request primitive index side {alone 0}} {
     dict set search lowest $lowest
     dict set search highest $highest
     dict set search fractional [expr {$index == 0 &&
-      [::vorkel::explain_walk::isFractional $request $primitive]}]
+      [::vorkel::explain_vcos::isFractional $request $primitive]}]
   }
   dict set search rungs [lsort -real -index 0 [[dict get $search family]Rungs $search]]
   return $search
@@ -97,9 +97,9 @@ proc ::vorkel::explain_ladder::LoopRungs {search} {
       return {}
     }
     if {$alone} {
-      set pairs [::vorkel::explain_walk::pairs $request $primitive [dict get $request inputs]]
+      set pairs [::vorkel::explain_vcos::pairs $request $primitive [dict get $request inputs]]
     } else {
-      set pairs [::vorkel::explain_walk::beside $request $primitive $index]
+      set pairs [::vorkel::explain_vcos::beside $request $primitive $index]
     }
     set rungs {}
     foreach pair $pairs {
@@ -166,8 +166,8 @@ proc ::vorkel::explain_ladder::LoopRung {search pair divider} {
       set divider [expr {round($divider)}]
     }
     if {[dict get $search alone] || [dict get $search fractional] ||
-        ([::vorkel::explain_walk::phaseServes [dict get $search output] $divider] &&
-          [::vorkel::explain_walk::dutyServes [dict get $search request] \
+        ([::vorkel::explain_vcos::phaseServes [dict get $search output] $divider] &&
+          [::vorkel::explain_vcos::dutyServes [dict get $search request] \
             [dict get $search output] $divider])} {
       return [Rung $search $value [list {*}$pair $divider]]
     }
@@ -204,7 +204,7 @@ proc ::vorkel::explain_ladder::KruRungs {search} {
       return [list {*}$rungs {*}[Single $search $bound [list CLKFX "as another output" 1 1]]]
     }
     foreach half [::vorkel::explain_pins::halves $primitive] {
-      for {set d 1} {$d <= [dict get $::vorkel::explain_pins::largest $primitive]} {incr d} {
+      for {set d 1} {$d <= [dict get $::vorkel::hardware::kru_largest $primitive]} {incr d} {
         set rung [KruRung $search $half $d [FirstM $search $half $d]]
         if {$rung ne ""} {
           lappend rungs $rung
@@ -233,11 +233,11 @@ proc ::vorkel::explain_ladder::FirstM {search half d} {
   dict with search {
     set begin [Start $search {*}[::vorkel::explain_pins::pinRange $request $primitive CLKFX]]
     set quotient [expr {$begin * $d * $half / [lindex [dict get $request inputs] 0]}]
-    set most [dict get $::vorkel::explain_pins::largest $primitive]
+    set most [dict get $::vorkel::hardware::kru_largest $primitive]
     if {$side eq "below"} {
       return [expr {int(floor(min($most, $quotient * (1 + $rounding))))}]
     }
-    return [expr {max($::vorkel::explain_pins::smallest_m,
+    return [expr {max($::vorkel::hardware::kru_smallest_m,
       int(ceil(min($most + 1, $quotient * (1 - $rounding)))))}]
   }
 }
@@ -253,8 +253,8 @@ proc ::vorkel::explain_ladder::KruNext {search place} {
 # The rung of CLKFX at an M, or "" when M or the frequency is out of its range.
 proc ::vorkel::explain_ladder::KruRung {search half d m} {
   set primitive [dict get $search primitive]
-  if {$m < $::vorkel::explain_pins::smallest_m ||
-      $m > [dict get $::vorkel::explain_pins::largest $primitive]} {
+  if {$m < $::vorkel::hardware::kru_smallest_m ||
+      $m > [dict get $::vorkel::hardware::kru_largest $primitive]} {
     return ""
   }
   set request [dict get $search request]
@@ -272,7 +272,7 @@ proc ::vorkel::explain_ladder::Followers {search} {
   set outputs [dict get $search request outputs]
   set index [dict get $search index]
   set rungs {}
-  foreach factor [list 1 {*}$::vorkel::explain_pins::fx_divides] {
+  foreach factor [list 1 {*}$::vorkel::hardware::clkgen_divides] {
     set pin [expr {$factor == 1 || $index == 0 ? "CLKFX" : "CLKFXDV"}]
     if {$index > 0} {
       set value [expr {double([dict get [lindex $outputs 0] freq]) / $factor}]

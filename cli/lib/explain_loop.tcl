@@ -2,12 +2,12 @@
 # A finding is a dict; explain_text.tcl tells what is in it.
 
 package provide vorkel::explain_loop 1.1
-package require vorkel::actual 1.1
 package require vorkel::answer 1.1
 package require vorkel::catalogue 1.1
 package require vorkel::explain_ladder 1.1
+package require vorkel::explain_shape 1.1
 package require vorkel::explain_text 1.1
-package require vorkel::explain_walk 1.1
+package require vorkel::explain_vcos 1.1
 package require vorkel::hardware 1.1
 package require vorkel::numbers 1.1
 package require vorkel::options 1.1
@@ -25,9 +25,9 @@ proc ::vorkel::explain_loop::findings {request primitive} {
   set possible [expr {[llength $findings] == 0}]
   set pairs {}
   if {$possible} {
-    set pairs [::vorkel::explain_walk::pairs $request $primitive [dict get $request inputs]]
+    set pairs [::vorkel::explain_vcos::pairs $request $primitive [dict get $request inputs]]
   }
-  set fractional [::vorkel::explain_walk::isFractional $request $primitive]
+  set fractional [::vorkel::explain_vcos::isFractional $request $primitive]
   set index 0
   foreach output [dict get $request outputs] {
     set found [Range $request $primitive $output $index]
@@ -54,18 +54,18 @@ proc ::vorkel::explain_loop::Inputs {request primitive} {
   set narrow [expr {$bandwidth eq "LOW" ? " with bandwidth LOW" : ""}]
   set findings {}
   foreach input $inputs {
-    lassign [::vorkel::explain_walk::dividersOf $input $pfd] first last
+    lassign [::vorkel::explain_vcos::dividersOf $input $pfd] first last
     if {$first > $last} {
       lappend findings [finding "PFD range" {} "the PFD runs at the input divided by D, and must\
         have [number [lindex $pfd 0]] to [number [lindex $pfd 1]] MHz$narrow:\
         [PfdMiss $input $pfd]"]
-    } elseif {[llength [::vorkel::explain_walk::pairs $request $primitive [list $input]]] == 0} {
+    } elseif {[llength [::vorkel::explain_vcos::pairs $request $primitive [list $input]]] == 0} {
       lappend findings [finding "VCO range" {} "the VCO must have [number [lindex $vco 0]] to\
         [number [lindex $vco 1]] MHz, and [number $input] MHz x M / D, with whole M up to\
         $::vorkel::hardware::largest_m and D from $first to $last, never has"]
     }
   }
-  if {[llength $findings] == 0 && [llength [::vorkel::explain_walk::pairs $request $primitive \
+  if {[llength $findings] == 0 && [llength [::vorkel::explain_vcos::pairs $request $primitive \
       $inputs]] == 0} {
     lappend findings [Apart $inputs $vco $pfd]
   }
@@ -127,7 +127,7 @@ proc ::vorkel::explain_loop::Range {request primitive output index} {
     return [list [finding "divider range" $index "to make [number $frequency] MHz of the lowest\
       VCO, [number $slow] MHz, the divider would have to be $needed; the largest is $most$why"]]
   }
-  set fractional [expr {$index == 0 && [::vorkel::explain_walk::isFractional $request $primitive]}]
+  set fractional [expr {$index == 0 && [::vorkel::explain_vcos::isFractional $request $primitive]}]
   set steps [expr {$fractional ? $::vorkel::hardware::fraction : 1}]
   set below [expr {floor($fast * $allowed / $frequency * $steps) / $steps}]
   # There is no divider between 1 and 2.
@@ -151,7 +151,7 @@ proc ::vorkel::explain_loop::Range {request primitive output index} {
 proc ::vorkel::explain_loop::SecondRange {request primitive frequency index} {
   lassign [dict get $request inputs] first second
   lassign [::vorkel::output_range::of $request $primitive $index \
-    [expr {$frequency * $::vorkel::explain_walk::rounding}]] lowest highest
+    [expr {$frequency * $::vorkel::explain_vcos::rounding}]] lowest highest
   if {$second eq "" || ($frequency >= $lowest && $frequency <= $highest)} {
     return ""
   }
@@ -168,7 +168,7 @@ proc ::vorkel::explain_loop::Alone {request primitive output index pairs fractio
   set level 0
   set serving {}
   foreach pair $pairs {
-    set reached [::vorkel::explain_walk::level $request $output [lindex $pair 0] $fractional]
+    set reached [::vorkel::explain_vcos::level $request $output [lindex $pair 0] $fractional]
     set level [expr {max($level, $reached)}]
     if {$reached > 0} {
       lappend serving $pair
@@ -176,17 +176,10 @@ proc ::vorkel::explain_loop::Alone {request primitive output index pairs fractio
   }
   switch -- $level {
     0 { return [list [Grid $request $primitive $output $index $fractional]] }
-    1 { return [list [Phase $output $index [Dividers $output $serving]]] }
-    2 { return [list [Duty $request $output $index [Dividers $output $serving]]] }
+    1 { return [list [::vorkel::explain_shape::phase $output $index $serving]] }
+    2 { return [list [::vorkel::explain_shape::duty $request $output $index $serving]] }
   }
   return {}
-}
-
-# The dividers that make an output of pairs that serve its frequency, sorted.
-proc ::vorkel::explain_loop::Dividers {output pairs} {
-  return [lsort -integer -unique [lmap pair $pairs {
-    expr {round([lindex $pair 0] / [dict get $output freq])}
-  }]]
 }
 
 # M and D do not make the VCO that the output needs.
@@ -214,7 +207,7 @@ proc ::vorkel::explain_loop::NoObstacle {output range} {
   set frequency [dict get $output freq]
   set divider [expr {max(1, int(ceil($lowest / $frequency)))}]
   for {} {$divider * $frequency <= $highest} {incr divider} {
-    if {[::vorkel::explain_walk::phaseServes $output $divider]} {
+    if {[::vorkel::explain_vcos::phaseServes $output $divider]} {
       return ". The phase is not in the way: a divider of $divider has [number $phase] degrees"
     }
   }
@@ -238,7 +231,7 @@ proc ::vorkel::explain_loop::NamedVcos {frequency range} {
 
 # That M and D do not make a VCO that is needed, and what there is of them.
 proc ::vorkel::explain_loop::Makes {request primitive what} {
-  set whose [expr {[::vorkel::explain_walk::isSearchWhole $request $primitive] ?
+  set whose [expr {[::vorkel::explain_vcos::isSearchWhole $request $primitive] ?
     "the engine's search, with whole M, makes $what of" : ""}]
   set input "[number [lindex [dict get $request inputs] 0]] MHz x M / D"
   return "[expr {$whose eq "" ? "$input makes $what" : "$whose $input"}]: [MostM $primitive],\
@@ -257,7 +250,7 @@ proc ::vorkel::explain_loop::LargestD {request primitive} {
   set last $::vorkel::hardware::largest_d
   set text $last
   foreach input [dict get $request inputs] {
-    set high [lindex [::vorkel::explain_walk::dividersOf $input $range] 1]
+    set high [lindex [::vorkel::explain_vcos::dividersOf $input $range] 1]
     if {$high < $last} {
       set last $high
       set text "$high, as the PFD needs [number [lindex $range 0]] MHz"
@@ -282,7 +275,7 @@ proc ::vorkel::explain_loop::nearestMade {request primitive index} {
     string cat "[number [lindex $rung 1]] MHz ([How $request $rung],\
       [change [lindex $rung 1] $frequency])"
   }]
-  set whose [expr {[::vorkel::explain_walk::isSearchWhole $request $primitive] ?
+  set whose [expr {[::vorkel::explain_vcos::isSearchWhole $request $primitive] ?
     " that it makes" : ""}]
   switch -- [llength $texts] {
     0 { return "It makes nothing that is in range" }
@@ -302,80 +295,17 @@ proc ::vorkel::explain_loop::How {request rung} {
     [::vorkel::numbers::short $divider 3]"
 }
 
-# Text for a list of dividers: all of them, or the ends.
-proc ::vorkel::explain_loop::Named {dividers} {
-  variable most_named
-  if {[llength $dividers] > $most_named} {
-    return "[lindex $dividers 0] to [lindex $dividers end]"
-  }
-  return [::vorkel::options::enumerate $dividers or]
-}
-
-# No divider that makes the frequency has a step at the phase.
-proc ::vorkel::explain_loop::Phase {output index dividers} {
-  set phase [dict get $output phase]
-  set best ""
-  foreach divider $dividers {
-    set step [expr {$::vorkel::actual::phase_step / $divider}]
-    set made [::vorkel::actual::phaseOnStep $phase $divider]
-    set error [expr {abs([::vorkel::actual::phaseDifference $made $phase])}]
-    if {$best eq "" || $error < [lindex $best 0]} {
-      set best [list $error $made $divider $step]
-    }
-  }
-  lassign $best error made divider step
-  return [finding "phase grid" $index "the phase moves in steps of\
-    [number $::vorkel::actual::phase_step] degrees of the VCO, 45 / N behind a divider N.\
-    [number [dict get $output freq]] MHz has a divider of [Named $dividers]; its step nearest to\
-    [number $phase] degrees is [::vorkel::numbers::short $made 3], with N = $divider in steps of\
-    [::vorkel::numbers::short $step 3], off by [::vorkel::numbers::short $error 3] with\
-    $::vorkel::answer::phase_tolerance allowed"]
-}
-
-# No divider that makes the frequency has the duty cycle: its counters are too short, or it has no
-# step there.
-proc ::vorkel::explain_loop::Duty {request output index dividers} {
-  set duty [dict get $output duty]
-  set most [dict get $request limits O_MAX_HT_LT]
-  set best ""
-  foreach divider $dividers {
-    set made [::vorkel::actual::dutyOnStep $duty $divider $most]
-    # What counters without an end would do.
-    set free [::vorkel::actual::dutyOnStep $duty $divider $divider]
-    set row [list [expr {abs($made - $duty)}] $made $divider \
-      [::vorkel::answer::isAllowed dutyError [expr {$free - $duty}]]]
-    if {$best eq "" || [lindex $row 0] < [lindex $best 0]} {
-      set best $row
-    }
-    lappend counted [lindex $row 3]
-  }
-  lassign $best error made divider
-  set near "the nearest is [::vorkel::numbers::short $made 3] %, with N = $divider"
-  set head "[number [dict get $output freq]] MHz has a divider N of [Named $dividers]"
-  if {1 in $counted} {
-    set low [expr {100.0 * max(1, $divider - $most) / $divider}]
-    set high [expr {100.0 * min($divider - 0.5, $most + 0.5) / $divider}]
-    return [finding "high and low count" $index "$head, which holds its output high or low for at\
-      most $most VCO periods: with N = $divider that is a duty cycle of\
-      [::vorkel::numbers::short $low 3] to [::vorkel::numbers::short $high 3] %, not\
-      [number $duty] %; $near"]
-  }
-  return [finding "duty grid" $index "$head and counts its high time in half VCO periods, at least\
-    one whole, so that [number $duty] % is none of its steps: $near, off by\
-    [::vorkel::numbers::short $error 3] points with $::vorkel::answer::duty_tolerance allowed"]
-}
-
 # Outputs of which each can be made, but not with the others.
 proc ::vorkel::explain_loop::Together {request primitive pairs} {
-  set masks [::vorkel::explain_walk::masks $request $primitive $pairs]
+  set masks [::vorkel::explain_vcos::masks $request $primitive $pairs]
   set indices [::vorkel::answer::indices $request]
-  if {[::vorkel::explain_walk::serving $masks $indices] != 0} {
+  if {[::vorkel::explain_vcos::serving $masks $indices] != 0} {
     return {}
   }
   # What can be left out without making it possible has no part in it.
   foreach index $indices {
     set others [lsearch -all -inline -not -exact $indices $index]
-    if {[::vorkel::explain_walk::serving $masks $others] == 0} {
+    if {[::vorkel::explain_vcos::serving $masks $others] == 0} {
       set indices $others
     }
   }
@@ -385,22 +315,22 @@ proc ::vorkel::explain_loop::Together {request primitive pairs} {
 proc ::vorkel::explain_loop::Conflict {request primitive indices} {
   set outputs [dict get $request outputs]
   set names [lmap index $indices {number [dict get [lindex $outputs $index] freq]}]
-  set text "each can be made alone, but [join $names { and }] MHz need one VCO that serves all of\
-    them. "
+  set text "each can be made alone, but [::vorkel::options::enumerate $names] MHz need one VCO that\
+    serves all of them. "
   set range [::vorkel::catalogue::vcoRange $primitive [dict get $request limits]]
   set common [commonVcos $request $primitive $indices $range]
   if {[llength $common] == 0} {
     return [append text "None from [number [lindex $range 0]] to [number [lindex $range 1]] MHz,\
       whatever the input clock, is [Multiple $request $primitive $indices]"]
   }
-  return [append text "That is one of [Vcos $common], and [Makes $request $primitive "none of\
-    these"]"]
+  set what [expr {[llength $common] == 1 ? "no such VCO" : "none of these"}]
+  return [append text "That can [Vcos $common], and [Makes $request $primitive $what]"]
 }
 
 # What a VCO that serves these outputs is.
 proc ::vorkel::explain_loop::Multiple {request primitive indices} {
   set text "a whole multiple of all of them"
-  if {[lindex $indices 0] == 0 && [::vorkel::explain_walk::isFractional $request $primitive]} {
+  if {[lindex $indices 0] == 0 && [::vorkel::explain_vcos::isFractional $request $primitive]} {
     append text ", in eighths of output 0,"
   }
   foreach {what words} {phase "their phases" duty "their duty cycles"} {
@@ -420,7 +350,7 @@ proc ::vorkel::explain_loop::Multiple {request primitive indices} {
 # The VCO frequencies in the range that would serve these outputs.
 proc ::vorkel::explain_loop::commonVcos {request primitive indices range} {
   lassign $range lowest highest
-  set fractional [::vorkel::explain_walk::isFractional $request $primitive]
+  set fractional [::vorkel::explain_vcos::isFractional $request $primitive]
   set seed [lindex [dict get $request outputs] [lindex $indices 0]]
   set steps [expr {$fractional && [lindex $indices 0] == 0 ? $::vorkel::hardware::fraction : 1}]
   set vcos {}
@@ -431,7 +361,7 @@ proc ::vorkel::explain_loop::commonVcos {request primitive indices range} {
     set serves 1
     foreach index $indices {
       set output [lindex [dict get $request outputs] $index]
-      if {[::vorkel::explain_walk::level $request $output $vco \
+      if {[::vorkel::explain_vcos::level $request $output $vco \
           [expr {$fractional && $index == 0}]] < 3} {
         set serves 0
         break
@@ -444,10 +374,16 @@ proc ::vorkel::explain_loop::commonVcos {request primitive indices range} {
   return $vcos
 }
 
+# What a VCO can be, of at least one frequency, in words.
 proc ::vorkel::explain_loop::Vcos {vcos} {
   variable most_named
-  set names [lmap vco [lrange $vcos 0 [expr {$most_named - 1}]] {number $vco}]
-  set more [expr {[llength $vcos] > $most_named ? " and [expr {[llength $vcos] - $most_named}]\
-    more" : ""}]
-  return "[join $names {, }] MHz$more"
+  set names [lmap vco $vcos {number $vco}]
+  if {[llength $names] == 1} {
+    return "only be [lindex $names 0] MHz"
+  }
+  set more [expr {[llength $names] - $most_named}]
+  if {$more > 1} {
+    return "be [join [lrange $names 0 $most_named-1] {, }] MHz or one of $more more"
+  }
+  return "be [::vorkel::options::enumerate $names or] MHz"
 }

@@ -4,11 +4,13 @@
 package provide vorkel::explain_nearest 1.1
 package require vorkel::actual 1.1
 package require vorkel::answer 1.1
+package require vorkel::catalogue 1.1
 package require vorkel::engine 1.1
 package require vorkel::explain_calls 1.1
 package require vorkel::explain_ladder 1.1
 package require vorkel::explain_loop 1.1
-package require vorkel::explain_walk 1.1
+package require vorkel::explain_text 1.1
+package require vorkel::explain_vcos 1.1
 package require vorkel::grid 1.1
 package require vorkel::hardware 1.1
 package require vorkel::numbers 1.1
@@ -17,6 +19,7 @@ package require vorkel::progress 1.1
 package require vorkel::units 1.1
 
 namespace eval ::vorkel::explain_nearest {
+  namespace path ::vorkel::explain_text
   # Oscillators that are on the shelf, MHz.
   variable stock {
     8 10 12 12.288 13 14.31818 14.7456 16 18.432 19.2 19.44 20 22.1184 24 24.576 25 26 27 30 32
@@ -95,7 +98,7 @@ proc ::vorkel::explain_nearest::proof {request primitive} {
 # A frequency as it can be given to the program: in up to six decimals if these are exact, else
 # as a quotient.
 proc ::vorkel::explain_nearest::Spell {frequency input ratio} {
-  set text [PlainMHz $frequency]
+  set text [plainMHz $frequency]
   if {abs([::vorkel::numbers::short $frequency 6] - $frequency) <= 1e-13 * $frequency} {
     return $text
   }
@@ -138,7 +141,7 @@ proc ::vorkel::explain_nearest::frequencies {request primitives index} {
   return [lsort -command ::vorkel::explain_nearest::Nearer [lmap near [dict values $told] {
     set frequency [dict get $near frequency]
     dict set near ppm [expr {($frequency / $asked - 1) * 1e6}]
-    set changed [With $request $index $frequency]
+    set changed [with $request $index freq $frequency]
     dict set near labels [lmap primitive [Makers $changed $primitives [dict get $near primitives]] {
       ::vorkel::explain_calls::label $changed $primitive
     }]
@@ -172,7 +175,7 @@ proc ::vorkel::explain_nearest::Working {request primitive index side count} {
     }
     set text [Spell [lindex $rung 1] $input [::vorkel::explain_ladder::ratio $search $rung]]
     set frequency [::vorkel::units::value $text frequency nearest]
-    if {[proof [With $request $index $frequency] $primitive] ne ""} {
+    if {[proof [with $request $index freq $frequency] $primitive] ne ""} {
       lappend told [dict create text $text frequency $frequency primitives [list $primitive]]
     } elseif {[llength $told] == 0} {
       lappend missed $text
@@ -184,17 +187,17 @@ proc ::vorkel::explain_nearest::Working {request primitive index side count} {
   return $told
 }
 
-# A request with another frequency of an output.
-proc ::vorkel::explain_nearest::With {request index frequency} {
+# A request with another frequency (freq), phase or duty cycle of an output.
+proc ::vorkel::explain_nearest::with {request index what value} {
   set outputs [dict get $request outputs]
-  lset outputs $index [dict replace [lindex $outputs $index] freq $frequency]
+  lset outputs $index [dict replace [lindex $outputs $index] $what $value]
   return [dict replace $request outputs $outputs]
 }
 
 # Those of some primitives that do what is asked. Of some it is `known`.
 proc ::vorkel::explain_nearest::Makers {request primitives known} {
   return [lmap primitive $primitives {
-    if {$primitive ni $known && ([isLate] || ![CouldMake $request $primitive] ||
+    if {$primitive ni $known && ([isLate] || ![couldMake $request $primitive] ||
         [proof $request $primitive] eq "")} continue
     set primitive
   }]
@@ -202,14 +205,14 @@ proc ::vorkel::explain_nearest::Makers {request primitives known} {
 
 # Whether a request is worth a run of the engine: of a PLL or a TSYN it is when a pair of M and D
 # serves all outputs.
-proc ::vorkel::explain_nearest::CouldMake {request primitive} {
+proc ::vorkel::explain_nearest::couldMake {request primitive} {
   if {[::vorkel::answer::refusal $request $primitive] ne ""} {
     return 0
   }
   if {[::vorkel::engine::family $primitive] ne "Loop"} {
     return 1
   }
-  return [::vorkel::explain_walk::isServed $request $primitive]
+  return [::vorkel::explain_vcos::isServed $request $primitive]
 }
 
 # When no output can be moved alone: all frequencies that are in the way moved to those of one VCO.
@@ -220,7 +223,7 @@ proc ::vorkel::explain_nearest::sets {request primitives} {
   variable most_sets
   set candidates {}
   foreach primitive [::vorkel::engine::ofFamily Loop $primitives] {
-    foreach pair [::vorkel::explain_walk::pairs $request $primitive [dict get $request inputs]] {
+    foreach pair [::vorkel::explain_vcos::pairs $request $primitive [dict get $request inputs]] {
       set candidate [Moved $request $primitive $pair]
       if {$candidate ne ""} {
         lappend candidates [list {*}$candidate $primitive]
@@ -276,7 +279,7 @@ proc ::vorkel::explain_nearest::gridSet {request answer} {
 proc ::vorkel::explain_nearest::Moved {request primitive pair} {
   lassign $pair vco m d
   set input [lindex [dict get $request inputs] 0]
-  set fractional [::vorkel::explain_walk::isFractional $request $primitive]
+  set fractional [::vorkel::explain_vcos::isFractional $request $primitive]
   set worst 0.0
   set texts {}
   foreach output [dict get $request outputs] {
@@ -284,12 +287,12 @@ proc ::vorkel::explain_nearest::Moved {request primitive pair} {
     set frequency [dict get $output freq]
     lassign [::vorkel::output_range::of $request $primitive $index] lowest highest
     set best ""
-    foreach divider [::vorkel::explain_walk::dividersAt $request [expr {$vco / $frequency}] \
+    foreach divider [::vorkel::explain_vcos::dividersAt $request [expr {$vco / $frequency}] \
         [expr {$fractional && $index == 0}]] {
       set made [expr {$vco / $divider}]
       if {$made < $lowest || $made > $highest} continue
-      if {![::vorkel::explain_walk::phaseServes $output $divider] ||
-          ![::vorkel::explain_walk::dutyServes $request $output $divider]} continue
+      if {![::vorkel::explain_vcos::phaseServes $output $divider] ||
+          ![::vorkel::explain_vcos::dutyServes $request $output $divider]} continue
       set ppm [expr {abs($made / $frequency - 1) * 1e6}]
       if {$best eq "" || $ppm < [lindex $best 0]} {
         set best [list $ppm $made $divider]
@@ -309,15 +312,15 @@ proc ::vorkel::explain_nearest::Moved {request primitive pair} {
   return [list $worst $texts]
 }
 
-# The input frequencies of a list that make every output exact: a list of the frequency in MHz,
-# as a text, and the labels of the primitives for each. Of two input clocks the first one is
-# replaced.
+# The input frequencies of a list with which the engine's search makes every frequency exact: a list
+# of the frequency in MHz, as a text, and the labels of the primitives for each. Of two input clocks
+# the first one is replaced.
 proc ::vorkel::explain_nearest::oscillators {request primitives texts} {
   dict set request tolerance 0
   set told {}
   foreach text $texts {
     if {[isLate]} break
-    set plain [PlainMHz [::vorkel::units::value $text frequency --oscillators]]
+    set plain [plainMHz [::vorkel::units::value $text frequency --oscillators]]
     set input [::vorkel::units::value $plain frequency --oscillators]
     set changed [dict replace $request inputs [lreplace [dict get $request inputs] 0 0 $input]]
     set serving {}
@@ -334,15 +337,6 @@ proc ::vorkel::explain_nearest::oscillators {request primitives texts} {
   return $told
 }
 
-# A frequency in MHz, in as many digits as it takes to be that one.
-proc ::vorkel::explain_nearest::PlainMHz {frequency} {
-  set text [::vorkel::numbers::short $frequency 6]
-  if {abs($text - $frequency) <= 1e-13 * $frequency} {
-    return $text
-  }
-  return [format %.15g $frequency]
-}
-
 # Whether an exact answer of a primitive is worth a run of the engine: of a PLL or a TSYN it is
 # when some VCO that all outputs divide is one that M and D make.
 proc ::vorkel::explain_nearest::CouldBe {request primitive} {
@@ -353,7 +347,7 @@ proc ::vorkel::explain_nearest::CouldBe {request primitive} {
   set indices [::vorkel::answer::indices $request]
   set range [::vorkel::catalogue::vcoRange $primitive $limits]
   set input [lindex [dict get $request inputs] 0]
-  lassign [::vorkel::explain_walk::dividersOf $input [::vorkel::catalogue::pfdRange $primitive \
+  lassign [::vorkel::explain_vcos::dividersOf $input [::vorkel::catalogue::pfdRange $primitive \
     $limits [dict get $request bandwidth]]] first last
   foreach vco [Vcos $request $primitive $indices $range] {
     for {set d $first} {$d <= $last} {incr d} {

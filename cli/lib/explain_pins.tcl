@@ -7,15 +7,10 @@ package provide vorkel::explain_pins 1.1
 package require vorkel::actual 1.1
 package require vorkel::answer 1.1
 package require vorkel::catalogue 1.1
+package require vorkel::hardware 1.1
 package require vorkel::numbers 1.1
 
-namespace eval ::vorkel::explain_pins {
-  # The divides of CLKDV, M and D of CLKFX, and the divides of CLKFXDV.
-  variable divides {2 2.5 3 3.5 4 4.5 5 5.5 6 6.5 7 7.5 8 9 10 11 12 13 14 15 16 17}
-  variable largest {KRU_SP 32 KRU_CLKGEN 256}
-  variable smallest_m 2
-  variable fx_divides {2 4 8 16 32}
-}
+namespace eval ::vorkel::explain_pins {}
 
 # The range of a pin of a KRU, MHz. That of a KRU_CLKGEN is as far as the engine looks for it.
 proc ::vorkel::explain_pins::pinRange {request primitive pin} {
@@ -30,7 +25,6 @@ proc ::vorkel::explain_pins::pinRange {request primitive pin} {
 
 # What a pin of a KRU makes whatever M and D are: a list of places and their frequencies, MHz.
 proc ::vorkel::explain_pins::fixed {request primitive} {
-  variable divides
   if {$primitive ne "KRU_SP"} {
     return {}
   }
@@ -40,7 +34,7 @@ proc ::vorkel::explain_pins::fixed {request primitive} {
     set from [From $input $half]
     lappend rows [list CLK0 $from 1 $half] [expr {double($input) / $half}] \
       [list CLK2X "$from x 2" 2 $half] [expr {double($input) * 2 / $half}]
-    foreach divide $divides {
+    foreach divide $::vorkel::hardware::kru_divides {
       lappend rows [list CLKDV "$from / $divide" 2 [expr {round(2 * $half * $divide)}]] \
         [expr {double($input) / $half / $divide}]
     }
@@ -51,15 +45,14 @@ proc ::vorkel::explain_pins::fixed {request primitive} {
 # Each way in which a KRU comes nearest to a frequency, whatever the ranges of the pins, in the
 # form of `fixed`: every pin without M and D, and CLKFX with every D.
 proc ::vorkel::explain_pins::places {request primitive frequency} {
-  variable largest
-  variable smallest_m
   set rows [fixed $request $primitive]
   set input [lindex [dict get $request inputs] 0]
-  set most [dict get $largest $primitive]
+  set most [dict get $::vorkel::hardware::kru_largest $primitive]
   foreach half [halves $primitive] {
     set base [expr {double($input) / $half}]
     for {set d 1} {$d <= $most} {incr d} {
-      set m [expr {round(max($smallest_m, min($most, $frequency * $d / $base)))}]
+      set m [expr {round(max($::vorkel::hardware::kru_smallest_m,
+        min($most, $frequency * $d / $base)))}]
       lappend rows [synthesised $input $half $m $d] [expr {$base * $m / $d}]
     }
   }

@@ -6,7 +6,7 @@ package require vorkel::answer 1.1
 package require vorkel::engine 1.1
 package require vorkel::explain_calls 1.1
 package require vorkel::explain_nearest 1.1
-package require vorkel::explain_walk 1.1
+package require vorkel::explain_vcos 1.1
 package require vorkel::numbers 1.1
 
 namespace eval ::vorkel::explain_steps {
@@ -34,8 +34,8 @@ proc ::vorkel::explain_steps::nearest {request primitives index what} {
         lindex $pair 1
       }]]
       if {$text ne ""} {
-        dict lappend told $text [::vorkel::explain_calls::label [With $request $index $what $text] \
-          $primitive]
+        dict lappend told $text [::vorkel::explain_calls::label \
+          [::vorkel::explain_nearest::with $request $index $what $text] $primitive]
       }
     }
   }
@@ -55,18 +55,12 @@ proc ::vorkel::explain_steps::First {request primitive index what values} {
   }
   foreach value [lrange $values 0 $most_tried-1] {
     if {[::vorkel::explain_nearest::isLate]} break
-    if {[::vorkel::explain_nearest::proof [With $request $index $what $value] $primitive] ne ""} {
+    set changed [::vorkel::explain_nearest::with $request $index $what $value]
+    if {[::vorkel::explain_nearest::proof $changed $primitive] ne ""} {
       return $value
     }
   }
   return ""
-}
-
-# A request with another phase or duty cycle of an output.
-proc ::vorkel::explain_steps::With {request index what value} {
-  set outputs [dict get $request outputs]
-  lset outputs $index [dict replace [lindex $outputs $index] $what $value]
-  return [dict replace $request outputs $outputs]
 }
 
 # The steps next to what is asked for of all dividers that make the output and that leave the other
@@ -76,8 +70,8 @@ proc ::vorkel::explain_steps::LoopValues {request primitive index what} {
   set free [dict replace $output $what ""]
   set values {}
   foreach divider [Dividers $request $primitive $index] {
-    if {[::vorkel::explain_walk::phaseServes $free $divider] &&
-        [::vorkel::explain_walk::dutyServes $request $free $divider]} {
+    if {[::vorkel::explain_vcos::phaseServes $free $divider] &&
+        [::vorkel::explain_vcos::dutyServes $request $free $divider]} {
       lappend values {*}[Beside $request $what [dict get $output $what] $divider]
     }
   }
@@ -87,11 +81,11 @@ proc ::vorkel::explain_steps::LoopValues {request primitive index what} {
 # The dividers that make the frequency of an output beside the others.
 proc ::vorkel::explain_steps::Dividers {request primitive index} {
   set frequency [dict get [lindex [dict get $request outputs] $index] freq]
-  set allowed [::vorkel::explain_walk::allowed $request]
+  set allowed [::vorkel::explain_vcos::allowed $request]
   set found {}
-  foreach pair [::vorkel::explain_walk::beside $request $primitive $index] {
+  foreach pair [::vorkel::explain_vcos::beside $request $primitive $index] {
     set vco [lindex $pair 0]
-    foreach divider [::vorkel::explain_walk::dividersAt $request [expr {$vco / $frequency}] 0] {
+    foreach divider [::vorkel::explain_vcos::dividersAt $request [expr {$vco / $frequency}] 0] {
       if {abs($vco / $divider / $frequency - 1) <= $allowed} {
         lappend found $divider
       }

@@ -2,13 +2,14 @@
 # have the same range and the same dividers, and the engine begins with output 0.
 
 package provide vorkel::explain_swap 1.1
-package require vorkel::answer 1.1
 package require vorkel::explain_calls 1.1
 package require vorkel::explain_nearest 1.1
+package require vorkel::explain_text 1.1
 package require vorkel::options 1.1
 package require vorkel::table 1.1
 
 namespace eval ::vorkel::explain_swap {
+  namespace path ::vorkel::explain_text
   # The last output that is another one than those behind it: output 1 of a PLL can be faster.
   variable last_other 1
 }
@@ -34,7 +35,7 @@ proc ::vorkel::explain_swap::advice {call answers} {
     append text \n [::vorkel::table::prose "" "Outputs [join $pair { and }] swapped work on\
       [::vorkel::options::enumerate $whom]: not every output has the same range and dividers."] \
       "hint: swapped: [::vorkel::explain_calls::command plan $call $outputs [lmap output $outputs {
-        ::vorkel::explain_nearest::PlainMHz [dict get $output freq]
+        plainMHz [dict get $output freq]
       }]]\n"
   }
   return $text
@@ -50,7 +51,7 @@ proc ::vorkel::explain_swap::Working {request primitive} {
       if {[::vorkel::explain_nearest::isLate]} {
         return ""
       }
-      if {$swapped ne $request && [::vorkel::explain_nearest::CouldMake $swapped $primitive] &&
+      if {$swapped ne $request && [::vorkel::explain_nearest::couldMake $swapped $primitive] &&
           [::vorkel::explain_nearest::proof $swapped $primitive] ne ""} {
         return [list $one $other]
       }

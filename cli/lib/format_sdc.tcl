@@ -13,6 +13,7 @@
 # exactly as a decimal can be; the comment has the ratio.
 
 package provide vorkel::format_sdc 1.1
+package require vorkel::actual 1.1
 package require vorkel::numbers 1.1
 
 namespace eval ::vorkel::format {}
@@ -140,7 +141,7 @@ proc ::vorkel::format::sdc_writer::Generated {output n input inputs pin} {
 
 proc ::vorkel::format::sdc_writer::Waveform {output input} {
   lassign [dict get $output ratio] multiply divide
-  set phase [expr {fmod(fmod([dict get $output phase], 360.0) + 360.0, 360.0)}]
+  set phase [::vorkel::actual::turned [dict get $output phase]]
   set duty [dict get $output duty]
   if {$phase != 0.0} {
     return [Edges $multiply $divide [expr {1000.0 / $input}] $phase $duty]

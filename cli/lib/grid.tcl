@@ -160,6 +160,17 @@ proc ::vorkel::grid::steps {request primitive} {
   return $steps
 }
 
+# The same together with runs of the engine for some primitives, besides the search of those that
+# are `loops`.
+proc ::vorkel::grid::stepsWithRuns {request primitives loops} {
+  variable run_steps
+  set steps [expr {[::vorkel::answer::runs $request $primitives] * $run_steps}]
+  foreach primitive $loops {
+    incr steps [steps $request $primitive]
+  }
+  return $steps
+}
+
 # The searches that together go through the whole grid, those for a lower class first. A search is
 # a dict of
 #   class    of the points that it is for
@@ -172,7 +183,7 @@ proc ::vorkel::grid::Searches {request primitive} {
   set whole $::vorkel::grid_dividers::whole
   set parts [expr {[::vorkel::hardware::hasFractions $request $primitive] ?
     $::vorkel::hardware::fraction : $whole}]
-  if {![::vorkel::answer::isAsked $request phase] && ![::vorkel::answer::isAsked $request duty]} {
+  if {![::vorkel::answer::isShapeAsked $request]} {
     set kinds [list [list 0 plain $parts]]
   } else {
     set kinds {}

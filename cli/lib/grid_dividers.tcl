@@ -20,7 +20,6 @@
 package provide vorkel::grid_dividers 1.1
 package require vorkel::actual 1.1
 package require vorkel::answer 1.1
-package require vorkel::catalogue 1.1
 package require vorkel::hardware 1.1
 package require vorkel::notes 1.1
 package require vorkel::output_range 1.1

@@ -21,10 +21,11 @@ namespace eval ::vorkel::help {
     help    {[COMMAND]}                           "show this help"
     version {}                                    "show the version"
   }
-  # Words that can be pasted. The first two have an exact solution: 27 MHz times 33 is 891 MHz, of
-  # which all three are whole parts. 100 MHz times 6 is 600 MHz, and 0 and 90 degrees are steps of
-  # its dividers; half of 100 MHz, doubled, as it is and times 3; 100 MHz times 3 / 2, as it is
-  # and halved. No VCO makes 148.5 and 27 MHz of 100 MHz.
+  # Words that can be pasted. 27 MHz times 33 is 891 MHz, of which 148.5, 74.25 and 27 MHz are whole
+  # parts; 25 MHz times 20 is 500 MHz, of which 125, 62.5 and 25 MHz are. 100 MHz times 6 is 600
+  # MHz, and 0 and 90 degrees are steps of its dividers; half of 100 MHz, doubled, as it is and
+  # times 3; 100 MHz times 3 / 2, as it is and halved. Of 100 MHz no VCO has both 148.5 and 27 MHz
+  # as whole parts, and there is no 333 MHz with a phase.
   variable examples {
     plan    {--in 27MHz --out 148.5,74.25,27}
     compare {--in 25 --out 125,62.5,25}

@@ -48,7 +48,7 @@ proc ::vorkel::kru_phases::Quarter {request primitive} {
 proc ::vorkel::kru_phases::Turned {phases} {
   return [lmap phase $phases {
     if {$phase ne "" && ($phase < 0 || $phase >= 360)} {
-      set phase [expr {fmod(fmod($phase, 360.0) + 360.0, 360.0)}]
+      set phase [::vorkel::actual::turned $phase]
     }
     set phase
   }]
@@ -76,7 +76,7 @@ proc ::vorkel::kru_phases::Stepped {phases quarter shifts allowed} {
         set pin [expr {round(($phase - $offset) / $quarter) * $quarter}]
         set error [expr {abs([::vorkel::actual::phaseDifference [expr {$pin + $offset}] $phase])}]
         set worst [expr {max($worst, $error)}]
-        set phase [expr {fmod(fmod($pin, 360.0) + 360.0, 360.0) + $rest}]
+        set phase [expr {[::vorkel::actual::turned $pin] + $rest}]
       }
       set phase
     }]
@@ -97,7 +97,7 @@ proc ::vorkel::kru_phases::Fillings {phases} {
   foreach turn {0.0 90.0 180.0 270.0} {
     foreach phase $phases {
       if {$phase eq ""} continue
-      set filling [expr {$turn == 0 ? $phase : fmod($phase + $turn + 360.0, 360.0)}]
+      set filling [expr {$turn == 0 ? $phase : [::vorkel::actual::turned [expr {$phase + $turn}]]}]
       if {$filling ni $fillings} {
         lappend fillings $filling
       }

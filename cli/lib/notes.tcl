@@ -71,12 +71,7 @@ proc ::vorkel::notes::on {answer} {
   set request [dict get $answer request]
   set divider [dict get [lindex [dict get $answer outputs] 0] divider]
   set closest [expr {[dict exists $request closest] && [dict get $request closest]}]
-  set asked 0
-  foreach output [dict get $request outputs] {
-    if {[dict get $output phase] ne "" || [dict get $output duty] ne ""} {
-      set asked 1
-    }
-  }
+  set asked [::vorkel::answer::isShapeAsked $request]
   set notes [Search $answer]
   if {[llength [dict get $request inputs]] > 1 && [isVcoOff $answer]} {
     set notes [linsert $notes 0 "the search took the VCO as [dict get $answer searchVco] MHz"]

@@ -4,7 +4,7 @@
 package provide vorkel::plan_data 1.1
 
 namespace eval ::vorkel::plan_data {
-  # Counts up when a program that reads the data could fail to understand it.
+  # Counts up when an entry goes, is added, or changes its meaning or type.
   variable version 2
   # A frequency that is off beyond what a double can count is told as the largest one.
   variable largest 1.7976931348623157e308

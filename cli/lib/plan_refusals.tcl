@@ -3,7 +3,6 @@
 package provide vorkel::plan_refusals 1.1
 package require vorkel::answer 1.1
 package require vorkel::engine 1.1
-package require vorkel::options 1.1
 package require vorkel::table 1.1
 
 namespace eval ::vorkel::plan_refusals {
@@ -42,6 +41,7 @@ proc ::vorkel::plan_refusals::Reason {request answer} {
     return $reason
   }
   package require vorkel::explain_kru 1.1
+  package require vorkel::explain_text 1.1
   set findings [::vorkel::explain_kru::findings $request $primitive]
   if {[llength $findings] == 0} {
     return [regsub {^The KRU\S* } $reason {}]
@@ -52,6 +52,5 @@ proc ::vorkel::plan_refusals::Reason {request answer} {
   if {[dict get $first kind] in $long} {
     set text [lindex [split $text :] 0]
   }
-  set noun [expr {[llength $outputs] > 1 ? "outputs" : "output"}]
-  return "$noun [::vorkel::options::enumerate $outputs]: $text."
+  return "[::vorkel::explain_text::outputs $outputs]: $text."
 }

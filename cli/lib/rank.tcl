@@ -114,8 +114,7 @@ proc ::vorkel::answer::Contradicts {request search loop} {
   if {[dict get $request preferMaxVco] && ![dict get $switches preferMaxVco]} {
     return 1
   }
-  return [expr {[dict exists $search smallest] && ([isAsked $request phase] ||
-    [isAsked $request duty])}]
+  return [expr {[dict exists $search smallest] && [isShapeAsked $request]}]
 }
 
 # Those of some answers that are of a primitive.

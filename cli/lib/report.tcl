@@ -1,7 +1,8 @@
-# The report on an answer as text: the settings, a table of the outputs, what was asked for beside
-# what comes out, and notes. Frequencies are those of the hardware, worked out from the settings.
-# On a PLL or a TSYN the engine accepts an M and a D whose ratio misses its VCO by a small
-# remainder, so its own figures can lie beside them; they are shown where they do.
+# The report on an answer as text: the settings, tables of the outputs, of what they have with a
+# second input clock, and of phases and duty cycles, what was asked for beside what comes out, and
+# notes. Frequencies are those of the hardware, worked out from the settings. On a PLL or a TSYN the
+# engine accepts an M and a D whose ratio misses its VCO by a small remainder, so its own figures
+# can lie beside them; they are shown where they do.
 
 package provide vorkel::report 1.1
 package require vorkel::cells 1.1

@@ -2,6 +2,8 @@
 
 package require tcltest 2.5
 namespace import -force ::tcltest::test
+# What a terminal gets can only be seen with this program.
+::tcltest::testConstraint script [expr {[auto_execok script] ne ""}]
 
 namespace eval ::cli {
   variable folder [file dirname [file normalize [info script]]]
@@ -40,10 +42,7 @@ proc ::cli::execute {args} {
   }
   set result [dict create status $status]
   foreach {key suffix} {out out err err} {
-    set channel [open $base.$suffix]
-    fconfigure $channel -translation lf
-    dict set result $key [read $channel]
-    close $channel
+    dict set result $key [contents $base.$suffix]
     file delete $base.$suffix
   }
   return $result
@@ -58,6 +57,29 @@ proc ::cli::write {name text} {
   puts -nonewline $channel $text
   close $channel
   return $path
+}
+
+# The text of a file.
+proc ::cli::contents {path} {
+  set channel [open $path]
+  fconfigure $channel -translation lf
+  set text [read $channel]
+  close $channel
+  return $text
+}
+
+# A text with each of its paragraphs in one line: what goes on in the next line is indented by two.
+proc ::cli::joined {text} {
+  return [regsub -all {\n  (?=\S)} $text { }]
+}
+
+# What a terminal gets from a Tcl program, run with some words and assignments of the environment.
+proc ::cli::onTerminal {assignments program args} {
+  set line [join [lmap word [list [info nameofexecutable] $program {*}$args] {
+    string cat ' $word '
+  }]]
+  return [dict get [execute env TERM=xterm {*}$assignments script --quiet --return \
+    --command $line /dev/null] out]
 }
 
 # Runs the command line with the given words, in this interpreter's environment.
@@ -92,9 +114,7 @@ proc ::cli::report {text} {
   set report [dict create notes {}]
   set rows [dict create]
   set headings {}
-  # What goes on in the next line is indented by two.
-  regsub -all {\n  (?=\S)} $text { } text
-  foreach line [split $text \n] {
+  foreach line [split [joined $text] \n] {
     if {[regexp "^($labels)  +(.*)\$" $line -> name value]} {
       dict set report $name $value
     } elseif {[regexp {^note: (.*)$} $line -> note]} {

@@ -1,14 +1,14 @@
 # All VCO frequencies that a PLL or a TSYN makes of its input clocks, and which of them serve an
 # output.
 
-package provide vorkel::explain_walk 1.1
+package provide vorkel::explain_vcos 1.1
 package require vorkel::actual 1.1
 package require vorkel::answer 1.1
 package require vorkel::catalogue 1.1
 package require vorkel::grid_dividers 1.1
 package require vorkel::hardware 1.1
 
-namespace eval ::vorkel::explain_walk {
+namespace eval ::vorkel::explain_vcos {
   # For each primitive the last request with its pairs and masks.
   variable known
   # The part of a frequency or of a limit that is only the rounding of the arithmetic.
@@ -17,7 +17,7 @@ namespace eval ::vorkel::explain_walk {
 
 # The smallest and the largest D that keep the phase-frequency detector in its range with an
 # input clock. There is none when the first is the larger one.
-proc ::vorkel::explain_walk::dividersOf {input range} {
+proc ::vorkel::explain_vcos::dividersOf {input range} {
   variable rounding
   lassign $range lowest highest
   return [list [expr {max(1, int(ceil(min(1e6, $input / $highest * (1 - $rounding)))))}] \
@@ -28,7 +28,7 @@ proc ::vorkel::explain_walk::dividersOf {input range} {
 # The pairs of M and D with a VCO in its range and a phase-frequency detector in its range, for
 # all input clocks: a list of lists of the VCO of the first input clock, M and D. Of the pairs
 # with the same quotient only one is there.
-proc ::vorkel::explain_walk::pairs {request primitive inputs} {
+proc ::vorkel::explain_vcos::pairs {request primitive inputs} {
   set limits [dict get $request limits]
   set range [::vorkel::catalogue::pfdRange $primitive $limits [dict get $request bandwidth]]
   set vcoRange [::vorkel::catalogue::vcoRange $primitive $limits]
@@ -42,7 +42,7 @@ proc ::vorkel::explain_walk::pairs {request primitive inputs} {
   return [Within $primitive $inputs $vcoRange $first $last]
 }
 
-proc ::vorkel::explain_walk::Within {primitive inputs vcoRange first last} {
+proc ::vorkel::explain_vcos::Within {primitive inputs vcoRange first last} {
   variable rounding
   lassign $vcoRange lowest highest
   set lowest [expr {$lowest * (1 - $rounding)}]
@@ -71,7 +71,7 @@ proc ::vorkel::explain_walk::Within {primitive inputs vcoRange first last} {
 
 # Whether output 0 can have a divider with eighths: that of a TSYN can, but then nothing moves
 # the phase or the duty cycle of any output.
-proc ::vorkel::explain_walk::isFractional {request primitive} {
+proc ::vorkel::explain_vcos::isFractional {request primitive} {
   if {![::vorkel::hardware::hasFractions $request $primitive]} {
     return 0
   }
@@ -85,13 +85,13 @@ proc ::vorkel::explain_walk::isFractional {request primitive} {
 
 # Whether only the engine's search has whole M, while the hardware could take eighths of it: those
 # of a TSYN with few outputs, whose phases and duty cycles are those that a fraction leaves.
-proc ::vorkel::explain_walk::isSearchWhole {request primitive} {
+proc ::vorkel::explain_vcos::isSearchWhole {request primitive} {
   return [expr {[::vorkel::hardware::hasFractions $request $primitive] &&
     [::vorkel::grid_dividers::fixedClass $request] == 0}]
 }
 
 # The dividers next to a quotient of VCO and output, of an output that can have eighths or not.
-proc ::vorkel::explain_walk::dividersAt {request quotient fractional} {
+proc ::vorkel::explain_vcos::dividersAt {request quotient fractional} {
   set largest [::vorkel::hardware::largestDivider [dict get $request limits]]
   set steps [expr {$fractional && $quotient >= 2 ? $::vorkel::hardware::fraction : 1}]
   set below [expr {floor($quotient * $steps) / $steps}]
@@ -105,14 +105,14 @@ proc ::vorkel::explain_walk::dividersAt {request quotient fractional} {
 }
 
 # How far a frequency may be off, as a fraction of it.
-proc ::vorkel::explain_walk::allowed {request} {
+proc ::vorkel::explain_vcos::allowed {request} {
   variable rounding
   return [expr {[dict get $request tolerance] * 1e-6 + $rounding}]
 }
 
 # How far a VCO serves an output: 0, 1 when the frequency is within its tolerance, 2 when the
 # phase is so too, 3 when the duty cycle is so too.
-proc ::vorkel::explain_walk::level {request output vco fractional} {
+proc ::vorkel::explain_vcos::level {request output vco fractional} {
   set frequency [dict get $output freq]
   set allowed [allowed $request]
   set best 0
@@ -127,7 +127,7 @@ proc ::vorkel::explain_walk::level {request output vco fractional} {
   return $best
 }
 
-proc ::vorkel::explain_walk::phaseServes {output divider} {
+proc ::vorkel::explain_vcos::phaseServes {output divider} {
   set phase [dict get $output phase]
   if {$phase eq "" || $divider != round($divider)} {
     return 1
@@ -136,7 +136,7 @@ proc ::vorkel::explain_walk::phaseServes {output divider} {
     [::vorkel::actual::phaseOnStep $phase $divider] $phase]]
 }
 
-proc ::vorkel::explain_walk::dutyServes {request output divider} {
+proc ::vorkel::explain_vcos::dutyServes {request output divider} {
   set duty [dict get $output duty]
   if {$duty eq "" || $divider != round($divider)} {
     return 1
@@ -146,7 +146,7 @@ proc ::vorkel::explain_walk::dutyServes {request output divider} {
 }
 
 # For each output a whole number whose bit n tells that pair n serves it in all.
-proc ::vorkel::explain_walk::masks {request primitive pairs} {
+proc ::vorkel::explain_vcos::masks {request primitive pairs} {
   set fractional [isFractional $request $primitive]
   set masks {}
   foreach output [dict get $request outputs] {
@@ -165,7 +165,7 @@ proc ::vorkel::explain_walk::masks {request primitive pairs} {
 }
 
 # The pairs that serve all outputs of a list of indices; all pairs for an empty list.
-proc ::vorkel::explain_walk::serving {masks indices} {
+proc ::vorkel::explain_vcos::serving {masks indices} {
   set common -1
   foreach index $indices {
     set common [expr {$common & [lindex $masks $index]}]
@@ -175,7 +175,7 @@ proc ::vorkel::explain_walk::serving {masks indices} {
 
 # The pairs that serve all outputs but one. The pairs and masks of a request are kept, as each of
 # its outputs is asked for.
-proc ::vorkel::explain_walk::beside {request primitive index} {
+proc ::vorkel::explain_vcos::beside {request primitive index} {
   variable known
   if {![info exists known($primitive)] || [lindex $known($primitive) 0] ne $request} {
     set pairs [pairs $request $primitive [dict get $request inputs]]
@@ -197,7 +197,7 @@ proc ::vorkel::explain_walk::beside {request primitive index} {
 }
 
 # Whether some pair serves all outputs.
-proc ::vorkel::explain_walk::isServed {request primitive} {
+proc ::vorkel::explain_vcos::isServed {request primitive} {
   set fractional [isFractional $request $primitive]
   foreach pair [pairs $request $primitive [dict get $request inputs]] {
     set vco [lindex $pair 0]

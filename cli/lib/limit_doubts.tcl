@@ -1,11 +1,11 @@
 # Limits of a device that cannot be meant: ranges whose ends are the wrong way round, counts that
 # are not whole. The engine takes them as they are.
 
-package provide vorkel::limits 1.1
+package provide vorkel::limit_doubts 1.1
 package require vorkel::catalogue 1.1
 package require vorkel::hardware 1.1
 
-namespace eval ::vorkel::limits {
+namespace eval ::vorkel::limit_doubts {
   # Limits that go together: what is to be the lower one, the higher one, what there is none of
   # when they are the wrong way round, and the primitives that then can do nothing.
   variable pairs {
@@ -30,7 +30,7 @@ namespace eval ::vorkel::limits {
 #   none      what there is none of, or ""
 #   touched   the primitives that it concerns
 #   lost      those of them that can do nothing with such limits
-proc ::vorkel::limits::doubts {limits} {
+proc ::vorkel::limit_doubts::of {limits} {
   set doubts {}
   foreach {low high what lost} [Pairs] {
     if {![dict exists $limits $low] || ![dict exists $limits $high] ||
@@ -58,7 +58,7 @@ proc ::vorkel::limits::doubts {limits} {
 }
 
 # The variable pairs, and the shortest and longest periods of the pins of a KRU.
-proc ::vorkel::limits::Pairs {} {
+proc ::vorkel::limit_doubts::Pairs {} {
   variable pairs
   variable needed_pins
   set all $pairs
@@ -74,7 +74,7 @@ proc ::vorkel::limits::Pairs {} {
 }
 
 # The primitives that need a keyword, among those whose limits are all there.
-proc ::vorkel::limits::Users {name limits} {
+proc ::vorkel::limit_doubts::Users {name limits} {
   return [lmap primitive [::vorkel::catalogue::primitivesOf $limits] {
     if {$name ni [lmap keyword [::vorkel::catalogue::keywordsOf $primitive] {lindex $keyword 0}]} {
       continue
