@@ -87,7 +87,7 @@ _vorkel() {
     words=$(_vorkel_options "$program" "$command")
   elif ((COMP_CWORD == 2)) && [[ $previous == "$command" ]]; then
     case $command in
-      check) _vorkel_files "$word" ''; return ;;
+      check) _vorkel_files "$word" '' .toml; return ;;
       devices) words=$(_vorkel_parts "$program" "$word") ;;
       help) words=$(_vorkel_listed "$program" Commands help) ;;
     esac
@@ -108,10 +108,17 @@ _vorkel() {
   mapfile -t COMPREPLY < <(compgen -P "$prefix" -W "$words" -- "$word")
 }
 
-# Offers the files that a word begins: _vorkel_files WORD PREFIX. A folder goes on with a slash;
-# with a prefix bash does not see that it is one, and leaves the end to the user.
+# Offers the files that a word begins: _vorkel_files WORD PREFIX [ENDING]. With an ending, only
+# folders and the files with it. A folder goes on with a slash; with a prefix bash does not see that
+# it is one, and leaves the end to the user.
 _vorkel_files() {
-  mapfile -t COMPREPLY < <(compgen -P "$2" -f -- "$1")
+  local name
+  COMPREPLY=()
+  while IFS= read -r name; do
+    if [[ -z ${3-} || $name == *"$3" || -d $name ]]; then
+      COMPREPLY+=("$2$name")
+    fi
+  done < <(compgen -f -- "$1")
   compopt -o "$([[ -n $2 ]] && printf nospace || printf filenames)" 2>/dev/null || true
 }
 

@@ -20,6 +20,7 @@ package require vorkel::colour 1.1
 package require vorkel::engine 1.1
 package require vorkel::explain_advice 1.1
 package require vorkel::explain_grid 1.1
+package require vorkel::explain_inputs 1.1
 package require vorkel::explain_kru 1.1
 package require vorkel::explain_loop 1.1
 package require vorkel::explain_nearest 1.1
@@ -72,7 +73,8 @@ proc ::vorkel::explain::Explanation {call texts} {
   append text [Verdict $call $findings $answers $found] [Reasons $findings] \
     [::vorkel::explain_swap::advice $call $answers] \
     [::vorkel::explain_advice::nearest $call $findings $answers $found] \
-    [::vorkel::explain_advice::inputs $call $texts [dict get [lindex $answers 0] within]] \
+    [expr {[::vorkel::explain_inputs::isCountOnly $findings] ? "" :
+      [::vorkel::explain_advice::inputs $call $texts [dict get [lindex $answers 0] within]]}] \
     [Hints $call $answers $found]
   return $text
 }
@@ -221,10 +223,34 @@ proc ::vorkel::explain::Verdict {call findings answers found} {
   set text "Not possible$how: something stands in the way of $whom."
   if {[dict get $best solved]} {
     append text " The engine's nearest answer is that of the [dict get $best primitive]:\
-      [join [list {*}[::vorkel::notes::errors $best] {*}[dict get $best violations]] {; }]."
+      [join [list {*}[Worst $best] {*}[dict get $best violations]] {; }]."
   }
   append text [::vorkel::explain_grid::nearer $settings $best]
   return [::vorkel::colour::paint off [::vorkel::table::prose "" $text]]
+}
+
+# A list of what of an answer is furthest off, and how many outputs are so beside it.
+proc ::vorkel::explain::Worst {answer} {
+  foreach key {ppm phaseError dutyError} {
+    set worst ""
+    foreach output [dict get $answer outputs] {
+      if {$key in [dict get $output offs] && ($worst eq "" ||
+          abs([dict get $output $key]) > abs([dict get $worst $key]))} {
+        set worst $output
+      }
+    }
+    if {$worst ne ""} break
+  }
+  if {$worst eq ""} {
+    return {}
+  }
+  set text [lindex [::vorkel::notes::errors [dict replace $answer outputs [list $worst]]] 0]
+  set count [expr {[llength [::vorkel::notes::errors $answer]] - 1}]
+  if {$count > 0} {
+    append text "; the tolerances of $count other output[expr {$count > 1 ? "s are" : " is"}]\
+      exceeded, too"
+  }
+  return [list $text]
 }
 
 # Whether some primitive could do all that is asked, but for the engine.

@@ -2,11 +2,16 @@
 
 package provide vorkel::explain_advice 1.1
 package require vorkel::answer 1.1
+package require vorkel::engine 1.1
 package require vorkel::explain_calls 1.1
 package require vorkel::explain_grid 1.1
+package require vorkel::explain_inputs 1.1
 package require vorkel::explain_nearest 1.1
 package require vorkel::explain_steps 1.1
 package require vorkel::explain_text 1.1
+package require vorkel::explain_vcos 1.1
+package require vorkel::grid 1.1
+package require vorkel::help 1.1
 package require vorkel::options 1.1
 package require vorkel::table 1.1
 
@@ -25,6 +30,9 @@ proc ::vorkel::explain_advice::nearest {call findings answers found} {
   if {[dict get [lindex $answers 0] within]} {
     return ""
   }
+  if {[::vorkel::explain_inputs::areInTheWay $findings]} {
+    return [::vorkel::explain_inputs::advice $request $findings]
+  }
   set offenders [Offenders $findings]
   if {[llength $offenders] == 0} {
     set offenders [::vorkel::answer::indices $request]
@@ -39,11 +47,11 @@ proc ::vorkel::explain_advice::nearest {call findings answers found} {
     set own [Rows $request $primitives $index]
     set steps [Steps $request $primitives $index]
     lappend rows {*}$own
-    lappend moved {*}$steps
+    lappend moved {*}$steps {*}[Unmoved $request $primitives $index]
     incr helped [expr {[llength $own] + [llength $steps] > 0}]
   }
   set left [lrange $offenders [llength $tried] end]
-  set text ""
+  set text [Unfed $call]
   if {[llength $rows] > 0} {
     append text \n [Table $rows $primitives] [First $call {*}[lrange [lindex $rows 0] 0 1]]
   }
@@ -67,6 +75,23 @@ proc ::vorkel::explain_advice::nearest {call findings answers found} {
       [outputs $left] has not been searched"]
   }
   return $text
+}
+
+# That the pins of a KRU_SP without feedback make all of it, when feedback was asked for; else "".
+proc ::vorkel::explain_advice::Unfed {call} {
+  set request [dict replace [dict get $call request] feedback 0]
+  if {![dict get $call request feedback] || "KRU_SP" ni [dict get $call primitives] ||
+      [::vorkel::explain_nearest::proof $request KRU_SP] eq ""} {
+    return ""
+  }
+  set index [::vorkel::explain_calls::index [dict get $call words] --feedback]
+  # Feedback that a request file asks for is taken out there.
+  if {$index < 0} {
+    return \n[::vorkel::table::prose "" "without feedback the KRU_SP makes all of it"]
+  }
+  set words [lreplace [dict get $call words] $index $index]
+  return "\n[::vorkel::table::prose {} {without --feedback the KRU_SP makes all of it}]hint:\
+    without it: [::vorkel::help::command plan $words]\n"
 }
 
 # The frequencies that work for an output, as rows of a table.
@@ -116,13 +141,40 @@ proc ::vorkel::explain_advice::Steps {request primitives index} {
   return $sentences
 }
 
+# Sentences on primitives that have settings for an output without its phase, with fractions that
+# only best finds and beside which nothing is moved.
+proc ::vorkel::explain_advice::Unmoved {request primitives index} {
+  if {[dict get [lindex [dict get $request outputs] $index] phase] in {"" 0 0.0}} {
+    return {}
+  }
+  set changed [::vorkel::explain_nearest::with $request $index phase 0]
+  set able [lmap primitive [::vorkel::engine::ofFamily Loop $primitives] {
+    if {[::vorkel::answer::refusal $changed $primitive] ne "" ||
+        ![::vorkel::explain_vcos::isFractional $changed $primitive] ||
+        [::vorkel::explain_nearest::isLate] ||
+        [::vorkel::explain_nearest::proof $changed $primitive] ne ""} continue
+    set best [lindex [::vorkel::grid::best $changed $primitive] 0]
+    if {$best eq "" || ![dict get $best within]} continue
+    set primitive
+  }]
+  return [lmap primitive $able {
+    string cat "output $index: a phase of 0 degrees works on the $primitive, with best"
+  }]
+}
+
 # Frequencies for all outputs at once, when to move those that were tried one at a time is in vain.
 # `beyond` is a set that only best finds the settings for, or "".
 proc ::vorkel::explain_advice::Together {call sets beyond tried} {
-  set one [expr {[llength $tried] > 1 ? ", one at a time," : " alone"}]
-  set vain "to move [outputs $tried]$one is not enough for the engine's search"
+  set which [expr {[llength $tried] > 1 ? "a single one of [outputs [lsort -integer $tried]]" :
+    "[outputs $tried] alone"}]
+  set vain "to move $which is not enough for the engine's search"
   if {$::vorkel::explain_nearest::stopped || [dict size $::vorkel::explain_nearest::passed] > 0} {
     set vain ""
+  }
+  if {$beyond ne "" && [::vorkel::explain_nearest::proof [dict get $beyond request] \
+      [dict get $beyond primitive]] ne ""} {
+    set sets [Inserted $sets $beyond]
+    set beyond ""
   }
   set nearer [expr {$beyond ne "" && ([llength $sets] == 0 ||
     [dict get $beyond ppm] < [dict get [lindex $sets 0] ppm])}]
@@ -130,7 +182,7 @@ proc ::vorkel::explain_advice::Together {call sets beyond tried} {
     return [expr {$vain eq "" ? "" : "\n[::vorkel::table::prose {} $vain]"}]
   }
   set text \n[::vorkel::table::prose "" \
-    "[expr {$vain eq "" ? "" : "$vain; "}]moved together, these work:"]
+    "[expr {$vain eq "" ? "" : "$vain; "}]with all the frequencies of one of these it works:"]
   if {$nearer} {
     append text [Set $beyond "[dict get $beyond primitive], which only best finds"]
   }
@@ -142,6 +194,19 @@ proc ::vorkel::explain_advice::Together {call sets beyond tried} {
   return "${text}hint: the first of these: [::vorkel::explain_calls::command \
     [expr {$nearer ? "best" : "plan"}] $call [dict get $call request outputs] \
     [dict get $first texts]]\n"
+}
+
+# Sets with another one, which is not there twice, the nearest first.
+proc ::vorkel::explain_advice::Inserted {sets set} {
+  foreach other $sets {
+    if {[dict get $other texts] eq [dict get $set texts]} {
+      return $sets
+    }
+  }
+  return [lsort -command {apply {{one other} {
+    set difference [expr {[dict get $one ppm] - [dict get $other ppm]}]
+    expr {$difference < 0 ? -1 : $difference > 0}
+  }}} [list {*}$sets $set]]
 }
 
 proc ::vorkel::explain_advice::Set {set whose} {

@@ -62,7 +62,7 @@ proc ::vorkel::explain_calls::command {name call outputs texts} {
   set words [dict get $call words]
   set changes [dict create --out [join $texts ,]]
   # Other frequencies than those of a request file go without its phases and duty cycles.
-  set filed [expr {[Index $words --out] < 0}]
+  set filed [expr {[index $words --out] < 0}]
   foreach {key option} {phase --phase duty --duty} {
     set values [lmap output $outputs {dict get $output $key}]
     if {($filed || $values ne [lmap output $before {dict get $output $key}]) &&
@@ -71,7 +71,7 @@ proc ::vorkel::explain_calls::command {name call outputs texts} {
     }
   }
   dict for {option value} $changes {
-    set index [Index $words $option]
+    set index [index $words $option]
     if {$index < 0} {
       lappend words $option $value
     } elseif {[lindex $words $index] eq $option} {
@@ -84,7 +84,7 @@ proc ::vorkel::explain_calls::command {name call outputs texts} {
 }
 
 # Where an option stands among words, -1 for nowhere.
-proc ::vorkel::explain_calls::Index {words option} {
+proc ::vorkel::explain_calls::index {words option} {
   set index 0
   foreach word $words {
     if {$word eq $option || [string match $option=* $word]} {

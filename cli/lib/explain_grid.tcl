@@ -81,7 +81,8 @@ proc ::vorkel::explain_grid::nearer {best answer} {
     dict get $output offs
   }]] ppm]
   return " Of all settings in the device's ranges, those of a [dict get $best primitive] that best\
-    finds are nearest in frequency, at most [far [dict get $best worstPpm] 0] off[expr {
+    finds are [expr {[dict get $best worstPpm] == 0 ? "exact in frequency" :
+    "nearest in frequency, at most [far [dict get $best worstPpm] 0] off"}][expr {
     [llength $shapes] > 0 ? ", but with phases or duty cycles that are off" : ""}]."
 }
 

@@ -10,6 +10,7 @@ package require vorkel::explain_pins 1.1
 package require vorkel::explain_text 1.1
 package require vorkel::explain_vcos 1.1
 package require vorkel::hardware 1.1
+package require vorkel::kru_phases 1.1
 package require vorkel::numbers 1.1
 package require vorkel::options 1.1
 
@@ -53,7 +54,7 @@ proc ::vorkel::explain_kru::Works {request primitive} {
 
 # What pins make within the tolerance of a frequency, whatever their ranges: lists of the
 # distance, the frequency, the pin and how it is made, the nearest first.
-proc ::vorkel::explain_kru::Fitting {request primitive frequency} {
+proc ::vorkel::explain_kru::fitting {request primitive frequency} {
   set allowed [expr {$frequency * [::vorkel::explain_vcos::allowed $request]}]
   set rows {}
   foreach {place value} [::vorkel::explain_pins::places $request $primitive $frequency] {
@@ -89,7 +90,7 @@ proc ::vorkel::explain_kru::Alone {request primitive output index} {
   }
   variable ranged
   set frequency [dict get $output freq]
-  set fitting [Fitting $request $primitive $frequency]
+  set fitting [fitting $request $primitive $frequency]
   if {[llength $fitting] == 0} {
     set findings {}
     set all [dict get $ranged $primitive]
@@ -220,7 +221,17 @@ proc ::vorkel::explain_kru::NoPhase {request primitive output index pins} {
     }
   }
   return [finding "pin phase" $index "the pins that make $frequency MHz\
-    have no phase of [number $phase] degrees: [join $texts {; }]"]
+    have no phase of [number $phase] degrees, not even with PHASE_SHIFT, which with feedback ends\
+    at [::vorkel::numbers::short [lindex [shifts 90.0] end] 3] degrees: [join $texts {; }]"]
+}
+
+# The phases that PHASE_SHIFT adds to those of pins that are so many degrees apart.
+proc ::vorkel::explain_kru::shifts {quarter} {
+  set shifts {}
+  for {set step 0} {$step <= [::vorkel::kru_phases::lastStep $quarter]} {incr step} {
+    lappend shifts [expr {$step * 360.0 / $::vorkel::actual::shift_steps}]
+  }
+  return $shifts
 }
 
 # Why an output of a KRU_CLKGEN cannot follow output 0, if so.
@@ -298,9 +309,15 @@ proc ::vorkel::explain_kru::Together {request primitive} {
       [::vorkel::options::enumerate $offsets] degrees of it"]]
   }
   if {$phases} {
-    return [list [finding "pin phase" $indices "no pins have these phases\
-      together: beside one PHASE_SHIFT for all, the pins at the input frequency have 0, 90, 180 and\
-      270 degrees, CLK2X and CLKFX 0 and 180, CLKDV 0"]]
+    set free [lmap index $indices {
+      if {[dict get [lindex [dict get $request outputs] $index] phase] ne ""} continue
+      set index
+    }]
+    set what [expr {[llength $free] == 0 ? "no pins have these phases together" :
+      "the pins that are left for [outputs $free], whatever the phase there, do not go with the\
+      other phases"}]
+    return [list [finding "pin phase" $indices "$what: beside one PHASE_SHIFT for all, the pins at\
+      the input frequency have 0, 90, 180 and 270 degrees, CLK2X and CLKFX 0 and 180, CLKDV 0"]]
   }
   return [list [finding "outputs together" $indices "each can be made\
     alone, but one CLKIN_DIVIDE_BY_2, one M and D of CLKFX and one divide of CLKDV must serve\

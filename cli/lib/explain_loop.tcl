@@ -21,7 +21,7 @@ namespace eval ::vorkel::explain_loop {
 
 # The findings; none when there are settings for all that is asked.
 proc ::vorkel::explain_loop::findings {request primitive} {
-  set findings [Inputs $request $primitive]
+  set findings [inputs $request $primitive]
   set possible [expr {[llength $findings] == 0}]
   set pairs {}
   if {$possible} {
@@ -45,7 +45,7 @@ proc ::vorkel::explain_loop::findings {request primitive} {
 }
 
 # What the input clocks are in the way of by themselves.
-proc ::vorkel::explain_loop::Inputs {request primitive} {
+proc ::vorkel::explain_loop::inputs {request primitive} {
   set inputs [dict get $request inputs]
   set limits [dict get $request limits]
   set bandwidth [dict get $request bandwidth]

@@ -5,13 +5,15 @@ package require vorkel::actual 1.1
 package require vorkel::answer 1.1
 package require vorkel::engine 1.1
 package require vorkel::explain_calls 1.1
+package require vorkel::explain_kru 1.1
 package require vorkel::explain_nearest 1.1
 package require vorkel::explain_vcos 1.1
 package require vorkel::numbers 1.1
 
 namespace eval ::vorkel::explain_steps {
-  # As many of a primitive are tried below and above what is asked for.
-  variable most_tried 40
+  # As many of a primitive are tried below and above what is asked for: of a KRU all steps of
+  # PHASE_SHIFT, for which its pins have phases in different quarters.
+  variable most_tried {Loop 40 Kru 400}
 }
 
 # The phases (degrees) or duty cycles (percent), as `what` says, that are nearest below and above
@@ -50,10 +52,11 @@ proc ::vorkel::explain_steps::nearest {request primitives index what} {
 # The first of some values of an output with which the primitive does all that is asked, or "".
 proc ::vorkel::explain_steps::First {request primitive index what values} {
   variable most_tried
-  if {[llength $values] > $most_tried} {
+  set most [dict get $most_tried [::vorkel::engine::family $primitive]]
+  if {[llength $values] > $most} {
     set ::vorkel::explain_nearest::stopped 1
   }
-  foreach value [lrange $values 0 $most_tried-1] {
+  foreach value [lrange $values 0 $most-1] {
     if {[::vorkel::explain_nearest::isLate]} break
     set changed [::vorkel::explain_nearest::with $request $index $what $value]
     if {[::vorkel::explain_nearest::proof $changed $primitive] ne ""} {
@@ -112,8 +115,9 @@ proc ::vorkel::explain_steps::Beside {request what asked divider} {
     [::vorkel::actual::dutyOnStep [expr {$below + $step}] $divider $most]]
 }
 
-# What the pins of a KRU have beside one PHASE_SHIFT: phases at quarters of a turn from 0 and from
-# those of all outputs, and what the engine answers. There is one duty cycle, 50 %, but for CLKDV.
+# What a KRU could have: all phases that pins make with PHASE_SHIFT, those at quarters of a turn
+# from those of the other outputs, and what the engine answers. There is one duty cycle, 50 %, but
+# for CLKDV.
 proc ::vorkel::explain_steps::KruValues {request primitive index what} {
   set values {}
   foreach answer [::vorkel::answer::all $request [list $primitive]] {
@@ -124,20 +128,55 @@ proc ::vorkel::explain_steps::KruValues {request primitive index what} {
   if {$what eq "duty"} {
     return [list {*}$values 50.0]
   }
-  set bases 0.0
-  set other -1
-  foreach output [dict get $request outputs] {
-    if {[incr other] != $index && [dict get $output phase] ne ""} {
-      lappend bases [dict get $output phase]
+  set others {}
+  foreach output [lreplace [dict get $request outputs] $index $index] {
+    if {[dict get $output phase] ne ""} {
+      lappend others [dict get $output phase]
     }
   }
-  foreach base $bases {
+  set phases [Shifted $request $primitive $index $others]
+  foreach other $others {
     foreach quarter {-270 -180 -90 0 90 180 270 360} {
-      set phase [expr {$base + $quarter}]
-      if {abs($phase) <= 360} {
-        lappend values $phase
-      }
+      lappend phases [expr {$other + $quarter}]
+    }
+  }
+  set asked [dict get [lindex [dict get $request outputs] $index] phase]
+  foreach phase $phases {
+    # Those further away are the same as others that are nearer.
+    if {abs($phase) <= 360 && abs($phase - $asked) <= 180} {
+      lappend values [::vorkel::numbers::short $phase 3]
     }
   }
   return $values
+}
+
+# The phases of the pins of an output with all steps of PHASE_SHIFT that there are and that go with
+# the phases of the other outputs. Whether there is feedback may be left open. Only the pins at the
+# frequency of CLK0 have all four quarters.
+proc ::vorkel::explain_steps::Shifted {request primitive index others} {
+  set phases {}
+  set pins [lmap row [::vorkel::explain_kru::fitting $request $primitive \
+      [dict get [lindex [dict get $request outputs] $index] freq]] {lindex $row 2}]
+  set quarter [expr {"CLK0" in $pins ? 90 : 180}]
+  foreach distance [expr {[dict get $request feedback] ? 90 : {90 180}}] {
+    set shifts [expr {$primitive eq "KRU_SP" ? [::vorkel::explain_kru::shifts $distance] : 0.0}]
+    foreach shift $shifts {
+      if {![Serves $shift $others $distance]} continue
+      for {set pin -360} {$pin <= 360} {incr pin [expr {max($distance, $quarter)}]} {
+        lappend phases [expr {$pin + $shift}]
+      }
+    }
+  }
+  return $phases
+}
+
+# Whether pins that are so many degrees apart have all of some phases with a shift.
+proc ::vorkel::explain_steps::Serves {shift phases distance} {
+  foreach phase $phases {
+    set pin [expr {round(($phase - $shift) / $distance) * $distance}]
+    if {![::vorkel::answer::isAllowed phaseError [expr {$pin + $shift - $phase}]]} {
+      return 0
+    }
+  }
+  return 1
 }

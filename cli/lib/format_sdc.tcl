@@ -114,7 +114,8 @@ proc ::vorkel::format::sdc_writer::Figures {output inputs} {
   }
   foreach input [lrange $inputs 1 end] {
     append text "; from input 2 [Short [expr {double($input) * $multiply / $divide}]] MHz, whose\
-      jitter is unknown"
+      jitter is unknown: it is worked out for the first input only, so that this clock has no\
+      uncertainty here and needs one of your own"
   }
   return $text
 }

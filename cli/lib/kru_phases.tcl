@@ -9,6 +9,8 @@
 #   for those between 0 and 360 degrees that are the same
 #   for those that the pins make with one step of PHASE_SHIFT, the one that comes nearest to all,
 #   where all are then within their tolerance
+#   for those with the nearest step that is not 0: the pins that make a frequency need not have the
+#   phase of a pin, such as 90 degrees, but they have all steps below it
 # each time with these phases of the outputs that ask for none: 0, each one that is asked for, and
 # those 90, 180 and 270 degrees from it.
 
@@ -24,9 +26,14 @@ namespace eval ::vorkel::kru_phases {
 # off, degrees.
 proc ::vorkel::kru_phases::lists {request primitive allowed} {
   set asked [lmap output [dict get $request outputs] {dict get $output phase}]
+  set quarter [Quarter $request $primitive]
+  set shifts [expr {$primitive eq "KRU_SP"}]
+  set all [list $asked [Turned $asked] [Stepped $asked $quarter $shifts $allowed]]
+  if {$shifts} {
+    lappend all [Stepped $asked $quarter $shifts $allowed 1]
+  }
   set lists [dict create]
-  foreach phases [list $asked [Turned $asked] [Stepped $asked [Quarter $request $primitive] \
-      [expr {$primitive eq "KRU_SP"}] $allowed]] {
+  foreach phases $all {
     foreach filling [Fillings $phases] {
       set list [lmap phase $phases {expr {$phase eq "" ? $filling : $phase}}]
       set key [lmap phase $list {expr {double($phase)}}]
@@ -36,6 +43,12 @@ proc ::vorkel::kru_phases::lists {request primitive allowed} {
     }
   }
   return [dict values $lists]
+}
+
+# The largest step of PHASE_SHIFT where the phases of pins are so many degrees apart. Steps are
+# rounded, and half a step is one only from there on, which is a pin already.
+proc ::vorkel::kru_phases::lastStep {quarter} {
+  return [expr {int(ceil($quarter / 360.0 * $::vorkel::actual::shift_steps - 0.5))}]
 }
 
 # The degrees between the phases of pins. Without feedback there are only CLKFX and CLKFX180, as on
@@ -56,15 +69,14 @@ proc ::vorkel::kru_phases::Turned {phases} {
 
 # The phases that the pins make with the step of PHASE_SHIFT, of those below the phase of the next
 # pin, whose largest error is the smallest; without PHASE_SHIFT, those of the pins. Where that is
-# larger than it may be the phases stay as they are.
-proc ::vorkel::kru_phases::Stepped {phases quarter shifts allowed} {
+# larger than it may be the phases stay as they are. `first` is the first step to try.
+proc ::vorkel::kru_phases::Stepped {phases quarter shifts allowed {first 0}} {
   variable below
   set steps $::vorkel::actual::shift_steps
-  # Steps are rounded, and half a step is one only from there on, which is a pin already.
-  set last [expr {$shifts ? int(ceil($quarter / 360.0 * $steps - 0.5)) : 0}]
+  set last [expr {$shifts ? [lastStep $quarter] : 0}]
   set least [expr {$allowed * (1 + 1e-9)}]
   set best $phases
-  for {set step 0} {$step <= $last} {incr step} {
+  for {set step $first} {$step <= $last} {incr step} {
     set offset [expr {$step * 360.0 / $steps}]
     # What the engine is to be asked for, of which it makes this step.
     set rest [expr {min($offset, $quarter - $below)}]

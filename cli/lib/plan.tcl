@@ -219,7 +219,8 @@ proc ::vorkel::plan::Contest {best} {
     } elseif {$jitter eq "" || $least eq ""} {
       set result ""
     } else {
-      set result "[::vorkel::numbers::ps [expr {$jitter - $least}]] ps more"
+      set result [expr {[jitter $answer] eq [jitter [lindex $best 0]] ? "the same jitter" :
+        "[::vorkel::numbers::ps [expr {$jitter - $least}]] ps more"}]
     }
     if {[llength $rows] == 0 && ![dict get $answer within]} {
       set result "winner, but OFF"
@@ -233,7 +234,7 @@ proc ::vorkel::plan::Contest {best} {
 # The table of all answers that are solved.
 proc ::vorkel::plan::Ranking {ranked} {
   set columns {{right #} {left primitive} {left variant} {left loop} {right {VCO MHz}}
-    {right {worst ppm}} {right {jitter ps}}}
+    {right {worst ppm}} {right {jitter ps}} {left off}}
   set rows {}
   set shown {}
   foreach answer $ranked {
@@ -243,9 +244,18 @@ proc ::vorkel::plan::Ranking {ranked} {
       [dash [dict get $answer variant]] [dash [dict get $answer bandwidth]] [vco $answer] \
       [ppm $answer] [jitter $answer] [mark $answer]]
   }
-  # Where the numbers of the rows take another column, there is no room for more than OFF.
-  lappend columns [list left [expr {[llength $shown] > 9 ? "off" : "mark"}]]
-  return [render $columns $rows $shown]
+  return [render $columns $rows $shown][Order $shown]
+}
+
+# What is told of the order when something is out of the device's range.
+proc ::vorkel::plan::Order {shown} {
+  foreach answer $shown {
+    if {[llength [dict get $answer violations]] > 0} {
+      return \n[::vorkel::table::prose "" "Rows with something out of the device's range come after\
+        all others."]
+    }
+  }
+  return ""
 }
 
 # What the user may want to do next. `better` is what Better has.

@@ -32,7 +32,7 @@ proc ::vorkel::plan_why::of {best ranked} {
   }
   set variants [Within [::vorkel::answer::ofPrimitive $ranked $name]]
   if {[llength $variants] > 1} {
-    append text ". Of its [llength $variants] settings, [Described $winner]\
+    append text ". Of the [llength $variants] settings of the $name, [Described $winner]\
       [Advantage $winner [lindex $variants 1] "the next"]"
   }
   return $text.
@@ -54,7 +54,7 @@ proc ::vorkel::plan_why::IsRivalled {winner best} {
 # The same when not even it is as asked for.
 proc ::vorkel::plan_why::WhyNothing {winner best} {
   if {[llength [dict get $winner violations]] > 0} {
-    return "nothing is as asked for and in the device's range."
+    return [WhyOutside $winner]
   }
   set name [dict get $winner primitive]
   set equal [list $winner]
@@ -82,6 +82,17 @@ proc ::vorkel::plan_why::WhyNothing {winner best} {
     default { append text "comes first, with all else the same" }
   }
   return $text.
+}
+
+# The same when not even it is in the device's range.
+proc ::vorkel::plan_why::WhyOutside {winner} {
+  set violations [lassign [dict get $winner violations] first]
+  set count [llength $violations]
+  if {$count > 0} {
+    append first " ($count more such [expr {$count > 1 ? "notes are" : "note is"}] above)"
+  }
+  return "nothing is as asked for and in the device's range: with the [dict get $winner primitive],\
+    $first. What is out of range ranks behind all that is only off, and is marked OFF as that is."
 }
 
 # What of an answer that is off is to be as near as it can be.

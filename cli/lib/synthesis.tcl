@@ -2,9 +2,12 @@
 
 package provide vorkel::synthesis 1.1
 package require vorkel::answer 1.1
+package require vorkel::help 1.1
 package require vorkel::output 1.1
+package require vorkel::plan_refusals 1.1
 package require vorkel::report 1.1
 package require vorkel::request 1.1
+package require vorkel::table 1.1
 
 namespace eval ::vorkel::synthesis {}
 
@@ -19,7 +22,7 @@ proc ::vorkel::synthesis::run {primitive words} {
   ::vorkel::output::into [dict get $call file]
   set answer [::vorkel::answer::solve $request $primitive]
   if {![dict get $answer solved]} {
-    throw {VORKEL UNSOLVED} [dict get $answer reason]
+    throw {VORKEL UNSOLVED} [Unsolved $call $primitive $answer]
   }
   if {[dict get $call format] eq "text"} {
     set text [::vorkel::report::render $answer]
@@ -28,4 +31,16 @@ proc ::vorkel::synthesis::run {primitive words} {
   }
   ::vorkel::output::write $text [dict get $call file]
   return [::vorkel::answer::status $answer]
+}
+
+# What is told when there is no configuration: the engine's sentence, and who says more.
+proc ::vorkel::synthesis::Unsolved {call primitive answer} {
+  set reason [dict get $answer reason]
+  set cause [::vorkel::plan_refusals::cause [dict get $call request] $primitive $reason ""]
+  set text $reason\n
+  if {$cause ne ""} {
+    append text [::vorkel::table::prose "" $cause]
+  }
+  return "${text}hint: what stands in the way: [::vorkel::help::command explain \
+    [list {*}[dict get $call words] --primitive $primitive]]"
 }
