@@ -180,9 +180,10 @@ inline constexpr Request kFudgeLarge[] = {
 
 // --- Hard ones ------------------------------------------------------------------------------
 //
-// What a climb from random requests towards slower ones has come to. Output 0 is low, the others
+// What climbs from random requests towards slower ones have come to. Output 0 is low, the others
 // are clocks that several VCO frequencies fit about as well, and the one that fits best changes
-// from fudge to fudge. Some have a solution, far out, and some have none.
+// from fudge to fudge. Some have a solution, far out, and some have none. In the last three, many
+// VCO frequencies are exact multiples of an output.
 inline constexpr Request kHard[] = {
     {"TSYN 3, fits from fudge to fudge", kTsyn, 3, "16.569 54.75 225.851", 25.425, 0, "0 0 0"},
     {"TSYN 3, output 2 at its low end", kTsyn, 3, "12.288 297 5", 100, 0, "0 0 315"},
@@ -198,6 +199,9 @@ inline constexpr Request kHard[] = {
     {"TSYN 7", kTsyn, 7, "13.765 16.55 266.862 63 226 6.415 368.875", 160.93},
     {"PLL 3", kPll, 3, "15.789 8.248 182.344", 37.25, 0, "0 0 0"},
     {"PLL 7, solved", kPll, 7, "11 14.75 358.62 222.875 85.125 42.435 339.75", 22.075},
+    {"TSYN 4, multiples, two inputs", kTsyn, 4, "17.44 13.167 57.25 52.323", 16.841, 17},
+    {"TSYN 5, multiples", kTsyn, 5, "17.113 68.877 34.5 27.001 19.63", 13.5},
+    {"TSYN 5, multiples, solved", kTsyn, 5, "11.838 7.725 22.84 6.093 42.156", 10.842, 13.067},
 };
 
 // --- The sets -------------------------------------------------------------------------------

@@ -17,8 +17,8 @@ static_assert(kTolerances < (1 << kKeyBits) && kKeyBits * (MAX_OUTPUTS - 1) < 32
 
 constexpr double kNoLimit = std::numeric_limits<double>::infinity();
 
-// What two frequencies that are computed in different ways may differ by, relative; and the bounds
-// that leave room for both of them.
+// What two frequencies that are computed in different ways may differ by, relative; and how far
+// bounds are moved to leave room for a VCO that is moved by that.
 constexpr double kRounding = 1e-12;
 constexpr double kSlack = 4.0 * kRounding;
 
@@ -44,7 +44,8 @@ using Stretches = std::vector<Stretch>;
 
 // Visits the ends, in rising order, of the stretches that a divider of an output makes, with the
 // digit below each end. `f` is the requested frequency and `end`, the last of them, the VCO at
-// which the next divider takes over, MHz.
+// which the next divider takes over, MHz. Tolerances count from the widest below the multiple, -26,
+// to the widest above it.
 template <typename Visit>
 void VisitDivider(double divider, double f, const OutputRange& range, double end, Visit visit) {
   const double served = std::min(divider * range.max, end);
