@@ -11,7 +11,7 @@ VORKEL_ROOT=$(cd -P -- "$(dirname -- "${BASH_SOURCE[0]}")/.." && pwd -P)
 
 # The folders that the package is built from. A tree that is configured with tests builds the
 # package alone by the targets of these folders.
-readonly PROGRAM_FOLDERS=(host engine binding)
+readonly PROGRAM_FOLDERS=(hardware host engine planner binding)
 readonly PROGRAM_SOURCES=(CMakeLists.txt devices doc examples "${PROGRAM_FOLDERS[@]}")
 readonly TEST_SOURCES=(tests)
 
@@ -31,7 +31,8 @@ fail() {
 
 # Prints the Debian packages that a job needs: `packages_for program|tests|benchmarks`.
 packages_for() {
-  printf '%s\n' g++ cmake ninja-build tcl8.6 tcl8.6-dev tcllib libtomlplusplus-dev
+  printf '%s\n' g++ cmake ninja-build tcl8.6 tcl8.6-dev tcllib libtomlplusplus-dev \
+    libboost-dev libcli11-dev libfmt-dev nlohmann-json3-dev
   case $1 in
     tests) printf '%s\n' libgtest-dev libgmock-dev ;;
     benchmarks) printf '%s\n' libbenchmark-dev ;;
