@@ -1,0 +1,75 @@
+// All settings of a primitive, searched for the best.
+//
+// The search takes every setting that keeps the device's limits, and answers exactly what trying
+// them one by one in exact arithmetic would (tests/planner/search/plain_enumeration.h does).
+//
+// A PLL or a TSYN: every bandwidth that the request leaves open and every M and D with which VCO
+// and PFD are in range with each input. Each output then has a divider of its own, of those that
+// keep its range with each input. Preferred is one that meets the demands of the output; of those
+// the one with the largest margin, when the request ranks by margin; then the smallest worst error
+// in units of the tolerances (answer/Rank.h), the smallest error of the frequency, of the phase, of
+// the duty cycle, and the smallest divider. Phases and high times are those that are nearest to the
+// request: 0 and 50 percent where none is asked for.
+//
+// Beside a fraction nothing can be moved. So where phases or duty cycles are asked for, a TSYN that
+// has fractions offers two settings for a whole M: all dividers whole, with phases and high times;
+// and a fraction for output 0, with none. The ranking decides.
+//
+// A KRU: every CLKIN_DIVIDE_BY_2, feedback, M, D, divide, PHASE_SHIFT and pin of each output that
+// keep the ranges of the pins. With the same figures the pins with the lower codes are taken.
+//
+// Tested by search_test.cpp.
+#ifndef VORKEL_PLANNER_SEARCH_SEARCH_H_
+#define VORKEL_PLANNER_SEARCH_SEARCH_H_
+
+#include <cstddef>
+#include <cstdint>
+#include <optional>
+#include <vector>
+
+#include "planner/Device.h"
+#include "planner/Request.h"
+#include "planner/Settings.h"
+
+namespace planner::search {
+
+// The trade-offs that are kept at most.
+inline constexpr std::size_t kMostOfFront = 10000;
+
+// Settings that keep the device's limits, with what they are ranked by first.
+struct Candidate {
+  Settings settings;
+  bool within = false;               // all demands are met
+  Rational worst_error = 0;          // in units of the tolerances
+  std::optional<double> max_jitter;  // ps, peak to peak; nothing when unknown
+};
+
+// What has been looked at. Loops are pairs of M and D (of a KRU: of M and D of the synthesiser,
+// and the settings without them) with a bandwidth, a CLKIN_DIVIDE_BY_2 or a feedback.
+struct Counts {
+  std::int64_t loops = 0;      // that keep the device's limits and were looked at, or left out ...
+  std::int64_t discarded = 0;  // ... because a bound tells that they can neither be the best nor a
+                               // trade-off
+};
+
+struct Found {
+  // For each bandwidth that the request leaves open, in the order of kBandwidths, the settings that
+  // rank first; not there when no setting with it keeps the limits. Of a KRU one, or none.
+  std::vector<Candidate> best;
+  // Trade-offs: settings of which each has less jitter than all with a smaller worst error, over all
+  // bandwidths, the smallest error first. With an unknown jitter only those with the smallest error.
+  std::vector<Candidate> front;
+  Counts counts;
+  // Nothing was left out that could be in `best` or `front`. False only when the front has more
+  // than kMostOfFront settings: then those with the smaller errors are there.
+  bool complete = true;
+};
+
+// The best settings of a primitive of the device, and the trade-offs. Empty when no setting keeps
+// the limits, and when the request has more inputs or outputs than the primitive. The request is
+// as Request.h says; its `primitive`, `any_order` and `engine_only` change nothing here.
+Found Search(const Request& request, const Device& device, Primitive primitive);
+
+}  // namespace planner::search
+
+#endif  // VORKEL_PLANNER_SEARCH_SEARCH_H_
