@@ -1,0 +1,134 @@
+// What is wrong with what a user has written, as data: where it stands, what it is about, and the
+// text itself. MistakeText.h makes sentences of it.
+#ifndef VORKEL_PLANNER_READ_MISTAKE_H_
+#define VORKEL_PLANNER_READ_MISTAKE_H_
+
+#include <optional>
+#include <stdexcept>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "hardware/Primitive.h"
+
+namespace planner::read {
+
+// What a value can be.
+enum class ValueKind {
+  kFrequency,       // MHz
+  kPhase,           // degrees
+  kDuty,            // percent
+  kJitter,          // ps
+  kTolerance,       // ppm
+  kPhaseTolerance,  // degrees
+  kDutyTolerance,   // percent points
+  kMaxJitter        // ps
+};
+
+// Where something stands, and what it is called there.
+struct Place {
+  std::string file;   // as the user has named it; empty: an option or the entry of a dict
+  int line = 0;       // from 1; 0: the file as a whole
+  int column = 0;     // from 1, counted in letters; 0: the line as a whole
+  std::string entry;  // "--in" of options, "inputs" of files; empty: the request as a whole
+  int index = -1;     // of one input or output, from 0; -1: the entry as a whole
+  std::string key;    // of an output or an input: "phase"
+
+  bool IsInFile() const { return !file.empty(); }
+  bool operator==(const Place&) const = default;
+};
+
+enum class MistakeKind {
+  // One value. `text` is all of it.
+  kNotAValue,
+  kNumberTooLarge,   // other: the number
+  kDividesByZero,
+  kMustBe,           // what DemandOf(value_kind) says
+  kOutOfRange,       // of the kind of value
+  kUnknownUnit,      // other: the unit
+  kOtherUnit,        // other: a unit, such as mHz, that means something else than `hint`
+  // A list of values.
+  kNumberMissing,
+  kEmptyList,
+  kBareBesideUnit,   // text: an entry without a unit; other: one with the unit `hint`
+  kTooMany,          // count, most; primitive when it is that one's limit
+  kCountDiffers,     // count entries for `most` outputs
+  kNothingUsed,      // all outputs are "-"
+  // Names and switches.
+  kNotAName,         // text must be one of `known`
+  kNotASwitch,       // text must be 1 or 0, true or false
+  kContradiction,    // `place` contradicts `other`, an option or entry with the value `text`
+  kOtherPrimitive,   // the request is for `primitive`, the command for a `known[0]`
+  // A request as a whole.
+  kMissing,          // place.entry: what is not said, as an option; file: what does not say it
+  kUnknownEntry,     // text; known: those there are
+  // JSON and TOML.
+  kSyntax,           // other: what is wrong, in the words of SyntaxText; text: what stands there
+  kWrongType,        // other: the type that is there; known: those that may be
+  kNoFrequency,      // an output without a frequency
+  // Tcl.
+  kScript            // text: the sentence of the script's interpreter
+};
+
+// How a JSON text is no JSON.
+enum class SyntaxFault {
+  kNone,
+  kValueExpected,
+  kNameExpected,
+  kColonExpected,
+  kCommaOrBracket,
+  kCommaOrBrace,
+  kMoreBehind,
+  kTwice,             // text: the name
+  kTextNotClosed,
+  kNoEscape,
+  kControlLetter,
+  kTooDeep,
+  kNoUnicode,         // bytes that are no UTF-8
+  kOther              // other: the sentence of the TOML reader
+};
+
+struct Mistake {
+  MistakeKind kind = MistakeKind::kNotAValue;
+  Place place;
+  ValueKind value_kind = ValueKind::kFrequency;
+  SyntaxFault fault = SyntaxFault::kNone;
+  std::string text;   // as the user has written it
+  std::string other;
+  std::string hint;   // what to write instead, where that is known
+  std::vector<std::string> known;
+  int count = 0;
+  int most = 0;
+  std::optional<hardware::Primitive> primitive;
+
+  bool operator==(const Mistake&) const = default;
+};
+
+using Mistakes = std::vector<Mistake>;
+
+// For callers that want an exception; the readers themselves collect mistakes.
+class MistakeError : public std::runtime_error {
+ public:
+  explicit MistakeError(Mistakes all);  // one at least
+  const Mistakes& All() const { return all_; }
+
+ private:
+  Mistakes all_;
+};
+
+// Something that may not be meant, beside a request that can be read.
+enum class DoubtKind {
+  kDecimalComma  // text: a list that looks like one number with a comma; hint: that number
+};
+
+struct Doubt {
+  DoubtKind kind = DoubtKind::kDecimalComma;
+  Place place;
+  std::string text;
+  std::string hint;
+  bool operator==(const Doubt&) const = default;
+};
+
+}  // namespace planner::read
+
+#endif  // VORKEL_PLANNER_READ_MISTAKE_H_
