@@ -29,8 +29,9 @@ enum class FindingKind {
   kOutput0Phase,       // a KRU_CLKGEN has output 0 on CLKFX whatever its phase
   kBandwidthUnused,    // a KRU has no bandwidth
   kInputJitterPasses,  // a KRU passes the jitter of the input on: value, ps
-  kNoJitter,           // no jitter of `outputs`, or of all when empty: text says why
-  kNoPhaseError,       // no phase error: text says why
+  kNoJitter,           // no jitter of `outputs`, or of all when empty: text says why, or
+                       // nothing when the device has no coefficients
+  kNoPhaseError,       // no phase error: likewise
   kMoved,              // any_order: outputs[i] tells which request stands at place i
   // Why a primitive has no settings.
   kTooManyInputs,      // value of them, range.highest allowed
