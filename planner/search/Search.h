@@ -56,8 +56,9 @@ struct Found {
   // For each bandwidth that the request leaves open, in the order of kBandwidths, the settings that
   // rank first; not there when no setting with it keeps the limits. Of a KRU one, or none.
   std::vector<Candidate> best;
-  // Trade-offs: settings of which each has less jitter than all with a smaller worst error, over all
-  // bandwidths, the smallest error first. With an unknown jitter only those with the smallest error.
+  // Trade-offs, over all bandwidths: settings of which each has less jitter than all with a smaller
+  // worst error, the smallest error first; only those that meet all demands when there are any
+  // such (answer/Front.h). With an unknown jitter only the one with the smallest error.
   std::vector<Candidate> front;
   Counts counts;
   // Nothing was left out that could be in `best` or `front`. False only when the front has more
