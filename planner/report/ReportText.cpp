@@ -1,0 +1,182 @@
+// Tested by report_text_test.cpp.
+#include "planner/report/ReportText.h"
+
+#include <algorithm>
+#include <cstddef>
+#include <functional>
+#include <optional>
+#include <vector>
+
+#include "planner/report/FindingText.h"
+#include "planner/report/Numbers.h"
+#include "planner/report/SettingsText.h"
+#include "planner/report/Table.h"
+
+namespace planner::report {
+
+namespace {
+
+using std::string;
+
+constexpr const char* kOff = "OFF";
+
+// One answer, in the terms of its tables.
+class Report {
+ public:
+  Report(const Request& request, const Answer& answer, const Style& style)
+      : request_(request), answer_(answer), style_(style) {}
+
+  // The frequencies, with the jitter where it is known.
+  string Outputs() const;
+  // The frequencies with the second input; empty without one. One table with the above would be
+  // wider than a terminal.
+  string Second() const;
+  // Phases and duty cycles, each if it was asked for or is not as usual; empty without any.
+  string Shapes() const;
+
+ private:
+  using IsOff = std::function<bool(const OutputAnswer&)>;
+
+  // A table with a row for each output that is used, and a column of marks when there are any.
+  string Table(std::vector<Column> columns, const std::function<Row(std::size_t)>& row_of,
+               const IsOff& is_off) const;
+  bool Any(const IsOff& holds) const;
+
+  const Request& request_;
+  const Answer& answer_;
+  const Style& style_;
+};
+
+bool Misses(const OutputAnswer& output, Quantity quantity) {
+  return std::any_of(output.misses.begin(), output.misses.end(),
+                     [&](const Finding& miss) { return miss.quantity == quantity; });
+}
+
+// Whether an output is outside of the device's limits with an input. What does not depend on the
+// input is told with the first one.
+bool IsOutside(const OutputAnswer& output, int input) {
+  return std::any_of(output.violations.begin(), output.violations.end(),
+                     [&](const Finding& violation) { return violation.input == input; });
+}
+
+bool Report::Any(const IsOff& holds) const {
+  return std::any_of(answer_.outputs.begin(), answer_.outputs.end(),
+                     [&](const OutputAnswer& output) { return output.used && holds(output); });
+}
+
+string Report::Table(std::vector<Column> columns, const std::function<Row(std::size_t)>& row_of,
+                     const IsOff& is_off) const {
+  const bool has_marks = Any(is_off);
+  if (has_marks) columns.push_back({Align::kLeft, "mark"});
+  std::vector<Row> rows;
+  for (std::size_t i = 0; i < answer_.outputs.size(); ++i) {
+    const OutputAnswer& output = answer_.outputs[i];
+    if (!output.used) continue;
+    Row row = row_of(i);
+    row.cells.insert(row.cells.begin(), std::to_string(i));
+    if (has_marks) row.cells.emplace_back(is_off(output) ? kOff : "");
+    if (is_off(output)) row.role = Role::kOff;
+    rows.push_back(std::move(row));
+  }
+  columns.insert(columns.begin(), {Align::kRight, "output"});
+  return TableText(style_, columns, rows);
+}
+
+string Report::Outputs() const {
+  const bool has_jitter = HasJitter(answer_);
+  std::vector<Column> columns = {
+      IsLoop(answer_.primitive) ? Column{Align::kRight, "divider"} : Column{Align::kLeft, "pin"},
+      {Align::kRight, "requested MHz"},
+      {Align::kRight, "actual MHz"},
+      {Align::kRight, "error ppm"}};
+  if (has_jitter) columns.push_back({Align::kRight, "jitter ps"});
+  const auto row_of = [&](std::size_t i) {
+    const OutputAnswer& output = answer_.outputs[i];
+    Row row{{Place(answer_.settings, static_cast<int>(i)),
+             Fixed(request_.outputs[i].frequency, kFrequencyDecimals),
+             Fixed(output.frequency, kFrequencyDecimals), Fixed(output.error_ppm, 2)}};
+    if (has_jitter) row.cells.push_back(output.jitter ? Ps(*output.jitter) : "-");
+    return row;
+  };
+  return Table(std::move(columns), row_of, [](const OutputAnswer& output) {
+    return Misses(output, Quantity::kFrequency) || Misses(output, Quantity::kJitter) ||
+           IsOutside(output, 0);
+  });
+}
+
+string Report::Second() const {
+  if (!Any([](const OutputAnswer& output) { return output.frequency_second.has_value(); })) {
+    return "";
+  }
+  const auto row_of = [&](std::size_t i) {
+    const auto& frequency = answer_.outputs[i].frequency_second;
+    return Row{{frequency ? Fixed(*frequency, kFrequencyDecimals) : "-"}};
+  };
+  return Table({{Align::kRight, "MHz with the second input"}}, row_of,
+               [](const OutputAnswer& output) { return IsOutside(output, 1); });
+}
+
+// What was asked for, what comes out, and the difference; "-" where nothing was asked for.
+void AddAsked(const std::optional<Rational>& requested, const Rational& actual,
+              const std::optional<Rational>& error, Row* row) {
+  row->cells.push_back(requested ? Fixed(*requested, 3) : "-");
+  row->cells.push_back(Fixed(actual, 3));
+  row->cells.push_back(error ? Fixed(*error, 3) : "-");
+}
+
+string Report::Shapes() const {
+  bool has_phases = Any([](const OutputAnswer& output) { return output.phase != Rational(0); });
+  bool has_duties = Any([](const OutputAnswer& output) { return output.duty != Rational(50); });
+  for (const Output& output : request_.outputs) {
+    has_phases = has_phases || (output.used && output.phase);
+    has_duties = has_duties || (output.used && output.duty);
+  }
+  if (!has_phases && !has_duties) return "";
+  std::vector<Column> columns;
+  if (has_phases) {
+    for (const char* heading : {"phase deg", "actual deg", "error deg"}) {
+      columns.push_back({Align::kRight, heading});
+    }
+  }
+  if (has_duties) {
+    for (const char* heading : {"duty %", "actual %", "error points"}) {
+      columns.push_back({Align::kRight, heading});
+    }
+  }
+  const auto row_of = [&](std::size_t i) {
+    const Output& asked = request_.outputs[i];
+    const OutputAnswer& output = answer_.outputs[i];
+    Row row;
+    if (has_phases) AddAsked(asked.phase, output.phase, output.phase_error, &row);
+    if (has_duties) AddAsked(asked.duty, output.duty, output.duty_error, &row);
+    return row;
+  };
+  return Table(std::move(columns), row_of, [](const OutputAnswer& output) {
+    return Misses(output, Quantity::kPhase) || Misses(output, Quantity::kDuty);
+  });
+}
+
+// A blank line and a paragraph for each note, or nothing.
+string Notes(const Answer& answer, const Style& style) {
+  string text;
+  for (const string& remark : RemarkTexts(answer)) {
+    string prose = Prose(style, "note: ", remark);
+    prose.pop_back();
+    text += (text.empty() ? "\n" : "") + Paint(style, Role::kNote, prose) + "\n";
+  }
+  return text;
+}
+
+}  // namespace
+
+string ReportText(const Request& request, const Device& device, const Answer& answer,
+                  const Style& style) {
+  const Report report(request, answer, style);
+  string text = PairsText(SettingsPairs(request, device, answer)) + "\n" + report.Outputs();
+  for (const string& table : {report.Second(), report.Shapes()}) {
+    if (!table.empty()) text += "\n" + table;
+  }
+  return text + Notes(answer, style);
+}
+
+}  // namespace planner::report
