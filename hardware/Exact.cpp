@@ -182,6 +182,11 @@ std::optional<std::int64_t> Rational::Whole() const {
   return numerator_;
 }
 
+std::optional<Rational::Words> Rational::InWords() const {
+  if (large_) return std::nullopt;
+  return Words{numerator_, denominator_};
+}
+
 std::string Rational::NumeratorText() const { return Widened().numerator.str(); }
 std::string Rational::DenominatorText() const { return Widened().denominator.str(); }
 

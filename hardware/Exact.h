@@ -54,6 +54,12 @@ class Rational {
   bool IsWhole() const;
   // The value when it is whole and fits.
   std::optional<std::int64_t> Whole() const;
+  // Numerator and denominator, when both fit: for who has to be quick.
+  struct Words {
+    std::int64_t numerator;
+    std::int64_t denominator;
+  };
+  std::optional<Words> InWords() const;
   // Numerator and denominator as decimal digits, the first with its sign.
   std::string NumeratorText() const;
   std::string DenominatorText() const;

@@ -4,6 +4,7 @@
 
 #include <cstdint>
 #include <limits>
+#include <optional>
 #include <stdexcept>
 
 namespace hardware {
@@ -25,6 +26,15 @@ TEST(Rational, CountsBeyondTwoWords) {
   const Rational least = std::numeric_limits<std::int64_t>::min();
   EXPECT_EQ((-least).NumeratorText(), "9223372036854775808");
   EXPECT_EQ(-(-least), least);
+}
+
+TEST(Rational, TellsItsWordsWhereItFits) {
+  const std::optional<Rational::Words> words = Rational(6, -4).InWords();
+  ASSERT_TRUE(words.has_value());
+  EXPECT_EQ(words->numerator, -3);
+  EXPECT_EQ(words->denominator, 2);
+  const Rational most = std::numeric_limits<std::int64_t>::max();
+  EXPECT_FALSE((most + 1).InWords().has_value());
 }
 
 TEST(Rational, RoundsOnceWhenShown) {
