@@ -19,6 +19,9 @@ class PM_PIC {
   // bare device name. Throws Port::Exception when there is no such device, package or grade,
   // after the reason was issued through the message manager.
   PM_PIC(const Port::StringBase& partName, bool isPartName, PM_PARTNAME_BINDING binding);
+  // The personality of a device that the host has already. Not for users of the interface, who
+  // have no Data.
+  explicit PM_PIC(std::unique_ptr<Data> data);
   virtual ~PM_PIC();
   PM_PIC(const PM_PIC&) = delete;
   PM_PIC& operator=(const PM_PIC&) = delete;

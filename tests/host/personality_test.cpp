@@ -56,6 +56,17 @@ TEST_F(PersonalityTest, FillsWhatThePartNameLeavesOut) {
   EXPECT_EQ(pic.data().part.grade, "g2");
 }
 
+// Without a file or a search path: the controller has the figures of the given device.
+TEST_F(PersonalityTest, CanBeThatOfADeviceInMemory) {
+  Device::DeviceFile file = Device::DeviceFile::Parse(
+      "device = \"dev\"\npackages = [\"p\"]\n[grade.1]\nO_MAX_HT_LT = 64\n", "nowhere", "dev");
+  PM_PIC pic(std::make_unique<PM_PIC::Data>(
+      PM_PIC::Data{Device::Part{std::move(file), std::nullopt, "1"}}));
+  const Dly_SpeedController controller(&pic);
+  EXPECT_EQ(controller.GetBelDelay("O_MAX_HT_LT", nullptr) * 1e9, 64.0);
+  EXPECT_EQ(controller.GetBelDelay("VCOCLK_FREQ_MAX", nullptr), kNoFigure);
+}
+
 TEST_F(PersonalityTest, CannotFillWithoutDefaults) {
   const std::string head = "device = \"dev\"\npackages = [\"p1\"]\n";
   const std::string grade = "[grade.1]\nO_MAX_HT_LT = 64\n";

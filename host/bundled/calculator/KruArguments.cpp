@@ -28,7 +28,7 @@ bool IsClkdvDivide(double divide) {
 // Those of the CLKFXDV pin. The pin has no code, but a script may hand its divide on.
 bool IsClkfxdvDivide(double divide) {
   constexpr double kDivides[] = {2.0, 4.0, 8.0, 16.0, 32.0};
-  return std::ranges::find(kDivides, divide) != std::end(kDivides);
+  return std::find(std::begin(kDivides), std::end(kDivides), divide) != std::end(kDivides);
 }
 
 std::string RangeOfDivide(Primitive primitive) {

@@ -1,6 +1,7 @@
 #include "host/bundled/device/CoefficientTable.h"
 
 #include <algorithm>
+#include <iterator>
 
 namespace Device {
 namespace {
@@ -27,7 +28,9 @@ constexpr Coefficient kCoefficients[] = {
 std::span<const Coefficient> Coefficients() { return kCoefficients; }
 
 std::optional<std::size_t> FindCoefficient(std::string_view name) {
-  const auto found = std::ranges::find(kCoefficients, name, &Coefficient::name);
+  const auto found = std::find_if(
+      std::begin(kCoefficients), std::end(kCoefficients),
+      [name](const Coefficient& coefficient) { return coefficient.name == name; });
   if (found == std::end(kCoefficients)) return std::nullopt;
   return static_cast<std::size_t>(found - std::begin(kCoefficients));
 }

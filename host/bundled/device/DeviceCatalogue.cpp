@@ -61,7 +61,7 @@ std::vector<std::string> DeviceCatalogue::PrefixesOf(std::string_view part_name)
     if (part_name.starts_with(name)) prefixes.push_back(name);
   }
   // Prefixes of one text sort by their length.
-  std::ranges::reverse(prefixes);
+  std::reverse(prefixes.begin(), prefixes.end());
   return prefixes;
 }
 

@@ -1,5 +1,7 @@
 #include "host/bundled/device/DeviceError.h"
 
+#include <utility>
+
 #include "host/Port_Exception.h"
 #include "host/Port_MsgManData.h"
 
@@ -10,14 +12,27 @@ constexpr char kCategory[] = "DesignEntry";
 constexpr char kSource[] = "host/device";
 constexpr char kRevision[] = "1.0";
 
+std::string Sentence(const std::string& path, const std::optional<SourcePosition>& position,
+                     const std::string& reason) {
+  std::string text = path;
+  if (position) {
+    text += ':' + std::to_string(position->line);
+    text += ':' + std::to_string(position->column);
+  }
+  return text + ": " + reason;
+}
+
 }  // namespace
 
+DeviceError::DeviceError(std::string path, std::optional<SourcePosition> position,
+                         std::string reason)
+    : std::runtime_error(Sentence(path, position, reason)),
+      path_(std::move(path)),
+      position_(position),
+      reason_(std::move(reason)) {}
+
 DeviceError ErrorAt(const std::string& path, SourcePosition position, std::string_view reason) {
-  std::string text = path;
-  text += ':' + std::to_string(position.line);
-  text += ':' + std::to_string(position.column) + ": ";
-  text += reason;
-  return DeviceError(text);
+  return DeviceError(path, position, std::string(reason));
 }
 
 std::string JoinNames(const std::vector<std::string>& names) {

@@ -4,8 +4,8 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
-#include <algorithm>
 #include <cerrno>
+#include <optional>
 #include <system_error>
 
 #include "host/bundled/device/DeviceError.h"
@@ -14,7 +14,7 @@ namespace Device {
 namespace {
 
 DeviceError CannotRead(const std::string& path, const std::string& reason) {
-  return DeviceError(path + ": cannot be read: " + reason);
+  return DeviceError(path, std::nullopt, "cannot be read: " + reason);
 }
 
 std::string SystemReason() { return std::generic_category().message(errno); }
@@ -53,7 +53,14 @@ class OpenFile {
   int descriptor_;
 };
 
-void RequireFewDots(const std::string& path, const std::string& text) {
+void RequireShort(const std::string& path, std::size_t length) {
+  if (length <= kLargestFile) return;
+  throw DeviceError(path, std::nullopt,
+                    "is longer than " + std::to_string(kLargestFile) +
+                        " bytes, which no device file is");
+}
+
+void RequireFewDots(const std::string& path, std::string_view text) {
   SourcePosition position;
   std::size_t dots = 0;
   for (const char c : text) {
@@ -82,13 +89,14 @@ std::string ReadFileText(const std::string& path) {
     if (count == 0) break;
     length += count;
   }
-  if (length > kLargestFile) {
-    throw DeviceError(path + ": is longer than " + std::to_string(kLargestFile) +
-                      " bytes, which no device file is");
-  }
+  RequireShort(path, length);
   text.resize(length);
-  RequireFewDots(path, text);
   return text;
+}
+
+void RequireParsable(const std::string& path, std::string_view text) {
+  RequireShort(path, text.size());
+  RequireFewDots(path, text);
 }
 
 }  // namespace Device

@@ -6,6 +6,7 @@
 
 #include <cstddef>
 #include <string>
+#include <string_view>
 
 namespace Device {
 
@@ -17,8 +18,11 @@ inline constexpr std::size_t kLargestFile = 256 * 1024;
 inline constexpr std::size_t kMostDots = 4096;
 
 // The bytes of the regular file at `path`. Throws DeviceError when it cannot be read, is no
-// regular file, or exceeds a limit from above. Never blocks, not even on a named pipe.
+// regular file, or is too long. Never blocks, not even on a named pipe.
 std::string ReadFileText(const std::string& path);
+
+// Throws DeviceError when a text exceeds a limit from above; `path` is for the message.
+void RequireParsable(const std::string& path, std::string_view text);
 
 }  // namespace Device
 

@@ -1,6 +1,7 @@
 #include "host/bundled/device/KeywordTable.h"
 
 #include <algorithm>
+#include <iterator>
 
 namespace Device {
 namespace {
@@ -49,7 +50,8 @@ constexpr Keyword kKeywords[] = {
 std::span<const Keyword> Keywords() { return kKeywords; }
 
 std::optional<std::size_t> FindKeyword(std::string_view name) {
-  const auto found = std::ranges::find(kKeywords, name, &Keyword::name);
+  const auto found = std::find_if(std::begin(kKeywords), std::end(kKeywords),
+                                  [name](const Keyword& keyword) { return keyword.name == name; });
   if (found == std::end(kKeywords)) return std::nullopt;
   return static_cast<std::size_t>(found - std::begin(kKeywords));
 }

@@ -29,6 +29,8 @@ PM_PIC::PM_PIC(const Port::StringBase& partName, bool isPartName, PM_PARTNAME_BI
   }
 }
 
+PM_PIC::PM_PIC(std::unique_ptr<Data> data) : data_(std::move(data)) {}
+
 PM_PIC::~PM_PIC() = default;
 
 bool PM_PIC::fill_defaults() {
