@@ -42,17 +42,17 @@ enum class FindingKind {
 
 struct Finding {
   FindingKind kind;
-  std::optional<Primitive> primitive;
+  std::optional<Primitive> primitive = {};
   Quantity quantity = Quantity::kNone;
   int output = -1;  // the index in the request; -1: none
   int input = 0;    // 0 or 1
   Rational value = 0;
   Range range{0, 0};
-  std::string pin;           // of a KRU: whose range it is
+  std::string pin = {};      // of a KRU: whose range it is
   bool feedback_2x = false;  // and that it is the one with feedback from CLK2X
-  std::vector<int> outputs;
-  std::vector<Rational> numbers;
-  std::string text;  // words of others: the engine, the calculator
+  std::vector<int> outputs = {};
+  std::vector<Rational> numbers = {};
+  std::string text = {};  // words of others: the engine, the calculator
 };
 
 }  // namespace planner

@@ -41,8 +41,8 @@ Rational WorstError(const Request& request, const Output& output, const Errors& 
 // said, the jitter is not known (kUnknownJitter of Jitter.h).
 Rational JitterError(const Request& request, const Output& output, double jitter);
 
-// Whether all demands of a used output are met, and those but for the jitter. An unknown jitter
-// does not meet a demand.
+// Whether all demands of a used output but that for the jitter are met; and that one. An unknown
+// jitter does not meet it.
 bool AreMet(const Request& request, const Output& output, const Errors& errors);
 bool IsJitterMet(const Request& request, const Output& output, double jitter);
 

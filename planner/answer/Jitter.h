@@ -12,9 +12,9 @@
 #ifndef VORKEL_PLANNER_ANSWER_JITTER_H_
 #define VORKEL_PLANNER_ANSWER_JITTER_H_
 
+#include <array>
 #include <limits>
 #include <optional>
-#include <string>
 
 #include "hardware/Kru.h"
 #include "host/bundled/calculator/Coefficients.h"
@@ -35,14 +35,15 @@ class LoopJitter {
   LoopJitter(const std::optional<Calculator::LoopCoefficients>& coefficients, double input,
              double input_jitter);
 
-  // Whether there are figures: the device has coefficients, and the model holds for the input.
-  bool IsKnown() const { return coefficients_.has_value(); }
+  // Whether the jitter is known: the device has coefficients, and the model holds for the input.
+  bool IsKnown() const { return is_known_; }
 
   // M in eighths. That of settings whose VCO and PFD are in the device's ranges; kUnknownJitter
   // when nothing is known.
   double PeakToPeak(int m_eighths, int d, Bandwidth bandwidth) const;
   double Rms(int m_eighths, int d, Bandwidth bandwidth) const;
-  // The largest distance between the edges of input and feedback, ps.
+  // The largest distance between the edges of input and feedback, ps, of a device that has
+  // coefficients.
   double PhaseError(int d, Bandwidth bandwidth) const;
 
   // Whether, with the same bandwidth, the jitter falls when M / D^2 rises: the product of VCO and
@@ -54,6 +55,7 @@ class LoopJitter {
 
  private:
   std::optional<Calculator::LoopCoefficients> coefficients_;
+  bool is_known_;
   double input_;
   double input_jitter_;
 };
@@ -65,21 +67,28 @@ class KruJitter {
   // `primitive` is that of the device whose pins are asked for.
   KruJitter(const Device& device, const Request& request, Primitive primitive);
 
-  bool IsKnown() const { return coefficients_.has_value(); }
+  // Whether that of any pin is known: as for LoopJitter.
+  bool IsKnown() const { return is_known_; }
 
   // That of a pin, which is not kNone; kUnknownJitter when it is not known: there are no
   // coefficients, or the model does not hold for the frequency of the pin or, for CLKDV, of the
   // delay line. CLKFXDV has that of CLKFX, as a divider moves no edge.
   double PeakToPeak(const KruSettings& settings, hardware::Pin pin) const;
   double Rms(const KruSettings& settings, hardware::Pin pin) const;
+  // Of a device that has coefficients.
   double PhaseError() const;
 
  private:
+  // MHz; empty for a pin that the device does not have.
+  struct Span {
+    double lowest = 1.0;
+    double highest = 0.0;
+  };
   bool Holds(const KruSettings& settings, hardware::Pin pin) const;
 
   std::optional<Calculator::KruCoefficients> coefficients_;
-  const Device& device_;
-  Primitive primitive_;
+  bool is_known_ = false;
+  std::array<Span, hardware::kPins.size() + 1> spans_;  // by the code of the pin
   double input_;
   double input_jitter_;
 };

@@ -56,11 +56,16 @@ double PinFrequency(const KruPin& pin, const KruSettings& settings) {
   return line;
 }
 
-double KruPkToPkJitter(const KruCoefficients& coefficients, const KruPin& pin,
-                       const KruSettings& settings) {
+double KruRmsJitter(const KruCoefficients& coefficients, const KruPin& pin,
+                    const KruSettings& settings) {
   const double variance = LineVariance(coefficients, pin, settings) +
                           Buffers(settings) * Square(coefficients.buffer_jitter);
-  return kPeakToPeakPerRms * std::sqrt(variance) +
+  return std::sqrt(variance);
+}
+
+double KruPkToPkJitter(const KruCoefficients& coefficients, const KruPin& pin,
+                       const KruSettings& settings) {
+  return kPeakToPeakPerRms * KruRmsJitter(coefficients, pin, settings) +
          TapSettings(pin, settings) * coefficients.tap_step;
 }
 

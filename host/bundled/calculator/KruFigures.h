@@ -35,7 +35,11 @@ double LineFrequency(const KruSettings& settings);
 // The frequency of a pin, MHz.
 double PinFrequency(const KruPin& pin, const KruSettings& settings);
 
-// The jitter, ps peak to peak, that the KRU adds to that of its input, which passes through.
+// The random jitter, ps rms, that the KRU adds to that of its input, which passes through.
+double KruRmsJitter(const KruCoefficients& coefficients, const KruPin& pin,
+                    const KruSettings& settings);
+
+// The jitter, ps peak to peak, that it adds: that of the random part, and the taps.
 double KruPkToPkJitter(const KruCoefficients& coefficients, const KruPin& pin,
                        const KruSettings& settings);
 

@@ -7,13 +7,19 @@
 
 namespace Calculator {
 
-double LoopPkToPkJitter(const LoopCoefficients& coefficients, const Loop& loop,
-                        double input_jitter) {
+double LoopRmsJitter(const LoopCoefficients& coefficients, const Loop& loop,
+                     double input_jitter) {
   const double fraction = BandwidthFraction(coefficients, loop.bandwidth);
   const double oscillator = OscillatorJitter(KappaAt(coefficients, loop.vco), fraction * loop.pfd);
   const double input = FilteredInputJitter(input_jitter / kPeakToPeakPerRms, fraction);
   const double variance = Square(oscillator) + Square(input) + Square(coefficients.buffer_jitter);
-  return kPeakToPeakPerRms * std::sqrt(variance) + coefficients.deterministic_jitter;
+  return std::sqrt(variance);
+}
+
+double LoopPkToPkJitter(const LoopCoefficients& coefficients, const Loop& loop,
+                        double input_jitter) {
+  return kPeakToPeakPerRms * LoopRmsJitter(coefficients, loop, input_jitter) +
+         coefficients.deterministic_jitter;
 }
 
 // The current of the pump sets the bandwidth of the loop and so is in proportion to it. Millionths

@@ -16,10 +16,12 @@ struct Loop {
   Bandwidth bandwidth;
 };
 
-// Peak-to-peak jitter, ps, with an input jitter in ps peak to peak: the noise of the oscillator,
-// of the input and of the buffers, which are independent and add as variances, and the
-// deterministic part. An output divider passes on edges of the VCO and leaves their jitter as
-// it is, so it is no argument.
+// The random jitter, ps rms, with an input jitter in ps peak to peak: the noise of the oscillator,
+// of the input and of the buffers, which are independent and add as variances. An output divider
+// passes on edges of the VCO and leaves their jitter as it is, so it is no argument.
+double LoopRmsJitter(const LoopCoefficients& coefficients, const Loop& loop, double input_jitter);
+
+// Peak-to-peak jitter, ps: that of the random part, and the deterministic part.
 double LoopPkToPkJitter(const LoopCoefficients& coefficients, const Loop& loop,
                         double input_jitter);
 
