@@ -151,7 +151,7 @@ proc ::vorkel::explain_advice::Unmoved {request primitives index} {
   set able [lmap primitive [::vorkel::engine::ofFamily Loop $primitives] {
     if {[::vorkel::answer::refusal $changed $primitive] ne "" ||
         ![::vorkel::explain_vcos::isFractional $changed $primitive] ||
-        [::vorkel::explain_nearest::isLate] ||
+        [::vorkel::explain_nearest::isSpent] ||
         [::vorkel::explain_nearest::proof $changed $primitive] ne ""} continue
     set best [lindex [::vorkel::grid::best $changed $primitive] 0]
     if {$best eq "" || ![dict get $best within]} continue

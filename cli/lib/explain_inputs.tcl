@@ -101,7 +101,7 @@ proc ::vorkel::explain_inputs::Second {request primitive} {
     lappend rows [list [expr {abs($nearest - $second)}] [::vorkel::numbers::short $nearest 6]]
   }
   foreach row [lrange [lsort -unique -real -index 0 $rows] 0 $most_tried-1] {
-    if {[::vorkel::explain_nearest::isLate]} break
+    if {[::vorkel::explain_nearest::isSpent]} break
     set near [lindex $row 1]
     if {[::vorkel::explain_nearest::proof [dict replace $request inputs [list $first $near]] \
         $primitive] ne ""} {

@@ -34,10 +34,11 @@ namespace eval ::vorkel::explain_nearest {
   # As many requests with all outputs moved are tried, and as many told.
   variable most_sets_tried 12
   variable most_sets 2
-  # The time for all of it, ms, and when it ends. `stopped` tells that something has not been
-  # searched to its end.
-  variable budget 1500
-  variable deadline 0
+  # As many runs of the engine are made for all of it, and how many there have been. Runs are
+  # counted and not the time, so that the answer is the same on every machine. `stopped` tells that
+  # something has not been searched to its end.
+  variable most_runs 4000
+  variable runs 0
   variable stopped 0
   # The input clock can be a quotient with a divisor of up to this, such as 100/3 MHz or 7 ns.
   variable largest_divisor 100
@@ -48,22 +49,22 @@ namespace eval ::vorkel::explain_nearest {
   variable passed {}
 }
 
-# Begins the time for the search.
+# Begins to count the runs of the search.
 proc ::vorkel::explain_nearest::start {} {
-  variable budget
-  variable deadline
+  variable runs
   variable stopped
   variable passed
-  set deadline [expr {[clock milliseconds] + $budget}]
+  set runs 0
   set stopped 0
   set passed {}
 }
 
-# Whether the time has run out.
-proc ::vorkel::explain_nearest::isLate {} {
-  variable deadline
+# Whether all runs have been made.
+proc ::vorkel::explain_nearest::isSpent {} {
+  variable most_runs
+  variable runs
   variable stopped
-  if {[clock milliseconds] <= $deadline} {
+  if {$runs < $most_runs} {
     return 0
   }
   set stopped 1
@@ -74,6 +75,7 @@ proc ::vorkel::explain_nearest::isLate {} {
 # which the user can ask for, has another range of the PFD; it is tried where it is left open and
 # the engine has an answer, which is off.
 proc ::vorkel::explain_nearest::proof {request primitive} {
+  variable runs
   set widths [list [dict get $request bandwidth]]
   if {[::vorkel::engine::family $primitive] eq "Loop" &&
       ![dict get $request bandwidthAsked]} {
@@ -84,6 +86,7 @@ proc ::vorkel::explain_nearest::proof {request primitive} {
     set solved 0
     dict set request bandwidth $width
     foreach variant [::vorkel::answer::variants $request $primitive] {
+      incr runs
       set answer [::vorkel::answer::solve $request $primitive $variant]
       if {[dict get $answer within]} {
         return $answer
@@ -158,7 +161,7 @@ proc ::vorkel::explain_nearest::Working {request primitive index side count} {
   variable most_tried
   variable stopped
   variable passed
-  if {[isLate] || [::vorkel::answer::refusal $request $primitive] ne ""} {
+  if {[isSpent] || [::vorkel::answer::refusal $request $primitive] ne ""} {
     return {}
   }
   set input [lindex [dict get $request inputs] 0]
@@ -168,7 +171,7 @@ proc ::vorkel::explain_nearest::Working {request primitive index side count} {
   set tried 0
   while {[llength $told] < $count &&
       [set rung [::vorkel::explain_ladder::next search]] ne ""} {
-    if {[isLate]} break
+    if {[isSpent]} break
     if {[incr tried] > $most_tried} {
       set stopped 1
       break
@@ -197,7 +200,7 @@ proc ::vorkel::explain_nearest::with {request index what value} {
 # Those of some primitives that do what is asked. Of some it is `known`.
 proc ::vorkel::explain_nearest::Makers {request primitives known} {
   return [lmap primitive $primitives {
-    if {$primitive ni $known && ([isLate] || ![couldMake $request $primitive] ||
+    if {$primitive ni $known && ([isSpent] || ![couldMake $request $primitive] ||
         [proof $request $primitive] eq "")} continue
     set primitive
   }]
@@ -233,7 +236,7 @@ proc ::vorkel::explain_nearest::sets {request primitives} {
   set told [dict create]
   foreach candidate [lrange [lsort -real -index 0 $candidates] 0 $most_sets_tried-1] {
     lassign $candidate ppm texts primitive
-    if {[dict size $told] >= $most_sets || [isLate]} break
+    if {[dict size $told] >= $most_sets || [isSpent]} break
     if {[dict exists $told $texts]} continue
     set outputs [lmap output [dict get $request outputs] text $texts {
       dict replace $output freq [::vorkel::units::value $text frequency nearest]
@@ -249,7 +252,7 @@ proc ::vorkel::explain_nearest::sets {request primitives} {
 # The same of what settings of the grid make, of which best is asked whether it finds them; "" when
 # it does not, or when nothing is to be moved. `answer` is what the grid has for the request, or "".
 proc ::vorkel::explain_nearest::gridSet {request answer} {
-  if {$answer eq "" || [isLate]} {
+  if {$answer eq "" || [isSpent]} {
     return ""
   }
   set primitive [dict get $answer primitive]
@@ -319,7 +322,7 @@ proc ::vorkel::explain_nearest::oscillators {request primitives texts} {
   dict set request tolerance 0
   set told {}
   foreach text $texts {
-    if {[isLate]} break
+    if {[isSpent]} break
     set plain [plainMHz [::vorkel::units::value $text frequency --oscillators]]
     set input [::vorkel::units::value $plain frequency --oscillators]
     set changed [dict replace $request inputs [lreplace [dict get $request inputs] 0 0 $input]]

@@ -57,7 +57,7 @@ proc ::vorkel::explain_steps::First {request primitive index what values} {
     set ::vorkel::explain_nearest::stopped 1
   }
   foreach value [lrange $values 0 $most-1] {
-    if {[::vorkel::explain_nearest::isLate]} break
+    if {[::vorkel::explain_nearest::isSpent]} break
     set changed [::vorkel::explain_nearest::with $request $index $what $value]
     if {[::vorkel::explain_nearest::proof $changed $primitive] ne ""} {
       return $value

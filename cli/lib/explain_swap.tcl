@@ -48,7 +48,7 @@ proc ::vorkel::explain_swap::Working {request primitive} {
   for {set one 0} {$one <= $last_other} {incr one} {
     for {set other [expr {$one + 1}]} {$other < $count} {incr other} {
       set swapped [Swapped $request [list $one $other]]
-      if {[::vorkel::explain_nearest::isLate]} {
+      if {[::vorkel::explain_nearest::isSpent]} {
         return ""
       }
       if {$swapped ne $request && [::vorkel::explain_nearest::couldMake $swapped $primitive] &&
