@@ -3,17 +3,14 @@
 #define VORKEL_ENGINE_MESSAGES_H_
 
 #include <memory>
-#include <source_location>
 
 #include "host/Port_MsgManData.h"
 
 namespace Ip {
 
 // A message object that names the calling statement; its issueError issues the message.
-inline std::unique_ptr<Port_MsgManData> Message(
-    std::source_location where = std::source_location::current()) {
-  return Port_MsgManData::createObject("DesignEntry", "../s/Ip_VorkelImp",
-                                       static_cast<int>(where.line()), "Ip_vorkel 1.1");
+inline std::unique_ptr<Port_MsgManData> Message(int line = __builtin_LINE()) {
+  return Port_MsgManData::createObject("DesignEntry", "../s/Ip_VorkelImp", line, "Ip_vorkel 1.1");
 }
 
 }  // namespace Ip

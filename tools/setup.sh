@@ -29,13 +29,14 @@ fail() {
 
 # --- Debian packages ---------------------------------------------------------------------
 
-# Prints the Debian packages that a job needs: `packages_for program|tests|benchmarks`.
+# Prints the Debian packages that a job needs: `packages_for program|tests|benchmarks|libcxx`.
 packages_for() {
   printf '%s\n' g++ cmake ninja-build tcl8.6 tcl8.6-dev tcllib libtomlplusplus-dev \
     libboost-dev libcli11-dev libfmt-dev nlohmann-json3-dev
   case $1 in
     tests) printf '%s\n' libgtest-dev libgmock-dev ;;
     benchmarks) printf '%s\n' libbenchmark-dev ;;
+    libcxx) printf '%s\n' clang-14 libc++-14-dev libc++abi-14-dev ;;
   esac
 }
 
@@ -49,7 +50,7 @@ missing_packages() {
   done
 }
 
-# Installs what a job lacks: `install_packages program|tests|benchmarks`. Ends the script when
+# Installs what a job lacks: `install_packages program|tests|benchmarks|libcxx`. Ends the script when
 # that cannot be done. On a system without dpkg the tools are taken as they are, and CMake
 # says what it lacks.
 install_packages() {

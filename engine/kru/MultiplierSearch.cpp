@@ -10,6 +10,7 @@
 
 #include "engine/Numbers.h"
 #include "engine/kru/Stages.h"
+#include "hardware/Kru.h"
 
 namespace Ip::Kru {
 
@@ -18,6 +19,9 @@ namespace {
 constexpr int kSmallestM = 2;
 constexpr int kLargestM = 32;
 constexpr int kLargestD = 32;
+static_assert(kSmallestM == hardware::kSmallestKruM);
+static_assert(kLargestM == hardware::LargestKruRatioPart(hardware::Primitive::kKruSp) &&
+              kLargestD == kLargestM);
 constexpr double kSeedTolerance = 0.0005;    // of D; exclusive
 constexpr double kFilterTolerance = 0.0001;  // of D; inclusive
 

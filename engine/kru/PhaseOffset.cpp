@@ -11,6 +11,7 @@
 
 #include "engine/Numbers.h"
 #include "engine/kru/Stages.h"
+#include "hardware/Kru.h"
 
 namespace Ip::Kru {
 
@@ -18,6 +19,8 @@ namespace {
 
 constexpr double kPhaseShiftSteps = 255.0;  // in a full turn, as this engine counts them
 constexpr int kLargestPhaseShift = 255;
+static_assert(kPhaseShiftSteps == hardware::kShiftSteps &&
+              kLargestPhaseShift == hardware::kShiftSteps);
 
 // A requested phase against the fixed phases. What no rule covers is 0.
 struct Split {

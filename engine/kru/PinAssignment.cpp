@@ -6,10 +6,12 @@
 //
 // Tested by kru_pin_assignment_test.cpp.
 
+#include <algorithm>
 #include <iterator>
 #include <span>
 
 #include "engine/kru/Stages.h"
+#include "hardware/Kru.h"
 
 namespace Ip::Kru {
 
@@ -21,7 +23,9 @@ constexpr double kFrequencyTolerance = 0.001;  // MHz
 // there is a 17; both are meant so.
 constexpr double kClkdvValues[] = {2.0, 2.5, 3.0, 3.5, 4.0, 4.5, 5.0,  5.5,  6.0,  6.5,  7.0,
                                    7.5, 8.0, 9.0, 10.0, 11.0, 12.0, 13.0, 14.0, 15.0, 16.0, 17.0};
-static_assert(std::size(kClkdvValues) == 22);
+static_assert(std::equal(std::begin(kClkdvValues), std::end(kClkdvValues),
+                         hardware::kClkdvHalves.begin(), hardware::kClkdvHalves.end(),
+                         [](double divide, int halves) { return 2.0 * divide == halves; }));
 
 // Output 0 on CLK2X takes the feedback from there, and the maxima of the list's other outputs
 // are then those of the 2X feedback.

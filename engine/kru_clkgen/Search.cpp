@@ -5,12 +5,14 @@
 
 #include "engine/kru_clkgen/Search.h"
 
+#include <algorithm>
 #include <array>
 #include <bitset>
 #include <cmath>
 
 #include "engine/Numbers.h"
 #include "engine/kru/Stages.h"
+#include "hardware/Kru.h"
 
 namespace Ip::KruClkgen {
 
@@ -24,6 +26,12 @@ constexpr int kLargestM = 256;
 constexpr int kLargestD = 256;
 constexpr double kTolerance = 0.0001;  // of D, and of an output frequency in MHz
 constexpr int kDvValues[] = {2, 4, 8, 16, 32};
+static_assert(kSmallestM == hardware::kSmallestKruM);
+static_assert(kLargestM == hardware::LargestKruRatioPart(hardware::Primitive::kKruClkgen) &&
+              kLargestD == kLargestM);
+static_assert(std::equal(std::begin(kDvValues), std::end(kDvValues),
+                         hardware::kClkfxdvHalves.begin(), hardware::kClkfxdvHalves.end(),
+                         [](int divide, int halves) { return 2 * divide == halves; }));
 
 // The D and DV of one M; D is 0 where there is no pair, DV 0 as long as no output needs one.
 struct Pair {

@@ -9,6 +9,7 @@
 
 #include "engine/Numbers.h"
 #include "engine/pll/Stages.h"
+#include "hardware/Loop.h"
 
 namespace Ip::Pll {
 
@@ -17,6 +18,12 @@ namespace {
 constexpr int kTrials = 498;  // fractional steps from 1 to 64: 1, 2 and then 62 x 8
 constexpr double kIntegerStep = 1.0;
 constexpr double kFractionalStep = 0.125;
+
+// What the search counts with is what the hardware has.
+static_assert(kLargestM == hardware::kLargestM);
+static_assert(kTsynGapEnd == hardware::kSmallestTsynM);
+static_assert(kDBelow == hardware::kLargestD + 0.5);
+static_assert(kFractionalStep * hardware::kEighths == 1.0);
 
 }  // namespace
 

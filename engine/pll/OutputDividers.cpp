@@ -15,12 +15,14 @@
 
 #include "engine/Numbers.h"
 #include "engine/pll/Stages.h"
+#include "hardware/Loop.h"
 
 namespace Ip::Pll {
 
 namespace {
 
 constexpr double kSmallestDivider = 1.0;
+static_assert(kLargestDivider == hardware::kLargestDivider);
 constexpr double kToleranceStep = 0.01;  // a fraction of the requested frequency
 
 // The tolerances, and the one that comes after the last.

@@ -2,30 +2,85 @@
 
 #include <gtest/gtest.h>
 
+#include <cmath>
 #include <cstdint>
 #include <limits>
 #include <optional>
+#include <random>
 #include <stdexcept>
 
 namespace hardware {
 namespace {
 
+constexpr std::int64_t kMost = std::numeric_limits<std::int64_t>::max();
+constexpr std::int64_t kLeast = std::numeric_limits<std::int64_t>::min();
+
 TEST(Rational, IsKeptInLowestTerms) {
   const Rational value(-6, -4);
   EXPECT_EQ(value.NumeratorText(), "3");
   EXPECT_EQ(value.DenominatorText(), "2");
+  EXPECT_EQ(Rational(6, -4).NumeratorText(), "-3");
+  EXPECT_EQ(Rational(0, -5).DenominatorText(), "1");
+}
+
+TEST(Rational, RefusesToDivideByZero) {
   EXPECT_THROW(Rational(1, 0), std::domain_error);
+  EXPECT_THROW(Rational(1) / Rational(0), std::domain_error);
+  const Rational large = Rational(kMost) * kMost;
+  EXPECT_THROW(large / Rational(0), std::domain_error);
 }
 
 TEST(Rational, CountsBeyondTwoWords) {
-  const Rational most = std::numeric_limits<std::int64_t>::max();
-  const Rational square = most * most;
+  const Rational square = Rational(kMost) * kMost;
   EXPECT_EQ(square.NumeratorText(), "85070591730234615847396907784232501249");
-  EXPECT_EQ(square / most, most);
+  EXPECT_EQ(square / kMost, Rational(kMost));
   EXPECT_EQ((square + 1) - square, Rational(1));
-  const Rational least = std::numeric_limits<std::int64_t>::min();
+  EXPECT_EQ(-(-square), square);
+  EXPECT_EQ((Rational(1) / square).DenominatorText(), "85070591730234615847396907784232501249");
+  EXPECT_EQ(Rational(1) / square * square, Rational(1));
+}
+
+TEST(Rational, HasTheLeastWordToo) {
+  const Rational least = kLeast;
+  EXPECT_EQ(least.NumeratorText(), "-9223372036854775808");
   EXPECT_EQ((-least).NumeratorText(), "9223372036854775808");
   EXPECT_EQ(-(-least), least);
+  EXPECT_EQ((Rational(1) / least).DenominatorText(), "9223372036854775808");
+  EXPECT_EQ(Rational(kLeast, kLeast), Rational(1));
+  EXPECT_EQ(least.Absolute() - 1, Rational(kMost));
+}
+
+TEST(Rational, IsOrderedByValue) {
+  EXPECT_LT(Rational(1, 3), Rational(34, 100));
+  EXPECT_GT(Rational(-1, 3), Rational(-34, 100));
+  const Rational square = Rational(kMost) * kMost;
+  EXPECT_LT(square, square + Rational(1, 7));
+  EXPECT_LT(-square, Rational(0));
+  EXPECT_LT(Rational(kMost - 1, kMost), Rational(kMost, kMost - 1));
+}
+
+TEST(Rational, ReadsDecimals) {
+  EXPECT_EQ(Rational::FromDecimal("187617", -3), Rational(187617, 1000));
+  EXPECT_EQ(Rational::FromDecimal("0005", 2), Rational(500));
+  EXPECT_EQ(Rational::FromDecimal("0", -30), Rational(0));
+  const Rational tiny = Rational::FromDecimal("1", -30);
+  EXPECT_GT(tiny, Rational(0));
+  EXPECT_EQ(tiny * Rational::FromDecimal("1", 30), Rational(1));
+}
+
+TEST(Rational, FloorAndRound) {
+  EXPECT_EQ(Rational(7, 2).Floor(), Rational(3));
+  EXPECT_EQ(Rational(-7, 2).Floor(), Rational(-4));
+  EXPECT_EQ(Rational(-4).Floor(), Rational(-4));
+  EXPECT_EQ(Rational(7, 2).Round(), Rational(4));
+  EXPECT_EQ(Rational(-7, 2).Round(), Rational(-3));  // the larger of two
+  const Rational large = Rational(kMost) * kMost;
+  EXPECT_EQ((large + Rational(1, 2)).Floor(), large);
+  EXPECT_EQ((-large - Rational(1, 2)).Floor(), -large - 1);
+  EXPECT_EQ(Rational(7).Whole(), 7);
+  EXPECT_EQ(Rational(7, 2).Whole(), std::nullopt);
+  EXPECT_EQ(large.Whole(), std::nullopt);
+  EXPECT_TRUE(large.IsWhole());
 }
 
 TEST(Rational, TellsItsWordsWhereItFits) {
@@ -42,6 +97,89 @@ TEST(Rational, RoundsOnceWhenShown) {
   EXPECT_EQ(Rational(-1, 2).Fixed(0), "-1");
   EXPECT_EQ(Rational(-1, 3000).Fixed(3), "0.000");
   EXPECT_EQ(Rational(12345, 10).Fixed(0), "1235");
+  EXPECT_EQ(Rational(-5, 1000).Fixed(2), "-0.01");
+  EXPECT_EQ(Rational(27).Fixed(6), "27.000000");
+}
+
+// A double is its own value exactly.
+TEST(Rational, TakesDoublesAsTheyAre) {
+  std::mt19937_64 random(1);
+  for (int i = 0; i < 20000; ++i) {
+    const double value =
+        std::ldexp(static_cast<double>(random()), static_cast<int>(random() % 2000) - 1060);
+    if (!std::isfinite(value)) continue;
+    ASSERT_EQ(Rational::FromDouble(value).ToDouble(), value);
+    ASSERT_EQ(Rational::FromDouble(-value).ToDouble(), -value);
+  }
+  EXPECT_EQ(Rational::FromDouble(0.1).DenominatorText(), "36028797018963968");  // 2^55
+  EXPECT_EQ(Rational::FromDouble(std::numeric_limits<double>::denorm_min()).ToDouble(),
+            std::numeric_limits<double>::denorm_min());
+}
+
+TEST(Rational, GoesToTheNearestDouble) {
+  EXPECT_EQ(Rational(1, 3).ToDouble(), 1.0 / 3.0);
+  // Half-way between two doubles goes to the even one, and a little more to the other.
+  const Rational half = Rational(1) + Rational(1, std::int64_t{1} << 53);
+  EXPECT_EQ(half.ToDouble(), 1.0);
+  EXPECT_EQ((half + Rational::FromDecimal("1", -60)).ToDouble(), std::nextafter(1.0, 2.0));
+  EXPECT_EQ((half + Rational(1, std::int64_t{1} << 52)).ToDouble(), 1.0 + std::ldexp(1.0, -51));
+  const Rational huge = Rational::FromDecimal("1", 400);
+  EXPECT_EQ(huge.ToDouble(), std::numeric_limits<double>::max());
+  EXPECT_EQ((-huge).ToDouble(), -std::numeric_limits<double>::max());
+  EXPECT_EQ((Rational(1) / huge).ToDouble(), 0.0);
+}
+
+// Decimal texts of up to 25 digits read as strtod reads them.
+TEST(Rational, RoundsDecimalsAsTheLibraryDoes) {
+  std::mt19937_64 random(2);
+  for (int i = 0; i < 20000; ++i) {
+    std::string digits;
+    const auto count = 1 + random() % 25;
+    for (std::uint64_t n = 0; n < count; ++n) {
+      digits += static_cast<char>('0' + random() % 10);
+    }
+    const int exponent = static_cast<int>(random() % 60) - 40;
+    const std::string text = digits + "e" + std::to_string(exponent);
+    ASSERT_EQ(Rational::FromDecimal(digits, exponent).ToDouble(),
+              std::strtod(text.c_str(), nullptr))
+        << text;
+  }
+}
+
+// Sums and products against those of wider words.
+TEST(Rational, CountsAlikeInBothForms) {
+  std::mt19937_64 random(3);
+  const Rational shift = Rational(kMost) * kMost;
+  for (int i = 0; i < 5000; ++i) {
+    const auto number = [&] {
+      return static_cast<std::int64_t>(random() >> (random() % 60 + 2)) - 1000;
+    };
+    const Rational a(number(), std::abs(number()) + 1);
+    const Rational b(number(), std::abs(number()) + 1);
+    // The same by way of numbers that do not fit into words.
+    ASSERT_EQ(a + b, ((a + shift) + (b + shift)) - shift - shift);
+    ASSERT_EQ(a * b, (a * shift) * (b * shift) / shift / shift);
+    ASSERT_EQ(a < b, a + shift < b + shift);
+  }
+}
+
+TEST(Angles, Turn) {
+  EXPECT_EQ(TurnedToHalf(-180), Rational(180));
+  EXPECT_EQ(TurnedToHalf(180), Rational(180));
+  EXPECT_EQ(TurnedToHalf(Rational(3601, 10)), Rational(1, 10));
+  EXPECT_EQ(TurnedToHalf(270), Rational(-90));
+  EXPECT_EQ(TurnedToFull(-30), Rational(330));
+  EXPECT_EQ(TurnedToFull(720), Rational(0));
+}
+
+TEST(Range, HasItsEnds) {
+  const Range range{400, 1080};
+  EXPECT_TRUE(range.Contains(400));
+  EXPECT_TRUE(range.Contains(1080));
+  const Rational little = Rational::FromDecimal("1", -30);
+  EXPECT_FALSE(range.Contains(Rational(400) - little));
+  EXPECT_FALSE(range.Contains(Rational(1080) + little));
+  EXPECT_FALSE((Range{2, 1}.Contains(Rational(3, 2))));
 }
 
 }  // namespace

@@ -196,11 +196,11 @@ TEST(KruArguments, DivideOfClkdv) {
   const auto divide = [](double value) {
     return AnyRefusal(Both(), kClkdv, [=](auto& of) { of.CheckDivide(value); });
   };
-  for (double value = 1.5; value <= 8; value += 0.5) EXPECT_EQ(divide(value), "accepted") << value;
+  for (double value = 2; value <= 8; value += 0.5) EXPECT_EQ(divide(value), "accepted") << value;
   for (double value = 9; value <= 17; ++value) EXPECT_EQ(divide(value), "accepted") << value;
-  for (const double value : {0.0, 1.0, 1.25, 8.5, 9.5, 18.0, 32.0, -2.0, kNan, kInfinity}) {
+  for (const double value : {0.0, 1.0, 1.25, 1.5, 8.5, 9.5, 18.0, 32.0, -2.0, kNan, kInfinity}) {
     EXPECT_EQ(divide(value), "CLKDV divide is " + Calculator::NumberText(value) +
-                                 ", but must be from 1.5 to 8 in steps of 0.5 or a whole number "
+                                 ", but must be from 2 to 8 in steps of 0.5 or a whole number "
                                  "from 9 to 17 for a KRU_SP.");
   }
 }
@@ -211,11 +211,11 @@ TEST(KruArguments, DivideThatThePinDoesNotNeed) {
   };
   for (const double value : {0.0, 2.5, 17.0}) EXPECT_EQ(divide(kClk0, value), "accepted") << value;
   EXPECT_EQ(divide(kClk0, 32),
-            "CLKDV divide is 32, but must be 0 (none), from 1.5 to 8 in steps of 0.5 or a whole "
+            "CLKDV divide is 32, but must be 0 (none), from 2 to 8 in steps of 0.5 or a whole "
             "number from 9 to 17 for a KRU_SP.");
   EXPECT_EQ(divide(kClkfx, 32), "accepted") << "that of a KRU_CLKGEN";
   EXPECT_EQ(divide(kClkfx, 64),
-            "CLKDV divide is 64, but must be 0 (none), from 1.5 to 8 in steps of 0.5 or a whole "
+            "CLKDV divide is 64, but must be 0 (none), from 2 to 8 in steps of 0.5 or a whole "
             "number from 9 to 17 for a KRU_SP, or 0 (none), 2, 4, 8, 16 or 32 for a KRU_CLKGEN.");
 }
 

@@ -5,6 +5,7 @@
 #include <cmath>
 
 #include "engine/timing/OutputSteps.h"
+#include "hardware/Loop.h"
 #include "host/bundled/calculator/LoopTiming.h"
 
 namespace {
@@ -31,14 +32,30 @@ TEST(PhaseOnStep, TakesTheLaterOfTwoEquallyNear) {
   EXPECT_EQ(PhaseOnStep(22.499, 1), 0.0);
 }
 
-TEST(PhaseOnStep, NegativeRequestsGoToTheFirstStepFromThem) {
-  EXPECT_EQ(PhaseOnStep(-100, 1), -90.0);
-  EXPECT_EQ(PhaseOnStep(-100, 4), -90.0);
+TEST(PhaseOnStep, NegativeRequestsGoToTheNearestStepToo) {
+  EXPECT_EQ(PhaseOnStep(-100, 1), -90.0);     // steps of 45
+  EXPECT_EQ(PhaseOnStep(-100, 4), -101.25);   // steps of 11.25
   EXPECT_EQ(PhaseOnStep(-90, 1), -90.0);
-  EXPECT_EQ(PhaseOnStep(-350, 1), -315.0);
+  EXPECT_EQ(PhaseOnStep(-350, 1), -360.0);
   EXPECT_EQ(PhaseOnStep(-360, 1), -360.0);
   EXPECT_EQ(PhaseOnStep(-20, 1), 0.0);
+  EXPECT_EQ(PhaseOnStep(-22.5, 1), 0.0);      // the later of two
+  EXPECT_EQ(PhaseOnStep(-22.501, 1), -45.0);
   EXPECT_EQ(PhaseOnStep(-1e-300, 1), 0.0);
+  EXPECT_FALSE(std::signbit(PhaseOnStep(-20, 1)));
+}
+
+// The model of the hardware has the same steps, exactly.
+TEST(PhaseOnStep, AgreesWithTheHardware) {
+  for (int divider = 1; divider <= 128; ++divider) {
+    for (int request = -360; request <= 360; ++request) {
+      const int eighths = divider * hardware::kEighths;
+      const int step = hardware::NearestPhaseStep(request, eighths);
+      ASSERT_NEAR(PhaseOnStep(request, divider), hardware::PhaseOfStep(step, eighths).ToDouble(),
+                  1e-9)
+          << request << " / " << divider;
+    }
+  }
 }
 
 TEST(PhaseOnStep, IsZeroForNoRequest) {
@@ -62,18 +79,15 @@ TEST(PhaseOnStep, KeepsEveryStepThatWasPrinted) {
   }
 }
 
-// Everywhere but within a step of a full cycle, where the solver's own rounding of a step makes
-// it leave out 360 degrees for some dividers, and beside a step by no more than what is printed.
+// The solver goes with a negative request to the first step that is not below it; a positive one
+// agrees everywhere but within a step of a full cycle, where the solver's own rounding of a step
+// makes it leave out 360 degrees for some dividers.
 TEST(PhaseOnStep, AgreesWithTheSolver) {
   int compared = 0;
   for (int divider = 1; divider <= 128; ++divider) {
     const double step = Ip::PhaseStep(divider);
-    for (double request = -359.963; request < 360.0; request += 0.737) {
-      const bool positive = request > 0;
-      const double beside = std::fmod(std::fabs(request), step);
-      if (!positive && std::min(beside, step - beside) < 0.001) continue;
-      if (positive ? request > 360.0 - step : request > -step) continue;
-      const double solver = Ip::NearestPhaseStep(request, step, positive);
+    for (double request = 0.037; request < 360.0 - step; request += 0.368) {
+      const double solver = Ip::NearestPhaseStep(request, step, true);
       ASSERT_NEAR(PhaseOnStep(request, divider), solver, 1e-9) << request << " / " << divider;
       ++compared;
     }

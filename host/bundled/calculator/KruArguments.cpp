@@ -1,10 +1,12 @@
 #include "host/bundled/calculator/KruArguments.h"
 
 #include <algorithm>
+#include <span>
 #include <string>
 #include <utility>
 #include <vector>
 
+#include "hardware/Kru.h"
 #include "host/bundled/calculator/Slack.h"
 
 namespace Calculator {
@@ -12,29 +14,32 @@ namespace {
 
 using Device::Primitive;
 
-constexpr double kLeastM = 2.0;
+constexpr double kLeastM = hardware::kSmallestKruM;
 constexpr double kLeastD = 1.0;
 
 // The largest M and the largest D.
 double LargestRatioPart(Primitive primitive) {
-  return primitive == Device::kKruClkgen ? 256.0 : 32.0;
+  return hardware::LargestKruRatioPart(primitive == Device::kKruClkgen
+                                           ? hardware::Primitive::kKruClkgen
+                                           : hardware::Primitive::kKruSp);
 }
 
-// The divides of CLKDV: halves at first, then whole numbers.
-bool IsClkdvDivide(double divide) {
-  return (IsWithin(divide, 1.5, 8.0) && IsMultiple(divide, 0.5)) || IsWhole(divide, 9.0, 17.0);
+bool IsOneOf(std::span<const int> halves, double divide) {
+  return std::any_of(halves.begin(), halves.end(),
+                     [divide](int one) { return one == 2.0 * divide; });
 }
 
-// Those of the CLKFXDV pin. The pin has no code, but a script may hand its divide on.
-bool IsClkfxdvDivide(double divide) {
-  constexpr double kDivides[] = {2.0, 4.0, 8.0, 16.0, 32.0};
-  return std::find(std::begin(kDivides), std::end(kDivides), divide) != std::end(kDivides);
+// The divides of CLKDV, or those of CLKFXDV: that pin has no code, but a script may hand its
+// divide on.
+bool IsDivide(Primitive primitive, double divide) {
+  return primitive == Device::kKruClkgen ? IsOneOf(hardware::kClkfxdvHalves, divide)
+                                         : IsOneOf(hardware::kClkdvHalves, divide);
 }
 
 std::string RangeOfDivide(Primitive primitive) {
   return primitive == Device::kKruClkgen
              ? "2, 4, 8, 16 or 32"
-             : "from 1.5 to 8 in steps of 0.5 or a whole number from 9 to 17";
+             : "from 2 to 8 in steps of 0.5 or a whole number from 9 to 17";
 }
 
 }  // namespace
@@ -105,9 +110,7 @@ void KruArguments::CheckDivide(double divide) {
   if (optional && divide == 0.0) return;
   candidates_.Keep(
       Statement("CLKDV divide", divide),
-      [=](Primitive primitive) {
-        return primitive == Device::kKruClkgen ? IsClkfxdvDivide(divide) : IsClkdvDivide(divide);
-      },
+      [=](Primitive primitive) { return IsDivide(primitive, divide); },
       [=](Primitive primitive) {
         return (optional ? "0 (none), " : "") + RangeOfDivide(primitive);
       });

@@ -5,6 +5,7 @@
 #include <utility>
 #include <vector>
 
+#include "hardware/Loop.h"
 #include "host/bundled/calculator/Slack.h"
 
 namespace Calculator {
@@ -12,14 +13,14 @@ namespace {
 
 using Device::Primitive;
 
-constexpr double kLargestM = 64.0;
-constexpr double kLargestD = 80.0;
-constexpr double kLargestDivider = 128.0;
+constexpr double kLargestM = hardware::kLargestM;
+constexpr double kLargestD = hardware::kLargestD;
+constexpr double kLargestDivider = hardware::kLargestDivider;
 
 // The TSYN counts in eighths, with gaps in front of these.
-constexpr double kEighth = 0.125;
-constexpr double kLeastFractionalM = 5.0;
-constexpr double kLeastFractionalDivider = 2.0;
+constexpr double kEighth = 1.0 / hardware::kEighths;
+constexpr double kLeastFractionalM = hardware::kSmallestTsynM;
+constexpr double kLeastFractionalDivider = hardware::kSmallestFractionalDivider;
 
 bool IsTsynValue(double value, double least, double largest) {
   return value == 1.0 || (IsWithin(value, least, largest) && IsMultiple(value, kEighth));

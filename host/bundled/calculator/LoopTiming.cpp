@@ -3,15 +3,14 @@
 #include <algorithm>
 #include <cmath>
 
+#include "hardware/Loop.h"
+
 namespace Calculator {
 namespace {
 
-constexpr double kVcoPhases = 8.0;
+constexpr double kVcoPhases = hardware::kEighths;
 constexpr double kFullCycle = 360.0;  // degrees
 constexpr double kHalf = 50.0;        // percent
-
-// Half the last decimal of a printed phase, degrees.
-constexpr double kPrintedPhase = 0.0005;
 
 }  // namespace
 
@@ -19,11 +18,8 @@ constexpr double kPrintedPhase = 0.0005;
 // that.
 double PhaseOnStep(double requested, double divider) {
   const double steps = divider * kVcoPhases;  // in a full cycle
-  if (requested >= 0.0) {
-    return std::floor(requested * steps / kFullCycle + 0.5) / steps * kFullCycle;
-  }
-  const double from = requested + kFullCycle - kPrintedPhase;
-  return std::ceil(from * steps / kFullCycle) / steps * kFullCycle - kFullCycle;
+  // Without the sign of a 0 from below.
+  return std::floor(requested * steps / kFullCycle + 0.5) / steps * kFullCycle + 0.0;
 }
 
 double DutyOnStep(double requested, double divider, double largest_count) {

@@ -7,10 +7,8 @@
 namespace Calculator {
 
 // The phase, in degrees, that an output divider makes of a requested one from -360 to 360. It
-// can start its output at any eighth of a VCO cycle. A positive request goes to the nearest
-// step, the later of two equally near; a negative one to the first step from it on, so that
-// the output is not earlier than requested. A request within half a thousandth of a degree of
-// a step means that step, since phases are printed with three decimals.
+// can start its output at any eighth of a VCO cycle. A request goes to the nearest step, the
+// later of two equally near, whatever its sign.
 double PhaseOnStep(double requested, double divider);
 
 // The duty cycle, in percent, that an output divider makes of a requested one from 0 to 100:

@@ -1,0 +1,1 @@
+#include "one/One.h"
