@@ -36,7 +36,7 @@ struct OutputAnswer {
 struct Source {
   bool engine = false;      // the design flow's own search answers them
   bool search = false;      // the search over all settings has found them
-  std::string variant;      // of the engine: "smallest VCO", "largest VCO", ...; empty else
+  std::string variant = {};  // of the engine: "smallest VCO", "largest VCO", ...; empty else
 };
 
 struct Answer {

@@ -32,7 +32,8 @@ enum class FindingKind {
   kNoJitter,           // no jitter of `outputs`, or of all when empty: text says why, or
                        // nothing when the device has no coefficients
   kNoPhaseError,       // no phase error: likewise
-  kMoved,              // any_order: outputs[i] tells which request stands at place i
+  kMoved,              // any_order: outputs[i] tells which output of the request stands at
+                       // place i; the whole answer goes by places (answer/Moved.h)
   // Why a primitive has no settings.
   kTooManyInputs,      // value of them, range.highest allowed
   kTooManyOutputs,

@@ -31,6 +31,7 @@ struct Output {
   std::optional<Rational> phase_tolerance;  // degrees
   std::optional<Rational> duty_tolerance;   // percent points
   std::optional<Rational> max_jitter;       // ps, peak to peak
+  bool operator==(const Output&) const = default;
 };
 
 struct Request {

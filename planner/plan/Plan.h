@@ -7,7 +7,6 @@
 #define VORKEL_PLANNER_PLAN_PLAN_H_
 
 #include <cstddef>
-#include <cstdint>
 #include <optional>
 #include <vector>
 
@@ -18,10 +17,10 @@
 
 namespace planner::plan {
 
+// Where a plan takes its answers from. request.engine_only is as if `search` were not set.
 struct Options {
-  // With any_order: how many orders of the outputs are tried for each primitive, at most. Seven
-  // outputs have 5040.
-  std::uint64_t most_orders = 5040;
+  bool engine = true;
+  bool search = true;
 };
 
 // Why the answer at place `first` of the ranking is before that at place `second`.
@@ -31,39 +30,49 @@ struct Reason {
   answer::Criterion decided = answer::Criterion::kNone;
 };
 
-// A limit on work that has kept something from being looked at.
-struct BoundWork {
-  Primitive primitive = Primitive::kPll;
-  std::uint64_t tried = 0;
-  std::uint64_t all = 0;
-};
-
 struct Plan {
   Request request;
-  // What is solved, the best first: the engine's answers, the first of the search for each
-  // bandwidth, and the one with the smallest error. The same settings are there once, with both
-  // flags of their source. Number N of a table of candidates is at place N - 1.
+
+  // What is solved, the best first: the engine's answers; of the search over all settings, for each
+  // primitive the first of each bandwidth and the one with the smallest error. The same settings
+  // are there once, with both flags of their source. Number N of a table of candidates is at place
+  // N - 1. With any_order an answer can have the outputs at other places than the request; it then
+  // goes by places (answer/Moved.h).
   std::vector<Answer> ranked;
-  // The trade-offs among all settings of all primitives (answer/Front.h).
+  // The trade-offs among all settings of all primitives (answer/Front.h); with engine_only among
+  // the engine's answers.
   Front front;
+
   // The primitives for which nothing is solved, each with its reasons, in their usual order.
   std::vector<Answer> refused;
+  // Those for which the engine finds nothing, although the search does.
+  std::vector<Answer> engine_refused;
+
   // Why the first is before the best of each other primitive that has one, in the order of these,
-  // and before the second of its own primitive.
+  // and before the next of its own primitive.
   std::vector<Reason> among_primitives;
   std::optional<Reason> among_own;
-  // Where a limit on work has bound: empty when everything was looked at.
-  std::vector<BoundWork> bound;
+
+  // Primitives some of whose trade-offs are left out, because there are more than the search keeps
+  // (search::kMostOfFront). All else is complete.
+  std::vector<Primitive> front_cut;
 
   bool IsSolved() const { return !ranked.empty(); }
   // Candidate `number`, from 1; null when there is none.
   const Answer* Pick(std::size_t number) const {
     return number >= 1 && number <= ranked.size() ? &ranked[number - 1] : nullptr;
   }
+  // The first of those that the engine answers; null when it answers none.
+  const Answer* FirstOfEngine() const {
+    for (const Answer& answer : ranked) {
+      if (answer.source.engine) return &answer;
+    }
+    return nullptr;
+  }
 };
 
-// Of all primitives of the device, or of request.primitive alone. With request.engine_only only
-// what the engine answers is there.
+// Of all primitives of the device, or of request.primitive alone. Throws std::invalid_argument when
+// the device does not have that one.
 Plan Make(const Request& request, const Device& device, const Options& options = {});
 
 }  // namespace planner::plan
