@@ -109,8 +109,17 @@ bool IsMissingFigure(const Finding& finding) {
   return finding.kind == FindingKind::kNoJitter || finding.kind == FindingKind::kNoPhaseError;
 }
 
+// Why there is no figure: in the words of the calculator, or because the device has nothing that
+// it could count with.
+string MissingReason(const Finding& finding, const Device& device) {
+  if (!finding.text.empty()) return finding.text;
+  const string has = device.part + " has no calculator coefficients";
+  if (!device.has_loop_jitter && !device.has_kru_jitter) return has;
+  return "Device " + has + (device.has_loop_jitter ? " for a KRU" : " for a PLL or TSYN");
+}
+
 // What figures there are not for a reason: "no jitter of output 1 and no phase error: ...".
-string MissingText(const std::vector<Finding>& same, int outputs) {
+string MissingText(const std::vector<Finding>& same, const Device& device, int outputs) {
   std::vector<string> missing;
   for (const Finding& finding : same) {
     if (finding.kind == FindingKind::kNoPhaseError) {
@@ -121,12 +130,12 @@ string MissingText(const std::vector<Finding>& same, int outputs) {
         finding.outputs.empty() || static_cast<int>(finding.outputs.size()) == outputs;
     missing.push_back(are_all ? "no jitter" : "no jitter of " + Outputs(finding.outputs));
   }
-  return Join(missing, " and ") + ": " + same.front().text;
+  return Join(missing, " and ") + ": " + MissingReason(same.front(), device);
 }
 
 }  // namespace
 
-string FindingText(const Finding& finding) {
+string FindingText(const Finding& finding, const Device& device) {
   switch (finding.kind) {
     case FindingKind::kOutsideLimit:
       return OutsideText(finding);
@@ -154,7 +163,7 @@ string FindingText(const Finding& finding) {
              " ps, which passes through a KRU";
     case FindingKind::kNoJitter:
     case FindingKind::kNoPhaseError:
-      return MissingText({finding}, -1);
+      return MissingText({finding}, device, -1);
     case FindingKind::kMoved:
       return MovedText(finding);
     case FindingKind::kTooManyInputs:
@@ -169,14 +178,15 @@ string FindingText(const Finding& finding) {
   return "no setting has everything in the device's ranges.";
 }
 
-std::vector<string> FindingTexts(const std::vector<Finding>& findings, int outputs) {
+std::vector<string> FindingTexts(const std::vector<Finding>& findings, const Device& device,
+                                 int outputs) {
   std::vector<string> texts;
   std::vector<bool> told(findings.size());
   for (std::size_t i = 0; i < findings.size(); ++i) {
     if (told[i]) continue;
     const Finding& first = findings[i];
     if (!IsMissingFigure(first) && first.kind != FindingKind::kOffTarget) {
-      texts.push_back(FindingText(first));
+      texts.push_back(FindingText(first, device));
       continue;
     }
     std::vector<Finding> same;
@@ -194,7 +204,7 @@ std::vector<string> FindingTexts(const std::vector<Finding>& findings, int outpu
       std::stable_sort(same.begin(), same.end(), [](const Finding& a, const Finding& b) {
         return a.kind == FindingKind::kNoJitter && b.kind != FindingKind::kNoJitter;
       });
-      texts.push_back(MissingText(same, outputs));
+      texts.push_back(MissingText(same, device, outputs));
     } else {
       texts.push_back(MissText(same));
     }
@@ -210,21 +220,21 @@ std::vector<string> MissTexts(const Answer& answer) {
   return texts;
 }
 
-std::vector<string> RemarkTexts(const Answer& answer) {
+std::vector<string> RemarkTexts(const Answer& answer, const Device& device) {
   std::vector<string> texts = MissTexts(answer);
   std::vector<Finding> rest = answer.violations;
   rest.insert(rest.end(), answer.notes.begin(), answer.notes.end());
   const auto used = std::count_if(answer.outputs.begin(), answer.outputs.end(),
                                   [](const OutputAnswer& output) { return output.used; });
-  for (string& text : FindingTexts(rest, static_cast<int>(used))) {
+  for (string& text : FindingTexts(rest, device, static_cast<int>(used))) {
     texts.push_back(std::move(text));
   }
   return texts;
 }
 
-string RefusalText(const Answer& answer) {
+string RefusalText(const Answer& answer, const Device& device) {
   std::vector<string> texts;
-  for (const Finding& refusal : answer.refusals) texts.push_back(FindingText(refusal));
+  for (const Finding& refusal : answer.refusals) texts.push_back(FindingText(refusal, device));
   return Join(texts, " ");
 }
 

@@ -6,26 +6,28 @@
 #include <vector>
 
 #include "planner/Answer.h"
+#include "planner/Device.h"
 #include "planner/Finding.h"
 
 namespace planner::report {
 
 // What a finding says, without a full stop at its end but where the sentence is the engine's.
-std::string FindingText(const Finding& finding);
+std::string FindingText(const Finding& finding, const Device& device);
 
 // All of them in their order. What belongs together is one sentence: the misses of an output, and
 // the figures that there are not for the same reason. `outputs` is how many outputs there are.
-std::vector<std::string> FindingTexts(const std::vector<Finding>& findings, int outputs);
+std::vector<std::string> FindingTexts(const std::vector<Finding>& findings, const Device& device,
+                                      int outputs);
 
 // What of the outputs of an answer is not as asked for, a sentence for each of them.
 std::vector<std::string> MissTexts(const Answer& answer);
 
 // All that a user should know about an answer: what is not as asked for, what is outside of the
 // device's limits, and the notes.
-std::vector<std::string> RemarkTexts(const Answer& answer);
+std::vector<std::string> RemarkTexts(const Answer& answer, const Device& device);
 
 // Why an answer is not solved.
-std::string RefusalText(const Answer& answer);
+std::string RefusalText(const Answer& answer, const Device& device);
 
 }  // namespace planner::report
 

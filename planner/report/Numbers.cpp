@@ -78,4 +78,17 @@ std::string Quotient(const Rational& value) {
   return text;
 }
 
+std::string Decimal(const Rational& value) {
+  // Decimals end where the denominator divides a power of ten: of its factors 2 and 5 none is there
+  // more often than it has digits to the base of 2.
+  Rational scaled = value;
+  int decimals = 0;
+  const auto most = static_cast<int>(value.DenominatorText().size()) * 4;
+  while (!scaled.IsWhole() && decimals < most) {
+    scaled *= 10;
+    ++decimals;
+  }
+  return scaled.IsWhole() ? value.Fixed(decimals) : Quotient(value);
+}
+
 }  // namespace planner::report

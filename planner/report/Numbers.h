@@ -38,6 +38,9 @@ std::string Eighths(int count);
 // Exactly, as "148" or "297/2".
 std::string Quotient(const Rational& value);
 
+// Exactly, in decimals where these end: "148.5"; else as Quotient has it: "100/3".
+std::string Decimal(const Rational& value);
+
 }  // namespace planner::report
 
 #endif  // VORKEL_PLANNER_REPORT_NUMBERS_H_

@@ -92,8 +92,9 @@ string Report::Outputs() const {
   if (has_jitter) columns.push_back({Align::kRight, "jitter ps"});
   const auto row_of = [&](std::size_t i) {
     const OutputAnswer& output = answer_.outputs[i];
-    Row row{{Place(answer_.settings, static_cast<int>(i)),
-             Fixed(request_.outputs[i].frequency, kFrequencyDecimals),
+    const auto place = static_cast<int>(i);
+    Row row{{Place(answer_.settings, place),
+             Fixed(RequestedAt(request_, answer_, place).frequency, kFrequencyDecimals),
              Fixed(output.frequency, kFrequencyDecimals), Fixed(output.error_ppm, 2)}};
     if (has_jitter) row.cells.push_back(output.jitter ? Ps(*output.jitter) : "-");
     return row;
@@ -144,7 +145,7 @@ string Report::Shapes() const {
     }
   }
   const auto row_of = [&](std::size_t i) {
-    const Output& asked = request_.outputs[i];
+    const Output& asked = RequestedAt(request_, answer_, static_cast<int>(i));
     const OutputAnswer& output = answer_.outputs[i];
     Row row;
     if (has_phases) AddAsked(asked.phase, output.phase, output.phase_error, &row);
@@ -157,9 +158,9 @@ string Report::Shapes() const {
 }
 
 // A blank line and a paragraph for each note, or nothing.
-string Notes(const Answer& answer, const Style& style) {
+string Notes(const Answer& answer, const Device& device, const Style& style) {
   string text;
-  for (const string& remark : RemarkTexts(answer)) {
+  for (const string& remark : RemarkTexts(answer, device)) {
     string prose = Prose(style, "note: ", remark);
     prose.pop_back();
     text += (text.empty() ? "\n" : "") + Paint(style, Role::kNote, prose) + "\n";
@@ -176,7 +177,7 @@ string ReportText(const Request& request, const Device& device, const Answer& an
   for (const string& table : {report.Second(), report.Shapes()}) {
     if (!table.empty()) text += "\n" + table;
   }
-  return text + Notes(answer, style);
+  return text + Notes(answer, device, style);
 }
 
 }  // namespace planner::report

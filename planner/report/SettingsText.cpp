@@ -54,7 +54,8 @@ string ShiftText(int shift) {
 }
 
 // Settings that no output uses are left out.
-Pairs KruPairs(const Request& request, const KruSettings& settings) {
+Pairs KruPairs(const Request& request, const Answer& answer) {
+  const auto& settings = std::get<KruSettings>(answer.settings);
   const bool is_sp = settings.primitive == Primitive::kKruSp;
   Pairs pairs = {{"input", Short(request.inputs[0], kFrequencyDecimals) + " MHz"}};
   if (is_sp) pairs.emplace_back("CLKIN_DIVIDE_BY_2", settings.divide_by_2 ? "true" : "false");
@@ -66,7 +67,7 @@ Pairs KruPairs(const Request& request, const KruSettings& settings) {
     pairs.emplace_back(is_sp ? "CLKDV" : "CLKFXDV", Short(Rational(settings.divide_halves, 2), 1));
   }
   if (is_sp) {
-    pairs.emplace_back("phase offset", Short(PhaseOffset(request, settings), 3) + " degrees");
+    pairs.emplace_back("phase offset", Short(PhaseOffset(request, answer), 3) + " degrees");
     pairs.emplace_back("PHASE_SHIFT", ShiftText(settings.phase_shift));
   }
   return pairs;
@@ -110,17 +111,29 @@ bool HasJitter(const Answer& answer) {
                      [](const OutputAnswer& output) { return output.jitter.has_value(); });
 }
 
+int RequestIndex(const Answer& answer, int place) {
+  for (const Finding& note : answer.notes) {
+    if (note.kind == FindingKind::kMoved) return note.outputs[static_cast<std::size_t>(place)];
+  }
+  return place;
+}
+
+const Output& RequestedAt(const Request& request, const Answer& answer, int place) {
+  return request.outputs[static_cast<std::size_t>(RequestIndex(answer, place))];
+}
+
 bool IsVcoOff(const Answer& answer) {
   return answer.searched_vco && std::abs(*answer.searched_vco - answer.vco.ToDouble()) > kVisible;
 }
 
-Rational PhaseOffset(const Request& request, const KruSettings& settings) {
+Rational PhaseOffset(const Request& request, const Answer& answer) {
+  const auto& settings = std::get<KruSettings>(answer.settings);
   if (settings.phase_shift == 0) return 0;
   const Rational made = Rational(settings.phase_shift) * 360 / hardware::kShiftSteps;
-  for (std::size_t i = 0; i < request.outputs.size(); ++i) {
-    const Output& output = request.outputs[i];
+  for (std::size_t place = 0; place < settings.pins.size(); ++place) {
+    const Output& output = RequestedAt(request, answer, static_cast<int>(place));
     if (!output.used || !output.phase) continue;
-    const int pin_phase = hardware::FactsOf(settings.pins[i]).phase;
+    const int pin_phase = hardware::FactsOf(settings.pins[place]).phase;
     // The turn of it that is nearest to what the shift makes.
     return made + hardware::TurnedToHalf(*output.phase - pin_phase - made);
   }
@@ -130,8 +143,8 @@ Rational PhaseOffset(const Request& request, const KruSettings& settings) {
 Pairs SettingsPairs(const Request& request, const Device& device, const Answer& answer) {
   Pairs pairs = {{"device", device.part + " " + string(Name(answer.primitive))}};
   const auto* loop = std::get_if<LoopSettings>(&answer.settings);
-  Pairs rest = loop != nullptr ? LoopPairs(request, answer, *loop)
-                               : KruPairs(request, std::get<KruSettings>(answer.settings));
+  Pairs rest =
+      loop != nullptr ? LoopPairs(request, answer, *loop) : KruPairs(request, answer);
   for (auto& pair : rest) pairs.push_back(std::move(pair));
   if (answer.phase_error) pairs.emplace_back("phase error", Ps(*answer.phase_error) + " ps");
   return pairs;

@@ -18,6 +18,11 @@ Pairs SettingsPairs(const Request& request, const Device& device, const Answer& 
 // Whether the jitter of some output is known.
 bool HasJitter(const Answer& answer);
 
+// Which output of the request stands at a place of an answer: another one than that place where
+// outputs were allowed to change places and have done so.
+int RequestIndex(const Answer& answer, int place);
+const Output& RequestedAt(const Request& request, const Answer& answer, int place);
+
 // Where an output is: its divider, or its pin.
 std::string Place(const Settings& settings, int output);
 
@@ -26,7 +31,7 @@ std::string SettingsWords(const Settings& settings);
 
 // The phase, degrees, that PHASE_SHIFT of a KRU_SP is to make: what the request asks for beyond
 // the phase of the pin, of the first output that asks for one. 0 without a PHASE_SHIFT.
-Rational PhaseOffset(const Request& request, const KruSettings& settings);
+Rational PhaseOffset(const Request& request, const Answer& answer);
 
 // Whether the engine has counted with a VCO that can be told from that of the settings.
 bool IsVcoOff(const Answer& answer);

@@ -15,8 +15,8 @@ struct Style {
 // Of an empty one there is no hint.
 struct Calls {
   std::string explain;
-  std::string compare;
-  std::string best;
+  std::string best;  // with the trade-offs
+  std::string pick;  // of one row of the ranking: "./vorkel plan ... --pick N"
 };
 
 }  // namespace planner::report
