@@ -14,11 +14,12 @@
 
 namespace planner::read {
 
-// What is said, and where.
+// What is said, where, and in which words; those of a file are not kept.
 template <typename T>
 struct Said {
   T value;
   Place place;
+  std::string text = {};
 };
 template <typename T>
 using Entry = std::optional<Said<T>>;

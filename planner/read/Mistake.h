@@ -40,10 +40,12 @@ struct Place {
 
 enum class MistakeKind {
   // One value. `text` is all of it.
-  kNotAValue,
-  kNumberTooLarge,   // other: the number
+  kNotAValue,        // hint: the same with a decimal point, when it has a decimal comma
+  kNumberTooLarge,   // text: the number
+  kNumberTooSmall,   // text: the number, which is not 0
+  kTooManyDigits,    // text: the number
   kDividesByZero,
-  kMustBe,           // what DemandOf(value_kind) says
+  kMustBe,           // demand
   kOutOfRange,       // of the kind of value
   kUnknownUnit,      // other: the unit
   kOtherUnit,        // other: a unit, such as mHz, that means something else than `hint`
@@ -52,23 +54,29 @@ enum class MistakeKind {
   kEmptyList,
   kBareBesideUnit,   // text: an entry without a unit; other: one with the unit `hint`
   kTooMany,          // count, most; primitive when it is that one's limit
-  kCountDiffers,     // count entries for `most` outputs
+  kCountDiffers,     // count entries for `most` outputs; hint: the outputs, when these have been
+                     // written with decimal commas, as `other`
   kNothingUsed,      // all outputs are "-"
   // Names and switches.
   kNotAName,         // text must be one of `known`
   kNotASwitch,       // text must be 1 or 0, true or false
-  kContradiction,    // `place` contradicts `other`, an option or entry with the value `text`
-  kOtherPrimitive,   // the request is for `primitive`, the command for a `known[0]`
+  kContradiction,    // with the option or entry `other`, whose value is `text`
+  kTwice,            // an option
+  kOtherPrimitive,   // the request is for a `text`, the command for a `primitive`
   // A request as a whole.
   kMissing,          // place.entry: what is not said, as an option; file: what does not say it
   kUnknownEntry,     // text; known: those there are
+  kUnknownOption,    // text; known: those there are
   // JSON and TOML.
-  kSyntax,           // other: what is wrong, in the words of SyntaxText; text: what stands there
+  kSyntax,           // fault; text: what stands there, empty: the end of the file
   kWrongType,        // other: the type that is there; known: those that may be
   kNoFrequency,      // an output without a frequency
   // Tcl.
   kScript            // text: the sentence of the script's interpreter
 };
+
+// What a number must be.
+enum class NumberDemand { kNone, kAboveZero, kNotNegative, kAtMostOneMs, kPercentage, kTurn };
 
 // How a JSON text is no JSON.
 enum class SyntaxFault {
@@ -79,7 +87,7 @@ enum class SyntaxFault {
   kCommaOrBracket,
   kCommaOrBrace,
   kMoreBehind,
-  kTwice,             // text: the name
+  kEntryTwice,        // text: the name
   kTextNotClosed,
   kNoEscape,
   kControlLetter,
@@ -92,6 +100,7 @@ struct Mistake {
   MistakeKind kind = MistakeKind::kNotAValue;
   Place place;
   ValueKind value_kind = ValueKind::kFrequency;
+  NumberDemand demand = NumberDemand::kNone;
   SyntaxFault fault = SyntaxFault::kNone;
   std::string text;   // as the user has written it
   std::string other;
