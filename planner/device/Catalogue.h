@@ -30,7 +30,7 @@ struct Part {
   std::string Name() const;
 };
 
-// What is wrong with a device file: the place, where there is one, and a sentence without it.
+// Why a device file cannot be read: the place, where there is one, and a sentence without it.
 struct FileComplaint {
   std::string device;
   std::string file;
@@ -38,6 +38,8 @@ struct FileComplaint {
   std::optional<unsigned> column;
   std::string reason;
 };
+
+FileComplaint ComplaintOf(std::string_view device, const ::Device::DeviceError& error);
 
 // Why a name stands for no part.
 class PartError : public std::exception {
@@ -47,7 +49,7 @@ class PartError : public std::exception {
     kUnknownPackage,  // `device` has no package `detail`; candidates: those that it has
     kUnknownGrade,    // likewise
     kNoDefaultGrade,  // the name has no grade and `device` no default; candidates: its grades
-    kAmbiguous,       // the beginning of several names: candidates
+    kAmbiguous,       // the beginning of several names, or several in other cases: candidates
     kBadFile,         // the file of the device that is meant, or may be: complaints
   };
 
@@ -60,7 +62,7 @@ class PartError : public std::exception {
   std::string detail;  // what there is not, as the user wrote it
   std::vector<std::string> candidates;
   // The files that could not be read on the way: with kBadFile the first is the reason, else
-  // they may hide what was meant.
+  // they may hide what was meant. `device` is that of the first then.
   std::vector<FileComplaint> complaints;
 };
 
@@ -69,6 +71,10 @@ class PartError : public std::exception {
 class Catalogue {
  public:
   explicit Catalogue(const Files& files) : files_(files) {}
+
+  // The device of that very name in any case; throws PartError when there is none, or its file is
+  // bad.
+  ::Device::DeviceFile Read(std::string_view device) const;
 
   // Throws PartError when the name stands for no part. A device whose file is bad is never passed
   // over in favour of one with a shorter name. But where none of the others fits either, and it
@@ -93,6 +99,9 @@ class Catalogue {
   std::vector<std::string> Completions(std::string_view name) const;
 
  private:
+  // Those of a device; none when its file cannot be read.
+  std::vector<std::string> PackagesOf(std::string_view device) const;
+
   const Files& files_;
 };
 

@@ -4,6 +4,8 @@
 #ifndef VORKEL_PLANNER_DEVICE_CHECK_H_
 #define VORKEL_PLANNER_DEVICE_CHECK_H_
 
+#include <compare>
+#include <cstddef>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -18,11 +20,14 @@ struct Mistake {
   struct Place {
     unsigned line = 1;  // both count from 1
     unsigned column = 1;
+    auto operator<=>(const Place&) const = default;
   };
   std::vector<Place> places;  // none: about the file as a whole
   std::string reason;         // a sentence of the host
-  std::string unknown;        // the keyword, coefficient or key that there is not; or empty
-  std::string nearest;        // the one that is nearly so; or empty
+  // A name that there is not, when it is that: a key, a keyword or a coefficient.
+  ::Device::NameKind kind = ::Device::NameKind::kNone;
+  std::string unknown;
+  std::vector<std::string> known;  // and those that there are
 };
 
 // What a doubt is about.
@@ -34,8 +39,8 @@ enum class DoubtKind {
                     // `other` is the end beyond which it is
   kDoubledAbove,    // `keyword`, the shortest period with feedback from CLK2X, is below `other`,
                     // that with the usual feedback
-  kNeverReached,    // `keyword`, a limit of the VCO or of outputs, is beyond `bound`, which is
-                    // the most (or least) that settings make of `other`
+  kNeverReached,    // `keyword`, a limit of VCO, PFD or outputs, is beyond `bound`, the most or
+                    // the least that settings make of `other`
   kNotWhole,        // `keyword` counts VCO periods and is not whole
   kFewDividers,     // `keyword` lets no divider be above `bound`
 };
@@ -72,22 +77,25 @@ struct Coverage {
   int needed = 0;
   int own = 0;     // of those that are there, those that no other primitive needs
   bool IsComplete() const { return there == needed; }
-  // Whether it was begun: something is missing beside limits that are of no other use.
+  // Whether something is missing, beside limits that are of no other use.
   bool IsBegun() const { return there != needed && own != 0; }
 };
 std::vector<Coverage> CoverageOf(const GradeDescription& grade);  // of all primitives, in order
 
-// A keyword that a grade lacks, and the primitives that it alone or with others keeps away: those
-// of which something is there.
+// A keyword that a grade lacks, and the primitives that this costs: those that are begun.
 struct Missing {
   Keyword keyword;
   std::vector<Primitive> costs;
 };
 std::vector<Missing> MissingOf(const GradeDescription& grade);
 
+// More mistakes are not told.
+inline constexpr std::size_t kMostMistakes = 20;
+
 // All that is to be said of the text of a device file.
 struct Checked {
-  std::vector<Mistake> mistakes;  // in the order of their places
+  std::vector<Mistake> mistakes;  // in the order of their first places, kMostMistakes at most
+  std::size_t untold = 0;         // how many there are beside them
   Description description;        // of a file with mistakes: as far as it could be read
   std::vector<Doubt> doubts;
 };

@@ -22,6 +22,7 @@ struct Keyword {
   std::string_view name;
   Unit unit;
   std::vector<Primitive> primitives;  // those that need it
+  bool IsOf(Primitive primitive) const;
 };
 
 // All keywords, in the order in which they are listed to users, and those of a primitive.

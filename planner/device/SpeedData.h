@@ -1,6 +1,6 @@
 // What of a device only the engine and the jitter model need: the host's speed data.
 //
-// Tested by speed_data_test.cpp.
+// Tested by from_file_test.cpp.
 #ifndef VORKEL_PLANNER_DEVICE_SPEEDDATA_H_
 #define VORKEL_PLANNER_DEVICE_SPEEDDATA_H_
 

@@ -66,8 +66,11 @@ TEST(Examine, FindsAllMistakesAndReadsTheRest) {
                           "9:8: grade name \"2-\" must be made of letters, digits and _",
                           "10:15: \"O_MAX_HT_LT\" must be a number"));
   const Examination examination = Examine(text);
+  EXPECT_EQ(examination.mistakes[4].kind, Device::NameKind::kKey);
   EXPECT_EQ(examination.mistakes[4].unknown, "speed");
+  EXPECT_EQ(examination.mistakes[6].kind, Device::NameKind::kKeyword);
   EXPECT_EQ(examination.mistakes[6].unknown, "FAST");
+  EXPECT_EQ(examination.mistakes[7].kind, Device::NameKind::kNone);
   EXPECT_EQ(examination.mistakes[7].unknown, "");
   const DeviceFile& file = examination.file;
   EXPECT_EQ(file.device, "dev");
@@ -125,6 +128,18 @@ TEST(Examine, ComparesTheBandwidthsThatAreThere) {
                           "\"LOOP_BANDWIDTH_LOW\"",
                           "8:23: \"LOOP_BANDWIDTH_HIGH\" must be at most 0.1, a tenth of the PFD "
                           "frequency"));
+}
+
+TEST(Examine, KnowsOfWhichKindANameIsToBe) {
+  const auto mistakes =
+      Examine(kHead + "[grade.1.calculator]\nLOOP_KAPA = 1\n").mistakes;
+  ASSERT_EQ(mistakes.size(), 1u);
+  EXPECT_EQ(mistakes[0].kind, Device::NameKind::kCoefficient);
+  EXPECT_EQ(mistakes[0].unknown, "LOOP_KAPA");
+  EXPECT_THAT(Device::NamesOf(mistakes[0].kind), testing::Contains("LOOP_KAPPA"));
+  EXPECT_THAT(Device::NamesOf(Device::NameKind::kKeyword), testing::Contains("O_MAX_HT_LT"));
+  EXPECT_THAT(Device::NamesOf(Device::NameKind::kKey), testing::Contains("default_grade"));
+  EXPECT_THAT(Device::NamesOf(Device::NameKind::kNone), IsEmpty());
 }
 
 TEST(Examine, KnowsNoMoreBehindMalformedToml) {

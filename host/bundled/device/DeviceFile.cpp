@@ -63,6 +63,24 @@ std::vector<std::string> DeviceFile::GradeNames() const {
   return names;
 }
 
+std::vector<std::string> NamesOf(NameKind kind) {
+  std::vector<std::string> names;
+  switch (kind) {
+    case NameKind::kNone:
+      break;
+    case NameKind::kKey:
+      names = {"device", "description", "packages", "default_package", "default_grade", "grade"};
+      break;
+    case NameKind::kKeyword:
+      for (const Keyword& keyword : Keywords()) names.emplace_back(keyword.name);
+      break;
+    case NameKind::kCoefficient:
+      for (const Coefficient& one : Coefficients()) names.emplace_back(one.name);
+      break;
+  }
+  return names;
+}
+
 bool IsName(std::string_view text) {
   constexpr std::string_view kNameCharacters =
       "ABCDEFGHIJKLMNOPQRSTUVWXYZabcdefghijklmnopqrstuvwxyz0123456789_";

@@ -78,11 +78,15 @@ struct DeviceFile {
   SourcePosition grades_position;
 };
 
+// What a name in a device file is to be one of.
+enum class NameKind { kNone, kKey, kKeyword, kCoefficient };
+
 // Something for which a device file is refused.
 struct Mistake {
   std::optional<SourcePosition> position;  // none: the file as a whole
   std::string reason;
-  // The key, keyword or coefficient that there is not, when it is that.
+  // A name that there is not, when it is that, and of which kind.
+  NameKind kind = NameKind::kNone;
   std::string unknown;
 };
 
@@ -93,6 +97,9 @@ struct Examination {
   // The device; with mistakes, as far as it could be read: what is wrong is left out.
   DeviceFile file;
 };
+
+// All names of a kind.
+std::vector<std::string> NamesOf(NameKind kind);
 
 // Names of devices, packages and grades are made of letters, digits and _.
 bool IsName(std::string_view text);

@@ -75,8 +75,10 @@ class Builder {
 
  private:
   template <typename Located>
-  void Note(const Located& where, std::string reason, std::string_view unknown = {}) {
-    mistakes_.push_back({PositionOf(where.source()), std::move(reason), std::string(unknown)});
+  void Note(const Located& where, std::string reason, NameKind kind = NameKind::kNone,
+            std::string_view unknown = {}) {
+    mistakes_.push_back(
+        {PositionOf(where.source()), std::move(reason), kind, std::string(unknown)});
   }
 
   void Require(const toml::table& root, std::string_view key) {
@@ -120,7 +122,7 @@ class Builder {
       Note(key,
            "unknown key " + Quoted(name) +
                ": must be device, description, packages, default_package, default_grade or grade",
-           name);
+           NameKind::kKey, name);
     }
   }
 
@@ -209,7 +211,8 @@ class Builder {
   void TakeFigure(const toml::key& keyword, const toml::node& number, Grade* grade) {
     const auto index = FindKeyword(keyword.str());
     if (!index) {
-      Note(keyword, "unknown keyword " + Quoted(keyword.str()), keyword.str());
+      Note(keyword, "unknown keyword " + Quoted(keyword.str()), NameKind::kKeyword,
+           keyword.str());
       return;
     }
     const auto figure = Figure(keyword.str(), number);
@@ -229,7 +232,8 @@ class Builder {
       if (index) {
         grade->coefficients[*index] = Figure(name->str(), *number);
       } else {
-        Note(*name, "unknown coefficient " + Quoted(name->str()), name->str());
+        Note(*name, "unknown coefficient " + Quoted(name->str()), NameKind::kCoefficient,
+             name->str());
       }
     }
     RequireGroup(key, *coefficients, CoefficientGroup::kLoop);
@@ -313,9 +317,9 @@ Examination DeviceFile::Examine(std::string_view text, const std::string& path,
     Builder(text, device, &result).Build(root);
   } catch (const toml::parse_error& error) {
     result.mistakes.push_back(
-        {PositionOf(error.source()), std::string(error.description()), {}});
+        {PositionOf(error.source()), std::string(error.description()), NameKind::kNone, {}});
   } catch (const DeviceError& error) {
-    result.mistakes.push_back({error.position(), error.reason(), {}});
+    result.mistakes.push_back({error.position(), error.reason(), NameKind::kNone, {}});
   }
   return result;
 }
