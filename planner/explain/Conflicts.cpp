@@ -1,0 +1,83 @@
+// Tested by conflicts_test.cpp.
+#include "planner/explain/Conflicts.h"
+
+#include <algorithm>
+#include <bit>
+
+#include "planner/explain/Subsets.h"
+
+namespace planner::explain {
+
+namespace {
+
+class Explorer {
+ public:
+  Explorer(Set all, const std::function<bool(Set)>& goes, std::int64_t most)
+      : all_(all), goes_(goes), most_(most) {}
+
+  bool Goes(Set set) {
+    ++questions_;
+    return goes_(set);
+  }
+  bool IsSpent() const { return questions_ >= most_; }
+  std::int64_t questions() const { return questions_; }
+
+  // The set with all that can be added to it one by one.
+  Set Grown(Set set) {
+    for (Set left = all_ & ~set; left != 0; left &= left - 1) {
+      const Set element = left & (~left + 1);
+      if (Goes(set | element)) set |= element;
+    }
+    return set;
+  }
+
+  // The set without all that can be left out one by one while it still does not go together.
+  Set Shrunk(Set set) {
+    for (Set left = set; left != 0; left &= left - 1) {
+      const Set element = left & (~left + 1);
+      if (!Goes(set & ~element)) set &= ~element;
+    }
+    return set;
+  }
+
+ private:
+  Set all_;
+  const std::function<bool(Set)>& goes_;
+  std::int64_t most_;
+  std::int64_t questions_ = 0;
+};
+
+bool IsSmaller(Set a, Set b) {
+  return std::popcount(a) != std::popcount(b) ? std::popcount(a) < std::popcount(b) : a < b;
+}
+
+}  // namespace
+
+Conflicts FindConflicts(std::size_t demands, const std::function<bool(Set)>& goes,
+                        std::int64_t most_questions) {
+  Conflicts found;
+  const Set all = demands == 0 ? 0 : ~Set{0} >> (64 - demands);
+  Explorer explorer(all, goes, most_questions);
+  Subsets subsets(all);
+  while (const std::optional<Set> set = subsets.Next()) {
+    if (explorer.IsSpent()) {
+      found.complete = false;
+      break;
+    }
+    if (explorer.Goes(*set)) {
+      const Set whole = explorer.Grown(*set);
+      if (whole != all) found.corrections.push_back(all & ~whole);
+      subsets.SettleBelow(whole);
+    } else {
+      const Set conflict = explorer.Shrunk(*set);
+      found.conflicts.push_back(conflict);
+      subsets.SettleAbove(conflict);
+    }
+  }
+  std::sort(found.conflicts.begin(), found.conflicts.end(), IsSmaller);
+  std::sort(found.corrections.begin(), found.corrections.end(), IsSmaller);
+  found.questions = explorer.questions();
+  return found;
+}
+
+}  // namespace planner::explain
