@@ -1,36 +1,9 @@
 // The methods that run the KRU_SP and KRU_CLKGEN solvers and read what they have chosen.
 
 #include "binding/Call.h"
-#include "engine/kru/Stages.h"
+#include "engine/ResultTexts.h"
 
 namespace Ip {
-
-namespace {
-
-// The sentences for a run without a configuration, for one requested output and for any other
-// number of them.
-struct NoConfigurationTexts {
-  const char* one;
-  const char* several;
-};
-
-constexpr NoConfigurationTexts kKruTexts = {
-    "The KRU_SP cannot support the requested output frequency and phase.",
-    "The KRU_SP cannot support the requested output frequencies and phases."};
-constexpr NoConfigurationTexts kKruClkgenTexts = {
-    "The KRU_CLKGEN cannot support the requested output frequency and phase.",
-    "The KRU_CLKGEN cannot support the requested output frequencies and phases."};
-
-const char* ResultText(int code, int numOut, const NoConfigurationTexts& texts) {
-  switch (code) {
-    case Kru::kSolved: return "1";
-    case Kru::kNoSpeedData: return "Could not get data from speedsfile.";
-    case Kru::kNoConfiguration: return numOut == 1 ? texts.one : texts.several;
-    default: return "";
-  }
-}
-
-}  // namespace
 
 // Frequency and phase lists, input frequency, number of outputs, feedback and trace flags.
 int VorkelPtrHandle::KruCalculateActuals(int objc, Words objv, Tcl_Interp* interp) {
@@ -40,7 +13,7 @@ int VorkelPtrHandle::KruCalculateActuals(int objc, Words objv, Tcl_Interp* inter
   const int numOut = call.Count(3);
   const int code = imp->KruCalculateActuals(call.String(0), call.String(1), call.Number(2),
                                             numOut, call.Flag(4), call.Flag(5));
-  return call.AnswerText(ResultText(code, numOut, kKruTexts));
+  return call.AnswerText(KruResultText(false, code, numOut));
 }
 
 // Frequency and phase lists, input frequency, number of outputs and trace flag.
@@ -51,7 +24,7 @@ int VorkelPtrHandle::KruClkgenCalculateActuals(int objc, Words objv, Tcl_Interp*
   const int numOut = call.Count(3);
   const int code = imp->KruClkgenCalculateActuals(call.String(0), call.String(1),
                                                   call.Number(2), numOut, call.Flag(4));
-  return call.AnswerText(ResultText(code, numOut, kKruClkgenTexts));
+  return call.AnswerText(KruResultText(true, code, numOut));
 }
 
 int VorkelPtrHandle::GetKruChosenM(int objc, Words objv, Tcl_Interp* interp) {

@@ -2,48 +2,20 @@
 
 #include "binding/Call.h"
 #include "engine/Numbers.h"
-#include "engine/pll/Stages.h"
+#include "engine/ResultTexts.h"
 
 namespace Ip {
 
 namespace {
 
-// The sentences for a run without a solution, for one requested output and for several.
-struct NoSolutionTexts {
-  const char* one;
-  const char* several;
-};
-
-constexpr NoSolutionTexts kTsynTexts = {
-    "Could not obtain valid VCO, M and D values with the requested frequency.",
-    "Could not obtain valid VCO, M and D values with these requested frequencies."};
-constexpr NoSolutionTexts kPllTexts = {
-    "Could not obtain valid VCO, M and D values with the given input freqs and the requested "
-    "frequency.",
-    "Could not obtain valid VCO, M and D values with the given input freqs and the requested "
-    "frequencies."};
-// The closest-solution method does not count its outputs.
-constexpr NoSolutionTexts kClosestTexts = {kPllTexts.several, kPllTexts.several};
-
-const char* ResultText(int code, int count, const NoSolutionTexts& texts) {
-  switch (code) {
-    case Pll::kSolved: return "1";
-    case Pll::kNoSpeedData: return "Could not get data from speedsfile.";
-    case Pll::kEmptyRange:
-      return "Could not obtain a valid VCO because the 2 input clock freqs are too far apart in "
-             "range.";
-    default: return count > 1 ? texts.several : texts.one;
-  }
-}
-
 // The two minimum-power methods: frequency list, both input frequencies, count, the two
 // option flags and the trace flag.
-int CalculateOutFreqs(const Call& call, VorkelImp& imp, int prim, const NoSolutionTexts& texts) {
+int CalculateOutFreqs(const Call& call, VorkelImp& imp, int prim, PllEntry entry) {
   const int count = call.Count(3);
   const int code =
       imp.CalculateMinPowerOutFreqs(call.String(0), call.Number(1), call.Number(2), count,
                                     call.Flag(4), call.Flag(5), prim, call.Flag(6));
-  return call.AnswerText(ResultText(code, count, texts));
+  return call.AnswerText(PllResultText(entry, code, count));
 }
 
 }  // namespace
@@ -54,7 +26,7 @@ int VorkelPtrHandle::TSYNCalculateActualOutFreqs(int objc, Words objv, Tcl_Inter
       *this, 7, "TSYNCalculateActualOutFreqs",
       "Unable to obtain Implementation object for VorkelPtrHandle::TSYNCalculateActualOutFreq");
   if (imp == nullptr) return TCL_ERROR;
-  return CalculateOutFreqs(call, *imp, Pll::kTsyn, kTsynTexts);
+  return CalculateOutFreqs(call, *imp, Pll::kTsyn, PllEntry::kTsynFrequencies);
 }
 
 int VorkelPtrHandle::PLLCalculateActualOutFreqs(int objc, Words objv, Tcl_Interp* interp) {
@@ -63,7 +35,7 @@ int VorkelPtrHandle::PLLCalculateActualOutFreqs(int objc, Words objv, Tcl_Interp
       *this, 7, "PLLCalculateActualOutFreqs",
       "Unable to obtain Implementation object for VorkelPtrHandle::PLLCalculateActualOutFreq");
   if (imp == nullptr) return TCL_ERROR;
-  return CalculateOutFreqs(call, *imp, Pll::kPll, kPllTexts);
+  return CalculateOutFreqs(call, *imp, Pll::kPll, PllEntry::kPllFrequencies);
 }
 
 // Frequency, phase and duty-cycle lists, both input frequencies, count, the two option flags,
@@ -77,7 +49,7 @@ int VorkelPtrHandle::GetClosestSolution(int objc, Words objv, Tcl_Interp* interp
   const int code = imp->GetClosestSolution(call.String(0), call.String(1), call.String(2),
                                            call.Number(3), call.Number(4), count, call.Flag(6),
                                            call.Flag(7), prim, call.Flag(9));
-  return call.AnswerText(ResultText(code, count, kClosestTexts));
+  return call.AnswerText(PllResultText(PllEntry::kClosestSolution, code, count));
 }
 
 int VorkelPtrHandle::GetChosenM(int objc, Words objv, Tcl_Interp* interp) {

@@ -1,0 +1,46 @@
+#include "planner/engine/Object.h"
+
+#include <cstdio>
+#include <string>
+
+#include "planner/device/SpeedData.h"
+
+namespace planner::engine {
+
+std::unique_ptr<Ip::VorkelImp> MakeObject(const Device& device) {
+  auto object = std::make_unique<Ip::VorkelImp>(nullptr);
+  object->SetDevice(Port::StringBase(std::string_view(device.part)));
+  // With this one the engine asks the host for none, which would look the part up by its name.
+  // The object does not own it.
+  object->speedController = device.speed_data->controller();
+  return object;
+}
+
+Port::StringBase ListOf(const std::vector<double>& numbers) {
+  std::string list;
+  for (const double number : numbers) {
+    char text[40];
+    std::snprintf(text, sizeof text, "%.17g", number);
+    if (!list.empty()) list += ' ';
+    list += text;
+  }
+  return Port::StringBase(std::string_view(list));
+}
+
+std::vector<std::size_t> UsedOutputs(const Request& request) {
+  std::vector<std::size_t> used;
+  for (std::size_t i = 0; i < request.outputs.size(); ++i) {
+    if (request.outputs[i].used) used.push_back(i);
+  }
+  return used;
+}
+
+std::vector<double> Frequencies(const Request& request) {
+  std::vector<double> frequencies;
+  for (const std::size_t index : UsedOutputs(request)) {
+    frequencies.push_back(request.outputs[index].frequency.ToDouble());
+  }
+  return frequencies;
+}
+
+}  // namespace planner::engine

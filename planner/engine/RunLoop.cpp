@@ -1,0 +1,154 @@
+// A run for a PLL or a TSYN.
+//
+// Tested by run_test.cpp.
+#include <cmath>
+#include <mutex>
+#include <stdexcept>
+
+#include "engine/ResultTexts.h"
+#include "hardware/Loop.h"
+#include "planner/engine/Object.h"
+#include "planner/engine/Run.h"
+
+namespace planner::engine {
+namespace {
+
+// The engine has the primitive of a PLL or TSYN run in a variable of the process.
+std::mutex& LoopRuns() {
+  static std::mutex runs;
+  return runs;
+}
+
+// Half an eighth is far more than the engine's doubles are off.
+int Eighths(double value) { return static_cast<int>(std::lround(value * hardware::kEighths)); }
+
+class LoopRun {
+ public:
+  LoopRun(const Request& request, const Device& device, Primitive primitive,
+          const Variant& variant, bool trace)
+      : request_(request),
+        device_(device),
+        primitive_(primitive),
+        variant_(variant),
+        trace_(trace),
+        used_(UsedOutputs(request)),
+        closest_(variant.closest || request.AsksForShape()),
+        object_(MakeObject(device)) {}
+
+  Outcome Run() {
+    const int code = Calculate();
+    if (code == Ip::Pll::kNoSpeedData) {
+      throw std::logic_error("The engine cannot read the limits of a primitive that is there.");
+    }
+    if (code != Ip::Pll::kSolved) return Refused{Ip::PllResultText(Entry(), code, Count())};
+    return Found{Chosen(), Searched()};
+  }
+
+ private:
+  int Count() const { return static_cast<int>(used_.size()); }
+  int Code() const { return primitive_ == Primitive::kPll ? Ip::Pll::kPll : Ip::Pll::kTsyn; }
+
+  Ip::PllEntry Entry() const {
+    if (closest_) return Ip::PllEntry::kClosestSolution;
+    return primitive_ == Primitive::kPll ? Ip::PllEntry::kPllFrequencies
+                                         : Ip::PllEntry::kTsynFrequencies;
+  }
+
+  // The engine gives a fraction to the first output that it is asked for. Only output 0 can have
+  // one, and only where there are few outputs, be they used or not.
+  bool IsWhole() const {
+    return variant_.whole_divider_0 || !request_.outputs.front().used ||
+           request_.outputs.size() >= hardware::kWholeOutputs;
+  }
+
+  int Calculate() {
+    const double first = request_.inputs[0].ToDouble();
+    const double second = request_.inputs.size() > 1 ? request_.inputs[1].ToDouble() : 0.0;
+    object_->SetLowBandwidth(variant_.bandwidth == Bandwidth::kLow);
+    const Port::StringBase frequencies = ListOf(Frequencies(request_));
+    const std::lock_guard lock(LoopRuns());
+    if (!closest_) {
+      return object_->CalculateMinPowerOutFreqs(frequencies, first, second, Count(),
+                                                variant_.prefer_max_vco, IsWhole(), Code(),
+                                                trace_);
+    }
+    return object_->GetClosestSolution(frequencies, ListOf(Asked(&Output::phase)),
+                                       ListOf(Asked(&Output::duty)), first, second, Count(),
+                                       variant_.prefer_max_vco, IsWhole(), Code(), trace_);
+  }
+
+  // 0 of the outputs that ask for none.
+  std::vector<double> Asked(std::optional<Rational> Output::*what) const {
+    std::vector<double> numbers;
+    for (const std::size_t index : used_) {
+      const std::optional<Rational>& asked = request_.outputs[index].*what;
+      numbers.push_back(asked ? asked->ToDouble() : 0.0);
+    }
+    return numbers;
+  }
+
+  LoopSettings Chosen() const {
+    LoopSettings settings;
+    settings.primitive = primitive_;
+    settings.bandwidth = variant_.bandwidth;
+    settings.m = Eighths(object_->GetChosenM());
+    settings.d = object_->GetChosenD();
+    settings.outputs.resize(request_.outputs.size());
+    for (int n = 0; n < Count(); ++n) {
+      LoopOutput& output = settings.outputs[used_[static_cast<std::size_t>(n)]];
+      output.divider = n == 0 ? Eighths(object_->GetChosenDiv0())
+                              : object_->GetChosenDivN(n) * hardware::kEighths;
+    }
+    if (closest_ && !settings.HasFraction()) {
+      for (int n = 0; n < Count(); ++n) Move(n, &settings);
+    }
+    return settings;
+  }
+
+  // Phase and duty cycle of an output as steps. The engine tells them as numbers, which are those
+  // of steps but for their rounding.
+  void Move(int n, LoopSettings* settings) const {
+    const std::size_t index = used_[static_cast<std::size_t>(n)];
+    const Output& asked = request_.outputs[index];
+    LoopOutput& output = settings->outputs[index];
+    if (asked.phase) {
+      output.phase = hardware::NearestPhaseStep(Rational::FromDouble(object_->GetChosenPhaseN(n)),
+                                                output.divider);
+    }
+    if (asked.duty) {
+      const double fraction = object_->GetChosenDutyCycleN(n);
+      // One of 0 is none: the engine has not looked for it.
+      const Rational percent = fraction > 0.0 ? 100 * Rational::FromDouble(fraction) : *asked.duty;
+      output.high_time = hardware::NearestHighTime(percent, output.divider / hardware::kEighths,
+                                                   device_.Loop(primitive_).max_count);
+    }
+  }
+
+  answer::Searched Searched() const {
+    answer::Searched searched;
+    searched.vco = object_->GetChosenVCO();
+    searched.outputs.resize(request_.outputs.size());
+    for (int n = 0; n < Count(); ++n) {
+      searched.outputs[used_[static_cast<std::size_t>(n)]] = object_->GetChosenOutFreqN(n);
+    }
+    return searched;
+  }
+
+  const Request& request_;
+  const Device& device_;
+  const Primitive primitive_;
+  const Variant& variant_;
+  const bool trace_;
+  const std::vector<std::size_t> used_;
+  const bool closest_;
+  const std::unique_ptr<Ip::VorkelImp> object_;
+};
+
+}  // namespace
+
+Outcome RunLoop(const Request& request, const Device& device, Primitive primitive,
+                const Variant& variant, bool trace) {
+  return LoopRun(request, device, primitive, variant, trace).Run();
+}
+
+}  // namespace planner::engine
