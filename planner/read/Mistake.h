@@ -72,7 +72,8 @@ enum class MistakeKind {
   kWrongType,        // other: the type that is there; known: those that may be
   kNoFrequency,      // an output without a frequency
   // Tcl.
-  kScript            // text: the sentence of the script's interpreter
+  kScript            // text: the sentence of the script's interpreter; other: a command that there
+                     // is not; known: those that there are
 };
 
 // What a number must be.

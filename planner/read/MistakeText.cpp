@@ -252,7 +252,7 @@ std::string FileText(const Mistake& mistake) {
                          Enumerated(wanted, "or"), TypeText(mistake.other, true));
     }
     case MistakeKind::kScript:
-      return ShownWhole(mistake.text);
+      return ShownWhole(mistake.text) + DidYouMean(mistake.other, mistake.known);
     default:
       return "";
   }

@@ -8,7 +8,7 @@ namespace planner::read {
 
 Draft ReadJson(std::string_view text, std::string_view file, Mistakes* mistakes) {
   const std::optional<Node> root = ReadJsonTree(text, file, mistakes);
-  return root ? ReadTree(*root, file, mistakes) : Draft{};
+  return root ? ReadTree(*root, file, Naming::kEntries, mistakes) : Draft{};
 }
 
 }  // namespace planner::read

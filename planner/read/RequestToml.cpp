@@ -113,7 +113,7 @@ Draft ReadToml(std::string_view text, std::string_view file, Mistakes* mistakes)
     const toml::table root = toml::parse(text);
     Node node = Builder(text).Of(root);
     node.position = {1, 1};
-    return ReadTree(node, file, mistakes);
+    return ReadTree(node, file, Naming::kEntries, mistakes);
   } catch (const toml::parse_error& error) {
     mistakes->push_back(
         SyntaxMistake(file, PositionOf(error.source()), std::string(error.description())));

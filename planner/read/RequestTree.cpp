@@ -1,4 +1,4 @@
-// Tested by request_json_test.cpp and request_toml_test.cpp.
+// Tested by request_json_test.cpp, request_toml_test.cpp and request_tcl_test.cpp.
 #include "planner/read/RequestTree.h"
 
 #include <algorithm>
@@ -55,7 +55,8 @@ const std::vector<std::string>& KnownOutputEntries() {
 
 class TreeReader {
  public:
-  TreeReader(std::string_view file, Mistakes* mistakes) : file_(file), mistakes_(mistakes) {}
+  TreeReader(std::string_view file, Naming naming, Mistakes* mistakes)
+      : file_(file), naming_(naming), mistakes_(mistakes) {}
 
   Draft Read(const Node& root) {
     if (!IsOf(root, {NodeType::kObject}, At(root.position, ""))) return {};
@@ -73,7 +74,23 @@ class TreeReader {
     place.entry = entry;
     place.index = index;
     place.key = key;
+    if (naming_ == Naming::kCommands) NameAsCommand(&place);
     return place;
+  }
+
+  static void NameAsCommand(Place* place) {
+    place->column = 0;
+    if (place->entry == "input_jitter") {
+      place->entry = "input";
+      place->key = "jitter";
+    } else if (place->entry == "inputs") {
+      place->entry = "input";
+      place->index = -1;
+    } else if (place->entry == "outputs") {
+      place->entry = "output";
+    }
+    if (place->key == "frequency") place->key.clear();
+    if (!place->key.empty()) place->key.insert(0, 1, '-');
   }
 
   // Whether a value is of one of some types.
@@ -242,6 +259,7 @@ class TreeReader {
   }
 
   std::string file_;
+  Naming naming_;
   Mistakes* mistakes_;
   Draft draft_;
   std::size_t outputs_ = 0;
@@ -249,8 +267,8 @@ class TreeReader {
 
 }  // namespace
 
-Draft ReadTree(const Node& root, std::string_view file, Mistakes* mistakes) {
-  return TreeReader(file, mistakes).Read(root);
+Draft ReadTree(const Node& root, std::string_view file, Naming naming, Mistakes* mistakes) {
+  return TreeReader(file, naming, mistakes).Read(root);
 }
 
 }  // namespace planner::read
