@@ -19,7 +19,7 @@ using hardware::Pin;
 
 // A device with all four primitives and no coefficients, MHz:
 //   PLL   VCO 400 to 1080, PFD 19 to 500 (LOW: 300), outputs 3 to 400, output 1 to 1080
-//   TSYN  VCO 600 to 1440, PFD 10 to 500 (LOW: 300), outputs 4 to 800
+//   TSYN  VCO 600 to 1440, PFD 10 to 500 (LOW: 250), outputs 4 to 800
 //   both  high and low times up to 60
 //   KRU   CLK0 5 to 300 (150), CLK90 5 to 250 (120), CLKDV 1/4 to 200 (160), CLK2X 10 to 400,
 //         CLKFX 5 to 400, CLKFXDV 1/8 to 200; in brackets with feedback from CLK2X
@@ -37,7 +37,7 @@ inline Device HandMade() {
                           .vco_target = 0};
   device.tsyn = LoopLimits{.vco = {600, 1440},
                            .pfd = {10, 500},
-                           .pfd_low = {10, 300},
+                           .pfd_low = {10, 250},
                            .output = {4, 800},
                            .output_1 = {4, 800},
                            .max_count = 60,
