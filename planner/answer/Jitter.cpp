@@ -1,6 +1,8 @@
 // Tested by jitter_test.cpp.
 #include "planner/answer/Jitter.h"
 
+#include <cstddef>
+#include <map>
 #include <string>
 
 #include "host/bundled/calculator/Argument.h"
@@ -33,6 +35,8 @@ Calculator::Loop LoopAt(double input, int m_eighths, int d, Bandwidth bandwidth)
   return {.pfd = input / d, .vco = input * m / d, .bandwidth = CalculatorBandwidth(bandwidth)};
 }
 
+std::size_t Index(hardware::Pin pin) { return static_cast<std::size_t>(pin); }
+
 }  // namespace
 
 LoopJitter::LoopJitter(const Device& device, const Request& request)
@@ -63,21 +67,27 @@ double LoopJitter::PhaseError(int d, Bandwidth bandwidth) const {
   return Calculator::LoopPhaseError(*coefficients_, input_ / d, CalculatorBandwidth(bandwidth));
 }
 
+KruJitter::Span KruJitter::SpanOf(const ::Device::Grade& grade, std::string_view limits) {
+  const std::string keyword =
+      "D_KRU_" + std::string(limits) + "_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_";
+  const std::optional<double> longest = grade.Figure(keyword + "MAXPERIOD");
+  const std::optional<double> shortest = grade.Figure(keyword + "MINPERIOD");
+  if (!longest || !shortest) return {};
+  return {kPeriodTimesFrequency / *longest, kPeriodTimesFrequency / *shortest};
+}
+
 KruJitter::KruJitter(const Device& device, const Request& request, Primitive primitive)
     : input_(request.inputs.front().ToDouble()), input_jitter_(request.input_jitter.ToDouble()) {
   const ::Device::Grade* grade = GradeOf(device);
   if (grade == nullptr || !grade->Has(::Device::CoefficientGroup::kKru)) return;
   coefficients_ = Calculator::KruCoefficients::Of(*grade);
   is_known_ = IsInput(input_);
+  std::map<std::string_view, Span> known;  // several pins share their limits
   for (const hardware::PinFacts& facts : hardware::kPins) {
     if (!(primitive == Primitive::kKruSp ? facts.is_sp : facts.is_clkgen)) continue;
-    const std::string keyword = "D_KRU_" + std::string(CalculatorPin(facts.pin).frequency) +
-                                "_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_";
-    const std::optional<double> longest = grade->Figure(keyword + "MAXPERIOD");
-    const std::optional<double> shortest = grade->Figure(keyword + "MINPERIOD");
-    if (!longest || !shortest) continue;
-    spans_[static_cast<std::size_t>(facts.pin)] = {kPeriodTimesFrequency / *longest,
-                                                   kPeriodTimesFrequency / *shortest};
+    const std::string_view limits = CalculatorPin(facts.pin).frequency;
+    if (known.count(limits) == 0) known[limits] = SpanOf(*grade, limits);
+    spans_[Index(facts.pin)] = known[limits];
   }
 }
 
@@ -88,7 +98,7 @@ bool KruJitter::Holds(const KruSettings& settings, hardware::Pin pin) const {
   const double frequency = output.source == Calculator::KruSource::kDivider
                                ? Calculator::LineFrequency(model)
                                : Calculator::PinFrequency(output, model);
-  const Span& span = spans_[static_cast<std::size_t>(pin)];
+  const Span& span = spans_[Index(pin)];
   return Calculator::IsWithinLimits(frequency, span.lowest, span.highest);
 }
 

@@ -15,6 +15,7 @@
 #include <array>
 #include <limits>
 #include <optional>
+#include <string_view>
 
 #include "hardware/Kru.h"
 #include "host/bundled/calculator/Coefficients.h"
@@ -84,6 +85,8 @@ class KruJitter {
     double lowest = 1.0;
     double highest = 0.0;
   };
+  // Of the pin that stands for limits.
+  static Span SpanOf(const ::Device::Grade& grade, std::string_view limits);
   bool Holds(const KruSettings& settings, hardware::Pin pin) const;
 
   std::optional<Calculator::KruCoefficients> coefficients_;

@@ -12,9 +12,8 @@
 #include "planner/Request.h"
 #include "planner/Settings.h"
 
-namespace answer_test {
+namespace planner::answer_test {
 
-using namespace planner;  // NOLINT: this is what is tested
 using hardware::Pin;
 
 // A device with all four primitives and no coefficients, MHz:
@@ -95,6 +94,6 @@ inline Rational Sliver(const Rational& value) {
   return value * Rational::FromDecimal("1", -30);
 }
 
-}  // namespace answer_test
+}  // namespace planner::answer_test
 
 #endif  // VORKEL_TESTS_PLANNER_ANSWER_ANSWER_SUPPORT_H_

@@ -6,10 +6,11 @@
 #include "planner/answer/Jitter.h"
 #include "tests/planner/answer/answer_support.h"
 
+namespace planner::answer {
+
 namespace {
 
-using namespace answer_test;  // NOLINT
-using namespace planner::answer;  // NOLINT
+using namespace answer_test;  // NOLINT: what all tests of this folder begin with
 
 TEST(Units, AreTheTolerances) {
   EXPECT_EQ(FrequencyUnit(20), Rational(20));
@@ -126,3 +127,5 @@ TEST(IsJitterMet, ExactAndNeverWhenUnknown) {
 }
 
 }  // namespace
+
+}  // namespace planner::answer

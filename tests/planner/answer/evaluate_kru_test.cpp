@@ -5,10 +5,11 @@
 #include "tests/planner/answer/answer_support.h"
 #include "tests/planner/answer/bundled_device.h"
 
+namespace planner::answer {
+
 namespace {
 
-using namespace answer_test;  // NOLINT
-using answer::Evaluate;
+using namespace answer_test;  // NOLINT: what all tests of this folder begin with
 
 KruSettings Sp(std::vector<Pin> pins) {
   KruSettings settings;
@@ -162,7 +163,7 @@ INSTANTIATE_TEST_SUITE_P(
         Edge{"CLK90", {Pin::kClk90}, 250, 0, 0, 0, 1, 0, "CLK90", {5, 250}, false},
         Edge{"with feedback from CLK2X", {Pin::kClk2x, Pin::kClk0}, 150, 0, 0, 0, 1, 1, "CLK0",
              {5, 150}, true},
-        Edge{"not from another output", {Pin::kClk2x180, Pin::kClk2x}, 200, 0, 0, 0, 1, 1,
+        Edge{"not from another output", {Pin::kClk0, Pin::kClk2x}, 200, 0, 0, 0, 1, 1,
              "CLK2X", {10, 400}, false},
         Edge{"CLKDV, 400 / 2", {Pin::kClkdv}, 400, 0, 0, 4, 1, 0, "CLKDV", {Rational(1, 4), 200},
              false},
@@ -170,7 +171,7 @@ INSTANTIATE_TEST_SUITE_P(
              "CLK90", {5, 120}, true},
         Edge{"the lowest of CLKFX", {Pin::kClkfx180}, 60, 2, 24, 0, -1, 0, "CLKFX180", {5, 400},
              false}),
-    [](const auto& info) { return std::to_string(info.index); });
+    [](const auto& test) { return std::to_string(test.index); });
 
 // A pin whose range is the same with feedback from CLK2X is said to be out of its usual one.
 TEST(EvaluateKru, FeedbackFromClk2xIsToldWhereItMatters) {
@@ -249,3 +250,5 @@ TEST(EvaluateKru, OutputsThatAreNotUsedHaveNoPin) {
 }
 
 }  // namespace
+
+}  // namespace planner::answer

@@ -5,10 +5,11 @@
 #include "tests/planner/answer/answer_support.h"
 #include "tests/planner/answer/bundled_device.h"
 
+namespace planner::answer {
+
 namespace {
 
-using namespace answer_test;  // NOLINT
-using answer::Evaluate;
+using namespace answer_test;  // NOLINT: what all tests of this folder begin with
 
 const Finding* Find(const std::vector<Finding>& findings, FindingKind kind) {
   for (const Finding& finding : findings) {
@@ -168,7 +169,7 @@ INSTANTIATE_TEST_SUITE_P(
              Quantity::kFrequency, {3, 400}},
         Edge{"the highest output of a TSYN", Primitive::kTsyn, 80, 10, 1, 1, kOptimized, 1,
              Quantity::kFrequency, {4, 800}}),
-    [](const auto& info) { return std::to_string(info.index); });
+    [](const auto& test) { return std::to_string(test.index); });
 
 // 480 / 120 = 4 MHz, the lowest.
 TEST(EvaluateLoop, TheLowestOutput) {
@@ -373,7 +374,7 @@ TEST(EvaluateLoop, OutputsThatAreNotUsedCountForNothing) {
 }
 
 TEST(Unsolved, SaysWhy) {
-  const Answer answer = answer::Unsolved(
+  const Answer answer = Unsolved(
       Primitive::kKruSp, {.engine = true},
       {{.kind = FindingKind::kUnsolved, .text = "No."}});
   EXPECT_FALSE(answer.solved);
@@ -385,9 +386,9 @@ TEST(Unsolved, SaysWhy) {
 
 TEST(Refusals, OfTooManyClocks) {
   Request request = Ask({100, 50}, {1, 2, 3, 4, 5, 6, 7});
-  EXPECT_TRUE(answer::Refusals(request, Primitive::kPll).empty());
-  EXPECT_TRUE(answer::Refusals(request, Primitive::kTsyn).empty());
-  const std::vector<Finding> refusals = answer::Refusals(request, Primitive::kKruSp);
+  EXPECT_TRUE(Refusals(request, Primitive::kPll).empty());
+  EXPECT_TRUE(Refusals(request, Primitive::kTsyn).empty());
+  const std::vector<Finding> refusals = Refusals(request, Primitive::kKruSp);
   ASSERT_EQ(refusals.size(), 2u);
   EXPECT_EQ(refusals[0].kind, FindingKind::kTooManyInputs);
   EXPECT_EQ(refusals[0].value, Rational(2));
@@ -395,7 +396,9 @@ TEST(Refusals, OfTooManyClocks) {
   EXPECT_EQ(refusals[1].kind, FindingKind::kTooManyOutputs);
   EXPECT_EQ(refusals[1].value, Rational(7));
   EXPECT_EQ(refusals[1].range.highest, Rational(6));
-  EXPECT_EQ(answer::Refusals(request, Primitive::kKruClkgen).size(), 2u);
+  EXPECT_EQ(Refusals(request, Primitive::kKruClkgen).size(), 2u);
 }
 
 }  // namespace
+
+}  // namespace planner::answer

@@ -7,51 +7,52 @@
 
 #include "tests/planner/answer/answer_support.h"
 
+namespace planner::answer {
+
 namespace {
 
-using namespace answer_test;  // NOLINT
-using namespace planner::answer;  // NOLINT
+using namespace answer_test;  // NOLINT: what all tests of this folder begin with
 
 using Places = std::vector<std::size_t>;
 
 RankKey Key(Rational error, double jitter, Class rank_class = Class::kMet) {
   return {.rank_class = rank_class, .worst_error = std::move(error), .jitter = jitter};
 }
-Places FrontOf(const std::vector<RankKey>& keys) {
-  return answer::FrontOf(keys, [](std::size_t a, std::size_t b) { return a < b; });
+Places PlacesOf(const std::vector<RankKey>& keys) {
+  return FrontOf(keys, [](std::size_t a, std::size_t b) { return a < b; });
 }
 
 TEST(FrontOf, LessJitterForALargerError) {
-  EXPECT_EQ(FrontOf({Key(Rational(1, 2), 90), Key(0, 100), Key(Rational(1, 3), 95),
+  EXPECT_EQ(PlacesOf({Key(Rational(1, 2), 90), Key(0, 100), Key(Rational(1, 3), 95),
                      Key(Rational(1, 4), 105), Key(1, 90)}),
             (Places{1, 2, 0}));
 }
 
 TEST(FrontOf, OfEqualOnesThatWhichRanksFirst) {
-  EXPECT_EQ(FrontOf({Key(0, 100), Key(0, 90), Key(0, 90), Key(0, 100)}), (Places{1}));
+  EXPECT_EQ(PlacesOf({Key(0, 100), Key(0, 90), Key(0, 90), Key(0, 100)}), (Places{1}));
   const std::vector<RankKey> keys = {Key(0, 90), Key(0, 90)};
-  EXPECT_EQ(answer::FrontOf(keys, [](std::size_t a, std::size_t b) { return a > b; }),
+  EXPECT_EQ(FrontOf(keys, [](std::size_t a, std::size_t b) { return a > b; }),
             (Places{1}));
 }
 
 // Less jitter does not make up for a demand that is missed while others meet it.
 TEST(FrontOf, OnlyTheClassOfTheBest) {
-  EXPECT_EQ(FrontOf({Key(2, 50, Class::kMissed), Key(1, 100), Key(0, 60, Class::kBroken),
+  EXPECT_EQ(PlacesOf({Key(2, 50, Class::kMissed), Key(1, 100), Key(0, 60, Class::kBroken),
                      Key(0, 0, Class::kUnsolved)}),
             (Places{1}));
-  EXPECT_EQ(FrontOf({Key(3, 50, Class::kMissed), Key(2, 60, Class::kMissed),
+  EXPECT_EQ(PlacesOf({Key(3, 50, Class::kMissed), Key(2, 60, Class::kMissed),
                      Key(0, 10, Class::kBroken)}),
             (Places{1, 0}));
 }
 
 TEST(FrontOf, NothingOfNothing) {
-  EXPECT_TRUE(FrontOf({}).empty());
-  EXPECT_TRUE(FrontOf({Key(0, 1, Class::kUnsolved)}).empty());
+  EXPECT_TRUE(PlacesOf({}).empty());
+  EXPECT_TRUE(PlacesOf({Key(0, 1, Class::kUnsolved)}).empty());
 }
 
 TEST(FrontOf, WithoutAJitterOnlyTheFirst) {
-  EXPECT_EQ(FrontOf({Key(1, kUnknownJitter), Key(0, kUnknownJitter)}), (Places{1}));
-  EXPECT_EQ(FrontOf({Key(0, kUnknownJitter), Key(1, 100)}), (Places{0, 1}));
+  EXPECT_EQ(PlacesOf({Key(1, kUnknownJitter), Key(0, kUnknownJitter)}), (Places{1}));
+  EXPECT_EQ(PlacesOf({Key(0, kUnknownJitter), Key(1, 100)}), (Places{0, 1}));
 }
 
 // By the definition: nothing of the same class is at least as good in both and better in one.
@@ -59,8 +60,8 @@ TEST(FrontOf, IsWhatNothingDominates) {
   std::mt19937 random(7);
   for (int round = 0; round < 500; ++round) {
     std::vector<RankKey> keys;
-    const unsigned count = random() % 12;
-    for (unsigned i = 0; i < count; ++i) {
+    const auto count = static_cast<int>(random() % 12);
+    for (int i = 0; i < count; ++i) {
       keys.push_back(Key(static_cast<int>(random() % 5), static_cast<double>(random() % 5),
                          random() % 4 == 0 ? Class::kMissed : Class::kMet));
     }
@@ -83,7 +84,7 @@ TEST(FrontOf, IsWhatNothingDominates) {
     std::sort(expected.begin(), expected.end(), [&](std::size_t a, std::size_t b) {
       return keys[a].worst_error < keys[b].worst_error;
     });
-    EXPECT_EQ(FrontOf(keys), expected);
+    EXPECT_EQ(PlacesOf(keys), expected);
   }
 }
 
@@ -98,7 +99,7 @@ TEST(FrontOf, OfAnswers) {
     made.worst_error = Rational(error, 10);
     return made;
   };
-  const Front front = answer::FrontOf(
+  const Front front = FrontOf(
       Ask({100}, {100}),
       {answer(Primitive::kTsyn, 90, 5), answer(Primitive::kPll, 90, 5),
        answer(Primitive::kTsyn, 100, 0), answer(Primitive::kPll, 95, 7)});
@@ -109,3 +110,5 @@ TEST(FrontOf, OfAnswers) {
 }
 
 }  // namespace
+
+}  // namespace planner::answer

@@ -12,10 +12,11 @@
 #include "tests/planner/answer/answer_support.h"
 #include "tests/planner/answer/bundled_device.h"
 
+namespace planner::answer {
+
 namespace {
 
-using namespace answer_test;  // NOLINT
-using namespace planner::answer;  // NOLINT
+using namespace answer_test;  // NOLINT: what all tests of this folder begin with
 using calculator_test::Asked;
 
 constexpr Calculator::LoopCoefficients kCoefficients = {.kappa = 30,
@@ -29,8 +30,8 @@ constexpr Calculator::LoopCoefficients kCoefficients = {.kappa = 30,
                                                         .leakage = 40};
 
 // PFD 100 MHz, VCO 1000 MHz: 30 x sqrt(1 / (4 pi x 2)) = 5.98413 ps of the oscillator;
-// 100 / 14.069 x sqrt(pi x 0.02) = 1.78167 ps of the input; variance 35.8099 + 3.1743 + 4 = 42.9842,
-// rms 6.55623; 14.069 x 6.55623 + 20 = 112.240.
+// 100 / 14.069 x sqrt(pi x 0.02) = 1.78167 ps of the input; variance 35.8099 + 3.1743 + 4 =
+// 42.9842, rms 6.55623; 14.069 x 6.55623 + 20 = 112.240.
 TEST(LoopJitter, ByHand) {
   const LoopJitter jitter(kCoefficients, 100, 100);
   EXPECT_TRUE(jitter.IsKnown());
@@ -209,8 +210,10 @@ TEST_P(Against, TheCalculatorOfKrus) {
   }
 }
 
-INSTANTIATE_TEST_SUITE_P(Jitter, Against, testing::ValuesIn(kGrades), [](const auto& info) {
-  return std::string(info.param.device) + "_" + info.param.grade;
+INSTANTIATE_TEST_SUITE_P(Jitter, Against, testing::ValuesIn(kGrades), [](const auto& test) {
+  return std::string(test.param.device) + "_" + test.param.grade;
 });
 
 }  // namespace
+
+}  // namespace planner::answer

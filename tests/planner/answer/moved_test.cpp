@@ -4,10 +4,11 @@
 
 #include "tests/planner/answer/answer_support.h"
 
+namespace planner::answer {
+
 namespace {
 
-using namespace answer_test;  // NOLINT
-using namespace planner::answer;  // NOLINT
+using namespace answer_test;  // NOLINT: what all tests of this folder begin with
 
 TEST(Moved, GoesByPlaces) {
   const Request request = Ask({100}, {10, 20, 30});
@@ -39,3 +40,5 @@ TEST(Moved, NothingToTellOfOutputsAtTheirPlaces) {
 }
 
 }  // namespace
+
+}  // namespace planner::answer

@@ -5,11 +5,11 @@
 #include "planner/answer/Evaluate.h"
 #include "tests/planner/answer/answer_support.h"
 
+namespace planner::answer {
+
 namespace {
 
-using namespace answer_test;  // NOLINT
-using answer::Evaluate;
-using answer::Searched;
+using namespace answer_test;  // NOLINT: what all tests of this folder begin with
 
 bool Has(const Answer& answer, FindingKind kind) {
   for (const Finding& note : answer.notes) {
@@ -120,3 +120,5 @@ TEST(Notes, JitterOfTheInput) {
 }
 
 }  // namespace
+
+}  // namespace planner::answer

@@ -9,10 +9,11 @@
 
 #include "tests/planner/answer/answer_support.h"
 
+namespace planner::answer {
+
 namespace {
 
-using namespace answer_test;  // NOLINT
-using namespace planner::answer;  // NOLINT
+using namespace answer_test;  // NOLINT: what all tests of this folder begin with
 using Preference = planner::Rank;
 
 constexpr std::array kPreferences = {Preference::kJitter, Preference::kError, Preference::kMargin,
@@ -185,9 +186,9 @@ TEST(CompareSettings, OfKrusInTheirOrder) {
   second.divide_by_2 = true;
   second.d = 1;
   expect(second, Criterion::kBandwidth);
-  second = {.feedback = true};
+  second = {.feedback = true, .pins = {}};
   expect(second, Criterion::kBandwidth);
-  second = {.primitive = Primitive::kKruClkgen};
+  second = {.primitive = Primitive::kKruClkgen, .pins = {}};
   expect(second, Criterion::kPrimitive);
   second = first;
   second.divide_halves = 5;
@@ -327,10 +328,10 @@ TEST(Rank, IsATotalOrder) {
           if (sign[i][j] == 0) {
             ASSERT_EQ(answers[i].solved, answers[j].solved);
             ASSERT_EQ(answers[i].primitive, answers[j].primitive);
-            if (answers[i].solved) ASSERT_TRUE(SameSettings(answers[i], answers[j]));
+            ASSERT_TRUE(!answers[i].solved || SameSettings(answers[i], answers[j]));
           }
           for (std::size_t k = 0; k < answers.size(); ++k) {
-            if (sign[i][j] <= 0 && sign[j][k] <= 0) ASSERT_LE(sign[i][k], 0);
+            ASSERT_TRUE(sign[i][j] > 0 || sign[j][k] > 0 || sign[i][k] <= 0);
           }
         }
       }
@@ -339,3 +340,5 @@ TEST(Rank, IsATotalOrder) {
 }
 
 }  // namespace
+
+}  // namespace planner::answer
