@@ -131,13 +131,15 @@ int VorkelPtrHandle::TSYNCalculateActualPhase(int objc, Words objv, Tcl_Interp* 
   return call.Answer("%3.3f", imp->TSYNCalculateActualPhase(&phase, &divider, call.Flag(2)));
 }
 
-// The flag, the third argument, has no effect. The engine answers with a fraction.
+// The flag is read as that of the phase is, and has no effect either. The engine answers with a
+// fraction.
 int VorkelPtrHandle::TSYNCalculateActualDutyCycle(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
   const VorkelImp* imp = call.Object(*this, 3, "TSYNCalculateActualDutyCycle");
   if (imp == nullptr) return TCL_ERROR;
   const double dutyCycle = call.Number(0);
   const double divider = call.Number(1);
+  [[maybe_unused]] const bool flag = call.Flag(2);
   return call.Answer("%3.3f", imp->TSYNCalculateActualDutyCycle(&dutyCycle, &divider) * 100.0);
 }
 

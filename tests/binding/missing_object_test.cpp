@@ -73,6 +73,15 @@ TEST_P(EveryMethod, WithTheRightCountAndAnObjectHasOtherAnswers) {
   }
 }
 
+// A word without effect is read like the others; only SetVcoMinThreshold leaves its word alone.
+TEST_P(EveryMethod, ReadsEachOfItsWordsOnce) {
+  const MethodFacts& method = GetParam();
+  Ip::VorkelImp imp(interp_.get());
+  Ip::VorkelPtrHandle handle(&imp, interp_.get());
+  Call(handle, method.arguments);
+  EXPECT_EQ(reads_, method.missingObject == nullptr ? 0 : method.arguments);
+}
+
 INSTANTIATE_TEST_SUITE_P(Methods, EveryMethod, testing::ValuesIn(kMethodFacts),
                          [](const auto& method) { return std::string(method.param.name); });
 
