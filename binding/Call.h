@@ -2,7 +2,9 @@
 // object, convert arguments and set the result.
 //
 // Arguments are numbered from 0, without the handle and the method name. Conversions check
-// nothing: text that is no number reads as 0, and only "true" is a set flag.
+// nothing: text that is no number reads as 0, and only "true" is a set flag. A method reads its
+// words from the first to the last, each converted before the next is looked at: so it holds them
+// in locals, since C++ leaves open in which order the arguments of a call are evaluated.
 #ifndef VORKEL_BINDING_CALL_H_
 #define VORKEL_BINDING_CALL_H_
 

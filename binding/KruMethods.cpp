@@ -10,9 +10,14 @@ int VorkelPtrHandle::KruCalculateActuals(int objc, Words objv, Tcl_Interp* inter
   const Call call(objc, objv, interp);
   VorkelImp* imp = call.Object(*this, 6, "KruCalculateActuals");
   if (imp == nullptr) return TCL_ERROR;
+  const Port::StringBase outFreqs = call.String(0);
+  const Port::StringBase phases = call.String(1);
+  const double inFreq = call.Number(2);
   const int numOut = call.Count(3);
-  const int code = imp->KruCalculateActuals(call.String(0), call.String(1), call.Number(2),
-                                            numOut, call.Flag(4), call.Flag(5));
+  const bool feedbackUsed = call.Flag(4);
+  const bool verbose = call.Flag(5);
+  const int code =
+      imp->KruCalculateActuals(outFreqs, phases, inFreq, numOut, feedbackUsed, verbose);
   return call.AnswerText(KruResultText(false, code, numOut));
 }
 
@@ -21,9 +26,12 @@ int VorkelPtrHandle::KruClkgenCalculateActuals(int objc, Words objv, Tcl_Interp*
   const Call call(objc, objv, interp);
   VorkelImp* imp = call.Object(*this, 5, "KruClkgenCalculateActuals");
   if (imp == nullptr) return TCL_ERROR;
+  const Port::StringBase outFreqs = call.String(0);
+  const Port::StringBase phases = call.String(1);
+  const double inFreq = call.Number(2);
   const int numOut = call.Count(3);
-  const int code = imp->KruClkgenCalculateActuals(call.String(0), call.String(1),
-                                                  call.Number(2), numOut, call.Flag(4));
+  const bool verbose = call.Flag(4);
+  const int code = imp->KruClkgenCalculateActuals(outFreqs, phases, inFreq, numOut, verbose);
   return call.AnswerText(KruResultText(true, code, numOut));
 }
 
@@ -82,7 +90,9 @@ int VorkelPtrHandle::GetKruChosenOutFreqN(int objc, Words objv, Tcl_Interp* inte
   const Call call(objc, objv, interp);
   const VorkelImp* imp = call.Object(*this, 2, "GetKruChosenOutFreqN");
   if (imp == nullptr) return TCL_ERROR;
-  return call.Answer("%4.3f", imp->GetKruChosenOutFreqN(call.Number(0), call.Count(1)));
+  const double inputFreq = call.Number(0);
+  const int n = call.Count(1);
+  return call.Answer("%4.3f", imp->GetKruChosenOutFreqN(inputFreq, n));
 }
 
 }  // namespace Ip

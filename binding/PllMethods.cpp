@@ -11,10 +11,15 @@ namespace {
 // The two minimum-power methods: frequency list, both input frequencies, count, the two
 // option flags and the trace flag.
 int CalculateOutFreqs(const Call& call, VorkelImp& imp, int prim, PllEntry entry) {
+  const Port::StringBase outFreqs = call.String(0);
+  const double inFreq = call.Number(1);
+  const double inFreq2 = call.Number(2);
   const int count = call.Count(3);
-  const int code =
-      imp.CalculateMinPowerOutFreqs(call.String(0), call.Number(1), call.Number(2), count,
-                                    call.Flag(4), call.Flag(5), prim, call.Flag(6));
+  const bool preferMaxVco = call.Flag(4);
+  const bool intDiv0Only = call.Flag(5);
+  const bool verbose = call.Flag(6);
+  const int code = imp.CalculateMinPowerOutFreqs(outFreqs, inFreq, inFreq2, count, preferMaxVco,
+                                                 intDiv0Only, prim, verbose);
   return call.AnswerText(PllResultText(entry, code, count));
 }
 
@@ -44,11 +49,18 @@ int VorkelPtrHandle::GetClosestSolution(int objc, Words objv, Tcl_Interp* interp
   const Call call(objc, objv, interp);
   VorkelImp* imp = call.Object(*this, 10, "GetClosestSolution");
   if (imp == nullptr) return TCL_ERROR;
+  const Port::StringBase outFreqs = call.String(0);
+  const Port::StringBase phases = call.String(1);
+  const Port::StringBase dutyCycles = call.String(2);
+  const double inFreq = call.Number(3);
+  const double inFreq2 = call.Number(4);
   const int count = call.Count(5);
+  const bool preferMaxVco = call.Flag(6);
+  const bool intDiv0Only = call.Flag(7);
   const int prim = call.Flag(8) ? Pll::kPll : Pll::kTsyn;
-  const int code = imp->GetClosestSolution(call.String(0), call.String(1), call.String(2),
-                                           call.Number(3), call.Number(4), count, call.Flag(6),
-                                           call.Flag(7), prim, call.Flag(9));
+  const bool verbose = call.Flag(9);
+  const int code = imp->GetClosestSolution(outFreqs, phases, dutyCycles, inFreq, inFreq2, count,
+                                           preferMaxVco, intDiv0Only, prim, verbose);
   return call.AnswerText(PllResultText(PllEntry::kClosestSolution, code, count));
 }
 

@@ -1,6 +1,7 @@
 #include "tests/binding/FakeStubs.h"
 
 #include <array>
+#include <cstdio>
 
 namespace {
 
@@ -28,7 +29,12 @@ int PkgProvide(Tcl_Interp* interp, const char* name, const char* version) {
   return FakeStubs::Instance().provideStatus;
 }
 
-char* GetString(Tcl_Obj* object) { return reinterpret_cast<char*>(object); }
+char* GetString(Tcl_Obj* object) {
+  static std::array<char, 256> text;
+  std::snprintf(text.data(), text.size(), "%s", reinterpret_cast<const char*>(object));
+  FakeStubs::Instance().reads.push_back(std::string("text ") + text.data());
+  return text.data();
+}
 
 void SetResult(Tcl_Interp* interp, char* text, Tcl_FreeProc* freeProcedure) {
   Note("result " + Address(interp) + (freeProcedure == TCL_VOLATILE ? " volatile" : " kept"));

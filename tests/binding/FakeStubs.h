@@ -19,8 +19,13 @@ struct FakeStubs {
   // The object of a text, which must outlive it.
   static Tcl_Obj* ObjectOf(const std::string& text);
 
-  // Every call, in order: the function, then its arguments as text.
+  // Every call but those of Tcl_GetString, in order: the function, then its arguments as text.
   std::vector<std::string> calls;
+
+  // Every text that Tcl_GetString was asked for, in order, behind the word "text". A test may note
+  // other looks at words among them. A text is gone with the next call, as if all objects were
+  // one; it has at most 255 characters.
+  std::vector<std::string> reads;
 
   // Of the last command created, and of the last result set.
   Tcl_ObjCmdProc* procedure = nullptr;

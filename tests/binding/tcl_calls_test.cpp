@@ -72,7 +72,10 @@ TEST_F(ExportedTable, LoadingTwiceTakesAllStepsAgain) {
 class FakeWord : public Script::Handle {
  public:
   explicit FakeWord(std::string text) : text_(std::move(text)) {}
-  Tcl_Obj* GetTclObj() const override { return FakeStubs::ObjectOf(text_); }
+  Tcl_Obj* GetTclObj() const override {
+    FakeStubs::Instance().reads.push_back("object " + text_);
+    return FakeStubs::ObjectOf(text_);
+  }
   // The text of a word is that of its Tcl object.
   const char* GetString() const override { return "not the text of the object"; }
   int SetResult(Tcl_Interp*) override { return TCL_ERROR; }
@@ -139,6 +142,23 @@ TEST_F(MethodsOnFiveFunctions, AllOfThemAnswer) {
     EXPECT_EQ(stubs_.result, WrongCount(method));
   }
   EXPECT_EQ(stubs_.stubLibraryCalls, 0);
+}
+
+// From the method name on, each word's object and then its text, before anything of the next. The
+// word of SetVcoMinThreshold is the one that nobody looks at.
+TEST_F(MethodsOnFiveFunctions, ReadTheirWordsFromTheFirstToTheLast) {
+  for (const MethodFacts& method : kMethodFacts) {
+    std::vector<std::string> texts = {method.name};
+    for (int i = 1; i <= method.arguments; ++i) texts.push_back(std::to_string(i));
+    const std::size_t wordsRead = method.missingObject == nullptr ? 1 : texts.size();
+    std::vector<std::string> expected;
+    for (std::size_t i = 0; i < wordsRead; ++i) {
+      expected.push_back("object " + texts[i]);
+      expected.push_back("text " + texts[i]);
+    }
+    Execute(texts);
+    EXPECT_EQ(stubs_.reads, expected) << method.name;
+  }
 }
 
 // Arguments are read through their Tcl objects, in the places that the method gives them.
