@@ -1,33 +1,48 @@
 // What the interpreter sees of the library: the entry point that `load` calls, and the
 // command "Ip::Vorkel::Init" that makes a handle.
 //
-// Tested by package.test.
+// Tested by package.test, creation_test.cpp and allocation_test.cpp.
 
 #include <new>
 
 #include "binding/TclCalls.h"
 #include "binding/VorkelPtrHandle.h"
 
+namespace {
+
+// A new object; null when there is no memory for it or for what it is made of.
+template <typename Object, typename... Arguments>
+Object* NewOrNull(Arguments... arguments) {
+  try {
+    return new (std::nothrow) Object(arguments...);
+  } catch (...) {
+    return nullptr;
+  }
+}
+
+}  // namespace
+
 extern "C" {
 
 // "Ip::Vorkel::Init ?word ...?": a new implementation object and a new handle around it, which
-// is the result. All words are ignored.
+// is the result. All words are ignored. It fails only without Tcl and without a handle: what
+// the host answers to the handle as a result is the host's affair, and an object lives until the
+// process ends, whatever has become of its handle.
 int InitVorkel(ClientData, Tcl_Interp* interp, int, Tcl_Obj* const*) {
   if (!Tcl::Bind(interp)) return TCL_ERROR;
   // Without memory for the object the handle has none, and its methods say so.
-  auto* imp = new (std::nothrow) Ip::VorkelImp(interp);
-  Ip::VorkelPtrHandle* handle = nullptr;
+  auto* const imp = NewOrNull<Ip::VorkelImp>(interp);
+  auto* const handle = NewOrNull<Ip::VorkelPtrHandle>(imp, interp);
+  if (handle == nullptr) {
+    Tcl::SetResult(interp, "Ip::Vorkel::Init: out of memory.");
+    return TCL_ERROR;
+  }
   try {
-    handle = new (std::nothrow) Ip::VorkelPtrHandle(imp, interp);
-    if (handle != nullptr && handle->SetResult(interp) == TCL_OK) return TCL_OK;
-  } catch (const std::bad_alloc&) {
+    handle->SetResult(interp);
+  } catch (...) {
     // Tcl is C: nothing may be thrown through it.
   }
-  // No script has seen the object: it goes, unlike one that a handle was made for.
-  delete handle;
-  delete imp;
-  Tcl::SetResult(interp, "Ip::Vorkel::Init: out of memory.");
-  return TCL_ERROR;
+  return TCL_OK;
 }
 
 // Fails only where no Tcl can be called, with Tcl's own message.

@@ -12,6 +12,8 @@ constexpr int kNever = -1;
 constinit std::size_t refusedSize = kNoSize;
 constinit int allocationsUntilRefusal = kNever;
 constinit int refusals = 0;
+constinit std::size_t countedSize = kNoSize;
+constinit int frees = 0;
 
 void* Allocate(std::size_t size) noexcept {
   if (allocationsUntilRefusal != kNever && allocationsUntilRefusal-- == 0) {
@@ -39,6 +41,15 @@ RefuseAfter::~RefuseAfter() { allocationsUntilRefusal = kNever; }
 
 int Refusals() { return refusals; }
 
+CountFrees::CountFrees(std::size_t size) {
+  countedSize = size;
+  frees = 0;
+}
+
+CountFrees::~CountFrees() { countedSize = kNoSize; }
+
+int CountFrees::Count() const { return frees; }
+
 void* operator new(std::size_t size, const std::nothrow_t&) noexcept {
   if (refusedSize != kNoSize && size == refusedSize) {
     ++refusals;
@@ -54,5 +65,8 @@ void* operator new(std::size_t size) {
 }
 
 void operator delete(void* memory) noexcept { std::free(memory); }
-void operator delete(void* memory, std::size_t) noexcept { std::free(memory); }
+void operator delete(void* memory, std::size_t size) noexcept {
+  if (countedSize != kNoSize && size == countedSize) ++frees;
+  std::free(memory);
+}
 void operator delete(void* memory, const std::nothrow_t&) noexcept { std::free(memory); }

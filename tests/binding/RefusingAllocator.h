@@ -1,5 +1,5 @@
-// An allocator that can be told to refuse memory: the operators new and delete of the program
-// that is linked with RefusingAllocator.cpp.
+// An allocator that can be told to refuse memory and to count what is freed: the operators new and
+// delete of the program that is linked with RefusingAllocator.cpp.
 #ifndef VORKEL_TESTS_BINDING_REFUSINGALLOCATOR_H_
 #define VORKEL_TESTS_BINDING_REFUSINGALLOCATOR_H_
 
@@ -26,5 +26,16 @@ class RefuseAfter {
 
 // How many allocations were refused since the last of these objects was made.
 int Refusals();
+
+// While it lives, counts the objects of `size` bytes that are deleted. One at a time.
+class CountFrees {
+ public:
+  explicit CountFrees(std::size_t size);
+  ~CountFrees();
+  CountFrees(const CountFrees&) = delete;
+  CountFrees& operator=(const CountFrees&) = delete;
+
+  int Count() const;
+};
 
 #endif  // VORKEL_TESTS_BINDING_REFUSINGALLOCATOR_H_
