@@ -35,13 +35,14 @@ Dly_SpeedController* ShareController(const PM_PIC* pic) {
 bool VorkelImp::EnsureSpeedController() {
   if (speedController != nullptr) return true;
   if (partName.IsEmpty()) return false;
-  // The host says by an exception that it has no such device, or no data for it.
+  // The host says by an exception that it has no such device or no data for it. One of any other
+  // type comes to the same: there is no controller, and no exception leaves the engine.
   try {
     auto personality = std::make_unique<PM_PIC>(partName, true, PM_PARTNAME_BINDING{});
     personality->fill_defaults();  // what stays open is the controller's to judge
     speedController = ShareController(personality.get());
     pic = personality.release();
-  } catch (const Port::Exception&) {
+  } catch (...) {
     return false;
   }
   return speedController != nullptr;

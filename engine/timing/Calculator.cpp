@@ -10,12 +10,23 @@
 
 namespace Ip {
 
+namespace {
+
+// The calculator of a controller; null when the host has none or throws while it makes one.
+Tw_BmCMBCalculator* CalculatorOf(Dly_SpeedController* controller) {
+  try {
+    return Tw_BmPhysicalBlockModeler::GetCMBCalculator(controller);
+  } catch (...) {
+    return nullptr;
+  }
+}
+
+}  // namespace
+
 // The earlier calculator is replaced, possibly by none, and not deleted: the host answers with
 // the same one for the same controller.
 bool VorkelImp::ObtainCalculator() {
-  if (EnsureSpeedController()) {
-    cmbCalculator = Tw_BmPhysicalBlockModeler::GetCMBCalculator(speedController);
-  }
+  if (EnsureSpeedController()) cmbCalculator = CalculatorOf(speedController);
   if (cmbCalculator != nullptr) return true;
   Message()->issueError(
       "Internal getCMBCalculator() error -- could not obtain CMBCalculator\n");

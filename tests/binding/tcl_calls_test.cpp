@@ -3,13 +3,13 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include <memory>
 #include <string>
 #include <vector>
 
 #include "binding/TclCalls.h"
 #include "binding/VorkelPtrHandle.h"
 #include "tests/binding/FakeStubs.h"
+#include "tests/binding/FakeWords.h"
 #include "tests/binding/MethodFacts.h"
 
 // Defined in binding/PackageEntry.cpp.
@@ -68,40 +68,11 @@ TEST_F(ExportedTable, LoadingTwiceTakesAllStepsAgain) {
   EXPECT_THAT(stubs_.calls, ElementsAre(kCreate, kLoad, kProvide, kCreate, kLoad, kProvide));
 }
 
-// A word whose Tcl object is its text.
-class FakeWord : public Script::Handle {
- public:
-  explicit FakeWord(std::string text) : text_(std::move(text)) {}
-  Tcl_Obj* GetTclObj() const override {
-    FakeStubs::Instance().reads.push_back("object " + text_);
-    return FakeStubs::ObjectOf(text_);
-  }
-  // The text of a word is that of its Tcl object.
-  const char* GetString() const override { return "not the text of the object"; }
-  int SetResult(Tcl_Interp*) override { return TCL_ERROR; }
-  int SetVariable(Tcl_Interp*, const char*) override { return TCL_ERROR; }
-  Script::Handle* CreateHandle(Tcl_Interp*) const override { return nullptr; }
-  Script::PtrHandleBase* GetPtrHandleBase() const override { return nullptr; }
-
- private:
-  std::string text_;
-};
-
 class MethodsOnFiveFunctions : public ExportedTable {
  protected:
   MethodsOnFiveFunctions() { EXPECT_TRUE(Tcl::Bind(FakeStubs::Interp())); }
 
-  int Execute(const std::vector<std::string>& texts) {
-    stubs_ = FakeStubs{};
-    std::vector<std::unique_ptr<FakeWord>> words;
-    std::vector<const Script::Handle*> pointers = {&handle_};
-    for (const std::string& text : texts) {
-      words.push_back(std::make_unique<FakeWord>(text));
-      pointers.push_back(words.back().get());
-    }
-    return handle_.Execute(static_cast<int>(pointers.size()), pointers.data(),
-                           FakeStubs::Interp());
-  }
+  int Execute(const std::vector<std::string>& texts) { return ExecuteFake(handle_, texts); }
 
   Ip::VorkelImp imp_{FakeStubs::Interp()};
   Ip::VorkelPtrHandle handle_{&imp_, FakeStubs::Interp()};

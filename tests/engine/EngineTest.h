@@ -3,8 +3,11 @@
 #define VORKEL_TESTS_ENGINE_ENGINETEST_H_
 
 #include <cmath>
+#include <functional>
 #include <limits>
 #include <memory>
+#include <new>
+#include <stdexcept>
 #include <string>
 #include <vector>
 
@@ -39,6 +42,12 @@ std::string TraceOf(Stage stage, bool on = true) {
     stage(trace);
   }
   return capture.Text();
+}
+
+// Actions that throw what no host service promises to.
+inline std::vector<std::function<void()>> Throwers() {
+  return {[] { throw std::bad_alloc(); }, [] { throw std::runtime_error("broken"); },
+          [] { throw 17; }};
 }
 
 inline std::string Repeat(const std::string& text, int times) {

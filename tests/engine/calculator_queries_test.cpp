@@ -326,6 +326,22 @@ TEST_F(CalculatorQueries, NeedADeviceThatThereIs) {
   unknown.cmbCalculator = nullptr;
 }
 
+TEST_F(CalculatorQueries, NeedAHostThatMakesTheCalculator) {
+  queries_[0]();
+  for (const auto& action : engine_test::Throwers()) {
+    for (const auto& query : queries_) {
+      host_.whileCalculatorIsMade = action;
+      host_.messages.clear();
+      EXPECT_FALSE(query());
+      EXPECT_TRUE(error_.IsEmpty());
+      EXPECT_THAT(host_.MessageTexts(), ElementsAre(kNoCalculator));
+      EXPECT_EQ(imp_.cmbCalculator, nullptr) << "the earlier one is no answer";
+      host_.whileCalculatorIsMade = nullptr;
+      EXPECT_TRUE(query());
+    }
+  }
+}
+
 TEST_F(CalculatorQueries, NeedSpeedData) {
   host_.withoutSpeedData.push_back(kPart);
   EXPECT_FALSE(queries_[0]());

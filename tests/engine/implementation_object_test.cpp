@@ -257,6 +257,24 @@ TEST_F(ImplementationObjectTest, ADeviceWithoutSpeedDataFailsAndTheNextOneWorks)
   EXPECT_NE(imp_.pic, nullptr);
 }
 
+// The host promises exceptions of one type. What else its constructors may throw is a failed
+// creation all the same.
+TEST_F(ImplementationObjectTest, WhateverTheHostThrowsIsAFailedCreation) {
+  const int personalities = host_.personalities;
+  imp_.SetDevice("first");
+  for (auto* const place : {&host_.whilePersonalityIsMade, &host_.whileControllerIsMade}) {
+    for (const auto& action : engine_test::Throwers()) {
+      *place = action;
+      EXPECT_FALSE(imp_.EnsureSpeedController());
+      EXPECT_EQ(imp_.pic, nullptr);
+      EXPECT_EQ(imp_.speedController, nullptr);
+      EXPECT_EQ(host_.personalities, personalities);
+    }
+    *place = nullptr;
+  }
+  EXPECT_TRUE(imp_.EnsureSpeedController());
+}
+
 TEST_F(ImplementationObjectTest, AFailedDeviceCanBeTriedAgain) {
   host_.withoutSpeedData = {"first"};
   imp_.SetDevice("first");

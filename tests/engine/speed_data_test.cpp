@@ -136,6 +136,16 @@ TEST_F(SpeedDataTest, ADeviceWithoutSpeedDataIsReported) {
   EXPECT_THAT(host_.reads, IsEmpty());
 }
 
+TEST_F(SpeedDataTest, ADeviceAtWhichTheHostThrowsIsReported) {
+  for (const auto& action : engine_test::Throwers()) {
+    host_.messages.clear();
+    host_.whileControllerIsMade = action;
+    EXPECT_FALSE(DeviceImp().GetSpdKeyValue("KEY", &value_));
+    EXPECT_EQ(value_, kUntouched);
+    EXPECT_THAT(host_.MessageTexts(), ElementsAre(kNotLoaded));
+  }
+}
+
 TEST_F(SpeedDataTest, MessagesSayWhereTheyComeFrom) {
   engine_test::NewImp().GetSpdKeyValue("", &value_);
   engine_test::NewImp().GetSpdKeyValue("KEY", &value_);

@@ -17,6 +17,14 @@ FakeHost& FakeHost::Instance() {
   return host;
 }
 
+namespace {
+
+void Run(const std::function<void()>& action) {
+  if (action) action();
+}
+
+}  // namespace
+
 void FakeHost::Reset() {
   const int living = personalities;
   *this = FakeHost{};
@@ -76,6 +84,7 @@ PM_PIC::PM_PIC(const Port::StringBase& partName, bool, PM_PARTNAME_BINDING)
   if (!FakeHost::Instance().devices.contains(data_->part)) {
     throw Port::Exception("Fake", "no such device");
   }
+  Run(FakeHost::Instance().whilePersonalityIsMade);
   ++FakeHost::Instance().personalities;
 }
 
@@ -96,6 +105,7 @@ Dly_SpeedController::Dly_SpeedController(const PM_PIC* pic) : data_(std::make_un
   if (std::find(without.begin(), without.end(), data_->part) != without.end()) {
     throw Port::Exception("Fake", "no speed data");
   }
+  Run(FakeHost::Instance().whileControllerIsMade);
   ++FakeHost::Instance().controllers;
 }
 
@@ -149,5 +159,6 @@ bool Tw_BmCMBCalculator::Unused(Port::StringBase*) { return false; }
 
 Tw_BmCMBCalculator* Tw_BmPhysicalBlockModeler::GetCMBCalculator(Dly_SpeedController*) {
   ++FakeHost::Instance().calculatorRequests;
+  Run(FakeHost::Instance().whileCalculatorIsMade);
   return FakeHost::Instance().calculator;
 }

@@ -5,6 +5,7 @@
 #ifndef VORKEL_TESTS_SUPPORT_FAKEHOST_H_
 #define VORKEL_TESTS_SUPPORT_FAKEHOST_H_
 
+#include <functional>
 #include <map>
 #include <string>
 #include <vector>
@@ -25,6 +26,11 @@ struct FakeHost {
 
   // Parts whose personality can be created but whose controller cannot.
   std::vector<std::string> withoutSpeedData;
+
+  // Run while a personality, a controller or a calculator is made; they may throw.
+  std::function<void()> whilePersonalityIsMade;
+  std::function<void()> whileControllerIsMade;
+  std::function<void()> whileCalculatorIsMade;
 
   struct Message {
     std::string category, source, revision, text;
