@@ -1,11 +1,9 @@
 #include "binding/Call.h"
 
-#include <algorithm>
 #include <array>
 #include <cstdarg>
 #include <cstdio>
 #include <cstdlib>
-#include <limits>
 #include <string>
 
 namespace Ip {
@@ -45,10 +43,9 @@ const char* Call::Text(int argument) const {
 double Call::Number(int argument) const { return std::atof(Text(argument)); }
 
 int Call::Count(int argument) const {
-  // As atoi, which leaves open what becomes of text that no int can hold.
-  const long value = std::strtol(Text(argument), nullptr, 10);
-  return static_cast<int>(std::clamp<long>(value, std::numeric_limits<int>::min(),
-                                           std::numeric_limits<int>::max()));
+  // What atoi does here, written out: of text that no int can hold C leaves its answer open, while
+  // a conversion to int is defined.
+  return static_cast<int>(std::strtol(Text(argument), nullptr, 10));
 }
 
 bool Call::Flag(int argument) const {

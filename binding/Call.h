@@ -30,7 +30,8 @@ class Call {
   const char* Text(int argument) const;
   Port::StringBase String(int argument) const { return Text(argument); }
   double Number(int argument) const;
-  // A count or an index. What an int cannot hold reads as the nearest int.
+  // A count or an index, as atoi reads it: of a number that no int holds, the low 32 bits. A
+  // number that no long holds is the nearest long before that.
   int Count(int argument) const;
   bool Flag(int argument) const;
 
