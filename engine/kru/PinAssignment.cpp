@@ -59,49 +59,59 @@ constexpr Range kClkdvByT = {&L::_kruClkdvMin, &L::_kruClkdvMax, &L::_kruClkdvMa
 constexpr Range kClk2x = {&L::_kruClk2xMin, &L::_kruClk2xMax, &L::_kruClk2xMax, byF};
 constexpr Range kClkfx = {&L::_kruClkfxMin, &L::_kruClkfxMax, &L::_kruClkfxMax, byF};
 
+// A list of pins, and the flag that CLK2X on its output 0 sets.
+struct List {
+  KruPinList KruState::*pins;
+  bool Feedback2x::*feedback2x;
+};
+constexpr List kListF = {&KruState::_kruPinsDivBy2F, byF};
+constexpr List kListT = {&KruState::_kruPinsDivBy2T, byT};
+
 // What a row puts into one list: a pin, when the frequency is in its range.
 struct Use {
+  List list = kListF;
   KruPin pin = KruPin::NONE;
   Range range = kClkfx;
 };
 
 // A row of a table: the phase above the offset; without feedback, the pin of both lists, if
-// CLKFX has the range for it; with feedback, what goes into each list, and the CLKDV value that
-// list F needs then, whether or not its range test holds.
+// CLKFX has the range for it; with feedback, what goes into the lists, in the order in which the
+// ranges are tested and their refusals traced, and the CLKDV value that list F needs then, whether
+// or not its range test holds.
 struct Row {
   double phase;
   KruPin withoutFeedback;
-  Use f;
-  Use t;
+  Use first;
+  Use second = {};
   double clkdvF = 0.0;
 };
 
 using enum KruPin;
-constexpr Use kNothing = {};
 
 // The output has the input frequency. That CLK90 goes by the flag of list T, and CLK270 by that
 // of list F, is meant so.
 constexpr Row kInputFrequency[] = {
-    //  phase  no feedback  list F               list T
-    {0.0, CLKFX, {CLK0, kClk0ByF}, {CLK2X, kClk2x}},
-    {90.0, NONE, {CLK90, kClk90ByT}, kNothing},
-    {180.0, CLKFX180, {CLK180, kClk0ByF}, {CLK2X180, kClk2x}},
-    {270.0, NONE, {CLK270, kClk90ByF}, kNothing},
+    //  phase  no feedback  with feedback
+    {0.0, CLKFX, {kListF, CLK0, kClk0ByF}, {kListT, CLK2X, kClk2x}},
+    {90.0, NONE, {kListF, CLK90, kClk90ByT}},
+    {180.0, CLKFX180, {kListF, CLK180, kClk0ByF}, {kListT, CLK2X180, kClk2x}},
+    {270.0, NONE, {kListF, CLK270, kClk90ByF}},
 };
 
 // Half the input frequency. Where CLKDV is out of range its value is recorded all the same;
-// that is meant so, and the search for one common value sees it.
+// that is meant so, and the search for one common value sees it. List T, whose CLK0 has the
+// frequency as it is, comes first.
 constexpr Row kHalfFrequency[] = {
-    {0.0, CLKFX, {CLKDV, kClkdvByF}, {CLK0, kClk0ByT}, 2.0},
-    {90.0, NONE, kNothing, {CLK90, kClk90ByT}},
-    {180.0, CLKFX180, kNothing, {CLK180, kClk0ByT}},
-    {270.0, NONE, kNothing, {CLK270, kClk90ByT}},
+    {0.0, CLKFX, {kListT, CLK0, kClk0ByT}, {kListF, CLKDV, kClkdvByF}, 2.0},
+    {90.0, NONE, {kListT, CLK90, kClk90ByT}},
+    {180.0, CLKFX180, {kListT, CLK180, kClk0ByT}},
+    {270.0, NONE, {kListT, CLK270, kClk90ByT}},
 };
 
 // Twice the input frequency.
 constexpr Row kDoubleFrequency[] = {
-    {0.0, CLKFX, {CLK2X, kClk2x}, {CLKFX, kClkfx}},
-    {180.0, CLKFX180, {CLK2X180, kClk2x}, kNothing},
+    {0.0, CLKFX, {kListF, CLK2X, kClk2x}, {kListT, CLKFX, kClkfx}},
+    {180.0, CLKFX180, {kListF, CLK2X180, kClk2x}},
 };
 
 // The assignment of one run.
@@ -142,9 +152,9 @@ class Assignment {
     for (const Row& row : table) {
       if (!PhaseIs(row.phase)) continue;
       if (run_.feedbackUsed) {
-        Put(row.f, kru_._kruPinsDivBy2F, feedback2x_.f);
+        Put(row.first);
+        Put(row.second);
         clkdv_.f[output_] = row.clkdvF;
-        Put(row.t, kru_._kruPinsDivBy2T, feedback2x_.t);
       } else if (row.withoutFeedback != NONE && InRangeOf(row.withoutFeedback, kClkfx)) {
         kru_._kruPinsDivBy2F[output_] = row.withoutFeedback;
         kru_._kruPinsDivBy2T[output_] = row.withoutFeedback;
@@ -153,11 +163,11 @@ class Assignment {
     }
   }
 
-  // Puts a pin into a list, if its range holds the frequency.
-  void Put(const Use& use, KruPinList& list, bool& feedback2x) {
+  // Puts a pin into its list, if its range holds the frequency.
+  void Put(const Use& use) {
     if (use.pin == NONE || !InRangeOf(use.pin, use.range)) return;
-    list[output_] = use.pin;
-    if (use.pin == CLK2X && output_ == 0) feedback2x = true;
+    (kru_.*use.list.pins)[output_] = use.pin;
+    if (use.pin == CLK2X && output_ == 0) feedback2x_.*use.list.feedback2x = true;
   }
 
   // True when the range holds the frequency; else the trace says that the pin cannot be used.

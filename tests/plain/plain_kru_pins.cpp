@@ -114,9 +114,9 @@ void AssignHalfFrequency(const Output& o, Assignment& a) {
   int& pin_f = a.state.pinsF[o.n];
   int& pin_t = a.state.pinsT[o.n];
   if (o.p == o.off) {
+    SetIf(InClk0Range(a, o.f, a.flagT), pin_t, kPinClk0, o.f, a.trace);
     SetIf(InClkdvRange(a, o.f, a.flagF), pin_f, kPinClkdv, o.f, a.trace);
     a.clkdv.f[o.n] = 2.0;
-    SetIf(InClk0Range(a, o.f, a.flagT), pin_t, kPinClk0, o.f, a.trace);
   } else if (o.p == o.off + 90.0) {
     SetIf(InClk90Range(a, o.f, a.flagT), pin_t, kPinClk90, o.f, a.trace);
   } else if (o.p == o.off + 180.0) {
