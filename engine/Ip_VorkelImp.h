@@ -181,7 +181,8 @@ class VorkelImp {
   KruState kru;
 
   // The primitive of the current PLL/TSYN run: 1 PLL, 0 TSYN, -1 before the first. One value
-  // for the whole process, not for each object; every solver pass sets it.
+  // for the whole process, not for each object; every solver pass sets it, and the trace prints
+  // it. Decisions are made by the run's own (Pll::Run).
   static std::int32_t _prim;
 };
 

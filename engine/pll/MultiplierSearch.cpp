@@ -27,14 +27,17 @@ static_assert(kFractionalStep * hardware::kEighths == 1.0);
 
 }  // namespace
 
-bool SearchMAndD(VcoCandidate& candidate, double inFreq, double pfdMin, double pfdMax,
-                 bool integerStep, const Trace& trace) {
+bool SearchMAndD(VcoCandidate& candidate, double pfdMin, double pfdMax, bool integerStep,
+                 const Run& run) {
+  const double inFreq = run.inFreq;
+  const Trace& trace = run.trace;
+  const bool hasGap = run.prim == kTsyn;
   TRACE(trace, "DLL - RK --> _prim = %d \n", VorkelImp::_prim);
   double m = 1.0;
   for (int trial = 0; trial < kTrials; ++trial) {
     if (trial == 1) m = 2.0;
     if (trial > 1) m += integerStep ? kIntegerStep : kFractionalStep;
-    if (VorkelImp::_prim == kTsyn && m >= kTsynGapBegin && m < kTsynGapEnd) {
+    if (hasGap && m >= kTsynGapBegin && m < kTsynGapEnd) {
       m = kTsynGapEnd;
     } else if (m > kLargestM) {
       return false;
@@ -61,16 +64,16 @@ bool SearchMAndD(VcoCandidate& candidate, double inFreq, double pfdMin, double p
   return false;
 }
 
-bool CalculateMAndD(VorkelImp& imp, double inFreq, bool integerStep, const Trace& trace) {
+bool CalculateMAndD(VorkelImp& imp, bool integerStep, const Run& run) {
   VcoCandidateTable& candidates = imp.pll._vcoCandidates;
+  const Trace& trace = run.trace;
   TRACE(trace, "DLL------- Calculating M and D\n");
   const double pfdMax = PfdMaximum(imp);
   if (imp.lowBandwidth) {
     TRACE(trace, "DLL  --- Using _maxPfdLowB (%f) for PFD max\n", pfdMax);
   }
   for (const int slot : candidates.Occupied()) {
-    if (!SearchMAndD(candidates[slot], inFreq, imp.pllLimits.pfdMin, pfdMax, integerStep,
-                     trace)) {
+    if (!SearchMAndD(candidates[slot], imp.pllLimits.pfdMin, pfdMax, integerStep, run)) {
       candidates.Empty(slot);
     }
   }

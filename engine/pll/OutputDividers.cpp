@@ -50,11 +50,12 @@ int FirstTolerance(double error) {
 namespace {
 
 // Keeps the candidates that serve output n at the smallest tolerance at which any does.
-bool FindDivider(VorkelImp& imp, int n, const Trace& trace) {
+bool FindDivider(VorkelImp& imp, int n, const Run& run) {
+  const Trace& trace = run.trace;
   const auto output = static_cast<std::size_t>(n);
   VcoCandidateTable& candidates = imp.pll._vcoCandidates;
   const double requested = imp.requests.reqOutFreq[output];
-  const OutputRange range = RangeOfOutput(imp.pllLimits, n);
+  const OutputRange range = RangeOfOutput(imp.pllLimits, run.prim, n);
   TRACE(trace, "DLL----- Looking for valid div%d from remaining VCOs\n", n);
 
   int narrowest = kTolerances;
@@ -102,8 +103,8 @@ double Tolerance(int number) { return kToleranceValues[static_cast<std::size_t>(
 
 // Output 1 of a PLL may drive an I/O clock, which goes higher; that the others may not is
 // meant so.
-OutputRange RangeOfOutput(const PllLimits& limits, int n) {
-  const bool ioClock = VorkelImp::_prim == kPll && n == 1;
+OutputRange RangeOfOutput(const PllLimits& limits, int prim, int n) {
+  const bool ioClock = prim == kPll && n == 1;
   return {limits.clkoutMin, ioClock ? limits.clkoutMaxIo : limits.clkoutMax};
 }
 
@@ -118,9 +119,9 @@ OutputFit FitOutput(double vco, double requested, const OutputRange& range) {
   return {divider, diff, inRange ? FirstTolerance(diff / requested) : kTolerances};
 }
 
-bool FindOutputDividers(VorkelImp& imp, int count, const Trace& trace) {
-  for (int n = 1; n < count; ++n) {
-    if (!FindDivider(imp, n, trace)) return false;
+bool FindOutputDividers(VorkelImp& imp, const Run& run) {
+  for (int n = 1; n < run.count; ++n) {
+    if (!FindDivider(imp, n, run)) return false;
   }
   return true;
 }

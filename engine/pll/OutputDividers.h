@@ -29,12 +29,12 @@ struct OutputFit {
                   // of the output range
 };
 
-// The range of frequencies of output n (MHz).
+// The range of frequencies of output n of a primitive (MHz).
 struct OutputRange {
   double min;
   double max;
 };
-OutputRange RangeOfOutput(const PllLimits& limits, int n);
+OutputRange RangeOfOutput(const PllLimits& limits, int prim, int n);
 
 // The divider, a whole number from 1 to 128, nearest to the ratio of `vco` and `requested`
 // (both MHz), and what comes of it. A NaN has the divider 0, and no tolerance.

@@ -76,8 +76,8 @@ bool SolverPass(VorkelImp& imp, double fudge, const Run& run) {
                                        upward ? fudge : 0.0 - fudge, integerDiv0, run.trace);
     }
     if (created > 0) {
-      if (run.count > 1 && !FindOutputDividers(imp, run.count, run.trace)) continue;
-      if (!CalculateMAndD(imp, run.inFreq, true, run.trace)) continue;
+      if (run.count > 1 && !FindOutputDividers(imp, run)) continue;
+      if (!CalculateMAndD(imp, true, run)) continue;
     }
     pll.chosen = Choose(imp, run);
     if (pll.chosen != nullptr) {

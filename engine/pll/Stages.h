@@ -13,7 +13,8 @@
 // 50 MHz (8, 12, 16, 20) and an M with D = 1 (4, 6, 8, 10). The smallest VCO wins: 400 MHz.
 //
 // All stages work on the candidate table of the implementation object. What they read of the
-// request beside its lists is in Run.
+// request beside its lists is in Run, the primitive among it; that of the process
+// (VorkelImp::_prim), which every pass sets to the same, is for the trace.
 #ifndef VORKEL_ENGINE_PLL_STAGES_H_
 #define VORKEL_ENGINE_PLL_STAGES_H_
 
@@ -60,17 +61,17 @@ int EnumerateVcoCandidates(VorkelImp& imp, double reqOutFreq0, double fudge, boo
 // OutputDividers.cpp: finds the dividers of outputs 1 to count - 1 and drops the candidates
 // that have none. False when an output has no divider on any candidate within the largest
 // tolerance; the table then holds what that output met.
-bool FindOutputDividers(VorkelImp& imp, int count, const Trace& trace);
+bool FindOutputDividers(VorkelImp& imp, const Run& run);
 
 // MultiplierSearch.cpp: finds M and D of every candidate and drops those that have none.
 // False when none is left. `integerStep`: M takes whole values, else steps of 0.125.
-bool CalculateMAndD(VorkelImp& imp, double inFreq, bool integerStep, const Trace& trace);
+bool CalculateMAndD(VorkelImp& imp, bool integerStep, const Run& run);
 
 // The same for one candidate: the smallest M with inFreq x M / D equal to the candidate's VCO
 // within the remainder, and inFreq / D in [pfdMin, pfdMax] (MHz, inclusive). Sets m and d, or
 // returns false.
-bool SearchMAndD(VcoCandidate& candidate, double inFreq, double pfdMin, double pfdMax,
-                 bool integerStep, const Trace& trace);
+bool SearchMAndD(VcoCandidate& candidate, double pfdMin, double pfdMax, bool integerStep,
+                 const Run& run);
 
 // PhaseAndDuty.cpp: works out the phase and duty cycle nearest to the request, and the
 // distances, of every candidate and output.

@@ -63,9 +63,9 @@ void VisitDivider(double divider, double f, const OutputRange& range, double end
 
 // The same for all dividers of output n that the VCO range can need. The last end is infinite.
 template <typename Visit>
-void VisitEnds(const VorkelImp& imp, int n, Visit visit) {
+void VisitEnds(const VorkelImp& imp, const Run& run, int n, Visit visit) {
   const double f = imp.requests.reqOutFreq[static_cast<std::size_t>(n)];
-  const OutputRange range = RangeOfOutput(imp.pllLimits, n);
+  const OutputRange range = RangeOfOutput(imp.pllLimits, run.prim, n);
   if (range.min <= range.max && std::isfinite(f)) {
     if (std::signbit(f)) {
       // A negative request, -0 among them, takes a divider of 1 and keeps every tolerance.
@@ -85,13 +85,13 @@ void VisitEnds(const VorkelImp& imp, int n, Visit visit) {
 
 // Appends the digit of output n to the keys and cuts the stretches where it changes. Where ends
 // meet goes to `points`.
-Stretches CutByOutput(const VorkelImp& imp, int n, const Stretches& stretches,
+Stretches CutByOutput(const VorkelImp& imp, const Run& run, int n, const Stretches& stretches,
                       std::vector<double>& points) {
   Stretches cut;
   cut.reserve(2 * stretches.size());
   auto stretch = stretches.begin();
   double low = stretch->low;
-  VisitEnds(imp, n, [&](double high, int digit) {
+  VisitEnds(imp, run, n, [&](double high, int digit) {
     if (AreClose(high, low)) points.push_back(low);
     while (stretch != stretches.end() && low < high) {
       if (AreClose(high, stretch->high)) points.push_back(high);
@@ -110,11 +110,11 @@ Stretches CutByOutput(const VorkelImp& imp, int n, const Stretches& stretches,
 }
 
 // The VCO range in stretches, none when it is empty; and where ends meet.
-Stretches FindStretches(const VorkelImp& imp, int count, std::vector<double>& points) {
+Stretches FindStretches(const VorkelImp& imp, const Run& run, std::vector<double>& points) {
   const double low = std::max(imp.pll.minAdjVco, kSmallestVco);
   if (!(low <= imp.pll.maxAdjVco && std::isfinite(low))) return {};
   Stretches stretches = {{low, imp.pll.maxAdjVco, 0, true}};
-  for (int n = 1; n < count; ++n) stretches = CutByOutput(imp, n, stretches, points);
+  for (int n = 1; n < run.count; ++n) stretches = CutByOutput(imp, run, n, stretches, points);
   return stretches;
 }
 
@@ -144,24 +144,24 @@ int DigitOfPoint(double point, double f, const OutputRange& range) {
   return digit;
 }
 
-Stretch MakePoint(const VorkelImp& imp, int count, double point) {
+Stretch MakePoint(const VorkelImp& imp, const Run& run, double point) {
   Stretch made = {point, point, 0, true};
-  for (int n = 1; n < count; ++n) {
+  for (int n = 1; n < run.count; ++n) {
     made.AppendDigit(DigitOfPoint(point, imp.requests.reqOutFreq[static_cast<std::size_t>(n)],
-                                  RangeOfOutput(imp.pllLimits, n)));
+                                  RangeOfOutput(imp.pllLimits, run.prim, n)));
   }
   return made;
 }
 
 // The stretches and the points, rising.
-Stretches FindStretchesAndPoints(const VorkelImp& imp, int count) {
+Stretches FindStretchesAndPoints(const VorkelImp& imp, const Run& run) {
   std::vector<double> points;
-  Stretches all = FindStretches(imp, count, points);
+  Stretches all = FindStretches(imp, run, points);
   if (all.empty()) return all;
-  AddMultiples(imp, count, points);
+  AddMultiples(imp, run.count, points);
   std::sort(points.begin(), points.end());
   points.erase(std::unique(points.begin(), points.end()), points.end());
-  for (const double point : points) all.push_back(MakePoint(imp, count, point));
+  for (const double point : points) all.push_back(MakePoint(imp, run, point));
   std::sort(all.begin(), all.end(),
             [](const Stretch& a, const Stretch& b) { return a.low < b.low; });
   return all;
@@ -174,7 +174,7 @@ VcoRanking RankVcos(const VorkelImp& imp, const Run& run) {
   const VcoWindows windows = FindVcoWindows(imp, run);
   if (windows.empty()) return ranking;
   auto window = windows.begin();
-  for (const Stretch& stretch : FindStretchesAndPoints(imp, run.count)) {
+  for (const Stretch& stretch : FindStretchesAndPoints(imp, run)) {
     using Kind = RankedRange::Kind;
     ranking.push_back({stretch.low, stretch.high, stretch.key,
                        stretch.isServed ? Kind::kServed : Kind::kUnserved});

@@ -56,7 +56,7 @@ struct RankedRange {
 // M, a D and all dividers.
 using VcoRanking = std::vector<RankedRange>;
 
-// The ranking for a run whose VCO range is prepared and whose primitive is that of the process.
+// The ranking for a run whose VCO range is prepared.
 VcoRanking RankVcos(const VorkelImp& imp, const Run& run);
 
 }  // namespace Ip::Pll

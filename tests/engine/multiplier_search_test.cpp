@@ -30,7 +30,13 @@ constexpr double kNoMaximum = 1e9;
 // One candidate. D before rounding is inFreq * M / vco and the PFD frequency vco / M.
 class MultiplierSearchTest : public testing::Test {
  protected:
-  MultiplierSearchTest() { VorkelImp::_prim = kPll; }
+  MultiplierSearchTest() { SetPrim(kPll); }
+
+  // The primitive of the run and, as a pass sets it, of the process.
+  void SetPrim(int prim) {
+    prim_ = prim;
+    VorkelImp::_prim = prim;
+  }
 
   bool Search(double vco, double inFreq, double pfdMin = kNoMinimum, double pfdMax = kNoMaximum,
               bool integerStep = true) {
@@ -38,7 +44,8 @@ class MultiplierSearchTest : public testing::Test {
     candidate_.vco = vco;
     bool found = false;
     trace_ = engine_test::TraceOf([&](const Trace& trace) {
-      found = Ip::Pll::SearchMAndD(candidate_, inFreq, pfdMin, pfdMax, integerStep, trace);
+      found = Ip::Pll::SearchMAndD(candidate_, pfdMin, pfdMax, integerStep,
+                                   {inFreq, 1, prim_, trace});
     });
     return found;
   }
@@ -47,6 +54,7 @@ class MultiplierSearchTest : public testing::Test {
     return Search(vco, inFreq, kNoMinimum, kNoMaximum, false);
   }
 
+  int prim_ = kPll;
   VcoCandidate candidate_{};
   std::string trace_;
 };
@@ -183,7 +191,7 @@ TEST_F(MultiplierSearchTest, DIsAbove0Point5) {
 TEST_F(MultiplierSearchTest, MIsAtMost64) {
   // D is M / 64, and M / 65.
   for (const int prim : {kPll, kTsyn}) {
-    VorkelImp::_prim = prim;
+    SetPrim(prim);
     EXPECT_TRUE(Search(640, 10));
     EXPECT_EQ(candidate_.m, 64.0);
     EXPECT_EQ(candidate_.d, 1u);
@@ -193,7 +201,7 @@ TEST_F(MultiplierSearchTest, MIsAtMost64) {
 
 TEST_F(MultiplierSearchTest, MOf1IsTried) {
   for (const int prim : {kPll, kTsyn}) {
-    VorkelImp::_prim = prim;
+    SetPrim(prim);
     EXPECT_TRUE(Search(600, 600));
     EXPECT_EQ(candidate_.m, 1.0);
     EXPECT_EQ(candidate_.d, 1u);
@@ -204,7 +212,7 @@ TEST_F(MultiplierSearchTest, MOf1IsTried) {
 }
 
 TEST_F(MultiplierSearchTest, ATsynGoesFrom1To5) {
-  VorkelImp::_prim = kTsyn;
+  SetPrim(kTsyn);
   EXPECT_TRUE(Search(600, 100));
   EXPECT_EQ(candidate_.m, 6.0);
   EXPECT_EQ(trace_,
@@ -227,7 +235,7 @@ TEST_F(MultiplierSearchTest, ATsynGoesFrom1To5) {
 
 TEST_F(MultiplierSearchTest, EveryOtherPrimitiveHas2To4) {
   for (const int prim : {kPll, -1, 2}) {
-    VorkelImp::_prim = prim;
+    SetPrim(prim);
     for (const int m : {2, 3, 4}) {
       EXPECT_TRUE(Search(m * 100, 100));
       EXPECT_EQ(candidate_.m, m);
@@ -235,6 +243,19 @@ TEST_F(MultiplierSearchTest, EveryOtherPrimitiveHas2To4) {
     }
     EXPECT_TRUE(trace_.starts_with("DLL - RK --> _prim = " + std::to_string(prim) + " \n"));
   }
+}
+
+// The trace prints the primitive of the process; the gap is that of the run's own.
+TEST_F(MultiplierSearchTest, ThePrimitiveOfTheProcessIsForTheTraceOnly) {
+  VorkelImp::_prim = kTsyn;
+  EXPECT_TRUE(Search(200, 100));
+  EXPECT_EQ(candidate_.m, 2.0);
+  EXPECT_TRUE(trace_.starts_with("DLL - RK --> _prim = 0 \n"));
+  prim_ = kTsyn;
+  VorkelImp::_prim = kPll;
+  EXPECT_TRUE(Search(200, 100));
+  EXPECT_EQ(candidate_.m, 6.0);
+  EXPECT_TRUE(trace_.starts_with("DLL - RK --> _prim = 1 \n"));
 }
 
 // --- Steps of an eighth ------------------------------------------------------------------------
@@ -259,7 +280,7 @@ TEST_F(MultiplierSearchTest, WholeStepsHaveNoFractions) {
 }
 
 TEST_F(MultiplierSearchTest, FractionalStepsOfATsynBeginAt5) {
-  VorkelImp::_prim = kTsyn;
+  SetPrim(kTsyn);
   EXPECT_TRUE(SearchFractional(512.5, 100));
   EXPECT_EQ(candidate_.m, 5.125);
   EXPECT_EQ(candidate_.d, 1u);
@@ -271,7 +292,7 @@ TEST_F(MultiplierSearchTest, FractionalStepsOfATsynBeginAt5) {
 
 TEST_F(MultiplierSearchTest, FractionalStepsEndAt64) {
   for (const int prim : {kPll, kTsyn}) {
-    VorkelImp::_prim = prim;
+    SetPrim(prim);
     EXPECT_TRUE(SearchFractional(640, 10)) << prim;
     EXPECT_EQ(candidate_.m, 64.0) << prim;
     EXPECT_TRUE(SearchFractional(638.75, 10)) << prim;
@@ -303,7 +324,7 @@ TEST_F(MultiplierSearchTest, ASearchThatFailsLeavesTheCandidate) {
   candidate_.m = 3;
   candidate_.d = 2;
   const Trace silent(false);
-  EXPECT_FALSE(Ip::Pll::SearchMAndD(candidate_, 100, 0, 1e9, true, silent));
+  EXPECT_FALSE(Ip::Pll::SearchMAndD(candidate_, 0, 1e9, true, {100, 1, kPll, silent}));
   EXPECT_EQ(candidate_.m, 3.0);
   EXPECT_EQ(candidate_.d, 2u);
 }
@@ -322,7 +343,7 @@ class CalculateMAndDTest : public testing::Test {
   bool Calculate(double inFreq, bool integerStep = true) {
     bool found = false;
     trace_ = engine_test::TraceOf([&](const Trace& trace) {
-      found = Ip::Pll::CalculateMAndD(imp_, inFreq, integerStep, trace);
+      found = Ip::Pll::CalculateMAndD(imp_, integerStep, {inFreq, 1, kPll, trace});
     });
     return found;
   }
@@ -434,9 +455,9 @@ TEST_F(CalculateMAndDTest, IsSilentWithTheTraceOff) {
   imp_.SetLowBandwidth(true);
   const std::string text = engine_test::TraceOf(
       [&](const Trace& trace) {
-        Ip::Pll::CalculateMAndD(imp_, 100, true, trace);
+        Ip::Pll::CalculateMAndD(imp_, true, {100, 1, kPll, trace});
         table_.EmptyAll();
-        Ip::Pll::CalculateMAndD(imp_, 100, true, trace);
+        Ip::Pll::CalculateMAndD(imp_, true, {100, 1, kPll, trace});
       },
       false);
   EXPECT_EQ(text, "");

@@ -50,7 +50,6 @@ std::string GivenUp(int n) {
 class OutputDividersTest : public testing::Test {
  protected:
   OutputDividersTest() {
-    VorkelImp::_prim = 1;
     imp_.pllLimits.clkoutMin = 3.125;
     imp_.pllLimits.clkoutMax = 400;
     imp_.pllLimits.clkoutMaxIo = 1080;
@@ -63,8 +62,9 @@ class OutputDividersTest : public testing::Test {
 
   bool Find(int count) {
     bool found = false;
-    trace_ = engine_test::TraceOf(
-        [&](const Trace& trace) { found = Ip::Pll::FindOutputDividers(imp_, count, trace); });
+    trace_ = engine_test::TraceOf([&](const Trace& trace) {
+      found = Ip::Pll::FindOutputDividers(imp_, {100, count, prim_, trace});
+    });
     return found;
   }
 
@@ -76,6 +76,7 @@ class OutputDividersTest : public testing::Test {
     return Find(2);
   }
 
+  int prim_ = Ip::Pll::kPll;
   VorkelImp& imp_ = engine_test::NewImp();
   VcoCandidateTable& table_ = imp_.pll._vcoCandidates;
   std::string trace_;
@@ -349,12 +350,23 @@ TEST_F(OutputDividersTest, TheOutputMaximumIsThatOfTheFurtherOutputsOfAPll) {
 TEST_F(OutputDividersTest, TheOutputMaximumIsThatOfOutput1OfAnyOtherPrimitive) {
   imp_.pllLimits.clkoutMaxIo = 1080;
   for (const int prim : {0, -1, 2}) {
-    VorkelImp::_prim = prim;
+    prim_ = prim;
     imp_.pllLimits.clkoutMax = 200;
     EXPECT_TRUE(Serves(400, 200)) << prim;
     imp_.pllLimits.clkoutMax = Below(200);
     EXPECT_FALSE(Serves(400, 200)) << prim;
   }
+}
+
+// A primitive that another object's run has left in the process decides nothing.
+TEST_F(OutputDividersTest, ThePrimitiveIsThatOfTheRun) {
+  imp_.pllLimits.clkoutMax = 100;
+  imp_.pllLimits.clkoutMaxIo = 200;
+  VorkelImp::_prim = Ip::Pll::kTsyn;
+  EXPECT_TRUE(Serves(400, 200));
+  VorkelImp::_prim = Ip::Pll::kPll;
+  prim_ = Ip::Pll::kTsyn;
+  EXPECT_FALSE(Serves(400, 200));
 }
 
 // 390 does not serve 200 exactly, but within the limits; 400 would, but 200 is above them.
@@ -410,7 +422,10 @@ TEST_F(OutputDividersTest, IsSilentWithTheTraceOff) {
   table_.Put(0, 450, 1);
   Request(100, 2000);
   const std::string text = engine_test::TraceOf(
-      [&](const Trace& trace) { Ip::Pll::FindOutputDividers(imp_, 3, trace); }, false);
+      [&](const Trace& trace) {
+        Ip::Pll::FindOutputDividers(imp_, {100, 3, prim_, trace});
+      },
+      false);
   EXPECT_EQ(text, "");
   EXPECT_EQ(table_[0].divN[1], 5u);
 }

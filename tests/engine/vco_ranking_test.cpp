@@ -34,7 +34,6 @@ class VcoRankingTest : public testing::Test {
 
   VcoRanking Rank(const char* outFreqs, int count, double inFreq = 100.0) {
     const Pll::Run run = {inFreq, count, kTsyn, trace_};
-    VorkelImp::_prim = kTsyn;
     EXPECT_EQ(PrepareVcoRange(imp_, outFreqs, 0.0, run), kSolved);
     return RankVcos(imp_, run);
   }
@@ -45,7 +44,7 @@ class VcoRankingTest : public testing::Test {
     bool served = true;
     for (int n = 1; n < count; ++n) {
       const double requested = imp_.requests.reqOutFreq[static_cast<std::size_t>(n)];
-      int digit = FitOutput(vco, requested, RangeOfOutput(imp_.pllLimits, n)).tolerance;
+      int digit = FitOutput(vco, requested, RangeOfOutput(imp_.pllLimits, kTsyn, n)).tolerance;
       if (coarse && requested > 0.0) digit = std::max(digit, 1);
       key = key << 5 | static_cast<ToleranceKey>(served ? digit : 0);
       if (digit == kTolerances) served = false;
@@ -56,8 +55,8 @@ class VcoRankingTest : public testing::Test {
   bool Accepted(double vco, double inFreq) {
     VcoCandidate candidate{};
     candidate.vco = vco;
-    return SearchMAndD(candidate, inFreq, imp_.pllLimits.pfdMin, imp_.pllLimits.pfdMax, true,
-                       trace_);
+    return SearchMAndD(candidate, imp_.pllLimits.pfdMin, imp_.pllLimits.pfdMax, true,
+                       {inFreq, 1, kTsyn, trace_});
   }
 
   static std::vector<RankedRange> Stretches(const VcoRanking& ranking) {

@@ -19,7 +19,6 @@ class VcoWindowsTest : public testing::Test {
 
   VcoWindows Windows(double inFreq = 100.0) {
     const Pll::Run run = {inFreq, 1, kTsyn, trace_};
-    VorkelImp::_prim = kTsyn;
     EXPECT_EQ(PrepareVcoRange(imp_, "100", 0.0, run), kSolved);
     return FindVcoWindows(imp_, run);
   }
@@ -27,7 +26,8 @@ class VcoWindowsTest : public testing::Test {
   bool Accepted(double vco, double inFreq = 100.0) {
     VcoCandidate candidate{};
     candidate.vco = vco;
-    return SearchMAndD(candidate, inFreq, imp_.pllLimits.pfdMin, PfdMax(), true, trace_);
+    return SearchMAndD(candidate, imp_.pllLimits.pfdMin, PfdMax(), true,
+                       {inFreq, 1, kTsyn, trace_});
   }
 
   double PfdMax() const {
