@@ -4,6 +4,7 @@
 #ifndef VORKEL_TESTS_COMPARE_REQUESTGENERATOR_H_
 #define VORKEL_TESTS_COMPARE_REQUESTGENERATOR_H_
 
+#include <ostream>
 #include <string>
 
 #include "tests/compare/Random.h"
@@ -24,6 +25,9 @@ enum class Kind {
   kWild,         // zero, negative, huge, inf, nan, text, short and long lists, odd counts
 };
 const char* KindName(Kind kind);
+
+// What GoogleTest shows of a kind.
+inline void PrintTo(Kind kind, std::ostream* out) { *out << KindName(kind); }
 
 struct Case {
   plain::PllLimits limits;

@@ -5,6 +5,7 @@
 
 #include <climits>
 #include <cmath>
+#include <ostream>
 #include <string>
 
 #include "tests/engine/EngineTest.h"
@@ -22,6 +23,8 @@ struct ListParser {
   bool (VorkelImp::*parse)(int, const Port::StringBase&);
   RequestList Ip::Requests::*list;
 };
+
+void PrintTo(const ListParser& parser, std::ostream* out) { *out << parser.name; }
 
 class ListParserTest : public testing::TestWithParam<ListParser> {
  protected:

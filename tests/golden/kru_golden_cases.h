@@ -2,6 +2,7 @@
 #ifndef VORKEL_TESTS_GOLDEN_KRU_GOLDEN_CASES_H_
 #define VORKEL_TESTS_GOLDEN_KRU_GOLDEN_CASES_H_
 
+#include <ostream>
 #include <string>
 #include <vector>
 
@@ -11,6 +12,9 @@ struct KruGoldenCase {
   std::string name;                    // of the file, without ".trace"
   int code;                            // the result of the last run
   std::vector<compare::KruCase> runs;  // on one object, one after the other
+
+  // What GoogleTest shows of a case.
+  friend void PrintTo(const KruGoldenCase& golden, std::ostream* out) { *out << golden.name; }
 };
 
 // All cases: KRU_SP and KRU_CLKGEN, each pin family, each way in which a run can end.
