@@ -8,6 +8,7 @@
 
 #include <algorithm>
 #include <random>
+#include <string>
 #include <string_view>
 #include <vector>
 
@@ -57,6 +58,31 @@ class VcoRankingTest : public testing::Test {
     candidate.vco = vco;
     return SearchMAndD(candidate, imp_.pllLimits.pfdMin, imp_.pllLimits.pfdMax, true,
                        {inFreq, 1, kTsyn, trace_});
+  }
+
+  // Prepares a run for 100 and 70 MHz.
+  void PrepareForTwo() { Rank("100 70", 2); }
+
+  // Expects that the ranking for two outputs with the limits as they stand foretells what becomes
+  // of the VCOs up to the highest that 100 MHz can make. Returns whether any is accepted.
+  bool ExpectForetold(const std::string& limits) {
+    const VcoRanking ranking = RankVcos(imp_, {100.0, 2, kTsyn, trace_});
+    bool anyAccepted = false;
+    for (double vco = 20.0; vco <= 6400.0; vco += 20.0) {
+      if (!(vco >= imp_.pll.minAdjVco && vco <= imp_.pll.maxAdjVco)) continue;
+      const ToleranceKey key = KeyByFit(vco, 2, true);
+      if (key == kTolerances || !Accepted(vco, 100.0)) continue;
+      anyAccepted = true;
+      EXPECT_TRUE(std::ranges::any_of(ranking, [&](const RankedRange& range) {
+        return range.kind == Kind::kAccepted && range.key == key && range.low <= vco &&
+               vco <= range.high;
+      })) << limits << ": " << vco;
+    }
+    EXPECT_EQ(std::ranges::any_of(
+                  ranking, [](const RankedRange& range) { return range.kind == Kind::kAccepted; }),
+              anyAccepted)
+        << limits;
+    return anyAccepted;
   }
 
   static std::vector<RankedRange> Stretches(const VcoRanking& ranking) {
@@ -270,22 +296,34 @@ TEST_F(VcoRankingTest, NothingWhereNoVcoHasAnMAndAD) {
   for (const RankedRange& range : ranking) EXPECT_EQ(range.kind, Kind::kUnserved);
 }
 
-// Limits that no VCO keeps, as a script may have them of an odd device.
-TEST_F(VcoRankingTest, StandsOddLimits) {
+// Limits that hardly a VCO keeps, as an odd device may have them. Whatever the fits and the M and D
+// search make of them, the ranking foretells it: a VCO that they accept lies in an accepted range
+// with its key, and where they accept none there is no such range.
+TEST_F(VcoRankingTest, ForetellsWhatOddLimitsLeave) {
+  int withAccepted = 0;
+  int withoutAccepted = 0;
+  const auto expectForetold = [&](const std::string& limits) {
+    ++(ExpectForetold(limits) ? withAccepted : withoutAccepted);
+  };
   for (const double odd : {engine_test::kNan, engine_test::kInfinity, -engine_test::kInfinity,
                            0.0, -5.0, 1e-320, 1e308}) {
-    for (double PllLimits::*limit : {&PllLimits::clkoutMin, &PllLimits::clkoutMax}) {
-      Rank("100 70", 2);
-      const Pll::Run run = {100.0, 2, kTsyn, trace_};
-      imp_.pllLimits.*limit = odd;
-      for (const RankedRange& range : RankVcos(imp_, run)) EXPECT_LE(range.low, range.high);
-      for (double PllState::*end : {&PllState::minAdjVco, &PllState::maxAdjVco}) {
-        Rank("100 70", 2);
-        imp_.pll.*end = odd;
-        for (const RankedRange& range : RankVcos(imp_, run)) EXPECT_LE(range.low, range.high);
-      }
-    }
+    const std::string name = std::to_string(odd);
+    PrepareForTwo();
+    imp_.pllLimits.clkoutMin = odd;
+    expectForetold("output minimum " + name);
+    PrepareForTwo();
+    imp_.pllLimits.clkoutMax = odd;
+    expectForetold("output maximum " + name);
+    PrepareForTwo();
+    imp_.pll.minAdjVco = odd;
+    expectForetold("VCO minimum " + name);
+    PrepareForTwo();
+    imp_.pll.maxAdjVco = odd;
+    expectForetold("VCO maximum " + name);
   }
+  // Of the 28, a minimum that is no number or above every VCO leaves none, and likewise a maximum.
+  EXPECT_EQ(withAccepted, 12);
+  EXPECT_EQ(withoutAccepted, 16);
 }
 
 }  // namespace
