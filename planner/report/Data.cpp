@@ -1,7 +1,6 @@
 // Tested by json_test.cpp.
 #include "planner/report/Data.h"
 
-#include <algorithm>
 #include <cstddef>
 #include <cstdint>
 #include <nlohmann/json.hpp>
@@ -231,7 +230,7 @@ ordered_json OutputData(const Request& request, const Device& device, const Answ
   if (!output.used) return data;
   const auto place = static_cast<int>(index);
   const Output& asked = RequestedAt(request, answer, place);
-  data["request"] = RequestIndex(answer, place);
+  data["request"] = RequestIndex(request, answer, place);
   AddPlace(&data, answer.settings, index);
   data["multiply"] = WholeNumber(output.ratio.NumeratorText());
   data["divide"] = WholeNumber(output.ratio.DenominatorText());
@@ -264,9 +263,10 @@ ordered_json RankingData(const Answer& answer) {
   return data;
 }
 
-ordered_json FindingsData(const std::vector<Finding>& findings, const Device& device) {
+ordered_json FindingsData(const std::vector<Finding>& findings, const Device& device,
+                          const Answer& answer) {
   ordered_json data = ordered_json::array();
-  for (const Finding& finding : findings) data.push_back(FindingData(finding, device));
+  for (const Finding& finding : findings) data.push_back(FindingData(finding, device, &answer));
   return data;
 }
 
@@ -301,12 +301,10 @@ void AddSolved(ordered_json* data, const Request& request, const Device& device,
     outputs.push_back(OutputData(request, device, answer, i));
   }
   (*data)["outputs"] = std::move(outputs);
-  const auto used = std::count_if(answer.outputs.begin(), answer.outputs.end(),
-                                  [](const OutputAnswer& output) { return output.used; });
   (*data)["misses"] = MissTexts(answer);
-  (*data)["violations"] = FindingTexts(answer.violations, device, static_cast<int>(used));
-  (*data)["notes"] = FindingTexts(answer.notes, device, static_cast<int>(used));
-  (*data)["findings"] = FindingsData(FindingsOf(answer), device);
+  (*data)["violations"] = FindingTexts(answer.violations, device, answer);
+  (*data)["notes"] = FindingTexts(answer.notes, device, answer);
+  (*data)["findings"] = FindingsData(FindingsOf(answer), device, answer);
 }
 
 }  // namespace
@@ -357,7 +355,7 @@ ordered_json RequestData(const Request& request, const Device& device) {
   return data;
 }
 
-ordered_json FindingData(const Finding& finding, const Device& device) {
+ordered_json FindingData(const Finding& finding, const Device& device, const Answer* answer) {
   ordered_json data;
   data["kind"] = KindName(finding.kind);
   data["primitive"] =
@@ -373,7 +371,7 @@ ordered_json FindingData(const Finding& finding, const Device& device) {
   data["numbers"] = ordered_json::array();
   for (const Rational& number : finding.numbers) data["numbers"].push_back(number.ToDouble());
   data["words"] = finding.text;
-  data["text"] = FindingText(finding, device);
+  data["text"] = FindingText(finding, device, answer);
   return data;
 }
 
@@ -387,7 +385,7 @@ ordered_json AnswerData(const Request& request, const Device& device, const Answ
   data["solved"] = answer.solved;
   data["within"] = answer.within;
   data["reason"] = RefusalText(answer, device);
-  data["refusals"] = FindingsData(answer.refusals, device);
+  data["refusals"] = FindingsData(answer.refusals, device, answer);
   if (answer.solved) AddSolved(&data, request, device, answer);
   return data;
 }

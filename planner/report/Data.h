@@ -25,8 +25,10 @@ nlohmann::ordered_json RangeData(const Range& range);
 // A request as a request file has it. What was not asked for is left out.
 nlohmann::ordered_json RequestData(const Request& request, const Device& device);
 
-// A finding: its kind, what it is about, its numbers, and the sentence.
-nlohmann::ordered_json FindingData(const Finding& finding, const Device& device);
+// A finding: its kind, what it is about, its numbers, and the sentence. `answer` is the one that it
+// is about, where there is one.
+nlohmann::ordered_json FindingData(const Finding& finding, const Device& device,
+                                   const Answer* answer = nullptr);
 
 // An answer, without what it is there for.
 nlohmann::ordered_json AnswerData(const Request& request, const Device& device,

@@ -83,6 +83,16 @@ string SearchedText(const Finding& finding) {
   return "the search counted with " + Join(figures, ", ") + " MHz, which M and D do not make";
 }
 
+// What of an answer is a fraction.
+string FractionWords(const Answer* answer) {
+  if (answer == nullptr || !IsLoop(answer->primitive)) return "M or divider";
+  const auto& settings = std::get<LoopSettings>(answer->settings);
+  std::vector<string> words;
+  if (settings.m % hardware::kEighths != 0) words.emplace_back("M");
+  if (settings.outputs[0].divider % hardware::kEighths != 0) words.emplace_back("divider");
+  return Enumerated(words);
+}
+
 // The outputs that have changed places.
 string MovedText(const Finding& finding) {
   std::vector<string> parts;
@@ -119,23 +129,22 @@ string MissingReason(const Finding& finding, const Device& device) {
 }
 
 // What figures there are not for a reason: "no jitter of output 1 and no phase error: ...".
-string MissingText(const std::vector<Finding>& same, const Device& device, int outputs) {
+string MissingText(const std::vector<Finding>& same, const Device& device) {
   std::vector<string> missing;
   for (const Finding& finding : same) {
     if (finding.kind == FindingKind::kNoPhaseError) {
       missing.emplace_back("no phase error");
       continue;
     }
-    const bool are_all =
-        finding.outputs.empty() || static_cast<int>(finding.outputs.size()) == outputs;
-    missing.push_back(are_all ? "no jitter" : "no jitter of " + Outputs(finding.outputs));
+    missing.push_back(finding.outputs.empty() ? "no jitter"
+                                              : "no jitter of " + Outputs(finding.outputs));
   }
   return Join(missing, " and ") + ": " + MissingReason(same.front(), device);
 }
 
 }  // namespace
 
-string FindingText(const Finding& finding, const Device& device) {
+string FindingText(const Finding& finding, const Device& device, const Answer* answer) {
   switch (finding.kind) {
     case FindingKind::kOutsideLimit:
       return OutsideText(finding);
@@ -148,8 +157,7 @@ string FindingText(const Finding& finding, const Device& device) {
     case FindingKind::kSearchedFrequencies:
       return SearchedText(finding);
     case FindingKind::kNothingMoves:
-      return "with a fractional " + (finding.text.empty() ? "M or divider" : finding.text) +
-             " all phases are 0 and all duty cycles 50 %; --int-div0 avoids it";
+      return "with a fractional " + FractionWords(answer) + " all phases are 0 and all duty cycles 50 %; --int-div0 avoids it";
     case FindingKind::kPreferMaxVcoUnused:
       return "--prefer-max-vco counts only with --phase or --duty";
     case FindingKind::kWholeDividerUnused:
@@ -163,7 +171,7 @@ string FindingText(const Finding& finding, const Device& device) {
              " ps, which passes through a KRU";
     case FindingKind::kNoJitter:
     case FindingKind::kNoPhaseError:
-      return MissingText({finding}, device, -1);
+      return MissingText({finding}, device);
     case FindingKind::kMoved:
       return MovedText(finding);
     case FindingKind::kTooManyInputs:
@@ -179,14 +187,14 @@ string FindingText(const Finding& finding, const Device& device) {
 }
 
 std::vector<string> FindingTexts(const std::vector<Finding>& findings, const Device& device,
-                                 int outputs) {
+                                 const Answer& answer) {
   std::vector<string> texts;
   std::vector<bool> told(findings.size());
   for (std::size_t i = 0; i < findings.size(); ++i) {
     if (told[i]) continue;
     const Finding& first = findings[i];
     if (!IsMissingFigure(first) && first.kind != FindingKind::kOffTarget) {
-      texts.push_back(FindingText(first, device));
+      texts.push_back(FindingText(first, device, &answer));
       continue;
     }
     std::vector<Finding> same;
@@ -204,7 +212,7 @@ std::vector<string> FindingTexts(const std::vector<Finding>& findings, const Dev
       std::stable_sort(same.begin(), same.end(), [](const Finding& a, const Finding& b) {
         return a.kind == FindingKind::kNoJitter && b.kind != FindingKind::kNoJitter;
       });
-      texts.push_back(MissingText(same, device, outputs));
+      texts.push_back(MissingText(same, device));
     } else {
       texts.push_back(MissText(same));
     }
@@ -224,11 +232,7 @@ std::vector<string> RemarkTexts(const Answer& answer, const Device& device) {
   std::vector<string> texts = MissTexts(answer);
   std::vector<Finding> rest = answer.violations;
   rest.insert(rest.end(), answer.notes.begin(), answer.notes.end());
-  const auto used = std::count_if(answer.outputs.begin(), answer.outputs.end(),
-                                  [](const OutputAnswer& output) { return output.used; });
-  for (string& text : FindingTexts(rest, device, static_cast<int>(used))) {
-    texts.push_back(std::move(text));
-  }
+  for (string& text : FindingTexts(rest, device, answer)) texts.push_back(std::move(text));
   return texts;
 }
 

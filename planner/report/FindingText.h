@@ -12,12 +12,14 @@
 namespace planner::report {
 
 // What a finding says, without a full stop at its end but where the sentence is the engine's.
-std::string FindingText(const Finding& finding, const Device& device);
+// `answer` is the one that it is about, where there is one.
+std::string FindingText(const Finding& finding, const Device& device,
+                        const Answer* answer = nullptr);
 
 // All of them in their order. What belongs together is one sentence: the misses of an output, and
-// the figures that there are not for the same reason. `outputs` is how many outputs there are.
+// the figures that there are not for the same reason.
 std::vector<std::string> FindingTexts(const std::vector<Finding>& findings, const Device& device,
-                                      int outputs);
+                                      const Answer& answer);
 
 // What of the outputs of an answer is not as asked for, a sentence for each of them.
 std::vector<std::string> MissTexts(const Answer& answer);

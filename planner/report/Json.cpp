@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <nlohmann/json.hpp>
 
+#include "planner/answer/Moved.h"
 #include "planner/answer/Rank.h"
 #include "planner/report/Data.h"
 #include "planner/report/FrontText.h"
@@ -37,7 +38,7 @@ ordered_json EntryData(const Request& request, const Device& device, const Entry
 
 ordered_json Document(const Request& request, const Device& device,
                       const std::vector<Entry>& entries,
-                      const std::vector<plan::BoundWork>& bound) {
+                      const std::vector<Primitive>& front_cut) {
   ordered_json data;
   data["format"] = "vorkel-plan";
   data["version"] = kPlanVersion;
@@ -45,32 +46,28 @@ ordered_json Document(const Request& request, const Device& device,
   data["request"] = RequestData(request, device);
   data["answers"] = ordered_json::array();
   for (const Entry& entry : entries) data["answers"].push_back(EntryData(request, device, entry));
-  data["not_tried"] = ordered_json::array();
-  for (const plan::BoundWork& work : bound) {
-    data["not_tried"].push_back({{"primitive", Name(work.primitive)},
-                                 {"orders_tried", work.tried},
-                                 {"orders", work.all}});
-  }
+  data["tradeoffs_cut"] = ordered_json::array();
+  for (const Primitive primitive : front_cut) data["tradeoffs_cut"].push_back(Name(primitive));
   return data;
 }
 
-bool IsThere(const std::vector<Entry>& entries, const Answer& answer) {
-  return std::any_of(entries.begin(), entries.end(), [&](const Entry& entry) {
-    return answer::SameSettings(*entry.answer, answer);
-  });
+// Whether two answers are the same settings, with the outputs at the same places.
+bool AreSame(const Request& request, const Answer& a, const Answer& b) {
+  return answer::SameSettings(a, b) &&
+         answer::OrderOf(request, a) == answer::OrderOf(request, b);
 }
 
 // The number in the ranking of an answer with such settings; 0 when there is none.
 std::size_t NumberOf(const plan::Plan& plan, const Answer& answer) {
   for (std::size_t i = 0; i < plan.ranked.size(); ++i) {
-    if (answer::SameSettings(plan.ranked[i], answer)) return i + 1;
+    if (AreSame(plan.request, plan.ranked[i], answer)) return i + 1;
   }
   return 0;
 }
 
 bool IsTradeoff(const plan::Plan& plan, const Answer& answer) {
   return std::any_of(plan.front.begin(), plan.front.end(), [&](const Answer& one) {
-    return answer::SameSettings(one, answer);
+    return AreSame(plan.request, one, answer);
   });
 }
 
@@ -95,32 +92,31 @@ std::vector<Entry> CompareEntries(const plan::Plan& plan) {
 std::vector<Entry> BestEntries(const plan::Plan& plan, std::size_t number, std::size_t most) {
   std::vector<Entry> entries = PlanEntries(plan, number);
   const auto add = [&](const Answer& answer) {
-    if (!IsThere(entries, answer)) {
-      entries.push_back({&answer, NumberOf(plan, answer), IsTradeoff(plan, answer)});
-    }
+    const bool is_there = std::any_of(entries.begin(), entries.end(), [&](const Entry& entry) {
+      return AreSame(plan.request, *entry.answer, answer);
+    });
+    if (!is_there) entries.push_back({&answer, NumberOf(plan, answer), IsTradeoff(plan, answer)});
   };
   add(plan.ranked.front());
   for (const plan::Reason& reason : plan.among_primitives) add(plan.ranked[reason.second]);
   std::vector<const Answer*> tradeoffs = Tradeoffs(plan);
   tradeoffs.resize(std::min(most, tradeoffs.size()));
   for (const Answer* answer : tradeoffs) add(*answer);
-  const auto engine = std::find_if(plan.ranked.begin(), plan.ranked.end(),
-                                   [](const Answer& answer) { return answer.source.engine; });
-  if (engine != plan.ranked.end()) add(*engine);
+  if (const Answer* engine = plan.FirstOfEngine()) add(*engine);
   return entries;
 }
 
 string Json(const Request& request, const Device& device, const std::vector<Entry>& entries,
-            const std::vector<plan::BoundWork>& bound) {
+            const std::vector<Primitive>& front_cut) {
   // What is no UTF-8 in a text of others is replaced.
-  return Document(request, device, entries, bound)
+  return Document(request, device, entries, front_cut)
              .dump(2, ' ', false, ordered_json::error_handler_t::replace) +
          "\n";
 }
 
 string Tcl(const Request& request, const Device& device, const std::vector<Entry>& entries,
-           const std::vector<plan::BoundWork>& bound) {
-  return TclDict(Document(request, device, entries, bound));
+           const std::vector<Primitive>& front_cut) {
+  return TclDict(Document(request, device, entries, front_cut));
 }
 
 }  // namespace planner::report

@@ -33,12 +33,13 @@ std::vector<Entry> CompareEntries(const plan::Plan& plan);
 // beside the candidate, and the best that the engine answers. Each is there once.
 std::vector<Entry> BestEntries(const plan::Plan& plan, std::size_t number, std::size_t most);
 
-// A document with some answers to a request, at least one; each ends in a newline.
+// A document with some answers to a request, at least one. `front_cut` is that of the plan. It ends
+// in a newline.
 std::string Json(const Request& request, const Device& device, const std::vector<Entry>& entries,
-                 const std::vector<plan::BoundWork>& bound = {});
+                 const std::vector<Primitive>& front_cut = {});
 // The same as a Tcl dict. What is null in JSON is empty here.
 std::string Tcl(const Request& request, const Device& device, const std::vector<Entry>& entries,
-                const std::vector<plan::BoundWork>& bound = {});
+                const std::vector<Primitive>& front_cut = {});
 
 }  // namespace planner::report
 

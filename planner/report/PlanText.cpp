@@ -52,6 +52,8 @@ class Texts {
   string Engine(std::size_t number) const;
   string Why(std::size_t number) const;
   string Refusals() const;
+  // Of which primitives some trade-offs are left out.
+  string FrontCut() const;
   string Hints(std::size_t number, bool has_front) const;
   // Whose jitter is shown: what kind of figure it is.
   string JitterNote() const;
@@ -59,7 +61,7 @@ class Texts {
  private:
   const Answer& At(std::size_t place) const { return plan_.ranked[place]; }
   MarkedRow ContestRow(const plan::Reason& reason) const;
-  string Bound() const;
+  string Silence() const;
 
   const plan::Plan& plan_;
   const Request& request_;
@@ -154,6 +156,15 @@ string Texts::JitterNote() const {
   return is_shown ? Prose(style_, "jitter: ", "peak to peak, at a bit error rate of 1e-12.") : "";
 }
 
+// Why the engine answers nothing, of each primitive for which the search has found something.
+string Texts::Silence() const {
+  std::vector<string> reasons;
+  for (const Answer& answer : plan_.engine_refused) {
+    reasons.push_back(NameOf(answer) + ": " + RefusalText(answer, device_));
+  }
+  return reasons.empty() ? "." : "; " + Join(reasons, " ");
+}
+
 string Texts::Engine(std::size_t number) const {
   if (request_.engine_only) return "";
   const string label = "engine: ";
@@ -164,10 +175,9 @@ string Texts::Engine(std::size_t number) const {
     return Prose(style_, label,
                  whose + "takes these settings" + (variant.empty() ? "" : ": " + variant) + ".");
   }
-  const auto first = std::find_if(plan_.ranked.begin(), plan_.ranked.end(),
-                                  [](const Answer& answer) { return answer.source.engine; });
-  if (first == plan_.ranked.end()) return Prose(style_, label, whose + "has no answer to this.");
-  const auto place = static_cast<std::size_t>(first - plan_.ranked.begin());
+  const Answer* first = plan_.FirstOfEngine();
+  if (first == nullptr) return Prose(style_, label, whose + "has no answer to this" + Silence());
+  const auto place = static_cast<std::size_t>(first - plan_.ranked.data());
   string text = whose + "does not take these settings; its best answer, number " +
                 std::to_string(place + 1) + " of compare, is a " + NameOf(*first) + " with " +
                 SettingsWords(first->settings);
@@ -190,19 +200,19 @@ string Texts::Why(std::size_t number) const {
   return Prose(style_, "why: ", text + ".");
 }
 
-string Texts::Bound() const {
+string Texts::FrontCut() const {
   string text;
-  for (const plan::BoundWork& work : plan_.bound) {
+  for (const Primitive primitive : plan_.front_cut) {
     text += Prose(style_, "note: ",
-                  "of the " + std::to_string(work.all) + " orders of the outputs, " +
-                      std::to_string(work.tried) + " were tried for the " +
-                      string(Name(work.primitive)));
+                  "the " + string(Name(primitive)) +
+                      " has more trade-offs than are kept; those with the larger errors are not "
+                      "there");
   }
   return text;
 }
 
 string Texts::Refusals() const {
-  string text = Bound();
+  string text;
   for (const Answer& answer : plan_.refused) {
     text += Prose(style_, NameOf(answer) + ": ", RefusalText(answer, device_));
   }
@@ -236,7 +246,7 @@ string Body(const plan::Plan& plan, const Device& device, std::size_t number, co
   const string contest = texts.Contest();
   if (!contest.empty()) text += "\n" + contest;
   text += "\n" + texts.Why(number) + texts.Engine(number) + texts.JitterNote();
-  if (!front.empty()) text += "\n" + front + "\n";
+  if (!front.empty()) text += "\n" + front + texts.FrontCut() + "\n";
   return text + texts.Refusals() + texts.Hints(number, has_front);
 }
 

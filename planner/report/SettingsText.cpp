@@ -6,6 +6,8 @@
 #include <cstddef>
 #include <vector>
 
+#include "planner/answer/Evaluate.h"
+#include "planner/answer/Moved.h"
 #include "planner/report/Numbers.h"
 #include "planner/report/Words.h"
 
@@ -14,9 +16,6 @@ namespace planner::report {
 namespace {
 
 using std::string;
-
-// The engine prints three decimals. What differs by no more than their rounding agrees.
-constexpr double kVisible = 0.0006;
 
 // A frequency that the first input makes, and what the second makes of it.
 string Both(const Request& request, const Rational& frequency) {
@@ -111,19 +110,16 @@ bool HasJitter(const Answer& answer) {
                      [](const OutputAnswer& output) { return output.jitter.has_value(); });
 }
 
-int RequestIndex(const Answer& answer, int place) {
-  for (const Finding& note : answer.notes) {
-    if (note.kind == FindingKind::kMoved) return note.outputs[static_cast<std::size_t>(place)];
-  }
-  return place;
+int RequestIndex(const Request& request, const Answer& answer, int place) {
+  return answer::OrderOf(request, answer)[static_cast<std::size_t>(place)];
 }
 
 const Output& RequestedAt(const Request& request, const Answer& answer, int place) {
-  return request.outputs[static_cast<std::size_t>(RequestIndex(answer, place))];
+  return request.outputs[static_cast<std::size_t>(RequestIndex(request, answer, place))];
 }
 
 bool IsVcoOff(const Answer& answer) {
-  return answer.searched_vco && std::abs(*answer.searched_vco - answer.vco.ToDouble()) > kVisible;
+  return answer.searched_vco && std::abs(*answer.searched_vco - answer.vco.ToDouble()) > answer::kVisible;
 }
 
 Rational PhaseOffset(const Request& request, const Answer& answer) {

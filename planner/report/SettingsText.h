@@ -20,7 +20,7 @@ bool HasJitter(const Answer& answer);
 
 // Which output of the request stands at a place of an answer: another one than that place where
 // outputs were allowed to change places and have done so.
-int RequestIndex(const Answer& answer, int place);
+int RequestIndex(const Request& request, const Answer& answer, int place);
 const Output& RequestedAt(const Request& request, const Answer& answer, int place);
 
 // Where an output is: its divider, or its pin.
