@@ -183,7 +183,7 @@ string FindingText(const Finding& finding, const Device& device, const Answer* a
     case FindingKind::kNoSettings:
       break;
   }
-  return "no setting has everything in the device's ranges.";
+  return "No setting has everything in the device's ranges.";
 }
 
 std::vector<string> FindingTexts(const std::vector<Finding>& findings, const Device& device,

@@ -1,0 +1,127 @@
+// Tested by devices_text_test.cpp.
+#include <algorithm>
+#include <nlohmann/json.hpp>
+
+#include "planner/device/Check.h"
+#include "planner/report/Data.h"
+#include "planner/report/DevicesText.h"
+#include "planner/report/DoubtText.h"
+#include "planner/report/Limits.h"
+
+namespace planner::report {
+
+namespace {
+
+using device::Description;
+using device::GradeDescription;
+using nlohmann::ordered_json;
+using std::string;
+
+ordered_json RangeOrNull(const std::optional<Range>& range) {
+  return range ? RangeData(*range) : ordered_json(nullptr);
+}
+
+template <typename T>
+ordered_json OrNull(const std::optional<T>& value) {
+  return value ? ordered_json(*value) : ordered_json(nullptr);
+}
+
+ordered_json PrimitiveData(const GradeDescription& grade, Primitive primitive) {
+  const PrimitiveRanges ranges = RangesOf(grade, primitive);
+  ordered_json data;
+  data["primitive"] = Name(primitive);
+  data["vco"] = RangeOrNull(ranges.vco);
+  data["pfd"] = RangeOrNull(ranges.pfd);
+  data["pfd_low"] = RangeOrNull(ranges.pfd_low);
+  data["output"] = RangeData(ranges.output);
+  data["output_1"] = RangeOrNull(ranges.output_1);
+  data["has_jitter"] = IsLoop(primitive) ? grade.has_loop_jitter : grade.has_kru_jitter;
+  return data;
+}
+
+const char* UnitName(std::string_view keyword) {
+  for (const device::Keyword& one : device::Keywords()) {
+    if (one.name != keyword) continue;
+    if (one.unit == device::Unit::kMegahertz) return "MHz";
+    if (one.unit == device::Unit::kNanoseconds) return "ns";
+  }
+  return "count";
+}
+
+ordered_json GradeData(const GradeDescription& grade) {
+  ordered_json data;
+  data["name"] = grade.name;
+  data["primitives"] = ordered_json::array();
+  for (const Primitive primitive : grade.primitives) {
+    data["primitives"].push_back(PrimitiveData(grade, primitive));
+  }
+  data["limits"] = ordered_json::array();
+  for (const device::Limit& limit : grade.limits) {
+    ordered_json entry;
+    entry["keyword"] = limit.keyword;
+    entry["unit"] = UnitName(limit.keyword);
+    AddExact(&entry, "value", limit.value);
+    data["limits"].push_back(std::move(entry));
+  }
+  data["warnings"] = ordered_json::array();
+  for (const device::Doubt& doubt : device::Doubts(grade)) {
+    data["warnings"].push_back(DoubtText(doubt));
+  }
+  return data;
+}
+
+ordered_json DescriptionData(const Description& description, const std::vector<string>* grades) {
+  ordered_json data;
+  data["name"] = description.name;
+  data["usable"] = true;
+  data["about"] = description.about;
+  data["file"] = description.file;
+  data["packages"] = description.packages;
+  data["default_package"] = OrNull(description.default_package);
+  data["default_grade"] = OrNull(description.default_grade);
+  data["fastest_grade"] = OrNull(FastestGrade(description));
+  data["grades"] = ordered_json::array();
+  for (const GradeDescription& grade : description.grades) {
+    const bool is_shown =
+        grades == nullptr || std::find(grades->begin(), grades->end(), grade.name) != grades->end();
+    if (is_shown) data["grades"].push_back(GradeData(grade));
+  }
+  return data;
+}
+
+ordered_json ComplaintData(const device::Listed& listed) {
+  const device::FileComplaint& complaint = *listed.complaint;
+  ordered_json data;
+  data["name"] = listed.name;
+  data["usable"] = false;
+  data["file"] = complaint.file;
+  data["line"] = OrNull(complaint.line);
+  data["column"] = OrNull(complaint.column);
+  data["reason"] = complaint.reason;
+  return data;
+}
+
+string Document(ordered_json devices) {
+  ordered_json data;
+  data["format"] = "vorkel-devices";
+  data["version"] = kDevicesVersion;
+  data["devices"] = std::move(devices);
+  return data.dump(2, ' ', false, ordered_json::error_handler_t::replace) + "\n";
+}
+
+}  // namespace
+
+string DevicesJson(const std::vector<device::Listed>& devices) {
+  ordered_json data = ordered_json::array();
+  for (const device::Listed& listed : devices) {
+    data.push_back(listed.description ? DescriptionData(*listed.description, nullptr)
+                                      : ComplaintData(listed));
+  }
+  return Document(std::move(data));
+}
+
+string DeviceJson(const Description& description, const std::vector<string>& grades) {
+  return Document(ordered_json::array({DescriptionData(description, &grades)}));
+}
+
+}  // namespace planner::report

@@ -1,0 +1,91 @@
+// Tested by devices_text_test.cpp.
+#include "planner/report/DoubtText.h"
+
+#include "hardware/Loop.h"
+#include "planner/report/Numbers.h"
+#include "planner/report/Words.h"
+
+namespace planner::report {
+
+namespace {
+
+using device::DoubtKind;
+using device::RangeOf;
+using std::string;
+
+string KeywordWords(const device::Doubt& doubt) { return doubt.keyword + ", " + doubt.text; }
+string OtherWords(const device::Doubt& doubt) { return doubt.other + ", " + doubt.other_text; }
+
+// "FIRST, 6000, is above OTHER, 1440".
+string Compared(const device::Doubt& doubt) {
+  const char* const where = doubt.value > doubt.other_value ? ", is above " : ", is below ";
+  return KeywordWords(doubt) + where + OtherWords(doubt);
+}
+
+string RangeWords(const device::Doubt& doubt) {
+  switch (doubt.range) {
+    case RangeOf::kNone:
+      break;
+    case RangeOf::kVco:
+      return "VCO frequency";
+    case RangeOf::kPfd:
+      return "PFD frequency";
+    case RangeOf::kPfdLow:
+      return "PFD frequency with bandwidth LOW";
+    case RangeOf::kOutput:
+      return "output frequency";
+    case RangeOf::kOutput1:
+      return "frequency of output 1";
+    case RangeOf::kPeriod:
+      return "period of " + doubt.pin;
+  }
+  return "";
+}
+
+string NeverReached(const device::Doubt& doubt) {
+  const bool is_above = doubt.value > doubt.bound;
+  string text = KeywordWords(doubt) + ", is never reached: with " + OtherWords(doubt);
+  text += is_above ? ", settings go up to " : ", settings go down to ";
+  return text + General(doubt.bound, 6) + " MHz";
+}
+
+string FewDividers(const device::Doubt& doubt) {
+  const string largest = Short(doubt.bound, 0);
+  return KeywordWords(doubt) + ", is so low that no divider can be above " +
+         (doubt.bound > Rational(1) ? "twice that, " + largest : largest) +
+         ": its high and low times do not fit; the engine takes up to " +
+         std::to_string(hardware::kLargestDivider) + " all the same";
+}
+
+}  // namespace
+
+string NothingWords(const device::Doubt& doubt) {
+  return doubt.kind == DoubtKind::kNothingBetween ? RangeWords(doubt) : "";
+}
+
+string DoubtText(const device::Doubt& doubt) {
+  switch (doubt.kind) {
+    case DoubtKind::kNothingBetween:
+      return Compared(doubt) + ": there is no " + RangeWords(doubt);
+    case DoubtKind::kLowUnused:
+      return Compared(doubt) + ", which is the highest PFD frequency with bandwidth LOW, too";
+    case DoubtKind::kTargetOutside:
+      return Compared(doubt) + ": the VCO frequency that is recommended is outside of its range";
+    case DoubtKind::kDoubledAbove:
+      return Compared(doubt) + ": with feedback from CLK2X, " +
+             (doubt.pin.empty() ? "the pin" : doubt.pin) + " would be faster than without";
+    case DoubtKind::kNeverReached:
+      return NeverReached(doubt);
+    case DoubtKind::kNotWhole:
+      return KeywordWords(doubt) + ", is a count of VCO cycles and should be a whole number";
+    case DoubtKind::kFewDividers:
+      break;
+  }
+  return FewDividers(doubt);
+}
+
+string GradesWords(const device::Doubt& doubt) {
+  return (doubt.grades.size() > 1 ? "grades " : "grade ") + Enumerated(doubt.grades);
+}
+
+}  // namespace planner::report
