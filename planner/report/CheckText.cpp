@@ -3,9 +3,9 @@
 
 #include <algorithm>
 #include <cstddef>
-#include <utility>
 #include <vector>
 
+#include "planner/read/Shown.h"
 #include "planner/report/DoubtText.h"
 #include "planner/report/Table.h"
 #include "planner/report/Words.h"
@@ -27,8 +27,10 @@ string PlaceText(const string& path, const Mistake::Place& place) {
   return path + ":" + std::to_string(place.line) + ":" + std::to_string(place.column) + ": ";
 }
 
+// The host names the keys that there are, but not the many keywords.
 string ReasonText(const Mistake& mistake) {
-  return mistake.reason + (mistake.nearest.empty() ? "" : "; did you mean " + mistake.nearest + "?");
+  if (mistake.kind == ::Device::NameKind::kKey) return mistake.reason;
+  return mistake.reason + read::DidYouMean(mistake.unknown, mistake.known);
 }
 
 // "; the same in lines 19, 31 and 43".
@@ -44,10 +46,6 @@ struct PlacedLine {
   Mistake::Place place;
   string text;
 };
-
-bool IsBefore(const PlacedLine& a, const PlacedLine& b) {
-  return std::pair(a.place.line, a.place.column) < std::pair(b.place.line, b.place.column);
-}
 
 bool Has(const std::vector<Primitive>& all, Primitive primitive) {
   return std::find(all.begin(), all.end(), primitive) != all.end();
@@ -146,8 +144,14 @@ string MistakesText(const Checked& checked, const string& path, const Style& sty
       if (is_merged) break;
     }
   }
-  std::stable_sort(lines.begin(), lines.end(), IsBefore);
+  std::stable_sort(lines.begin(), lines.end(), [](const PlacedLine& a, const PlacedLine& b) {
+    return a.place < b.place;
+  });
   for (const PlacedLine& line : lines) whole += line.text;
+  if (checked.untold > 0) {
+    whole += path + ": " + std::to_string(checked.untold) + " more " +
+             (checked.untold > 1 ? "mistakes" : "mistake") + "\n";
+  }
   return whole + Warnings(checked, path, style);
 }
 
