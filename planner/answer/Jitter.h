@@ -79,6 +79,12 @@ class KruJitter {
   // Of a device that has coefficients.
   double PhaseError() const;
 
+  // Whether the jitter of CLKFX, CLKFX180 and CLKFXDV does not fall when M or D rises and all else
+  // stays: the ring of the synthesiser runs freely for D input periods, and M of its own are
+  // rounded to taps. That is so of the doubles, too, as each step that works them out keeps the
+  // order of its arguments.
+  bool RisesWithSettings() const { return true; }
+
  private:
   // MHz; empty for a pin that the device does not have.
   struct Span {

@@ -74,6 +74,32 @@ TEST(LoopJitter, FallsWithMOverDSquared) {
   }
 }
 
+// What a search may rely on when it leaves out a larger M or D.
+TEST(KruJitter, RisesWithMAndD) {
+  for (const char* const input : {"100", "999", "61"}) {
+    const Request request = Ask({Rational::FromDecimal(input, 0) / 3}, {100});
+    const KruJitter jitter(Bundled("vk40", "2"), request, Primitive::kKruSp);
+    ASSERT_TRUE(jitter.RisesWithSettings());
+    const auto of = [&](int m, int d) {
+      KruSettings settings;
+      settings.m = m;
+      settings.d = d;
+      return jitter.PeakToPeak(settings, Pin::kClkfx);
+    };
+    int compared = 0;
+    for (int m = 2; m <= 32; ++m) {
+      for (int d = 1; d <= 32; ++d) {
+        if (of(m, d) == kUnknownJitter) continue;
+        // That of a frequency out of range is not known, which is above all others.
+        ASSERT_LE(of(m, d), of(m + 1, d));
+        ASSERT_LE(of(m, d), of(m, d + 1));
+        ++compared;
+      }
+    }
+    EXPECT_GT(compared, 100);
+  }
+}
+
 // --- The calculator's figures ------------------------------------------------------------------
 
 struct GradeName {
