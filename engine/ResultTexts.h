@@ -21,8 +21,9 @@ inline const char* PllResultText(PllEntry entry, int code, int count) {
     default: break;
   }
   if (entry == PllEntry::kTsynFrequencies) {
-    return count > 1 ? "Could not obtain valid VCO, M and D values with these requested frequencies."
-                     : "Could not obtain valid VCO, M and D values with the requested frequency.";
+    return count > 1
+               ? "Could not obtain valid VCO, M and D values with these requested frequencies."
+               : "Could not obtain valid VCO, M and D values with the requested frequency.";
   }
   // The closest-solution entry does not count its outputs.
   return entry == PllEntry::kClosestSolution || count > 1

@@ -22,7 +22,7 @@ namespace planner::engine {
 
 // A way to ask the engine. What a primitive does not have is not looked at.
 struct Variant {
-  std::string name;  // "smallest VCO"; empty when there is nothing to tell apart
+  std::string name = {};  // "smallest VCO"; empty when there is nothing to tell apart
   Bandwidth bandwidth = Bandwidth::kOptimized;
   bool closest = false;         // choose by phases and duty cycles, even if there are none
   bool prefer_max_vco = false;  // of several, the one with the largest VCO

@@ -213,7 +213,8 @@ TEST(Check, TellsCountsThatAreNone) {
 
 // A count that two primitives share, in three grades of which two are alike.
 TEST(Check, TellsTheSameOfSeveralGradesOnce) {
-  const std::string few = With(kPll, "HT_LT = 64", "HT_LT = 60") + With(kTsyn, "O_MAX_HT_LT = 64\n", "");
+  const std::string few = With(kPll, "HT_LT = 64", "HT_LT = 60") +
+                          With(kTsyn, "O_MAX_HT_LT = 64\n", "");
   const Checked checked = CheckText(kHead + "[grade.a]\n" + few + "[grade.b]\n" +
                                     With(few, "HT_LT = 60", "HT_LT = 61") + "[grade.c]\n" + few);
   ASSERT_EQ(checked.doubts.size(), 2u);
