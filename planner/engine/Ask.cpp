@@ -24,6 +24,36 @@ Answer AnswerOf(const Request& request, const Device& device, Primitive primitiv
   return answer::Evaluate(request, device, found.settings, source, found.searched);
 }
 
+// The runs for the variants of a PLL or a TSYN. The engine knows bandwidth LOW and no other: the
+// run for OPTIMIZED is that for HIGH, too.
+class LoopRuns {
+ public:
+  LoopRuns(const Request& request, const Device& device, Primitive primitive)
+      : request_(request), device_(device), primitive_(primitive) {}
+
+  Outcome Of(const Variant& variant) {
+    Variant key = variant;
+    if (key.bandwidth == Bandwidth::kHigh) key.bandwidth = Bandwidth::kOptimized;
+    auto run = std::find_if(runs_.begin(), runs_.end(),
+                            [&key](const auto& one) { return one.first == key; });
+    if (run == runs_.end()) {
+      runs_.emplace_back(key, RunLoop(request_, device_, primitive_, key, false));
+      run = runs_.end() - 1;
+    }
+    Outcome outcome = run->second;
+    if (auto* const found = std::get_if<Found>(&outcome)) {
+      std::get<LoopSettings>(found->settings).bandwidth = variant.bandwidth;
+    }
+    return outcome;
+  }
+
+ private:
+  const Request& request_;
+  const Device& device_;
+  const Primitive primitive_;
+  std::vector<std::pair<Variant, Outcome>> runs_;
+};
+
 // The first answer that is as asked for, of all phases that stand for those of the request, or
 // else the best.
 Answer AskKru(const Request& request, const Device& device, Primitive primitive,
@@ -49,13 +79,31 @@ bool IsSame(const Answer& a, const Answer& b) {
   return connected == *other && a.max_jitter == b.max_jitter && a.phase_error == b.phase_error;
 }
 
+void RequirePrimitive(const Device& device, Primitive primitive) {
+  if (device.Has(primitive)) return;
+  throw std::invalid_argument("The device does not have the primitive.");
+}
+
+// The answers of all variants, solved or not, in their order.
+std::vector<Answer> AllAnswers(const Request& request, const Device& device,
+                               Primitive primitive) {
+  std::vector<Answer> answers;
+  LoopRuns runs(request, device, primitive);
+  for (const Variant& variant : Variants(request, primitive)) {
+    const Source source = {.engine = true, .variant = variant.name};
+    answers.push_back(
+        hardware::IsLoop(primitive)
+            ? AnswerOf(request, device, primitive, source, runs.Of(variant))
+            : AskKru(request, device, primitive, variant, source, false));
+  }
+  return answers;
+}
+
 }  // namespace
 
 Answer AskOne(const Request& request, const Device& device, Primitive primitive,
               const Variant& variant, bool trace) {
-  if (!device.Has(primitive)) {
-    throw std::invalid_argument("The device does not have the primitive.");
-  }
+  RequirePrimitive(device, primitive);
   const Source source = {.engine = true, .variant = variant.name};
   std::vector<Finding> refusals = answer::Refusals(request, primitive);
   if (!refusals.empty()) return answer::Unsolved(primitive, source, std::move(refusals));
@@ -67,14 +115,15 @@ Answer AskOne(const Request& request, const Device& device, Primitive primitive,
 }
 
 std::vector<Answer> Ask(const Request& request, const Device& device, Primitive primitive) {
+  RequirePrimitive(device, primitive);
+  std::vector<Finding> refusals = answer::Refusals(request, primitive);
+  if (!refusals.empty()) {
+    return {answer::Unsolved(primitive, {.engine = true}, std::move(refusals))};
+  }
+  std::vector<Answer> answers = AllAnswers(request, device, primitive);
   std::vector<Answer> solved;
-  std::optional<Answer> unsolved;
-  for (const Variant& variant : Variants(request, primitive)) {
-    Answer answer = AskOne(request, device, primitive, variant);
-    if (!answer.solved) {
-      if (!unsolved) unsolved = std::move(answer);
-      continue;
-    }
+  for (Answer& answer : answers) {
+    if (!answer.solved) continue;
     const auto same = std::find_if(solved.begin(), solved.end(), [&answer](const Answer& other) {
       return IsSame(answer, other);
     });
@@ -86,8 +135,8 @@ std::vector<Answer> Ask(const Request& request, const Device& device, Primitive 
   }
   if (!solved.empty()) return solved;
   // The reason is that of all variants; the name of one would only distract from it.
-  unsolved->source.variant.clear();
-  return {std::move(*unsolved)};
+  answers.front().source.variant.clear();
+  return {std::move(answers.front())};
 }
 
 }  // namespace planner::engine

@@ -11,7 +11,6 @@ namespace planner::engine {
 namespace {
 
 using hardware::TurnedToFull;
-using hardware::TurnedToHalf;
 
 // A phase of each output, or none where it does not matter.
 using Phases = std::vector<std::optional<Rational>>;
@@ -85,14 +84,19 @@ class PhaseLists {
     return ((phase - offset) / quarter_).Round() * quarter_;
   }
 
+  // How far a phase is from the nearest that the pins make with an offset.
+  Rational ErrorOf(const Rational& phase, const Rational& offset) const {
+    const Rational distance = (phase - offset).Absolute();
+    return ((distance / quarter_).Round() * quarter_ - distance).Absolute();
+  }
+
   // The largest error with an offset, in units of the tolerances; none where one is larger than it
   // may be.
   std::optional<Rational> WorstError(const Phases& phases, const Rational& offset) const {
     Rational worst = 0;
     for (std::size_t i = 0; i < phases.size(); ++i) {
       if (!phases[i]) continue;
-      const Rational error =
-          TurnedToHalf(PinOf(*phases[i], offset) + offset - *phases[i]).Absolute();
+      const Rational error = ErrorOf(*phases[i], offset);
       const Rational& allowed = request_.PhaseToleranceOf(request_.outputs[i]);
       if (error > allowed) return std::nullopt;
       worst = std::max(worst, error / answer::PhaseUnit(allowed));
