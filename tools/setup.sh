@@ -34,7 +34,7 @@ packages_for() {
   printf '%s\n' g++ cmake ninja-build tcl8.6 tcl8.6-dev tcllib libtomlplusplus-dev \
     libboost-dev libcli11-dev libfmt-dev nlohmann-json3-dev
   case $1 in
-    tests) printf '%s\n' libgtest-dev libgmock-dev ;;
+    tests) printf '%s\n' libgtest-dev libgmock-dev opensta ;;
     benchmarks) printf '%s\n' libbenchmark-dev ;;
     libcxx) printf '%s\n' clang-14 libc++-14-dev libc++abi-14-dev ;;
   esac

@@ -1,16 +1,21 @@
 # A plan as timing constraints in SDC: the clocks at the inputs, those that the primitive makes of
 # them, and their uncertainty.
 #
-# A clock without a phase has the ratio of its settings, as whole numbers: -multiply_by,
-# -divide_by and, when it is not 50 percent, -duty_cycle.
-#
-# SDC has no phase beside these. Its means for one is -edge_shift, which goes with -edges and
-# with nothing else: three edges of the source clock, and how much later than these the clock
-# rises, falls and rises again. A delay of the clock (set_clock_latency) would be no phase: tools
-# then count from the edges as if they were not shifted. Without a multiplier the shift of both
-# rising edges is the same number, so that the period is exactly a multiple of the source's. With
-# one the second has what the period is longer or shorter than whole periods of the source, as
-# exactly as a decimal can be; the comment has the ratio.
+# A timing tool takes one description of a clock and refuses two beside each other, so each clock
+# has the plainest that says all of it:
+#   -multiply_by   a whole multiple of the input; -duty_cycle goes with it, and with nothing else
+#   -divide_by     a whole part of the input, high for half of the time
+#   -edges and -edge_shift
+#                  all else: fractions, phases, and parts with another duty cycle
+# The last are three edges of the input and how much later than these the clock rises, falls and
+# rises again. The edges of a clock are counted from 1, two in each period, the input's being half
+# a period apart. The first rise is in the first period of the clock, from time 0 on: some tools
+# overlook gaps between clocks that rise for the first time before or after that. A delay of the
+# clock (set_clock_latency) would be no phase: tools then count from the edges as if they were not
+# shifted. Of a whole part of the input both rising edges are shifted by the same number, so that
+# its period is exactly a multiple of the input's. Else the shift of the second has what the period
+# is longer or shorter than whole periods of the input, in all digits of a double; the comment has
+# the ratio.
 
 package provide vorkel::format_sdc 1.1
 package require vorkel::actual 1.1
@@ -140,33 +145,34 @@ proc ::vorkel::format::sdc_writer::Generated {output n input inputs pin} {
   return $text
 }
 
+# When a clock rises and falls, in the plainest of the descriptions above.
 proc ::vorkel::format::sdc_writer::Waveform {output input} {
   lassign [dict get $output ratio] multiply divide
   set phase [::vorkel::actual::turned [dict get $output phase]]
   set duty [dict get $output duty]
-  if {$phase != 0.0} {
-    return [Edges $multiply $divide [expr {1000.0 / $input}] $phase $duty]
+  if {$phase == 0.0 && $divide == 1} {
+    return "-multiply_by $multiply[expr {$duty == 50.0 ? "" : " -duty_cycle [Exact $duty]"}]"
   }
-  set text "-multiply_by $multiply -divide_by $divide"
-  if {$duty != 50.0} {
-    append text " -duty_cycle [Exact $duty]"
+  if {$phase == 0.0 && $multiply == 1 && $duty == 50.0} {
+    return "-divide_by $divide"
   }
-  return $text
+  return [Edges $multiply $divide [expr {1000.0 / $input}] $phase $duty]
 }
 
-# Edges of the source, which has two in each period, and their shifts (ns).
+# Edges of the source, and their shifts (ns). The shifts are worked out in periods of the source,
+# where what is 0 or the same comes out so, and multiplied by `source`, its period, at the end.
+#
+# A timing tool may count in floats. Of a fast clock little would be left of them where a shift
+# takes away nearly all of a period of the source; so one that is more than four times as fast has
+# all three edges at the first one of the source.
 proc ::vorkel::format::sdc_writer::Edges {multiply divide source phase duty} {
-  # Whole periods of the source, of which there must be one at least between rising edges.
-  set whole [expr {max(1, $divide / $multiply)}]
-  set period [expr {$source * $divide / $multiply}]
-  set rise [expr {$period * $phase / 360.0}]
-  set fall [expr {$rise + $period * $duty / 100.0 - $source * $whole / 2.0}]
-  set again $rise
-  if {$multiply * $whole != $divide} {
-    set again [expr {$rise + $source * ($divide - $multiply * $whole) / $multiply}]
-  }
-  return "-edges {1 [expr {1 + $whole}] [expr {1 + 2 * $whole}]}\
-    -edge_shift {[Exact $rise] [Exact $fall] [Exact $again]}"
+  # Whole periods of the source between the rising edges.
+  set whole [expr {$multiply > 4 * $divide ? 0 : max(1, $divide / $multiply)}]
+  set rise [expr {$divide * $phase / (360.0 * $multiply)}]
+  set fall [expr {$rise + ($divide * $duty / (100.0 * $multiply) - $whole / 2.0)}]
+  set again [expr {$rise + double($divide - $multiply * $whole) / $multiply}]
+  set shifts [lmap shift [list $rise $fall $again] {Exact [expr {$source * $shift}]}]
+  return "-edges {1 [expr {1 + $whole}] [expr {1 + 2 * $whole}]} -edge_shift {$shifts}"
 }
 
 # The jitter is worked out for the first input clock, and with another one it is another.

@@ -2,7 +2,8 @@
 # a timing tool has them, and works out what clocks they make.
 
 namespace eval ::constraints {
-  # From name to a dict: period, edges (rise, fall and next rise, ns), uncertainty, object, source.
+  # From name to a dict: period, edges (rise, fall and next rise, ns), uncertainty, object; of a
+  # generated one also description, the options that describe it, in alphabetical order.
   variable clocks {}
   variable groups {}
 }
@@ -94,40 +95,45 @@ proc ::constraints::create_generated_clock {args} {
       error "$name is at $object already"
     }
   }
+  set description [lmap option [lsort [dict keys $given]] {
+    if {$option ni {-multiply_by -divide_by -duty_cycle -edges -edge_shift}} continue
+    set option
+  }]
   set source [dict get $master period]
-  if {[dict exists $given -edges]} {
-    foreach option {-multiply_by -divide_by -duty_cycle} {
-      if {[dict exists $given $option]} {
-        error "$option goes not with -edges"
+  switch -- $description {
+    -divide_by - -multiply_by - {-duty_cycle -multiply_by} {
+      set factor [lindex [dict get $given [lindex $description end]] 0]
+      if {![regexp {^[1-9][0-9]*$} $factor]} {
+        error "[lindex $description end] is no whole number"
       }
+      set period [expr {[lindex $description end] eq "-divide_by" ? $source * $factor :
+        $source / $factor}]
+      set duty [expr {[dict exists $given -duty_cycle] ?
+        [lindex [dict get $given -duty_cycle] 0] : 50}]
+      set edges [list 0.0 [expr {$period * $duty / 100.0}] $period]
     }
-    set edges {}
-    set last 0
-    foreach edge [lindex [dict get $given -edges] 0] \
-        shift [lindex [dict get $given -edge_shift] 0] {
-      if {$edge <= $last} {
-        error "edges must rise"
+    {-edge_shift -edges} {
+      set edges {}
+      set last 0
+      foreach edge [lindex [dict get $given -edges] 0] \
+          shift [lindex [dict get $given -edge_shift] 0] {
+        if {$edge < max(1, $last)} {
+          error "edges are in order, from 1 on"
+        }
+        set last $edge
+        lappend edges [expr {($edge - 1) * $source / 2.0 + $shift}]
       }
-      set last $edge
-      lappend edges [expr {($edge - 1) * $source / 2.0 + $shift}]
+      if {[llength $edges] != 3 || [lsort -real -unique $edges] ne $edges} {
+        error "a clock rises, falls and rises, each time later: $edges"
+      }
+      set period [expr {[lindex $edges 2] - [lindex $edges 0]}]
     }
-    set period [expr {[lindex $edges 2] - [lindex $edges 0]}]
-  } else {
-    if {[dict exists $given -edge_shift]} {
-      error "-edge_shift goes with -edges only"
+    default {
+      error "a clock is not described by [join $description {, }]"
     }
-    set multiply [lindex [dict get $given -multiply_by] 0]
-    set divide [lindex [dict get $given -divide_by] 0]
-    if {![string is integer -strict $multiply] || ![string is integer -strict $divide]} {
-      error "a ratio is made of whole numbers"
-    }
-    set period [expr {$source * $divide / $multiply}]
-    set duty [expr {[dict exists $given -duty_cycle] ?
-      [lindex [dict get $given -duty_cycle] 0] : 50}]
-    set edges [list 0.0 [expr {$period * $duty / 100.0}] $period]
   }
   Add [lindex [dict get $given -name] 0] [dict create period $period edges $edges object $object \
-    ratio [expr {[dict exists $given -edges] ? "" : "$multiply $divide"}]]
+    description $description]
 }
 
 proc ::constraints::set_clock_uncertainty {value names} {

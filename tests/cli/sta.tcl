@@ -1,0 +1,280 @@
+# Plans in a timing engine: a netlist for each, what the engine makes of it and of the constraints,
+# and how that differs from what the settings make.
+#
+# The engine is the opensta of Debian. It counts in floats. For the gap between two clocks it goes
+# through the periods of the capturing clock until both clocks begin one at the same time, but at
+# most through 1000 periods, or 100 when the capturing clock is the slower one. Then it warns that
+# it has found no common period, and the gap is the least of those that it has seen. Times that
+# differ by less than a millionth are the same for it, so that after many periods it takes edges
+# beside each other for one, and ends too early. It does so, too, when the capturing edge is the
+# fall of a clock that rises in its first period and falls in the second: it then begins a period
+# before time 0, and with launches from time 0 on before the fall in that period it is content with
+# them at time 0, where all clocks begin a period. A fall right at the end of the first period may,
+# by the rounding of floats, come just after a launch at time 0. Where none of this is so, the gap
+# must be the exact one. Else it must be no shorter than that, and no longer than the shortest that
+# the engine must have seen.
+
+namespace eval ::sta {
+  variable folder [file join $::cli::folder sta]
+  variable program [expr {[info exists ::env(VORKEL_STA)] ? $::env(VORKEL_STA) : "sta"}]
+  # Periods of the capturing clock, less a few for where the counting begins.
+  variable most_periods 995
+  variable most_slower_periods 95
+  # What the engine can tell apart, in parts of the time from 0, with room for the errors of its
+  # periods; what a period and a gap may be off, in parts of themselves and of that time; and the
+  # last digit of an uncertainty, ns.
+  variable distinct 4e-6
+  variable tolerance 6e-7
+  variable rounding 1e-7
+}
+
+# A design with the primitive of a plan, and paths between all its clocks: from a flip-flop at each
+# input and output to two more at each, one for the rising and one for the falling edge.
+proc ::sta::netlist {module answer inputs} {
+  set ports {}
+  set connections {}
+  for {set n 1} {$n <= $inputs} {incr n} {
+    lappend ports clk_in$n
+    lappend connections .CLKIN${n}(clk_in$n)
+  }
+  set nets $ports
+  foreach output [clocked $answer] {
+    lappend nets net_[pin $output]
+    lappend connections .[pin $output](net_[pin $output])
+  }
+  set primitive [dict get $answer primitive]
+  set lines [list "module $module ([join $ports {, }]);" "input [join $ports {, }];"]
+  foreach net [lrange $nets $inputs end] {
+    lappend lines "wire $net;"
+  }
+  lappend lines "$primitive [string tolower $primitive]_inst ([join $connections {, }]);"
+  foreach from $nets {
+    lappend lines "wire q_$from;" "FLOP_RISE launch_$from (.CK($from), .D(q_$from), .Q(q_$from));"
+    foreach to $nets {
+      foreach edge {RISE FALL} {
+        lappend lines "FLOP_$edge [string tolower $edge]_${from}_$to (.CK($to), .D(q_$from));"
+      }
+    }
+  }
+  return [join $lines \n]\nendmodule\n
+}
+
+proc ::sta::pin {output} {
+  set pin [dict get $output pin]
+  return [expr {$pin eq "null" ? "CLKOUT[dict get $output index]" : $pin}]
+}
+
+# The outputs that have a clock: of those at the same pin, the first.
+proc ::sta::clocked {answer} {
+  set pins {}
+  return [lmap output [dict get $answer outputs] {
+    set pin [pin $output]
+    if {$pin in $pins} continue
+    lappend pins $pin
+    set output
+  }]
+}
+
+# Runs the engine on plans. Each is a dict with the answer (as in JSON), the inputs (ratios, MHz)
+# and sdc, the constraints. Answers a list with a dict for each plan: faults (what the engine says
+# of the constraints), warnings (what it says afterwards), clocks and paths as in report.tcl.
+proc ::sta::run {plans} {
+  variable folder
+  variable program
+  file copy -force [file join $folder cells.lib] $::cli::scratch
+  set n 0
+  foreach plan $plans {
+    ::cli::write plan-$n.v [netlist plan_$n [dict get $plan answer] \
+      [llength [dict get $plan inputs]]]
+    ::cli::write plan-$n.sdc [dict get $plan sdc]
+    incr n
+  }
+  set here [pwd]
+  cd $::cli::scratch
+  try {
+    # A library that is loaded for the sanitizers is not for this program. Both it and its script
+    # write to the file of its warnings.
+    exec env -u LD_PRELOAD $program -exit -no_splash [file join $folder report.tcl] \
+      >said 2>>warnings </dev/null
+    set said [string trim [::cli::contents said]]
+    if {$said ne ""} {
+      error "the timing engine: $said"
+    }
+    set results {}
+    foreach line [split [string trim [::cli::contents report] \n] \n] {
+      lassign $line number faults clocks paths
+      dict set results $number [dict create faults $faults warnings {} \
+        clocks $clocks paths $paths]
+    }
+    foreach line [split [string trim [::cli::contents warnings]] \n] {
+      if {![regexp {^plan (\d+)$} $line -> number]} {
+        dict with results $number {
+          lappend warnings $line
+        }
+      }
+    }
+  } finally {
+    cd $here
+  }
+  if {[dict size $results] != [llength $plans]} {
+    error "the timing engine has [dict size $results] of [llength $plans] plans"
+  }
+  return [dict values $results]
+}
+
+# What differs between a plan and what the engine makes of it, as sentences. Counts the pairs of
+# clocks whose gap must be exact, and the others, in the variables of that name.
+proc ::sta::differences {plan result exactPairs otherPairs} {
+  upvar 1 $exactPairs exact_pairs $otherPairs other_pairs
+  set answer [dict get $plan answer]
+  set inputs [dict get $plan inputs]
+  set outputs [clocked $answer]
+  set faults {}
+  if {[dict get $result faults] ne ""} {
+    lappend faults [dict get $result faults]
+  }
+  foreach output $outputs {
+    lassign [::exact::shape $answer $output] frequency
+    if {$frequency ne [list [dict get $output multiply] [dict get $output divide]]} {
+      lappend faults "output [dict get $output index] is $frequency of the input"
+    }
+  }
+  lassign [::exact::clocks $answer $inputs $outputs] steps clocks
+  lappend faults {*}[ClockDifferences $steps $clocks [dict get $result clocks]]
+
+  set uncertainties [Uncertainties $answer $inputs $outputs]
+  set slacks [dict create]
+  foreach path [dict get $result paths] {
+    lassign $path from to endpoint slack
+    set edge [expr {[string match fall_* $endpoint] ? "fall" : "rise"}]
+    set slack [expr {$slack * 1e9}]
+    set key [list $from $to $edge]
+    if {![dict exists $slacks $key] || $slack < [dict get $slacks $key]} {
+      dict set slacks $key $slack
+    }
+  }
+  # Pairs of clocks for which it may have found no common period.
+  set long {}
+  foreach from [dict keys $clocks] {
+    foreach to [dict keys $clocks] {
+      foreach edge {rise fall} {
+        set key [list $from $to $edge]
+        if {[AreExclusive $from $to]} {
+          if {[dict exists $slacks $key]} {
+            lappend faults "$from to $to: only one of them is there"
+          }
+          continue
+        }
+        if {![dict exists $slacks $key]} {
+          lappend faults "$from to $to, $edge: no path"
+          continue
+        }
+        set gap [expr {[dict get $slacks $key] + [dict get $uncertainties $to]}]
+        lassign [Bounds $steps [dict get $clocks $from] [dict get $clocks $to] $edge] least most \
+          margin isLong
+        if {$gap < $least - $margin || ($most ne "" && $gap > $most + $margin)} {
+          lappend faults "$from to $to, $edge: $gap ns, not $least to $most"
+        }
+        incr [expr {$least eq $most ? "exact_pairs" : "other_pairs"}]
+        if {$isLong} {
+          lappend long [lsort [list $from $to]]
+        }
+        dict unset slacks $key
+      }
+    }
+  }
+  if {[dict size $slacks] > 0} {
+    lappend faults "further paths: $slacks"
+  }
+  foreach warning [dict get $result warnings] {
+    if {![regexp {^Warning: No common period was found between clocks (\S+) and (\S+)\.$} $warning \
+        -> one two] || [lsort [list $one $two]] ni $long} {
+      lappend faults $warning
+    }
+  }
+  return $faults
+}
+
+# What differs between clocks on a grid of steps and those of the engine.
+proc ::sta::ClockDifferences {steps clocks found} {
+  variable tolerance
+  if {[lsort [dict keys $clocks]] ne [lsort [dict keys $found]]} {
+    return [list "the clocks are [lsort [dict keys $found]]"]
+  }
+  set faults {}
+  dict for {name times} $clocks {
+    set period [expr {[lindex $times 0] / double($steps)}]
+    foreach what {period rise fall} exact $times seconds [dict get $found $name] {
+      set exact [expr {$exact / double($steps)}]
+      set time [expr {$seconds * 1e9}]
+      set off [expr {($time - $exact) / $period}]
+      # An edge can be told in another period.
+      if {$what ne "period"} {
+        set off [expr {$off - round($off)}]
+      }
+      if {abs($off) > $tolerance} {
+        lappend faults "$name: $what $time ns, not $exact"
+      }
+    }
+  }
+  return $faults
+}
+
+# How early or late each clock can be, ns: half of its jitter where that is known.
+proc ::sta::Uncertainties {answer inputs outputs} {
+  set uncertainties [dict create]
+  for {set n 1} {$n <= [llength $inputs]} {incr n} {
+    dict set uncertainties clk_in$n [expr {[dict get $answer input_jitter] / 2000.0}]
+    foreach output $outputs {
+      set name clk_out[dict get $output index][expr {[llength $inputs] > 1 ? "_in$n" : ""}]
+      set jitter [dict get $output jitter]
+      dict set uncertainties $name [expr {$n > 1 || $jitter eq "null" ? 0 : $jitter / 2000.0}]
+    }
+  }
+  return $uncertainties
+}
+
+# Whether two clocks follow different inputs of the primitive.
+proc ::sta::AreExclusive {one two} {
+  return [expr {[regexp {^clk_out\d+_in(\d)$} $one -> first] &&
+    [regexp {^clk_out\d+_in(\d)$} $two -> second] && $first != $second}]
+}
+
+# What the engine's gap between two clocks must be: at least and at most (ns, "" when it can be
+# anything), how far it may be off, and whether it may have found no common period. Clocks are
+# period, rise and fall in steps, of which a nanosecond has `steps`.
+proc ::sta::Bounds {steps from to edge} {
+  variable most_periods
+  variable most_slower_periods
+  variable distinct
+  variable tolerance
+  variable rounding
+  lassign $from first rise
+  lassign $to second toRise toFall
+  set capture [expr {$edge eq "fall" ? $toFall : $toRise}]
+  # Periods of the capturing clock until both begin one at the same time.
+  set periods [expr {$first / [::exact::gcd $first $second]}]
+  set limit [expr {$second > $first ? $most_slower_periods : $most_periods}]
+  # The least difference between edges that are not at the same time, and with it the periods in
+  # which the engine can tell all of them apart.
+  set grain [::exact::gcd [::exact::gcd $first $second] [expr {$capture - $rise}]]
+  set seen [expr {min($periods, $limit, int($grain / ($distinct * $second)))}]
+  set least [::exact::gap $first $rise $second $capture $periods 0]
+  set most $least
+  if {$seen < $periods} {
+    set most [::exact::gap $first $rise $second $capture $seen 1]
+  }
+  if {$capture >= $second} {
+    set before [::exact::gap $first $rise $second [expr {$capture - $second}] 1 1]
+    if {$before ne ""} {
+      set most $before
+    }
+    if {$capture == $second && $rise == 0} {
+      set least 0
+    }
+  }
+  set time [expr {($seen * $second + $first + $second) / double($steps)}]
+  return [list [expr {$least / double($steps)}] \
+    [expr {$most eq "" ? "" : $most / double($steps)}] \
+    [expr {$tolerance * $time + $rounding}] [expr {$periods > $limit}]]
+}
