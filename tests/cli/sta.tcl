@@ -9,10 +9,10 @@
 # beside each other for one, and ends too early. It does so, too, when the capturing edge is the
 # fall of a clock that rises in its first period and falls in the second: it then begins a period
 # before time 0, and with launches from time 0 on before the fall in that period it is content with
-# them at time 0, where all clocks begin a period. A fall right at the end of the first period may,
-# by the rounding of floats, come just after a launch at time 0. Where none of this is so, the gap
-# must be the exact one. Else it must be no shorter than that, and no longer than the shortest that
-# the engine must have seen.
+# them at time 0, where all clocks begin a period. By the rounding of floats, that fall may also
+# come just after a launch that is at the same time. Where none of this is so, the gap must be the
+# exact one. Else it must be no shorter than that, and no longer than the shortest that the engine
+# must have seen.
 
 namespace eval ::sta {
   variable folder [file join $::cli::folder sta]
@@ -265,11 +265,13 @@ proc ::sta::Bounds {steps from to edge} {
     set most [::exact::gap $first $rise $second $capture $seen 1]
   }
   if {$capture >= $second} {
+    # A fall in the second period.
     set before [::exact::gap $first $rise $second [expr {$capture - $second}] 1 1]
     if {$before ne ""} {
       set most $before
     }
-    if {$capture == $second && $rise == 0} {
+    set apart [expr {$capture - $second - $rise}]
+    if {$apart >= 0 && $apart % $first == 0} {
       set least 0
     }
   }
