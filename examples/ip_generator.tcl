@@ -43,7 +43,7 @@ proc ::generator::loadEngine {} {
   variable script
   set folder [file join [file dirname [file dirname $script]] build ip_vorkel1.1]
   if {[info exists ::env(VORKEL_PACKAGE_DIR)]} {
-    set folder $::env(VORKEL_PACKAGE_DIR)
+    set folder [file normalize [path $::env(VORKEL_PACKAGE_DIR)]]
   }
   set ::auto_path [linsert $::auto_path 0 $folder]
   package require Ip_vorkel 1.1
@@ -134,6 +134,12 @@ proc ::generator::column {dict list key} {
   return [lmap entry [dict get $dict $list] {dict get $entry $key}]
 }
 
+# The name of a file as the file commands take it: to them a leading "|" is a program to run, and a
+# leading "~" a user's folder.
+proc ::generator::path {name} {
+  return [expr {[string index $name 0] in {~ |} ? "./$name" : $name}]
+}
+
 # A flag as the methods of a handle take it.
 proc ::generator::flag {value} {
   return [expr {$value ? "true" : "false"}]
@@ -160,7 +166,7 @@ proc ::generator::Write {text path} {
     puts -nonewline $text
     return
   }
-  set channel [open $path w]
+  set channel [open [path $path] w]
   try {
     fconfigure $channel -encoding utf-8
     puts -nonewline $channel $text

@@ -64,7 +64,7 @@ proc ::vorkel::check::Contents {path} {
     if {![file isfile $path]} {
       throw {POSIX EINVAL} "it is no plain file"
     }
-    if {[file extension $path] ne ".toml" || [file rootname [file tail $path]] eq ""} {
+    if {[file extension $path] ne ".toml" || [::vorkel::options::tail $path] eq ".toml"} {
       throw {POSIX EINVAL} "a device file is named DEVICE.toml"
     }
     if {[file size $path] > $largest_file} {
@@ -100,12 +100,13 @@ proc ::vorkel::check::IsDevice {name} {
 proc ::vorkel::check::Read {path text} {
   variable most_mistakes
   variable most_rounds
-  set copy [::vorkel::device_repair::begin [file rootname [file tail $path]] $text]
+  set name [::vorkel::options::tail $path]
+  set copy [::vorkel::device_repair::begin [file rootname $name] $text]
   set mistakes {}
   set description ""
   for {set round 0} {$round < $most_rounds && [llength $mistakes] < $most_mistakes} {incr round} {
     try {
-      set description [Describe [file tail $path] [::vorkel::device_repair::text $copy]]
+      set description [Describe $name [::vorkel::device_repair::text $copy]]
       break
     } trap {VORKEL USAGE} {complaint} {
       if {![regexp {^.*?:(\d+):(\d+): (.*)$} $complaint -> line column reason]} {
@@ -114,7 +115,10 @@ proc ::vorkel::check::Read {path text} {
       }
       if {![::vorkel::device_repair::isFollowing $copy $line $reason]} {
         set place [list [::vorkel::device_repair::line $copy $line] $column]
-        lappend mistakes [list {*}$place "$path:[join $place :]: $reason[Nearest $reason]"]
+        set mistake [list {*}$place "$path:[join $place :]: $reason[Nearest $reason]"]
+        # What cannot be mended, such as a device whose file no device can be named as, comes again.
+        if {$mistake in $mistakes} break
+        lappend mistakes $mistake
       }
       set mended [::vorkel::device_repair::mend $copy $line $reason]
       if {$mended eq $copy} break
@@ -133,7 +137,7 @@ proc ::vorkel::check::Describe {name text} {
   set back [pwd]
   set devices [expr {[info exists ::env(VORKEL_DEVICES)] ? [list $::env(VORKEL_DEVICES)] : {}}]
   try {
-    set channel [open [file join $folder $name] wb]
+    set channel [open $folder/$name wb]
     puts -nonewline $channel $text
     close $channel
     cd $folder
@@ -150,9 +154,10 @@ proc ::vorkel::check::Describe {name text} {
   }
 }
 
-# A new folder of its own: the name of a file that was created is nobody else's.
+# A new folder of its own, by its whole path: the name of a file that was created is nobody else's.
 proc ::vorkel::check::Scratch {} {
   close [file tempfile file vorkel]
+  set file [file normalize [::vorkel::options::path $file]]
   set folder $file.d
   if {[file exists $folder]} {
     file delete -- $file

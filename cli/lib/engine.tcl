@@ -1,6 +1,7 @@
 # The engine: its package, and one run of one of its solvers through the methods of a handle.
 
 package provide vorkel::engine 1.1
+package require vorkel::options 1.1
 
 namespace eval ::vorkel::engine {
   # Where the package stands when the environment does not say it: in the build folder.
@@ -20,7 +21,7 @@ proc ::vorkel::engine::load {} {
   variable bundled
   set dir $bundled
   if {[info exists ::env(VORKEL_PACKAGE_DIR)] && $::env(VORKEL_PACKAGE_DIR) ne ""} {
-    set dir [file normalize $::env(VORKEL_PACKAGE_DIR)]
+    set dir [file normalize [::vorkel::options::path $::env(VORKEL_PACKAGE_DIR)]]
   }
   set index [file join $dir pkgIndex.tcl]
   if {![file isfile $index]} {

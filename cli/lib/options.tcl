@@ -131,9 +131,15 @@ proc ::vorkel::options::enumerate {words {last and}} {
   return "[join [lrange $words 0 end-1] {, }] $last [lindex $words end]"
 }
 
-# The name of a file as the file commands take it: a shell has already made of "~" what it makes.
+# The name of a file as the file commands take it. To them a leading "~" is a user's folder, which a
+# shell has already made of it where that is meant, and a leading "|" is a program to run.
 proc ::vorkel::options::path {name} {
-  return [expr {[string match ~* $name] ? "./$name" : $name}]
+  return [expr {[string index $name 0] in {~ |} ? "./$name" : $name}]
+}
+
+# The last part of the name of a file. "file tail" asks for the user that a leading "~" names.
+proc ::vorkel::options::tail {name} {
+  return [regsub {^.*/} $name {}]
 }
 
 # A text as a complaint shows it: on one line, and not without end.

@@ -5,7 +5,7 @@ namespace eval ::generator::report {}
 proc ::generator::report::render {request part plan} {
   set lines {}
   foreach {name value} [list \
-    request [file tail [dict get $request path]] \
+    request [regsub {^.*/} [dict get $request path] {}] \
     device [dict get $part name] \
     primitive [dict get $plan primitive] \
     {*}[Inputs $request] {*}[dict get $plan settings] \

@@ -66,7 +66,7 @@ proc ::generator::request::Wrong {reason} {
 # The commands of a file, each behind the number of its first line.
 proc ::generator::request::Commands {path} {
   try {
-    set channel [open $path]
+    set channel [open [::generator::path $path]]
     fconfigure $channel -encoding utf-8
     set text [::read $channel]
     close $channel
