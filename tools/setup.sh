@@ -15,6 +15,10 @@ readonly PROGRAM_FOLDERS=(hardware host engine planner binding)
 readonly PROGRAM_SOURCES=(CMakeLists.txt devices doc examples "${PROGRAM_FOLDERS[@]}")
 readonly TEST_SOURCES=(tests)
 
+# The exit status of a script whose set-up fails. Those that call ./vorkel take 1 for an answer of
+# the program.
+readonly SET_UP_FAILED=5
+
 # Without it there is nothing to run, whatever the stamp says.
 readonly PACKAGE_LIBRARY=ip_vorkel1.1/libIp_Vorkel.so
 
@@ -24,7 +28,16 @@ say() {
 
 fail() {
   say "$@"
-  exit 1
+  exit "$SET_UP_FAILED"
+}
+
+# Runs when a script ends in its set-up, and makes one failure of all: a command that has failed has
+# said why itself. What was killed ends as that does.
+end_set_up() {
+  local status=$?
+  if ((status > 0 && status < 128 && status != SET_UP_FAILED)); then
+    fail "the set-up failed; the reason stands above"
+  fi
 }
 
 # --- Debian packages ---------------------------------------------------------------------
@@ -70,7 +83,7 @@ install_packages() {
       say "$count must be installed first, and this user may not do it. Please run, as root:"
       printf '  %sapt-get update && %sapt-get install --yes %s\n' \
         "$sudo" "$sudo" "${missing[*]}" >&2
-      exit 1
+      exit "$SET_UP_FAILED"
     fi
   fi
 
@@ -113,12 +126,15 @@ fingerprint() {
   find "${present[@]}" ! -type d ! -name '.*' ! -name '*~' -printf '%p %s %T@\n' | LC_ALL=C sort
 }
 
-# Whether the folder holds the build of the sources as they are: `is_current FOLDER WHAT`.
+# Whether the folder holds the build of the sources as they are: `is_current FOLDER WHAT`. It can be
+# asked without the lock: another run takes the stamp away before it builds.
 is_current() {
-  local stamp=$1/.built-$2
-  [[ -f $stamp && -e $1/$PACKAGE_LIBRARY ]] || return 1
+  local stamp
+  # $(<FILE) would end the script when the file is not there any more.
+  stamp=$(cat -- "$1/.built-$2" 2>/dev/null) || return 1
+  [[ -e $1/$PACKAGE_LIBRARY ]] || return 1
   command -v tclsh8.6 >/dev/null || return 1
-  [[ $(fingerprint "$2") == "$(<"$stamp")" ]]
+  [[ $(fingerprint "$2") == "$stamp" ]]
 }
 
 # --- Configuring and building ------------------------------------------------------------
@@ -126,8 +142,10 @@ is_current() {
 # Waits until no other run builds or tests in the folder and keeps it for this one, until
 # `unlock` or the end of the script.
 lock() {
-  mkdir -p -- "$1"
-  exec 9>"$1/.lock"
+  local reason
+  reason=$(mkdir -p -- "$1" 2>&1 && { : >>"$1/.lock"; } 2>&1) ||
+    fail "nothing can be built in ${1##*/}/: ${reason##*: }"
+  exec 9>>"$1/.lock"
   if ! flock --nonblock 9; then
     say "waiting for another run that is using ${1##*/}/"
     flock 9
@@ -200,4 +218,14 @@ bring_up_to_date() {
   fi
   rm -f -- "$folder/.building"
   printf '%s\n' "$state" >"$folder/.built-$what"
+}
+
+# `set_up FOLDER program|tests OPTION...`: keeps the folder for this run, see `lock`, and has what
+# it is to hold in it. Whatever fails ends the script.
+set_up() {
+  trap end_set_up EXIT
+  lock "$1"
+  # Another run may have built it while this one waited.
+  is_current "$1" "$2" || bring_up_to_date "$@"
+  trap - EXIT
 }

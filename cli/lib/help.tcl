@@ -75,6 +75,7 @@ namespace eval ::vorkel::help {
     2 "wrong usage, or a file or standard output that cannot be read or written"
     3 "solved, but something is outside its tolerance or range"
     4 "the program itself failed"
+    5 "it could not be set up: packages cannot be installed, or the build fails"
   }
 }
 
