@@ -37,22 +37,41 @@ proc ::vorkel::catalogue::describe {device} {
 # A name that stands for nothing is wrong usage.
 #
 # Nothing marks where the device ends, so a name can begin with several devices. As for the
-# host, the longest that has such a package and grade is meant.
+# host, the longest that has such a package and grade is meant. A device whose file is bad is not
+# passed over in favour of a shorter one; but only for its own name the file is to blame.
 proc ::vorkel::catalogue::resolve {part} {
-  set complaint "unknown device \"[::vorkel::options::shown $part]\"; the devices are\
+  set unknown "unknown device \"[::vorkel::options::shown $part]\"; the devices are\
     [join [names] {, }]"
-  set longest 1
+  set complaint ""
+  set bad ""
   foreach device [Prefixes $part] {
+    set rest [string range $part [string length $device] end]
     try {
-      return [Resolve $device [string range $part [string length $device] end]]
-    } trap {VORKEL DETAIL} {reason} {
-      if {$longest} {
-        set complaint $reason
+      set found [Resolve $device $rest]
+    } trap {VORKEL DETAIL} {wrong} {
+      set found ""
+    } trap {VORKEL USAGE FILE} {reason options} {
+      if {[string index $rest 0] in {{} -}} {
+        return -options $options $reason
       }
-      set longest 0
+      # The rest may be a package of this device, or the name that of another one.
+      set wrong "$unknown; it could be a part of $device, whose file is bad: $reason"
+      set found ""
+      if {$bad eq ""} {
+        set bad $reason
+      }
+    }
+    if {$found ne ""} {
+      if {$bad ne ""} {
+        throw {VORKEL USAGE FILE} $bad
+      }
+      return $found
+    }
+    if {$complaint eq ""} {
+      set complaint $wrong
     }
   }
-  throw {VORKEL USAGE} $complaint
+  throw {VORKEL USAGE} [expr {$complaint eq "" ? $unknown : $complaint}]
 }
 
 # The devices that a part name begins with, the longest first.
@@ -224,6 +243,8 @@ proc ::vorkel::catalogue::Range {primitive what limits} {
 proc ::vorkel::catalogue::find {part} {
   try {
     return [resolve $part]
+  } trap {VORKEL USAGE FILE} {complaint options} {
+    return -options $options $complaint
   } trap {VORKEL USAGE} {complaint options} {
     set matches [Completions $part]
     if {[llength $matches] == 1} {

@@ -119,6 +119,33 @@ TEST_F(PartNameTest, NeverPassesOverABadFile) {
   EXPECT_EQ(Meaning("dev-1"), "dev - 1");
 }
 
+TEST_F(PartNameTest, BlamesABadFileForItsOwnDevice) {
+  const std::string bad = folder_.Write("dev.toml", "what = 1\n");
+  for (const char* name : {"dev", "dev-1", "dev-"}) {
+    EXPECT_TRUE(Meaning(name).starts_with(bad + ":1:1: unknown key")) << Meaning(name);
+  }
+}
+
+TEST_F(PartNameTest, DoesNotBlameABadFileForALongerName) {
+  folder_.WriteDevice("other");
+  const std::string bad = folder_.Write("dev.toml", "what = 1\n");
+  for (const std::string name : {"dev0", "devb256", "devb256-1"}) {
+    EXPECT_TRUE(Meaning(name).starts_with(
+        "unknown device in part name \"" + name +
+        "\": the devices are dev, other; the folders searched are " + folder_.path() +
+        "; it could be a part of dev, whose file is bad: " + bad + ":1:1: unknown key"))
+        << Meaning(name);
+  }
+}
+
+TEST_F(PartNameTest, ComplainsAboutTheLongestDeviceBesideABadFile) {
+  WriteWithPackage("devb", "q144");
+  folder_.Write("dev.toml", "what = 1\n");
+  EXPECT_EQ(Meaning("devbq144-1"), "devb q144 1");
+  EXPECT_TRUE(Meaning("devbx").starts_with(folder_.File("devb.toml") + ":2:1: unknown package"))
+      << Meaning("devbx");
+}
+
 TEST_F(PartNameTest, TakesABareDeviceNameAsItIs) {
   folder_.WriteDevice("dev");
   EXPECT_EQ(DeviceMeaning("dev"), "dev");

@@ -5,7 +5,7 @@
 namespace Device {
 namespace {
 
-DeviceError UnknownDevice(const DeviceCatalogue& catalogue, std::string_view what,
+std::string UnknownDevice(const DeviceCatalogue& catalogue, std::string_view what,
                           std::string_view name) {
   std::string text = "unknown device in ";
   text += what;
@@ -16,7 +16,7 @@ DeviceError UnknownDevice(const DeviceCatalogue& catalogue, std::string_view wha
   text += names.empty() ? "none" : JoinNames(names);
   text += "; the folders searched are ";
   text += catalogue.folders().empty() ? "none" : JoinNames(catalogue.folders());
-  return DeviceError(text);
+  return text;
 }
 
 // "unknown package "x" in part name "vk10x": device vk10 has q144, b256"
@@ -61,19 +61,33 @@ std::optional<DeviceError> TakeRest(std::string_view rest, std::string_view part
 
 Part FindPart(const DeviceCatalogue& catalogue, std::string_view part_name) {
   std::optional<DeviceError> complaint;
+  std::optional<DeviceError> bad_file;
   for (const std::string& device : catalogue.PrefixesOf(part_name)) {
-    Part part{FindDevice(catalogue, device), {}, {}};
-    auto wrong = TakeRest(part_name.substr(device.size()), part_name, &part);
-    if (!wrong) return part;
+    const std::string_view rest = part_name.substr(device.size());
+    std::optional<DeviceError> wrong;
+    try {
+      Part part{FindDevice(catalogue, device), {}, {}};
+      wrong = TakeRest(rest, part_name, &part);
+      if (!wrong && !bad_file) return part;
+    } catch (const DeviceError& error) {
+      const bool names_device = rest.empty() || rest.front() == '-';
+      if (names_device) throw;
+      // The rest may be a package of this device, or the name that of another one.
+      wrong = DeviceError(UnknownDevice(catalogue, "part name", part_name) +
+                          "; it could be a part of " + device + ", whose file is bad: " +
+                          error.what());
+      if (!bad_file) bad_file = error;
+    }
+    if (!wrong) throw *bad_file;
     if (!complaint) complaint = std::move(wrong);
   }
   if (complaint) throw *complaint;
-  throw UnknownDevice(catalogue, "part name", part_name);
+  throw DeviceError(UnknownDevice(catalogue, "part name", part_name));
 }
 
 DeviceFile FindDevice(const DeviceCatalogue& catalogue, std::string_view device) {
   const std::string* const path = catalogue.FindFile(device);
-  if (path == nullptr) throw UnknownDevice(catalogue, "device name", device);
+  if (path == nullptr) throw DeviceError(UnknownDevice(catalogue, "device name", device));
   return DeviceFile::Read(*path, device);
 }
 

@@ -27,7 +27,8 @@ struct Part {
 };
 
 // The part of that name. Throws DeviceError when the device, package or grade is unknown or
-// the device file is bad. A bad file is never passed over in favour of a shorter device name.
+// the device file is bad. A bad file is never passed over in favour of a shorter device name. It is
+// not to blame for a name that only begins like its device, where no other device has such a part.
 Part FindPart(const DeviceCatalogue& catalogue, std::string_view part_name);
 
 // The device of exactly that name, without package and grade. Throws as above.
