@@ -39,10 +39,12 @@ proc ::vorkel::check::run {words} {
       set warnings [Warnings $path $description [Lines $text]]
     }
     # Nobody may be listening.
-    catch {puts -nonewline stderr "[join $mistakes \n]\n$warnings"}
+    catch {
+      puts -nonewline stderr [::vorkel::options::escaped "[join $mistakes \n]\n$warnings" "" \n]
+    }
     return $bad
   }
-  ::vorkel::output::write [Report $path $text $description]
+  ::vorkel::output::write [Report [::vorkel::options::escaped $path] $text $description]
   return $good
 }
 

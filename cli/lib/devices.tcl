@@ -11,6 +11,8 @@ namespace eval ::vorkel::devices {
   variable label_width 10
   # So many grades stand beside each other.
   variable most_grades 5
+  # No more letters of a description are shown.
+  variable most_described 1000
   # Behind a range whose ends are the wrong way round.
   variable mark " !"
 }
@@ -51,7 +53,8 @@ proc ::vorkel::devices::All {} {
       lappend rows {*}[Rows $device]
       append troubles [Doubts "$name, " [dict get $device grade] [dict get $device limits]]
     } trap {VORKEL USAGE} {reason} {
-      append troubles [::vorkel::table::prose "$name cannot be used: " $reason]
+      append troubles [::vorkel::table::prose \
+        "[::vorkel::options::escaped $name] cannot be used: " [::vorkel::options::escaped $reason]]
     }
   }
   set columns {{left device} {left grade} {left primitive} {left {VCO MHz}} {left {PFD MHz}}
@@ -118,13 +121,15 @@ proc ::vorkel::devices::SecondOutput {primitive limits} {
 # Everything that is known about a device: a row for each keyword, a column for each grade.
 proc ::vorkel::devices::One {part} {
   variable label_width
+  variable most_described
   lassign [Shown $part] description grades
   set limits [dict get $description limits]
   set text ""
   foreach {label value} [list \
     device [dict get $description name] \
-    about [dict get $description description] \
-    file [dict get $description file] \
+    about [::vorkel::options::escaped \
+      [string map {\n { } \r { } \t { }} [dict get $description description]] $most_described] \
+    file [::vorkel::options::escaped [dict get $description file]] \
     packages [Choice $description package] \
     grades [Choice $description grade]] {
     append text [::vorkel::table::labelled $label_width $label $value]

@@ -102,7 +102,7 @@ proc ::vorkel::main::Version {words} {
   return "vorkel $version\n"
 }
 
-# Nobody may be listening on standard error either.
+# Nobody may be listening on standard error either. Names of files and devices can have any letter.
 proc ::vorkel::main::Complain {text} {
-  catch {puts stderr $text}
+  catch {puts stderr [::vorkel::options::escaped $text "" \n]}
 }

@@ -156,6 +156,22 @@ proc ::vorkel::options::shown {text} {
   }] ""]
 }
 
+# A text that is not the program's own as it shows it: its control characters are escapes, and line
+# breaks only where they are kept; what is longer than some letters is cut.
+proc ::vorkel::options::escaped {text {most ""} {kept ""}} {
+  if {$most ne "" && [string length $text] > $most} {
+    set text [string range $text 0 $most-1]...
+  }
+  if {![regexp {[[:cntrl:]]} $text]} {
+    return $text
+  }
+  return [join [lmap letter [split $text ""] {
+    set code [scan $letter %c]
+    expr {![string is control $letter] || $letter eq $kept ? $letter :
+      [format [expr {$code < 256 ? "\\x%02x" : "\\u%04x"}] $code]}
+  }] ""]
+}
+
 # "; did you mean X?" for the name that is nearest to a mistyped one, or "" when none is near.
 proc ::vorkel::options::nearest {name names} {
   variable most_shown

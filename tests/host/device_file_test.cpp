@@ -135,6 +135,35 @@ TEST_F(DeviceFileTest, ReportsUnknownKeys) {
             "default_package, default_grade or grade");
 }
 
+// Quoted keys and texts can have any letter.
+TEST_F(DeviceFileTest, ReportsWithoutControlCharacters) {
+  EXPECT_THAT(Error("\"a\\u001b[31m\\n\\u009b\" = 1\n"),
+              StartsWith(R"(:1:1: unknown key "a\x1b[31m\n\x9b": must be)"));
+  EXPECT_EQ(Error(kHead + "[grade.1]\n\"X\\u0007\" = 1\n"), R"(:4:1: unknown keyword "X\x07")");
+  EXPECT_THAT(Error("device = \"\\u001b]0;x\\u0007\"\n"),
+              StartsWith(R"(:1:10: device name "\x1b]0;x\x07" must be)"));
+  EXPECT_THAT(Error("\"\\u001b\" = 1\n\"\\u001b\" = 2\n"),
+              testing::AllOf(StartsWith(":2:"), testing::Not(HasSubstr("\x1b"))));
+  EXPECT_THAT(Error(kHead + "default_grade = \"\\u001b[2J\"\n" + kGrade),
+              StartsWith(R"(:3:17: "\x1b[2J" is not one of the grades)"));
+}
+
+TEST_F(DeviceFileTest, ReportsTheBeginningOfWhatIsEndless) {
+  const std::string endless(200'000, 'x');
+  EXPECT_EQ(Error(kHead + "[grade.1]\n" + endless + " = 1\n"),
+            ":4:1: unknown keyword \"" + std::string(100, 'x') + "...\"");
+  EXPECT_LT(Error(endless + " = 1\n" + endless.substr(0, 60'000) + " = 1\n" +
+                  endless.substr(0, 60'000) + " = 1\n")
+                .size(),
+            1100U);
+  std::string packages;
+  for (int i = 0; i < 10'000; ++i) packages += "\"p" + std::to_string(i) + "\", ";
+  EXPECT_LT(Error("device = \"dev\"\npackages = [" + packages +
+                  "]\ndefault_package = \"q\"\n" + kGrade)
+                .size(),
+            1100U);
+}
+
 TEST_F(DeviceFileTest, ReportsTheFirstOfSeveralMistakes) {
   EXPECT_EQ(Error(kHead + "[grade.1]\nZZZ = 1\nAAA = 1\n"), ":4:1: unknown keyword \"ZZZ\"");
 }

@@ -4,6 +4,7 @@
 
 #include "host/Port_Exception.h"
 #include "host/Port_MsgManData.h"
+#include "host/bundled/port/ShownText.h"
 
 namespace Device {
 namespace {
@@ -12,14 +13,18 @@ constexpr char kCategory[] = "DesignEntry";
 constexpr char kSource[] = "host/device";
 constexpr char kRevision[] = "1.0";
 
+// In bytes. A list or what the TOML parser says can be as long as a device file.
+constexpr std::size_t kLongestName = 100;
+constexpr std::size_t kLongestReason = 1000;
+
 std::string Sentence(const std::string& path, const std::optional<SourcePosition>& position,
                      const std::string& reason) {
-  std::string text = path;
+  std::string text = Port::Escaped(path);
   if (position) {
     text += ':' + std::to_string(position->line);
     text += ':' + std::to_string(position->column);
   }
-  return text + ": " + reason;
+  return text + ": " + Port::Shown(reason, kLongestReason);
 }
 
 }  // namespace
@@ -35,13 +40,15 @@ DeviceError ErrorAt(const std::string& path, SourcePosition position, std::strin
   return DeviceError(path, position, std::string(reason));
 }
 
+std::string Quoted(std::string_view text) { return '"' + Port::Shown(text, kLongestName) + '"'; }
+
 std::string JoinNames(const std::vector<std::string>& names) {
   std::string joined;
   for (const std::string& name : names) {
     if (!joined.empty()) joined += ", ";
     joined += name;
   }
-  return joined;
+  return Port::Shown(joined, kLongestReason);
 }
 
 void ReportAndThrow(const std::string& reason) {

@@ -1,4 +1,5 @@
-// Why a device cannot be had, in one sentence for the user.
+// Why a device cannot be had, in one sentence for the user: what is from a device file or a script
+// is shown without control characters, and cut where it is endless.
 #ifndef VORKEL_HOST_BUNDLED_DEVICE_DEVICEERROR_H_
 #define VORKEL_HOST_BUNDLED_DEVICE_DEVICEERROR_H_
 
@@ -37,6 +38,9 @@ class DeviceError : public std::runtime_error {
 
 // The error with that place in a file.
 DeviceError ErrorAt(const std::string& path, SourcePosition position, std::string_view reason);
+
+// A name in quotes.
+std::string Quoted(std::string_view text);
 
 // "a, b, c".
 std::string JoinNames(const std::vector<std::string>& names);

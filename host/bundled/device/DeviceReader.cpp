@@ -25,8 +25,6 @@ constexpr std::string_view kCalculatorKey = "calculator";
 constexpr std::string_view kRisingBandwidths[] = {"LOOP_BANDWIDTH_LOW", "LOOP_BANDWIDTH_OPTIMIZED",
                                                   "LOOP_BANDWIDTH_HIGH"};
 
-std::string Quoted(std::string_view text) { return '"' + std::string(text) + '"'; }
-
 // "a", "b" and "c".
 std::string QuotedAll(const std::vector<std::string_view>& names) {
   std::string text;

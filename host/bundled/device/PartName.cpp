@@ -9,9 +9,7 @@ std::string UnknownDevice(const DeviceCatalogue& catalogue, std::string_view wha
                           std::string_view name) {
   std::string text = "unknown device in ";
   text += what;
-  text += " \"";
-  text += name;
-  text += "\": the devices are ";
+  text += ' ' + Quoted(name) + ": the devices are ";
   const std::vector<std::string> names = catalogue.Names();
   text += names.empty() ? "none" : JoinNames(names);
   text += "; the folders searched are ";
@@ -25,11 +23,8 @@ std::string UnknownDetail(std::string_view what, std::string_view detail,
                           const std::vector<std::string>& known) {
   std::string text = "unknown ";
   text += what;
-  text += " \"";
-  text += detail;
-  text += "\" in part name \"";
-  text += part_name;
-  text += "\": device " + file.device + " has " + JoinNames(known);
+  text += ' ' + Quoted(detail) + " in part name " + Quoted(part_name);
+  text += ": device " + file.device + " has " + JoinNames(known);
   return text;
 }
 
@@ -74,8 +69,8 @@ Part FindPart(const DeviceCatalogue& catalogue, std::string_view part_name) {
       if (names_device) throw;
       // The rest may be a package of this device, or the name that of another one.
       wrong = DeviceError(UnknownDevice(catalogue, "part name", part_name) +
-                          "; it could be a part of " + device + ", whose file is bad: " +
-                          error.what());
+                          "; it could be a part of " + JoinNames({device}) +
+                          ", whose file is bad: " + error.what());
       if (!bad_file) bad_file = error;
     }
     if (!wrong) throw *bad_file;

@@ -12,30 +12,9 @@
 #include <string_view>
 
 #include "host/Port_MsgManData.h"
+#include "host/bundled/port/ShownText.h"
 
 namespace {
-
-bool IsControl(unsigned char byte) { return byte < 0x20 || byte == 0x7f; }
-
-void AppendEscaped(std::string_view text, std::string* line) {
-  constexpr char kDigits[] = "0123456789abcdef";
-  for (const char c : text) {
-    const auto byte = static_cast<unsigned char>(c);
-    if (!IsControl(byte)) {
-      *line += c;
-    } else if (c == '\n') {
-      *line += "\\n";
-    } else if (c == '\r') {
-      *line += "\\r";
-    } else if (c == '\t') {
-      *line += "\\t";
-    } else {
-      *line += "\\x";
-      *line += kDigits[byte >> 4];
-      *line += kDigits[byte & 15];
-    }
-  }
-}
 
 // The formatted text; the bare format where printf can make none, of 2 GiB for example.
 [[gnu::format(printf, 1, 0)]] std::string Format(const char* format, va_list arguments) {
@@ -69,9 +48,9 @@ class StandardErrorMessage final : public Port_MsgManData {
   void Write(std::string_view severity, std::string_view text) const {
     if (text.ends_with('\n')) text.remove_suffix(1);
     std::string line(severity);
-    if (category_ != nullptr) AppendEscaped(category_, &line);
+    if (category_ != nullptr) line += Port::Escaped(category_);
     line += ": ";
-    AppendEscaped(text, &line);
+    line += Port::Escaped(text);
     line += '\n';
     // One write, so that lines of several processes on one terminal do not mix.
     std::fwrite(line.data(), 1, line.size(), stderr);

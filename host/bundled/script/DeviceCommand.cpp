@@ -134,14 +134,11 @@ Tcl_Obj* NewDescription(const Device::DeviceFile& file) {
 
 // "unknown device "x": must be a, b or c"
 std::string UnknownDevice(const std::string& device, const std::vector<std::string>& names) {
-  std::string text = "unknown device \"" + device + "\": ";
+  const std::string text = "unknown device " + Device::Quoted(device) + ": ";
   if (names.empty()) return text + "there are no devices";
-  text += "must be ";
-  for (std::size_t i = 0; i < names.size(); ++i) {
-    if (i > 0) text += i + 1 == names.size() ? " or " : ", ";
-    text += names[i];
-  }
-  return text;
+  const std::string last = Device::JoinNames({names.back()});
+  if (names.size() == 1) return text + "must be " + last;
+  return text + "must be " + Device::JoinNames({names.begin(), names.end() - 1}) + " or " + last;
 }
 
 int Describe(Tcl_Interp* interp, Tcl_Obj* name) {
