@@ -158,10 +158,10 @@ TEST_F(DeviceFileTest, ReportsTheBeginningOfWhatIsEndless) {
             1100U);
   std::string packages;
   for (int i = 0; i < 10'000; ++i) packages += "\"p" + std::to_string(i) + "\", ";
-  EXPECT_LT(Error("device = \"dev\"\npackages = [" + packages +
-                  "]\ndefault_package = \"q\"\n" + kGrade)
-                .size(),
-            1100U);
+  EXPECT_LT(
+      Error("device = \"dev\"\npackages = [" + packages + "]\ndefault_package = \"q\"\n" + kGrade)
+          .size(),
+      1100U);
 }
 
 TEST_F(DeviceFileTest, ReportsTheFirstOfSeveralMistakes) {
