@@ -56,6 +56,18 @@ TEST(KruPkToPkJitter, OfTheSynthesiser) {
   EXPECT_EQ(Jitter(kClkfx180, settings), Jitter(kClkfx, settings));
 }
 
+// The rms values of the three above: the taps do not count.
+TEST(KruRmsJitter, IsTheRandomPart) {
+  const auto rms = [](int pin, const KruSettings& settings) {
+    return KruRmsJitter(Coefficients(), PinOf(pin), settings);
+  };
+  EXPECT_NEAR(rms(kClk2x, {.input = 100, .feedback = true}), 7.34847, 1e-5);
+  EXPECT_NEAR(
+      rms(kClk0, {.input = 100, .divide_by_2 = true, .feedback = true, .phase_shift = true}),
+      9.94987, 1e-5);
+  EXPECT_NEAR(rms(kClkfx, {.input = 100, .m = 3, .d = 2}), 17.49286, 1e-5);
+}
+
 TEST(KruPkToPkJitter, OfTheSynthesiserIsWorseThanThatOfTheLine) {
   for (const double input : {5.0, 33.0, 100.0, 200.0}) {
     for (int flags = 0; flags < 8; ++flags) {

@@ -47,6 +47,17 @@ TEST(LoopPkToPkJitter, OfASlowVco) {
   EXPECT_NEAR(Jitter(100, 400, Bandwidth::kOptimized, 0), 156.0587, 1e-3);
 }
 
+// The figures of OfACleanInput and OfAnInputWithJitter without the deterministic part.
+TEST(LoopRmsJitter, IsTheRandomPart) {
+  const auto rms = [](Bandwidth bandwidth, double input_jitter) {
+    return LoopRmsJitter(Coefficients(), {.pfd = 100, .vco = 1000, .bandwidth = bandwidth},
+                         input_jitter);
+  };
+  EXPECT_NEAR(rms(Bandwidth::kLow, 0), 8.69596, 1e-5);
+  EXPECT_NEAR(rms(Bandwidth::kHigh, 0), 4.68027, 1e-5);
+  EXPECT_NEAR(rms(Bandwidth::kOptimized, 100), 6.55623, 1e-5);
+}
+
 TEST(LoopPkToPkJitter, FallsWithAHigherVco) {
   for (const Bandwidth setting : kSettings) {
     for (const double input : {0.0, 100.0, 1000.0}) {

@@ -3,7 +3,10 @@
 
 #include <gtest/gtest.h>
 
+#include <random>
+#include <set>
 #include <stdexcept>
+#include <utility>
 
 #include "planner/answer/Evaluate.h"
 #include "planner/answer/Moved.h"
@@ -183,12 +186,65 @@ TEST(Plan, NoSettingsKeepTheLimits) {
   Request request = Ask({1}, {100});
   request.primitive = Primitive::kPll;
   const Plan plan = Make(request, Bundled("vk40", "2"));
+  EXPECT_FALSE(plan.IsSolved());
   EXPECT_TRUE(plan.front.empty());
-  for (const Answer& answer : plan.ranked) EXPECT_FALSE(answer.source.search);
-  if (plan.ranked.empty()) {
-    ASSERT_EQ(plan.refused.size(), 1u);
-    EXPECT_EQ(plan.refused[0].refusals.back().kind, FindingKind::kNoSettings);
+  EXPECT_TRUE(plan.engine_refused.empty());
+  EXPECT_EQ(plan.FirstOfEngine(), nullptr);
+  EXPECT_FALSE(plan.among_own);
+  ASSERT_EQ(plan.refused.size(), 1u);
+  ASSERT_EQ(plan.refused[0].refusals.size(), 2u);
+  EXPECT_EQ(plan.refused[0].refusals[0].kind, FindingKind::kUnsolved);
+  EXPECT_EQ(plan.refused[0].refusals[1].kind, FindingKind::kNoSettings);
+}
+
+// A request with some of everything.
+Request Drawn(std::mt19937* random) {
+  const auto draw = [random](int count) {
+    return static_cast<int>((*random)() % static_cast<unsigned>(count));
+  };
+  Request request;
+  request.inputs = {20 + Rational(draw(180 * 4), 4)};
+  if (draw(4) == 0) request.inputs.push_back(request.inputs[0] * Rational(95 + draw(11), 100));
+  const int outputs = 1 + draw(4);
+  for (int i = 0; i < outputs; ++i) {
+    Output output = Frequency(request.inputs[0] * (1 + draw(12)) / (1 + draw(8)));
+    if (draw(4) == 0) output.phase = 45 * draw(8);
+    if (draw(6) == 0) output.duty = 25 * (1 + draw(3));
+    if (draw(8) == 0) output.used = false;
+    request.outputs.push_back(output);
   }
+  request.outputs[0].used = true;
+  if (draw(3) == 0) request.input_jitter = 50 * draw(10);
+  if (draw(3) == 0) request.tolerance = draw(2) * 1000;
+  if (draw(4) == 0) request.bandwidth = hardware::kBandwidths[static_cast<std::size_t>(draw(3))];
+  if (draw(4) == 0) request.max_jitter = 100 + draw(200);
+  request.rank = static_cast<planner::Rank>(draw(4));
+  request.prefer_max_vco = draw(6) == 0;
+  request.whole_divider_0 = draw(6) == 0;
+  return request;
+}
+
+// All that the engine answers in the device's limits is among the settings that are searched: what
+// is first of a primitive, and of each of its bandwidths, is the search's.
+TEST(Plan, TheEngineNeverFindsWhatTheSearchDoesNot) {
+  std::mt19937 random(20261121);
+  const Device device = Bundled("vk40", "2");
+  int of_engine = 0;
+  for (int i = 0; i < 60; ++i) {
+    const Request request = Drawn(&random);
+    const Plan plan = Make(request, device);
+    std::set<std::pair<Primitive, int>> seen;
+    for (const Answer& answer : plan.ranked) {
+      const bool is_loop = hardware::IsLoop(answer.primitive);
+      const int bandwidth = is_loop ? static_cast<int>(LoopOf(answer).bandwidth) : 0;
+      if (answer.source.engine) ++of_engine;
+      EXPECT_TRUE(!answer.source.search || answer.violations.empty());
+      if (!seen.insert({answer.primitive, bandwidth}).second) continue;
+      EXPECT_TRUE(answer.source.search || !answer.violations.empty())
+          << "request " << i << ", " << hardware::Name(answer.primitive);
+    }
+  }
+  EXPECT_GT(of_engine, 100);
 }
 
 // --- Any order ---------------------------------------------------------------------------------
