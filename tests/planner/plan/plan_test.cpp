@@ -110,7 +110,8 @@ TEST(Plan, IsRankedAndHasTheSameSettingsOnce) {
 
 // What no member of the front is at least as good as in both would have to be on it.
 TEST(Plan, NothingRankedIsBetterThanTheFront) {
-  for (const Request& request : {VideoRequest(), Ask({100}, {333}), Ask({24}, {Rational(651, 8)})}) {
+  for (const Request& request :
+       {VideoRequest(), Ask({100}, {333}), Ask({24}, {Rational(651, 8)})}) {
     const Plan plan = Make(request, Bundled("vk40", "2"));
     ASSERT_FALSE(plan.front.empty());
     for (std::size_t i = 0; i < plan.front.size(); ++i) {
@@ -304,10 +305,10 @@ TEST(Plan, TheFastOutputOfAClkgenIsOnClkfx) {
   ASSERT_NE(Moved(first), nullptr);
 }
 
-// 800/9 MHz beside 100 MHz. With 800/9 on a whole divider n the VCO is at 800 n / 9; D = 1 asks for
-// an M of 8 n / 9 in eighths, a VCO of 800 MHz with n = 9. On output 0 it can be VCO / 15.75, with a
-// VCO of 1400 MHz, 14 x 100 - the highest up to 1440 on which 100 MHz has a whole divider - and so
-// less jitter.
+// 800/9 MHz beside 100 MHz. With 800/9 on a whole divider n the VCO is at 800 n / 9; D = 1 asks
+// for an M of 8 n / 9 in eighths, a VCO of 800 MHz with n = 9. On output 0 it can be VCO / 15.75,
+// with a VCO of 1400 MHz, 14 x 100, the highest up to 1440 on which 100 MHz has a whole divider,
+// and so with less jitter.
 TEST(Plan, TheOutputThatNeedsItHasTheFraction) {
   Request request = Ask({100}, {100, Rational(800, 9)});
   request.tolerance = 0;
