@@ -44,12 +44,14 @@ struct Candidate {
   std::optional<double> max_jitter;  // ps, peak to peak; nothing when unknown
 };
 
-// What has been looked at. Loops are pairs of M and D (of a KRU: of M and D of the synthesiser,
-// and the settings without them) with a bandwidth, a CLKIN_DIVIDE_BY_2 or a feedback.
+// What there was to look at. A pair is an M and a D that keep VCO and PFD in range, with a bandwidth;
+// of a KRU an M and a D of the synthesiser, or neither, with CLKIN_DIVIDE_BY_2 or not and with
+// feedback or not.
 struct Counts {
-  std::int64_t loops = 0;      // that keep the device's limits and were looked at, or left out ...
-  std::int64_t discarded = 0;  // ... because a bound tells that they can neither be the best nor a
-                               // trade-off
+  std::int64_t pairs = 0;
+  // How often dividers or pins were chosen; of the others a bound tells that they can neither be
+  // the best nor a trade-off.
+  std::int64_t judged = 0;
 };
 
 struct Found {
