@@ -6,8 +6,8 @@
 // figures of jitter are the calculator's (answer/Jitter.h), and what the engine answers is asked of
 // the engine again.
 //
-// The settings of an answer are what is judged, so all other numbers are held against them. Where
-// one other setting makes all of them right, that setting is named as well.
+// The settings of an answer are what is judged, so all other numbers are held against them. But where
+// one other entry would make it an answer that the request has, in every number, that one is wrong.
 //
 // Tested by verify_test.cpp and mutation_test.cpp.
 #ifndef VORKEL_PLANNER_VERIFY_VERIFY_H_
@@ -34,7 +34,7 @@ enum class DiscrepancyKind {
                  // expected: what should be there, where that is known
   kNoSetting,    // what the hardware cannot be set to; expected: what it can
   kDiffers,      // expected: the right value
-  kContradicts,  // a setting, or a number of the request, that all others of the answers
+  kContradicts,  // an entry, such as a setting, or a number of the request, that all others
                  // contradict; expected: the value with which they are right
   kMisplaced,    // an answer that ranks before the one above it; expected: where that stands
   kRanksBefore,  // there are settings that rank before the answer, though it is said to be the
@@ -58,12 +58,13 @@ struct Discrepancy {
 class Sentences {
  public:
   virtual ~Sentences() = default;
-  virtual std::string Of(const Finding& finding, const Device& device) const = 0;
-  virtual std::string Reason(const Answer& answer, const Device& device) const = 0;
-  virtual std::vector<std::string> Misses(const Answer& answer) const = 0;
-  // `outputs` is how many outputs are used.
+  // All of them are of this answer.
+  virtual std::string Of(const Finding& finding, const Device& device,
+                         const Answer& answer) const = 0;
   virtual std::vector<std::string> All(const std::vector<Finding>& findings, const Device& device,
-                                       int outputs) const = 0;
+                                       const Answer& answer) const = 0;
+  virtual std::vector<std::string> Misses(const Answer& answer) const = 0;
+  virtual std::string Reason(const Answer& answer, const Device& device) const = 0;
 };
 
 // The part that the request of a plan names; nothing when there is none that can be read.

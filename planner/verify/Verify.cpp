@@ -1,0 +1,250 @@
+// Tested by verify_test.cpp and mutation_test.cpp.
+#include "planner/verify/Verify.h"
+
+#include <algorithm>
+#include <cstddef>
+#include <nlohmann/json.hpp>
+#include <utility>
+
+#include "planner/read/JsonTree.h"
+#include "planner/verify/Claim.h"
+#include "planner/verify/Difference.h"
+#include "planner/verify/Entries.h"
+#include "planner/verify/ReadRequest.h"
+#include "planner/verify/Sequence.h"
+#include "planner/verify/Standing.h"
+
+namespace planner::verify {
+
+namespace {
+
+using nlohmann::ordered_json;
+using read::Node;
+using read::NodeType;
+using std::string;
+
+constexpr int kVersion = 3;
+
+class Verifier {
+ public:
+  Verifier(const Node& document, const Device& device, const Sentences* sentences)
+      : document_(document), device_(device), sentences_(sentences) {}
+
+  Discrepancies Do() {
+    if (document_.type != NodeType::kObject) {
+      found_.push_back(At(document_, DiscrepancyKind::kWrongType, "", "object"));
+      return std::move(found_);
+    }
+    const std::optional<Request> request = ReadRequest(document_, device_, &found_);
+    if (request) {
+      request_ = *request;
+      standing_ = StandingOf(request_, device_);
+      DoAnswers();
+      DoHead();
+    }
+    std::stable_sort(found_.begin(), found_.end(), [](const Discrepancy& a, const Discrepancy& b) {
+      return a.line != b.line ? a.line < b.line : a.column < b.column;
+    });
+    return std::move(found_);
+  }
+
+ private:
+  // --- The whole --------------------------------------------------------------------------
+
+  void DoHead() {
+    ordered_json head;
+    head["format"] = "vorkel-plan";
+    head["version"] = kVersion;
+    head["units"] = Units();
+    head["tradeoffs_cut"] = ordered_json::array();
+    for (const Primitive one : standing_.cut) head["tradeoffs_cut"].push_back(Name(one));
+    // The request and the answers are held on their own.
+    Node rest = document_;
+    std::erase_if(rest.members, [](const read::Member& member) {
+      return member.name == "request" || member.name == "answers";
+    });
+    Differ(head, rest, "", &found_);
+  }
+
+  void DoAnswers() {
+    const Node* const answers = document_.Find("answers");
+    const Node& there = answers != nullptr ? *answers : document_;
+    if (answers == nullptr || answers->type != NodeType::kArray || answers->items.empty()) {
+      found_.push_back(At(there,
+                          answers == nullptr ? DiscrepancyKind::kMissing
+                          : answers->items.empty() && answers->type == NodeType::kArray
+                              ? DiscrepancyKind::kDiffers
+                              : DiscrepancyKind::kWrongType,
+                          "answers", "array"));
+      if (answers == nullptr) found_.back().found.clear();
+      return;
+    }
+    HoldRequest(request_, document_, &found_);
+    std::vector<Claim> claims;
+    for (std::size_t i = 0; i < answers->items.size(); ++i) {
+      DoAnswer(answers->items[i], "answers[" + std::to_string(i) + "]", &claims);
+    }
+    if (claims.size() == answers->items.size()) HoldSequence(standing_, claims, &found_);
+  }
+
+  // --- One answer -------------------------------------------------------------------------
+
+  void DoAnswer(const Node& node, const string& path, std::vector<Claim>* claims) {
+    Discrepancies wrong;
+    const std::optional<Claim> claim = ReadClaim(request_, device_, node, path, &wrong);
+    if (claim) {
+      Differ(claim->solved ? Solved(*claim) : Unsolved(*claim), node, path, &wrong);
+      if (claim->solved) HoldPlace(*claim, &wrong);
+    }
+    if (!wrong.empty() && node.type == NodeType::kObject) {
+      if (auto one = OnlyOne(node, path)) wrong = {*std::move(one)};
+    }
+    found_.insert(found_.end(), wrong.begin(), wrong.end());
+    if (claim) claims->push_back(*claim);
+  }
+
+  ordered_json EntriesOfCandidate(const Candidate& candidate) const {
+    const Answer answer = Recompute(request_, device_, candidate.ranked.settings,
+                                    candidate.order, candidate.origin);
+    ordered_json entries = Numbered(candidate.ranked.settings, candidate.order);
+    entries.update(EntriesOf(request_, device_, answer, candidate.order, sentences_));
+    return entries;
+  }
+
+  ordered_json Numbered(const Settings& settings, const PlaceOrder& order) const {
+    const auto place = standing_.PlaceOf(settings, order);
+    ordered_json entries;
+    entries["number"] = place ? ordered_json(*place + 1) : ordered_json(nullptr);
+    entries["tradeoff"] = standing_.TradeoffOf(settings, order).has_value();
+    return entries;
+  }
+
+  // Where the settings of an answer come from.
+  Candidate CandidateOf(const Claim& claim) const {
+    for (const auto* const all : {&standing_.candidates, &standing_.tradeoffs}) {
+      for (const Candidate& one : *all) {
+        if (one.ranked.settings == claim.settings && one.order == claim.order) return one;
+      }
+    }
+    for (const Candidate& one : standing_.as_requested) {
+      if (one.ranked.settings == claim.settings && one.order == claim.order) return one;
+    }
+    return {{claim.settings, {}}, claim.order, {.source = {.search = true}}};
+  }
+
+  // Whether an answer is one of a command that asks the engine for nothing else.
+  bool IsAsRequested(const Claim& claim) const {
+    if (claim.number || !claim.is_engine || !claim.variant.empty()) return false;
+    return std::any_of(standing_.as_requested.begin(), standing_.as_requested.end(),
+                       [&](const Candidate& one) {
+                         return one.ranked.settings == claim.settings &&
+                                one.order == claim.order;
+                       });
+  }
+
+  ordered_json Solved(const Claim& claim) const {
+    if (!IsAsRequested(claim)) return EntriesOfCandidate(CandidateOf(claim));
+    for (const Candidate& one : standing_.as_requested) {
+      if (!(one.ranked.settings == claim.settings)) continue;
+      ordered_json entries = EntriesOfCandidate(one);
+      entries["number"] = nullptr;
+      return entries;
+    }
+    return {};
+  }
+
+  ordered_json Unsolved(const Claim& claim) const {
+    Answer answer;
+    answer.primitive = claim.primitive;
+    const auto& all = claim.is_engine ? standing_.engine_refusals : standing_.refusals;
+    answer.source.engine = claim.is_engine;
+    const auto refusals = all.find(claim.primitive);
+    // The reason is told by who makes the document; that there is one is not so where it is solved.
+    if (refusals != all.end() && !refusals->second.empty()) {
+      answer.refusals = refusals->second;
+    } else {
+      answer.solved = true;
+    }
+    ordered_json entries;
+    entries["number"] = nullptr;
+    entries["tradeoff"] = false;
+    if (answer.solved) {
+      entries["solved"] = true;
+      return entries;
+    }
+    entries.update(EntriesOf(request_, device_, answer, OwnPlaces(request_), sentences_));
+    return entries;
+  }
+
+  // What says that it is a candidate, and is none.
+  void HoldPlace(const Claim& claim, Discrepancies* wrong) const {
+    if (!claim.number || standing_.PlaceOf(claim.settings, claim.order)) return;
+    Candidate candidate = CandidateOf(claim);
+    candidate.ranked.figures = FiguresOf(Recompute(request_, device_, claim.settings, claim.order,
+                                                   candidate.origin));
+    if (*claim.number > standing_.candidates.size()) return;
+    const Candidate& right = standing_.candidates[*claim.number - 1];
+    if (!IsBefore(request_, right.ranked, candidate.ranked)) return;
+    Discrepancy discrepancy = At(*claim.node, DiscrepancyKind::kRanksBefore, claim.path, "");
+    discrepancy.settings = right.ranked.settings;
+    wrong->push_back(std::move(discrepancy));
+  }
+
+  // The only entry with which an answer is not one that the request has; nothing when it is more
+  // than one.
+  std::optional<Discrepancy> OnlyOne(const Node& node, const string& path) const {
+    for (const auto* const all : {&standing_.candidates, &standing_.tradeoffs}) {
+      for (const Candidate& one : *all) {
+        Discrepancies wrong;
+        Differ(EntriesOfCandidate(one), node, path, &wrong);
+        if (wrong.size() != 1) continue;
+        if (wrong[0].kind == DiscrepancyKind::kDiffers) {
+          wrong[0].kind = DiscrepancyKind::kContradicts;
+        }
+        return wrong[0];
+      }
+    }
+    return std::nullopt;
+  }
+
+  const Node& document_;
+  const Device& device_;
+  const Sentences* const sentences_;
+  Request request_;
+  Standing standing_;
+  Discrepancies found_;
+};
+
+std::optional<Node> ReadDocument(std::string_view json, read::Mistakes* mistakes) {
+  return read::ReadJsonTree(json, "", mistakes);
+}
+
+}  // namespace
+
+std::optional<string> PartOf(std::string_view json) {
+  read::Mistakes mistakes;
+  const std::optional<Node> document = ReadDocument(json, &mistakes);
+  const Node* const request = document ? document->Find("request") : nullptr;
+  const Node* const part = request != nullptr ? request->Find("device") : nullptr;
+  if (part == nullptr || part->type != NodeType::kString) return std::nullopt;
+  return part->text;
+}
+
+Discrepancies Verify(std::string_view json, const Device& device, const Sentences* sentences) {
+  read::Mistakes mistakes;
+  const std::optional<Node> document = ReadDocument(json, &mistakes);
+  Discrepancies discrepancies;
+  for (const read::Mistake& mistake : mistakes) {
+    discrepancies.push_back({.kind = DiscrepancyKind::kNotJson,
+                             .path = "",
+                             .found = mistake.text,
+                             .expected = "",
+                             .line = mistake.place.line,
+                             .column = mistake.place.column,
+                             .mistake = mistake});
+  }
+  if (!document) return discrepancies;
+  return Verifier(*document, device, sentences).Do();
+}
+
+}  // namespace planner::verify
