@@ -1,0 +1,58 @@
+// A call of a command that takes a request: options, request file and device, read and checked.
+#ifndef VORKEL_CLI_CALL_H_
+#define VORKEL_CLI_CALL_H_
+
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "cli/Setting.h"
+#include "cli/Words.h"
+#include "planner/Device.h"
+#include "planner/read/Draft.h"
+#include "planner/report/Style.h"
+
+namespace cli {
+
+enum class Format { kText, kJson, kTcl, kSdc };
+
+struct Call {
+  std::string_view command;
+  Given given;
+  planner::read::Reading reading;
+  planner::Device device;
+  Format format = Format::kText;
+  std::string file;                           // of -o; empty: standard output
+  std::vector<planner::read::Option> pasted;  // options that ask the same once more
+
+  const planner::Request& request() const { return reading.request; }
+};
+
+// Reads the words of a command; with a primitive, of that which asks it alone. Throws Failure, for
+// all that is wrong at once.
+Call ReadCall(std::string_view command, const std::vector<std::string>& words,
+              std::optional<planner::Primitive> primitive, const Setting& setting);
+
+// The value of an option that is a whole number from `lowest` to `highest`, nothing when it was not
+// given. Throws Failure.
+std::optional<int> WholeNumber(const Given& given, std::string_view name, int lowest, int highest);
+
+// How the text of a call looks where it goes.
+planner::report::Style StyleOf(const Call& call, const Setting& setting);
+
+// A call of another command about the same, as it can be pasted into a shell.
+std::string PastedCall(std::string_view command, const Call& call, const Setting& setting);
+// A command with some options, likewise.
+std::string PastedCall(std::string_view command, const std::vector<planner::read::Option>& options,
+                       const Setting& setting);
+
+// Writes what a call has to say, in its format. What may not have been meant is told behind a text,
+// and else on standard error.
+void Write(const Call& call, const std::string& text, const Setting& setting);
+// That itself, lines for the end of a text; mostly nothing.
+std::string DoubtLines(const Call& call, const planner::report::Style& style);
+
+}  // namespace cli
+
+#endif  // VORKEL_CLI_CALL_H_

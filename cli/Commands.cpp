@@ -1,0 +1,66 @@
+#include "cli/Commands.h"
+
+#include "cli/CheckCommand.h"
+#include "cli/DevicesCommand.h"
+#include "cli/EngineCommand.h"
+#include "cli/ExplainCommand.h"
+#include "cli/Help.h"
+#include "cli/PlanCommand.h"
+
+namespace cli {
+
+namespace {
+
+constexpr std::string_view kLoopArguments = "--in F[,F2] --out LIST [OPTION...]";
+constexpr std::string_view kKruArguments = "--in F --out LIST [OPTION...]";
+
+// The examples: 27 MHz times 33 is 891 MHz, of which 148.5, 74.25 and 27 MHz are whole parts; 25
+// MHz times 20 is 500 MHz, of which 125, 62.5 and 25 MHz are. 100 MHz times 6 is 600 MHz, and 0 and
+// 90 degrees are steps of its dividers; half of 100 MHz, doubled, as it is and times 3; 100 MHz
+// times 3 / 2, as it is and halved. Of 100 MHz no VCO has both 148.5 and 27 MHz as whole parts, and
+// there is no 333 MHz with a phase.
+constexpr Command kCommands[] = {
+    {"plan", kLoopArguments, "find the settings that serve best, and say why",
+     "--in 27MHz --out 148.5,74.25,27", "", true, RunPlan},
+    {"compare", kLoopArguments, "show what all primitives have to offer",
+     "--in 25 --out 125,62.5,25", "", true, RunPlan},
+    {"best", kLoopArguments, "show the best of all settings, with the trade-offs",
+     "--in 100 --out 148.5,74.25,27", "", true, RunPlan},
+    {"explain", kLoopArguments, "say why a request fails, and what would work",
+     "--in 100 --out 333 --phase 90deg",
+     "The exit status is 0 also when the request is not possible: an explanation is what was asked "
+     "for.",
+     true, RunExplain},
+    {"tsyn", kLoopArguments, "find the settings of a TSYN", "--in 27 --out 148.5,74.25,27", "",
+     true, RunEngine},
+    {"pll", kLoopArguments, "find the settings of a PLL", "--in 100 --out 200,100 --phase 0,90", "",
+     true, RunEngine},
+    {"kru", kKruArguments, "find the settings of a KRU_SP",
+     "--in 100 --out 100,50,150 --phase 0,180,0 --feedback", "", true, RunEngine},
+    {"clkgen", kKruArguments, "find the settings of a KRU_CLKGEN", "--in 100 --out 150,75", "",
+     true, RunEngine},
+    {"devices", "[NAME]", "list the devices, or all limits of one", "vk40",
+     "NAME is a device, or a part name with package and grade; the beginning is enough where only "
+     "one goes on like it.",
+     false, RunDevices},
+    {"check", "FILE", "say what is wrong with a device file", "devices/vk40.toml",
+     "FILE is named DEVICE.toml. Mistakes are on standard error, with line and column, and the exit "
+     "status is 2. Missing keywords and limits that contradict each other are no mistakes: they are "
+     "reported with exit status 0.",
+     false, RunCheck},
+    {"help", "[COMMAND]", "show this help", "plan", "", false, RunHelp},
+    {"version", "", "show the version", "", "", false, RunVersion},
+};
+
+}  // namespace
+
+std::span<const Command> Commands() { return kCommands; }
+
+const Command* FindCommand(std::string_view name) {
+  for (const Command& command : kCommands) {
+    if (command.name == name) return &command;
+  }
+  return nullptr;
+}
+
+}  // namespace cli

@@ -1,0 +1,179 @@
+#include "cli/Options.h"
+
+#include <algorithm>
+#include <utility>
+
+#include "cli/Commands.h"
+
+namespace cli {
+
+namespace {
+
+constexpr std::pair<std::string_view, std::string_view> kGroups[] = {
+    {"any", "plan compare best explain tsyn pll kru clkgen"},
+    {"planning", "plan compare best explain"},
+    {"loops", "plan compare best explain tsyn pll"},
+    {"loop", "tsyn pll"},
+    {"krus", "kru clkgen"},
+    {"single", "tsyn pll kru clkgen"},
+    {"written", "plan best tsyn pll kru clkgen"},
+};
+
+constexpr OptionRow kRows[] = {
+    {"--in", "F[,F2]", "loops",
+     "input frequency; F2 is that of a second input clock, with which all must stay in range; "
+     "errors are for the first"},
+    {"--in", "F", "krus", "input frequency"},
+    {"--out", "LIST", "loops", "frequencies of 1 to 7 outputs; - for one that is not used"},
+    {"--out", "LIST", "krus", "frequencies of 1 to 6 outputs; - for one that is not used"},
+    {"--phase", "LIST", "any", "phase of each output; - where any will do"},
+    {"--duty", "LIST", "loops", "duty cycle of each output; - or 0 where any will do"},
+    {"--any-order", "", "planning",
+     "outputs may change places, where not all places can make a frequency"},
+    {"--device", "NAME", "any", "DEVICE[PACKAGE][-GRADE] or its beginning; vk40 by default"},
+    {"--primitive", "NAME", "planning", "auto (default), PLL, TSYN, KRU_SP or KRU_CLKGEN"},
+    {"--engine", "", "plan compare explain",
+     "only what the design flow's own search answers, not all settings"},
+    {"--bandwidth", "NAME", "planning", "LOW, HIGH or OPTIMIZED; of the loop, all by default"},
+    {"--bandwidth", "NAME", "loop",
+     "LOW, HIGH or OPTIMIZED (default); with LOW, the maximum of the PFD is lower"},
+    {"--low-bandwidth", "", "loops", "short for --bandwidth LOW"},
+    {"--rank", "NAME", "planning",
+     "jitter (default), error, margin or vco; what counts first among settings that meet all "
+     "demands: the least jitter, the smallest error, the largest margin to the device's limits or "
+     "the lowest VCO"},
+    {"--prefer-max-vco", "", "planning",
+     "the highest VCO counts instead of the lowest; without --rank it counts first"},
+    {"--prefer-max-vco", "", "loop", "with --phase or --duty: take the highest VCO"},
+    {"--int-div0", "", "planning", "of a TSYN only whole M and whole dividers"},
+    {"--int-div0", "", "tsyn", "a whole divider for output 0"},
+    {"--feedback", "", "planning", "a KRU_SP only with its feedback connected; both by default"},
+    {"--feedback", "", "kru", "use the feedback, without which there are only CLKFX pins"},
+    {"--input-jitter", "PS", "any", "peak-to-peak jitter of the input clock, 0 by default"},
+    {"--tolerance", "PPM", "any",
+     "how far a frequency may be off, 100 by default; a list has one for each output, and so has "
+     "that of the next options"},
+    {"--exact", "", "any", "short for --tolerance 0"},
+    {"--phase-tolerance", "DEG", "any", "how far a phase may be off, 0.5 by default"},
+    {"--duty-tolerance", "POINTS", "loops", "how far a duty cycle may be off, 0.5 by default"},
+    {"--max-jitter", "PS", "any", "the most jitter that an output may have, peak to peak"},
+    {"--pick", "N", "plan compare best", "the candidate to take, by its number in compare"},
+    {"--front", "N", "best", "trade-offs to show, the best settings as the first; 6 by default"},
+    {"--oscillators", "LIST", "explain", "input frequencies to try instead of stock oscillators"},
+    {"--request", "FILE", "any", "take from a file what no option says; - is standard input"},
+    {"--format", "NAME", "written", "text (default), json, tcl or sdc"},
+    {"--format", "NAME", "compare explain", "text (default), json or tcl"},
+    {"--format", "NAME", "devices", "text (default) or json"},
+    {"-o", "FILE", "any", "write to a file; - is standard output"},
+    {"--trace", "", "single",
+     "print first what the engine itself tells of its search, a line for each step; text format "
+     "only"},
+};
+
+// Why some commands have no use for an option, and what to do.
+struct Reason {
+  std::string_view option;
+  std::string_view commands;
+  std::string_view sentence;
+};
+constexpr Reason kReasons[] = {
+    {"--duty", "krus", "a KRU has no choice of its duty cycles; leave --duty out"},
+    {"--duty-tolerance", "krus",
+     "a KRU has no choice of its duty cycles; leave --duty-tolerance out"},
+    {"--bandwidth", "krus", "a KRU has no loop; leave --bandwidth out"},
+    {"--low-bandwidth", "krus", "a KRU has no loop; leave --low-bandwidth out"},
+    {"--prefer-max-vco", "krus", "a KRU has no VCO; leave --prefer-max-vco out"},
+    {"--int-div0", "pll", "all dividers of a PLL are whole; leave --int-div0 out"},
+    {"--int-div0", "krus", "a KRU has no such divider; leave --int-div0 out"},
+    {"--feedback", "loop clkgen", "only a KRU_SP has a feedback to connect"},
+    {"--primitive", "single", "the command itself names the primitive"},
+    {"--rank", "single", "the engine ranks its settings itself; use plan"},
+    {"--any-order", "single", "the engine takes the outputs as they come; use plan"},
+    {"--engine", "single", "the command asks the engine anyway"},
+    {"--engine", "best", "best searches all settings; use plan"},
+    {"--pick", "single explain", "only plan, compare and best have candidates to pick"},
+    {"--trace", "planning", "a trace is of one search; take the command of a primitive"},
+};
+
+// The options that do not ask for anything: they belong to one call.
+constexpr std::string_view kOfOneCall[] = {"--format", "-o", "--trace", "--pick"};
+
+// Whether a list of words has one.
+bool Has(std::string_view list, std::string_view word) {
+  for (std::size_t end = 0; end != std::string_view::npos;) {
+    end = list.find(' ');
+    if (list.substr(0, end) == word) return true;
+    if (end != std::string_view::npos) list.remove_prefix(end + 1);
+  }
+  return false;
+}
+
+// Whether a list of commands and groups means a command.
+bool Means(std::string_view takers, std::string_view command) {
+  if (Has(takers, command)) return true;
+  return std::any_of(std::begin(kGroups), std::end(kGroups), [&](const auto& group) {
+    return Has(takers, group.first) && Has(group.second, command);
+  });
+}
+
+const OptionRow* Find(std::string_view option) {
+  for (const OptionRow& row : kRows) {
+    if (row.name == option) return &row;
+  }
+  return nullptr;
+}
+
+}  // namespace
+
+std::vector<const OptionRow*> OptionsOf(std::string_view command) {
+  std::vector<const OptionRow*> rows;
+  for (const OptionRow& row : kRows) {
+    if (Means(row.takers, command)) rows.push_back(&row);
+  }
+  return rows;
+}
+
+bool Takes(std::string_view command, std::string_view option) {
+  const std::vector<const OptionRow*> rows = OptionsOf(command);
+  return std::any_of(rows.begin(), rows.end(),
+                     [&](const OptionRow* row) { return row->name == option; });
+}
+
+std::vector<std::string> TakersOf(std::string_view option) {
+  std::vector<std::string> takers;
+  for (const Command& command : Commands()) {
+    if (Takes(command.name, option)) takers.emplace_back(command.name);
+  }
+  return takers;
+}
+
+bool IsSwitch(std::string_view option) {
+  const OptionRow* row = Find(option);
+  return row && row->placeholder.empty();
+}
+
+std::string_view ReasonAgainst(std::string_view command, std::string_view option) {
+  for (const Reason& reason : kReasons) {
+    if (reason.option == option && Means(reason.commands, command)) return reason.sentence;
+  }
+  return "";
+}
+
+std::optional<ValueFacts> ValueOf(std::string_view option) {
+  if (option == "--oscillators") return {{planner::read::ValueKind::kFrequency, true}};
+  const planner::read::OptionFacts* facts = planner::read::FindOption(option);
+  if (!facts || !facts->kind) return std::nullopt;
+  return {{*facts->kind, facts->is_list}};
+}
+
+std::vector<planner::read::Option> KeptFor(std::string_view command,
+                                           std::vector<planner::read::Option> options) {
+  std::erase_if(options, [&](const planner::read::Option& option) {
+    return !Takes(command, option.name) ||
+           std::find(std::begin(kOfOneCall), std::end(kOfOneCall), option.name) !=
+               std::end(kOfOneCall);
+  });
+  return options;
+}
+
+}  // namespace cli

@@ -1,0 +1,57 @@
+#include "cli/Setting.h"
+
+#include <sys/ioctl.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <cstdlib>
+#include <filesystem>
+#include <string_view>
+#include <system_error>
+
+namespace cli {
+
+namespace {
+
+std::string Variable(const char* name) {
+  const char* value = std::getenv(name);
+  return value ? value : "";
+}
+
+// Prose and tables are made for 80 columns; a narrower terminal gets shorter lines.
+int WidthOf(int stream) {
+  constexpr int kUsual = 80;
+  constexpr int kNarrowest = 40;
+  winsize size{};
+  if (!isatty(stream) || ioctl(stream, TIOCGWINSZ, &size) != 0 || size.ws_col == 0) return kUsual;
+  return std::clamp(static_cast<int>(size.ws_col), kNarrowest, kUsual);
+}
+
+bool HasColour() {
+  const std::string terminal = Variable("TERM");
+  return Variable("NO_COLOR").empty() && !terminal.empty() && terminal != "dumb" &&
+         isatty(STDOUT_FILENO);
+}
+
+}  // namespace
+
+Setting SettingOfProcess() {
+  Setting setting;
+  const std::string program = Variable("VORKEL_PROGRAM");
+  if (!program.empty()) setting.program = program;
+  std::error_code error;
+  setting.folder = std::filesystem::read_symlink("/proc/self/exe", error).parent_path().native();
+  std::string_view folders;
+  const std::string devices = Variable("VORKEL_DEVICES");
+  for (folders = devices; !folders.empty();) {
+    const std::size_t colon = std::min(folders.find(':'), folders.size());
+    if (colon > 0) setting.device_folders.emplace_back(folders.substr(0, colon));
+    folders.remove_prefix(std::min(colon + 1, folders.size()));
+  }
+  setting.out_has_colour = HasColour();
+  setting.out_width = WidthOf(STDOUT_FILENO);
+  setting.err_width = WidthOf(STDERR_FILENO);
+  return setting;
+}
+
+}  // namespace cli
