@@ -9,6 +9,12 @@
 #include "planner/read/Units.h"
 #include "planner/report/ExplainText.h"
 
+#ifdef VORKEL_NO_EXPLAIN
+int cli::RunExplain(std::string_view, const std::vector<std::string>&, const Setting&) {
+  throw Failure(kFailed, "vorkel: explain is not there yet\n");
+}
+#else
+
 namespace cli {
 
 namespace {
@@ -57,3 +63,4 @@ int RunExplain(std::string_view command, const std::vector<std::string>& words,
 }
 
 }  // namespace cli
+#endif

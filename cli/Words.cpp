@@ -2,7 +2,7 @@
 
 #include <fmt/format.h>
 
-#include <CLI/App.hpp>
+#include <CLI/CLI.hpp>
 #include <algorithm>
 #include <utility>
 
