@@ -7,6 +7,7 @@
 #include "planner/report/DevicesText.h"
 #include "planner/report/DoubtText.h"
 #include "planner/report/Limits.h"
+#include "planner/report/TclDict.h"
 
 namespace planner::report {
 
@@ -101,17 +102,15 @@ ordered_json ComplaintData(const device::Listed& listed) {
   return data;
 }
 
-string Document(ordered_json devices) {
+ordered_json Document(ordered_json devices) {
   ordered_json data;
   data["format"] = "vorkel-devices";
   data["version"] = kDevicesVersion;
   data["devices"] = std::move(devices);
-  return data.dump(2, ' ', false, ordered_json::error_handler_t::replace) + "\n";
+  return data;
 }
 
-}  // namespace
-
-string DevicesJson(const std::vector<device::Listed>& devices) {
+ordered_json DevicesData(const std::vector<device::Listed>& devices) {
   ordered_json data = ordered_json::array();
   for (const device::Listed& listed : devices) {
     data.push_back(listed.description ? DescriptionData(*listed.description, nullptr)
@@ -120,8 +119,30 @@ string DevicesJson(const std::vector<device::Listed>& devices) {
   return Document(std::move(data));
 }
 
-string DeviceJson(const Description& description, const std::vector<string>& grades) {
+ordered_json DeviceData(const Description& description, const std::vector<string>& grades) {
   return Document(ordered_json::array({DescriptionData(description, &grades)}));
+}
+
+string Text(const ordered_json& data) {
+  return data.dump(2, ' ', false, ordered_json::error_handler_t::replace) + "\n";
+}
+
+}  // namespace
+
+string DevicesJson(const std::vector<device::Listed>& devices) {
+  return Text(DevicesData(devices));
+}
+
+string DeviceJson(const Description& description, const std::vector<string>& grades) {
+  return Text(DeviceData(description, grades));
+}
+
+string DevicesTcl(const std::vector<device::Listed>& devices) {
+  return TclDict(DevicesData(devices));
+}
+
+string DeviceTcl(const Description& description, const std::vector<string>& grades) {
+  return TclDict(DeviceData(description, grades));
 }
 
 }  // namespace planner::report

@@ -26,6 +26,10 @@ std::string DeviceText(const device::Description& description,
 std::string DevicesJson(const std::vector<device::Listed>& devices);
 std::string DeviceJson(const device::Description& description,
                        const std::vector<std::string>& grades);
+// The same as Tcl dicts.
+std::string DevicesTcl(const std::vector<device::Listed>& devices);
+std::string DeviceTcl(const device::Description& description,
+                      const std::vector<std::string>& grades);
 
 // The grade that is faster than each other in some limit and slower in none; nothing when there is
 // no such one, as where grades have different primitives.

@@ -7,6 +7,7 @@
 //
 // Tested by all_settings_test.cpp.
 #include <algorithm>
+#include <array>
 #include <cmath>
 #include <cstddef>
 #include <limits>
@@ -108,6 +109,8 @@ class Krus {
     set_.pins.assign(request.outputs.size(), Pin::kNone);
     for (const Output& output : request.outputs) {
       has_phase_ = has_phase_ || (output.used && output.phase);
+      rough_.push_back({output.frequency.ToDouble(),
+                        output.tolerance.value_or(request.tolerance).ToDouble()});
     }
   }
 
@@ -214,9 +217,8 @@ class Krus {
     const auto& range = RoughRange(pin);
     if (frequency < range.first * (1 - kRounding)) return std::nullopt;
     if (frequency > range.second * (1 + kRounding)) return std::nullopt;
-    const Output& asked = request_.outputs[output];
-    const double allowed = asked.tolerance.value_or(request_.tolerance).ToDouble();
-    double ppm = std::abs(frequency / asked.frequency.ToDouble() - 1) * 1e6;
+    const double allowed = rough_[output].tolerance;
+    double ppm = std::abs(frequency / rough_[output].frequency - 1) * 1e6;
     ppm = std::max(0.0, ppm * (1 - kRounding) - 1e-8);
     Bound::Figures figures;
     figures.rank_class = ppm <= allowed * (1 + kRounding) ? 0 : 1;
@@ -229,7 +231,7 @@ class Krus {
   }
 
   const std::pair<double, double>& RoughRange(Pin pin) const {
-    auto& known = ranges_[{pin, doubled_}];
+    auto& known = ranges_[doubled_ ? 1 : 0][static_cast<std::size_t>(pin)];
     if (!known) {
       const Range& range = limits_.Of(pin, doubled_);
       known = {range.lowest.ToDouble(), range.highest.ToDouble()};
@@ -245,13 +247,13 @@ class Krus {
 
   // With PHASE_SHIFT and without.
   double LeastJitter(Pin pin) const {
-    const auto key = std::tuple(pin, set_.feedback, set_.divide_by_2, HasM(pin) ? set_.m : 0,
-                                HasM(pin) ? set_.d : 0,
-                                HasDivide(pin) ? set_.divide_halves : 0);
-    if (last_.count(pin) != 0 && last_.at(pin).first == key) return last_.at(pin).second;
+    const JitterKey key(set_.feedback, set_.divide_by_2, HasM(pin) ? set_.m : 0,
+                        HasM(pin) ? set_.d : 0, HasDivide(pin) ? set_.divide_halves : 0);
+    auto& last = last_[static_cast<std::size_t>(pin)];
+    if (last && last->first == key) return last->second;
     double least = JitterAt(pin, 0);
     if (is_sp_) least = std::min(least, JitterAt(pin, 1));
-    last_[pin] = {key, least};
+    last = {key, least};
     return least;
   }
 
@@ -434,10 +436,19 @@ class Krus {
   bool has_phase_ = false;
   bool doubled_ = false;
   KruSettings set_;  // what the loops are at
+  struct RoughDemand {
+    double frequency;
+    double tolerance;
+  };
+  std::vector<RoughDemand> rough_;  // by output
   std::map<std::tuple<std::size_t, Pin, int>, Rational> phases_;
-  mutable std::map<std::pair<Pin, bool>, std::optional<std::pair<double, double>>> ranges_;
-  using JitterKey = std::tuple<Pin, bool, bool, int, int, int>;
-  mutable std::map<Pin, std::pair<JitterKey, double>> last_;
+  // By the code of the pin: its range, as usual and with feedback from CLK2X; and the jitter that
+  // was asked for last.
+  template <typename T>
+  using ByPin = std::array<std::optional<T>, hardware::kPins.size() + 1>;
+  mutable std::array<ByPin<std::pair<double, double>>, 2> ranges_;
+  using JitterKey = std::tuple<bool, bool, int, int, int>;
+  mutable ByPin<std::pair<JitterKey, double>> last_;
 };
 
 }  // namespace

@@ -223,14 +223,18 @@ class Loops {
     choice->error = std::max(choice->error, DegreesInUnits(choice->degrees, allowed));
   }
 
-  // The high time that is nearest; of two the longer one.
+  // The high time that is nearest to the duty cycle, one of the two around it; of two the longer
+  // one.
   void AddDuty(const Output& asked, bool moves, Choice* choice) const {
     Rational made = 50;
     if (moves) {
       const int divider = choice->set.divider / 8;
       const hardware::HighTimes times = hardware::HighTimesOf(divider, limits_.max_count);
+      const Rational below = (*asked.duty * 2 * divider / 100).Floor();
+      const int first = static_cast<int>(*below.Whole());
       std::optional<Rational> least;
-      for (int high = times.shortest; high <= times.longest; ++high) {
+      for (const int one : {first, first + 1}) {
+        const int high = std::clamp(one, times.shortest, times.longest);
         const Rational error = (verify::DutyOf(high, choice->set.divider) - *asked.duty).Absolute();
         if (least && *least < error) continue;
         least = error;
