@@ -221,7 +221,8 @@ TEST_F(RunTest, AnswersAsAnyObjectOfTheEngine) {
   const SearchPath path(folder.path());
   const Request request =
       Ask({Rational(33333, 1000), Rational(10001, 300)},
-          {Out(Rational(148351, 1000), Rational(451, 10), Rational(301, 10)), Out(Rational(74176, 1000))});
+          {Out(Rational(148351, 1000), Rational(451, 10), Rational(301, 10)),
+           Out(Rational(74176, 1000))});
   Ip::VorkelImp other(nullptr);
   other.SetDevice("round");
   const int code =
