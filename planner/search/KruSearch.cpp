@@ -57,7 +57,7 @@ class KruSearch {
       : task_(request, device, primitive),
         solver_(task_),
         largest_(hardware::LargestKruRatioPart(primitive)),
-        leaves_out_multiples_(task_.Model().RisesWithSettings() && task_.IsJitterAllKnown()) {
+        leaves_out_multiples_(task_.Model().RisesWithSettings() && IsJitterAllKnown()) {
     if (task_.IsSp()) {
       divides_ = hardware::kClkdvHalves;
     } else {
@@ -77,6 +77,13 @@ class KruSearch {
   }
 
  private:
+  // Where the jitter of a ratio is known, it is so with all M and D that make it. With output 0 of a
+  // KRU_CLKGEN unused CLKFX can be out of range.
+  bool IsJitterAllKnown() const {
+    const bool on_clkfx = task_.IsSp() || task_.Outputs().front().Index() == 0;
+    return !task_.Model().IsKnown() || (on_clkfx && task_.IsJitterAllKnown());
+  }
+
   void Walk(bool all_met) {
     all_met_ = all_met;
     pairs_ = 0;

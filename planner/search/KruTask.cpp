@@ -9,7 +9,7 @@ namespace planner::search {
 
 namespace {
 
-constexpr std::int64_t kHalvesOfOne = 2;
+constexpr int kHalvesOfOne = 2;
 
 }  // namespace
 
@@ -40,7 +40,7 @@ KruOutput::KruOutput(const Request& request, int index, std::size_t shifts)
   if (!asked_->duty) return;
   even_ = DutyOf(50);
   divided_.resize(static_cast<std::size_t>(hardware::kClkdvHalves.back()) + 1, even_);
-  for (const int halves : hardware::kClkdvHalves) {
+  for (int halves = kHalvesOfOne; halves <= hardware::kClkdvHalves.back(); ++halves) {
     divided_[static_cast<std::size_t>(halves)] = DutyOf(hardware::PinDuty(Pin::kClkdv, halves));
   }
 }
@@ -51,9 +51,11 @@ KruOutput::Duty KruOutput::DutyOf(const Rational& percent) const {
   return {Rounded((error / answer::DutyUnit(tolerance)).ToDouble()), error <= tolerance};
 }
 
-const KruOutput::Duty& KruOutput::Of(PinSource source, int divide_halves) const {
+KruOutput::Duty KruOutput::Of(PinSource source, int divide_halves) const {
   if (source != PinSource::kDivider || divided_.empty()) return even_;
-  return divided_[static_cast<std::size_t>(divide_halves)];
+  const auto place = static_cast<std::size_t>(divide_halves);
+  if (place < divided_.size()) return divided_[place];
+  return DutyOf(hardware::PinDuty(Pin::kClkdv, divide_halves));
 }
 
 Near KruOutput::DutyError(PinSource source, int divide_halves) const {

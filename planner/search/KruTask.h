@@ -88,7 +88,7 @@ class KruOutput {
     bool is_met = true;
   };
   Duty DutyOf(const Rational& percent) const;
-  const Duty& Of(PinSource source, int divide_halves) const;
+  Duty Of(PinSource source, int divide_halves) const;
 
   const Request* request_;
   int index_;
@@ -113,7 +113,7 @@ class KruTask {
   const std::vector<KruPin>& Pins() const { return pins_; }
   bool AsksForPhase() const { return asks_for_phase_; }
   const answer::KruJitter& Model() const { return jitter_; }
-  // Whether all pins that are in range have a jitter that is known, or none has.
+  // Whether CLKFX, where an output can be on it, has a jitter that is known, or nothing has.
   bool IsJitterAllKnown() const { return is_jitter_all_known_; }
 
   double JitterOf(const KruBase& base, Pin pin, bool shifted) const;

@@ -1,0 +1,435 @@
+// Tested by within_test.cpp.
+#include "planner/search/KruWithin.h"
+
+#include <algorithm>
+#include <array>
+#include <cmath>
+#include <cstddef>
+#include <cstdint>
+#include <utility>
+#include <vector>
+
+#include "host/bundled/calculator/Slack.h"
+#include "planner/search/VcoSpans.h"
+
+namespace planner::search {
+
+namespace {
+
+// Outputs, by their places among the used ones.
+using Outputs = std::uint32_t;
+constexpr Outputs Of(std::size_t place) { return Outputs{1} << place; }
+
+// Something that is set, and the outputs that it can then serve.
+struct Served {
+  KruBase base;
+  Outputs outputs = 0;
+};
+
+// Adds what serves outputs that no other one serves all of.
+void AddServed(const Served& one, std::vector<Served>* all) {
+  for (const Served& other : *all) {
+    if ((one.outputs & ~other.outputs) == 0) return;
+  }
+  all->push_back(one);
+}
+
+}  // namespace
+
+KruWithin::KruWithin(const Request& request, const Device& device, Primitive primitive)
+    : request_(request), task_(request_, device, primitive) {}
+
+// A question, and how far its answer is.
+class KruWithin::Question {
+ public:
+  Question(const KruTask& task, const Relaxed& relaxed) : task_(task), relaxed_(relaxed) {
+    const int largest = hardware::LargestKruRatioPart(task.Which());
+    first_m_ = relaxed.m ? 1 : hardware::kSmallestKruM;
+    last_m_ = relaxed.m ? kRelaxedM : largest;
+    last_d_ = relaxed.d ? kRelaxedD : largest;
+    for (std::size_t i = 0; i < task.Outputs().size(); ++i) {
+      all_ |= Of(i);
+      const Relaxed::OfOutput& own = OwnOf(i);
+      asks_for_jitter_ =
+          asks_for_jitter_ || (!own.jitter && task.Outputs()[i].Jitter().IsAsked());
+      asks_for_phase_ = asks_for_phase_ || PhasesOf(i) != nullptr;
+    }
+    if (relaxed.dividers) {
+      // Any half of CLKDV, any whole number of CLKFXDV.
+      const int step = task.IsSp() ? 1 : 2;
+      for (int halves = 2; halves <= 2 * kRelaxedDivider; halves += step) {
+        divides_.push_back(halves);
+      }
+    } else if (task.IsSp()) {
+      divides_.assign(hardware::kClkdvHalves.begin(), hardware::kClkdvHalves.end());
+    } else {
+      divides_.assign(hardware::kClkfxdvHalves.begin(), hardware::kClkfxdvHalves.end());
+    }
+  }
+
+  std::optional<Settings> Answer() {
+    if (!task_.IsSp()) return AnswerClkgen();
+    const bool must_feed_back = task_.Asked().feedback && !relaxed_.feedback;
+    // With feedback there are more pins. Without it there is less jitter.
+    for (const bool feedback : {true, false}) {
+      if (!feedback && (must_feed_back || !asks_for_jitter_)) continue;
+      for (const bool divide_by_2 : {false, true}) {
+        for (const bool doubled : {false, true}) {
+          if (doubled && (!feedback || task_.Outputs().front().Index() != 0)) continue;
+          for (const bool shifted : {false, true}) {
+            if (shifted && !asks_for_phase_) continue;
+            doubled_ = doubled;
+            shifted_ = shifted;
+            if (auto found = AnswerSp({.feedback = feedback, .divide_by_2 = divide_by_2})) {
+              return found;
+            }
+          }
+        }
+      }
+    }
+    return std::nullopt;
+  }
+
+ private:
+  const Relaxed::OfOutput& OwnOf(std::size_t place) const {
+    return relaxed_.outputs[static_cast<std::size_t>(task_.Outputs()[place].Index())];
+  }
+  // Null where the phase does not count.
+  const PhaseTable* PhasesOf(std::size_t place) const {
+    return OwnOf(place).phase ? nullptr : task_.Outputs()[place].Phases();
+  }
+
+  // --- What a pin does for an output ----------------------------------------------------------
+
+  // Whether an output can be on a pin, but for its phase.
+  bool Serves(const KruPin& pin, std::size_t place, const KruBase& base) const {
+    const KruOutput& output = task_.Outputs()[place];
+    const Relaxed::OfOutput& own = OwnOf(place);
+    if (!IsConnected(pin, output, base)) return false;
+    const PinSource source = pin.facts->source;
+    const KruRatio ratio = RatioOf(source, base);
+    if (!own.frequency && !output.Frequency().IsMet(ratio.a, ratio.b)) return false;
+    if (!own.range && !(doubled_ ? pin.doubled : pin.usual).Contains(ratio.a, ratio.b)) {
+      return false;
+    }
+    if (!own.duty && output.AsksForDuty() && !output.IsDutyMet(source, base.divide_halves)) {
+      return false;
+    }
+    return own.jitter || !output.Jitter().IsAsked() ||
+           output.Jitter().IsMet(task_.JitterOf(base, pin.facts->pin, shifted_));
+  }
+
+  bool IsConnected(const KruPin& pin, const KruOutput& output, const KruBase& base) const {
+    if (pin.facts->needs_feedback && !base.feedback) return false;
+    if (output.Index() != 0) return true;
+    return task_.IsSp() ? doubled_ == (pin.facts->pin == Pin::kClk2x)
+                        : pin.facts->pin == Pin::kClkfx;
+  }
+
+  // The PHASE_SHIFTs with which it then meets its phase.
+  Shifts ShiftsOf(const KruPin& pin, std::size_t place) const {
+    const PhaseTable* const phases = PhasesOf(place);
+    if (phases != nullptr) return phases->Met(static_cast<std::size_t>(pin.quarter));
+    Shifts all;
+    return all.set();
+  }
+
+  template <typename Take>
+  void ForEachPin(bool synthesised, bool divided, const Take& take) const {
+    for (const KruPin& pin : task_.Pins()) {
+      const PinSource source = pin.facts->source;
+      const bool has_m =
+          source == PinSource::kSynthesiser || source == PinSource::kDividedSynthesiser;
+      const bool has_divide =
+          source == PinSource::kDivider || source == PinSource::kDividedSynthesiser;
+      if (has_m == synthesised && has_divide == divided) take(pin);
+    }
+  }
+
+  // The outputs that pins of a kind serve.
+  Outputs ServedBy(bool synthesised, bool divided, const KruBase& base) const {
+    Outputs outputs = 0;
+    ForEachPin(synthesised, divided, [&](const KruPin& pin) {
+      for (std::size_t i = 0; i < task_.Outputs().size(); ++i) {
+        if ((outputs & Of(i)) == 0 && Serves(pin, i, base)) outputs |= Of(i);
+      }
+    });
+    return outputs;
+  }
+
+  // --- Spans of M / D ---------------------------------------------------------------------------
+
+  // The ratios of M to D with which a pin serves an output, but for the jitter; they are rounded
+  // outwards. Empty when it cannot.
+  std::optional<Span> SpanOf(const KruPin& pin, std::size_t place, const KruBase& base) const {
+    const KruOutput& output = task_.Outputs()[place];
+    const Relaxed::OfOutput& own = OwnOf(place);
+    if (!IsConnected(pin, output, base)) return std::nullopt;
+    if (!own.duty && output.AsksForDuty() &&
+        !output.IsDutyMet(pin.facts->source, base.divide_halves)) {
+      return std::nullopt;
+    }
+    KruBase unit = base;
+    unit.m = 1;
+    unit.d = 1;
+    const KruRatio ratio = RatioOf(pin.facts->source, unit);
+    const double scale = static_cast<double>(ratio.b) / static_cast<double>(ratio.a);
+    const double line_scale = base.divide_by_2 ? 2 : 1;
+    Span span = {0, HUGE_VAL};
+    if (!own.frequency) {
+      const FrequencyDemand& frequency = output.Frequency();
+      const double exact = scale / frequency.InputPerAsked();
+      span.lowest = exact * (1 - frequency.Allowed());
+      span.highest = exact * (1 + frequency.Allowed());
+    }
+    if (!own.range) {
+      const RatioRange& range = doubled_ ? pin.doubled : pin.usual;
+      span.lowest = std::max(span.lowest, scale * range.Lowest());
+      span.highest = std::min(span.highest, scale * range.Highest());
+    }
+    if (!own.jitter && output.Jitter().IsAsked()) LeaveKnown(line_scale, &span);
+    span.lowest *= 1 - kWider;
+    span.highest *= 1 + kWider;
+    if (span.lowest > span.highest) return std::nullopt;
+    return span;
+  }
+
+  // Leaves of a span where the jitter of the synthesiser is known: about where CLKFX is in range.
+  void LeaveKnown(double scale, Span* span) const {
+    for (const KruPin& pin : task_.Pins()) {
+      if (pin.facts->pin != Pin::kClkfx) continue;
+      const double lowest = pin.usual.Lowest() * (1 - Calculator::kSolverSlack);
+      const double highest = pin.usual.Highest() * (1 + Calculator::kSolverSlack);
+      span->lowest = std::max(span->lowest, scale * lowest);
+      span->highest = std::min(span->highest, scale * highest);
+    }
+  }
+
+  // Calls `take` with the M and D whose ratio is in a span, the smallest D and then the smallest M
+  // first, until it answers false.
+  template <typename Take>
+  void ForEachRatio(const Span& span, const Take& take) const {
+    for (int d = 1; d <= last_d_; ++d) {
+      const double low = std::ceil(std::min(span.lowest * d, last_m_ + 1.0));
+      const int first = std::max(first_m_, static_cast<int>(low));
+      const int last = static_cast<int>(std::min<double>(span.highest * d, last_m_));
+      for (int m = first; m <= last; ++m) {
+        if (!take(m, d)) return;
+      }
+    }
+  }
+
+  // --- KRU_SP -------------------------------------------------------------------------------------
+
+  std::optional<Settings> AnswerSp(const KruBase& line) {
+    const Outputs on_line = line.feedback ? ServedBy(false, false, line) : 0;
+    std::vector<Served> divides = {{line, 0}};
+    if (line.feedback) {
+      for (const int halves : divides_) {
+        KruBase base = line;
+        base.divide_halves = halves;
+        AddServed({base, ServedBy(false, true, base)}, &divides);
+      }
+    }
+    for (const Served& ratio : RatiosOf(line)) {
+      for (const Served& divide : divides) {
+        if ((on_line | ratio.outputs | divide.outputs) != all_) continue;
+        KruBase base = line;
+        base.m = ratio.base.m;
+        base.d = ratio.base.d;
+        base.divide_halves = divide.base.divide_halves;
+        if (auto settings = WithPins(base)) return settings;
+      }
+    }
+    return std::nullopt;
+  }
+
+  // The M and D that serve different outputs, and none, which serve none.
+  std::vector<Served> RatiosOf(const KruBase& line) const {
+    std::vector<Served> ratios = {{line, 0}};
+    // Between two neighbours of these ends all ratios serve the same outputs, but for jitter, of
+    // which the first has the least.
+    std::vector<Span> spans;
+    std::vector<double> ends;
+    ForEachPin(true, false, [&](const KruPin& pin) {
+      for (std::size_t i = 0; i < task_.Outputs().size(); ++i) {
+        const std::optional<Span> span = SpanOf(pin, i, line);
+        if (!span) continue;
+        spans.push_back(*span);
+        ends.push_back(span->lowest);
+        ends.push_back(span->highest);
+      }
+    });
+    std::sort(ends.begin(), ends.end());
+    ends.erase(std::unique(ends.begin(), ends.end()), ends.end());
+    for (std::size_t i = 0; i < ends.size(); ++i) {
+      AddRatios(line, {ends[i], ends[i]}, spans, &ratios);
+      if (i + 1 < ends.size()) AddRatios(line, {ends[i], ends[i + 1]}, spans, &ratios);
+    }
+    return ratios;
+  }
+
+  void AddRatios(const KruBase& line, const Span& part, const std::vector<Span>& spans,
+                 std::vector<Served>* ratios) const {
+    const bool is_asked = std::any_of(spans.begin(), spans.end(), [&](const Span& span) {
+      return span.lowest <= part.lowest && part.highest <= span.highest;
+    });
+    if (!is_asked) return;
+    // Close to an end some ratios do not serve all of the outputs, so that more than one is tried.
+    constexpr int kTries = 4;
+    int tries = 0;
+    ForEachRatio(part, [&](int m, int d) {
+      KruBase base = line;
+      base.m = m;
+      base.d = d;
+      AddServed({base, ServedBy(true, false, base)}, ratios);
+      return task_.Model().RisesWithSettings() ? ++tries < kTries : true;
+    });
+  }
+
+  // --- KRU_CLKGEN ---------------------------------------------------------------------------------
+
+  std::optional<Settings> AnswerClkgen() {
+    doubled_ = false;
+    shifted_ = false;
+    // First without CLKFXDV.
+    if (auto settings = AnswerClkgenWith({})) return settings;
+    for (const int halves : divides_) {
+      if (auto settings = AnswerClkgenWith({.divide_halves = halves})) return settings;
+    }
+    return std::nullopt;
+  }
+
+  std::optional<Settings> AnswerClkgenWith(const KruBase& line) {
+    Spans spans = {{0, HUGE_VAL}};
+    for (std::size_t i = 0; i < task_.Outputs().size(); ++i) {
+      Spans own;
+      const auto add = [&](const KruPin& pin) {
+        if (!ShiftsOf(pin, i)[0]) return;
+        if (const std::optional<Span> span = SpanOf(pin, i, line)) own.push_back(*span);
+      };
+      ForEachPin(true, false, add);
+      if (line.divide_halves != 0) ForEachPin(true, true, add);
+      std::sort(own.begin(), own.end(),
+                [](const Span& a, const Span& b) { return a.lowest < b.lowest; });
+      spans = Common(spans, own);
+      if (spans.empty()) return std::nullopt;
+    }
+    for (const Span& span : spans) {
+      std::optional<Settings> settings;
+      ForEachRatio(span, [&](int m, int d) {
+        KruBase base = line;
+        base.m = m;
+        base.d = d;
+        settings = WithPins(base);
+        return !settings && !IsHopeless(base);
+      });
+      if (settings) return settings;
+    }
+    return std::nullopt;
+  }
+
+  // Where two sets of spans meet; those of `others` can overlap.
+  static Spans Common(const Spans& spans, const Spans& others) {
+    Spans merged;
+    for (const Span& other : others) AddSpan(other.lowest, other.highest, &merged);
+    Spans common;
+    for (const Span& span : spans) {
+      for (const Span& other : merged) {
+        AddSpan(std::max(span.lowest, other.lowest), std::min(span.highest, other.highest),
+                &common);
+      }
+    }
+    return common;
+  }
+
+  // Whether a jitter that is asked for is too large already with this M and D: with others that
+  // follow it is no smaller.
+  bool IsHopeless(const KruBase& base) const {
+    if (!asks_for_jitter_ || !task_.Model().RisesWithSettings()) return false;
+    for (std::size_t i = 0; i < task_.Outputs().size(); ++i) {
+      if (OwnOf(i).jitter) continue;
+      const double jitter = task_.JitterOf(base, Pin::kClkfx, false);
+      if (jitter != answer::kUnknownJitter && !task_.Outputs()[i].Jitter().IsMet(jitter)) {
+        return true;
+      }
+    }
+    return false;
+  }
+
+  // --- Pins ----------------------------------------------------------------------------------------
+
+  // The first PHASE_SHIFT with which each output has a pin, and the first such pins.
+  std::optional<Settings> WithPins(const KruBase& base) const {
+    Shifts shifts;
+    if (shifted_) {
+      shifts.set();
+      shifts[0] = false;
+    } else {
+      shifts[0] = true;
+    }
+    const std::size_t count = task_.Outputs().size();
+    std::array<std::vector<const KruPin*>, kMostOutputs> pins;
+    for (std::size_t i = 0; i < count && shifts.any(); ++i) {
+      Shifts own;
+      for (const KruPin& pin : task_.Pins()) {
+        if (!IsSet(pin, base) || !Serves(pin, i, base)) continue;
+        pins[i].push_back(&pin);
+        own |= ShiftsOf(pin, i);
+      }
+      shifts &= own;
+    }
+    if (shifts.none()) return std::nullopt;
+    int shift = 0;
+    while (!shifts[static_cast<std::size_t>(shift)]) ++shift;
+    KruSettings settings{.primitive = task_.Which(),
+                         .feedback = base.feedback,
+                         .divide_by_2 = base.divide_by_2,
+                         .phase_shift = shift,
+                         .pins = {}};
+    settings.pins.resize(task_.Asked().outputs.size(), Pin::kNone);
+    for (std::size_t i = 0; i < count; ++i) {
+      for (const KruPin* const pin : pins[i]) {
+        if (!ShiftsOf(*pin, i)[static_cast<std::size_t>(shift)]) continue;
+        settings.pins[static_cast<std::size_t>(task_.Outputs()[i].Index())] = pin->facts->pin;
+        if (UsesM(*pin)) {
+          settings.m = base.m;
+          settings.d = base.d;
+        }
+        if (UsesDivide(*pin)) settings.divide_halves = base.divide_halves;
+        break;
+      }
+    }
+    return settings;
+  }
+
+  static bool UsesM(const KruPin& pin) {
+    return pin.facts->source == PinSource::kSynthesiser ||
+           pin.facts->source == PinSource::kDividedSynthesiser;
+  }
+  static bool UsesDivide(const KruPin& pin) {
+    return pin.facts->source == PinSource::kDivider ||
+           pin.facts->source == PinSource::kDividedSynthesiser;
+  }
+  static bool IsSet(const KruPin& pin, const KruBase& base) {
+    return (base.m != 0 || !UsesM(pin)) && (base.divide_halves != 0 || !UsesDivide(pin));
+  }
+
+  const KruTask& task_;
+  const Relaxed& relaxed_;
+  int first_m_;
+  int last_m_;
+  int last_d_;
+  Outputs all_ = 0;
+  bool asks_for_jitter_ = false;
+  bool asks_for_phase_ = false;
+  std::vector<int> divides_;
+  bool doubled_ = false;
+  bool shifted_ = false;
+};
+
+std::optional<Settings> KruWithin::Find(const Relaxed& relaxed) const {
+  return Question(task_, relaxed).Answer();
+}
+
+}  // namespace planner::search
