@@ -9,12 +9,6 @@
 #include "planner/read/Units.h"
 #include "planner/report/ExplainText.h"
 
-#ifdef VORKEL_NO_EXPLAIN
-int cli::RunExplain(std::string_view, const std::vector<std::string>&, const Setting&) {
-  throw Failure(kFailed, "vorkel: explain is not there yet\n");
-}
-#else
-
 namespace cli {
 
 namespace {
@@ -46,7 +40,8 @@ std::string InFormat(const Call& call, const planner::explain::Explanation& expl
   if (call.format == Format::kTcl) return planner::report::ExplainTcl(explanation, call.device);
   planner::report::Calls calls;
   calls.best = PastedCall("best", call, setting);
-  return planner::report::ExplainText(explanation, call.device, StyleOf(call, setting), calls, own_inputs);
+  return planner::report::ExplainText(explanation, call.device, StyleOf(call, setting), calls,
+                                      own_inputs);
 }
 
 }  // namespace
@@ -63,4 +58,3 @@ int RunExplain(std::string_view command, const std::vector<std::string>& words,
 }
 
 }  // namespace cli
-#endif

@@ -25,6 +25,16 @@ using explain::Explanation;
 using explain::OfPrimitive;
 using std::string;
 
+// A tolerance above this, ppm, and a number that moves by more than this part of it is no advice.
+constexpr int kLargestTolerance = 20000;
+constexpr int kFarthest = 10;
+
+// Of the labels in front of what a primitive has to say.
+constexpr int kLabelWidth = 14;
+
+// So many conflicts of a primitive are told; the data have all.
+constexpr std::size_t kMostConflicts = 4;
+
 string NameOf(const OfPrimitive& one) { return string(Name(one.primitive)); }
 
 class Texts {
@@ -49,7 +59,11 @@ class Texts {
   string Of(const OfPrimitive& one) const;
   string Inputs() const;
   string Demands(const std::vector<Demand>& demands, Primitive primitive) const;
-  string Changes(const std::vector<Change>& changes, Primitive primitive) const;
+  string Changes(const std::vector<const Change*>& changes, Primitive primitive) const;
+  string Works(const OfPrimitive& one) const;
+  string Line(const string& label, const string& value) const {
+    return Labelled(style_, kLabelWidth, "  " + label, value);
+  }
   string Together(const OfPrimitive& one) const;
   string Corrections(const OfPrimitive& one) const;
   const OfPrimitive* Nearest() const;
@@ -70,13 +84,36 @@ string Texts::Demands(const std::vector<Demand>& demands, Primitive primitive) c
   return Enumerated(words);
 }
 
-string Texts::Changes(const std::vector<Change>& changes, Primitive primitive) const {
+// Changes that a user can make, without those that nobody would: a loss of what the hardware is, or
+// a number so far away that it is another request.
+bool IsAdvice(const Change& change) {
+  switch (change.kind) {
+    case ChangeKind::kWithout:
+      return change.demand.kind == DemandKind::kPhase || change.demand.kind == DemandKind::kDuty ||
+             change.demand.kind == DemandKind::kJitter ||
+             change.demand.kind == DemandKind::kFeedback ||
+             change.demand.kind == DemandKind::kSecondInput;
+    case ChangeKind::kTolerance:
+      return change.value <= kLargestTolerance;
+    case ChangeKind::kFrequency:
+      return (change.value - change.before).Absolute() <= change.before / kFarthest;
+    case ChangeKind::kLowest:
+    case ChangeKind::kHighest:
+      return (change.value - change.before).Absolute() <= change.before / kFarthest;
+    default:
+      return true;
+  }
+}
+
+// What works, each once: the changes of some conflicts, in words.
+string Texts::Changes(const std::vector<const Change*>& changes, Primitive primitive) const {
   std::vector<string> words;
-  for (const Change& change : changes) {
-    string one = ChangeWords(change, request_, device_, primitive);
+  for (const Change* change : changes) {
+    if (!IsAdvice(*change)) continue;
+    string one = ChangeWords(*change, request_, device_, primitive);
     if (std::find(words.begin(), words.end(), one) == words.end()) words.push_back(std::move(one));
   }
-  return Enumerated(words, "or");
+  return Join(words, "; ");
 }
 
 // The primitive whose common tolerance is the smallest; null when none has one.
@@ -115,16 +152,13 @@ string Texts::Verdict() const {
                                       device_.part + ".");
   const OfPrimitive* nearest = Nearest();
   if (!nearest) return text;
-  text += Prose(style_, "nearest: ", Together(*nearest) + " (" + NameOf(*nearest) + ")");
-  if (!nearest->conflicts.empty()) {
-    text += Prose(style_, "in the way: ",
-                  Demands(nearest->conflicts.front().demands, nearest->primitive));
-  }
-  return text;
+  return text +
+         Prose(style_, "nearest: ", Together(*nearest) + " (" + NameOf(*nearest) + ")");
 }
 
 // What single outputs or demands have to go; more at once are no advice.
 string Texts::Corrections(const OfPrimitive& one) const {
+  if (request_.outputs.size() < 2) return "";
   std::vector<string> words;
   for (const std::vector<Demand>& correction : one.corrections) {
     const bool are_outputs =
@@ -136,33 +170,51 @@ string Texts::Corrections(const OfPrimitive& one) const {
     for (const Demand& demand : correction) outputs.push_back(demand.output);
     words.push_back(Outputs(outputs));
   }
-  return words.empty() ? "" : Prose(style_, "  without: ", Enumerated(words, "or"));
+  return words.empty() ? "" : Line("without", Enumerated(words, "or"));
+}
+
+// The changes with which the whole request goes; or, where conflicts remain beside each, with which
+// each of them is out of the way.
+string Texts::Works(const OfPrimitive& one) const {
+  std::vector<const Change*> lifting;
+  std::vector<const Change*> others;
+  for (const Conflict& conflict : one.conflicts) {
+    for (const Change& change : conflict.changes) {
+      (conflict.lifts_all ? lifting : others).push_back(&change);
+    }
+  }
+  const string works = Changes(lifting, one.primitive);
+  if (!works.empty()) return Line("works with", works);
+  const string helps = Changes(others, one.primitive);
+  return helps.empty() ? "" : Line("helps", helps);
 }
 
 string Texts::Of(const OfPrimitive& one) const {
   if (one.is_met) return "";
   string text = "\n" + NameOf(one) + "\n";
   if (!one.refusals.empty()) {
-    for (const Finding& refusal : one.refusals) {
-      text += Prose(style_, "  ", FindingText(refusal, device_));
-    }
+    for (const Finding& refusal : one.refusals) text += Line("", FindingText(refusal, device_));
     return text;
   }
+  std::size_t told = 0;
   for (const Conflict& conflict : one.conflicts) {
-    text += Prose(style_, "  in the way: ", Demands(conflict.demands, one.primitive));
-    if (conflict.changes.empty()) continue;
-    text += Prose(style_, conflict.lifts_all ? "    works with " : "    out of the way with ",
-                  Changes(conflict.changes, one.primitive));
+    if (told == kMostConflicts) break;
+    text += Line(told++ == 0 ? "in the way" : "and", Demands(conflict.demands, one.primitive));
   }
-  text += Corrections(one);
-  if (!one.together.empty()) text += Prose(style_, "  all together: ", Together(one));
+  if (one.conflicts.size() > told) {
+    text += Line("", std::to_string(one.conflicts.size() - told) + " more; --format json has all");
+  }
+  text += Works(one) + Corrections(one);
+  if (!one.together.empty() && one.together.front().value <= kLargestTolerance) {
+    text += Line("all moved", Together(one));
+  }
   for (const explain::Swap& swap : one.swaps) {
-    text += Prose(style_, "  ", "works when outputs " + std::to_string(swap.first) + " and " +
-                                    std::to_string(swap.second) + " change places");
+    text += Line("", "works when outputs " + std::to_string(swap.first) + " and " +
+                         std::to_string(swap.second) + " change places: --any-order");
   }
   if (!one.is_complete) {
-    text += Prose(style_, "  ", "There may be more: " + std::to_string(one.questions) +
-                                    " sets of demands were looked at.");
+    text += Line("", "there may be more: " + std::to_string(one.questions) +
+                         " sets of demands were looked at");
   }
   return text;
 }

@@ -25,8 +25,15 @@ string RangeWords(const Range& range) {
          Short(range.highest, kFrequencyDecimals) + " MHz";
 }
 
-// An angle or a duty cycle, which may be a quotient such as 360/7.
-string ValueWords(const Rational& value) { return Decimal(value); }
+// A number with its unit: decimals where they end soon; else the quotient that it is, too.
+string ExactWords(const Rational& value, const string& unit) {
+  const string decimal = Short(value, kFrequencyDecimals);
+  const string text = decimal + " " + unit;
+  return Decimal(value) == decimal ? text : text + " (" + Quotient(value) + ")";
+}
+
+string PhaseWords(const Rational& phase) { return ExactWords(phase, "degrees"); }
+string DutyWords(const Rational& duty) { return ExactWords(duty, "percent"); }
 
 string JitterWords(const Request& request, const Demand& demand) {
   return Outputs({demand.output}) + " with a jitter of at most " +
@@ -130,12 +137,7 @@ string RoundedUp(const Rational& value, int decimals) {
   return Short(-(-value * scale).Floor() / scale, decimals);
 }
 
-// Decimals where they end soon; else the quotient that it is.
-string FrequencyWords(const Rational& frequency) {
-  const string decimal = Short(frequency, kFrequencyDecimals);
-  return Decimal(frequency) == decimal ? decimal + " MHz"
-                                       : decimal + " MHz (" + Quotient(frequency) + ")";
-}
+string FrequencyWords(const Rational& frequency) { return ExactWords(frequency, "MHz"); }
 
 string DemandWords(const Demand& demand, const Request& request, const Device& device,
                    Primitive primitive) {
@@ -144,11 +146,10 @@ string DemandWords(const Demand& demand, const Request& request, const Device& d
       return Outputs({demand.output}) + " at " +
              FrequencyWords(OutputOf(request, demand).frequency);
     case DemandKind::kPhase:
-      return Outputs({demand.output}) + " at " + ValueWords(*OutputOf(request, demand).phase) +
-             " degrees";
+      return Outputs({demand.output}) + " at " + PhaseWords(*OutputOf(request, demand).phase);
     case DemandKind::kDuty:
       return Outputs({demand.output}) + " with a duty cycle of " +
-             ValueWords(*OutputOf(request, demand).duty) + " percent";
+             DutyWords(*OutputOf(request, demand).duty);
     case DemandKind::kJitter:
       return JitterWords(request, demand);
     case DemandKind::kOutputRange:
@@ -192,10 +193,9 @@ string ChangeWords(const Change& change, const Request& request, const Device& /
     case ChangeKind::kFrequency:
       return Outputs({demand.output}) + " at " + FrequencyWords(change.value);
     case ChangeKind::kPhase:
-      return Outputs({demand.output}) + " at " + ValueWords(change.value) + " degrees";
+      return Outputs({demand.output}) + " at " + PhaseWords(change.value);
     case ChangeKind::kDuty:
-      return Outputs({demand.output}) + " with a duty cycle of " + ValueWords(change.value) +
-             " percent";
+      return Outputs({demand.output}) + " with a duty cycle of " + DutyWords(change.value);
     case ChangeKind::kJitter:
       return Outputs({demand.output}) + " with a jitter of up to " + RoundedUp(change.value, 3) +
              " ps";
