@@ -50,6 +50,13 @@ string Figure(const Rational& error, const Rational& allowed) {
   return is_distinct ? text : Distinct(error, error < Rational(0) ? -allowed : allowed, 2);
 }
 
+// A jitter as all of them are shown, or with as many decimals as it takes not to look like what is
+// allowed.
+string JitterFigure(const Rational& jitter, const Rational& allowed) {
+  const string text = Fixed(jitter, 3);
+  return text != Fixed(allowed, 3) ? text : Distinct(jitter, allowed, 3);
+}
+
 // "frequency is off by 1001.00 ppm, with 100 allowed", which stands behind "the".
 string MissPart(const Finding& finding) {
   const Rational& allowed = finding.range.highest;
@@ -64,7 +71,7 @@ string MissPart(const Finding& finding) {
       return off("duty cycle", "percent points");
     case Quantity::kJitter:
       if (finding.value == Rational(0)) return "jitter is not known" + limit;
-      return "jitter is " + Distinct(finding.value, allowed, 3) + " ps" + limit;
+      return "jitter is " + JitterFigure(finding.value, allowed) + " ps" + limit;
     default:
       return off("frequency", "ppm");
   }

@@ -59,6 +59,8 @@ TEST(FindingText, ErrorsAboveTheirTolerances) {
             "output 1: the jitter is 128.815 ps, with 100 allowed");
   EXPECT_EQ(Text(Off(Quantity::kJitter, 1, 0, 100)),
             "output 1: the jitter is not known, with 100 allowed");
+  EXPECT_EQ(Text(Off(Quantity::kJitter, 1, Rational(1000001, 10000), 100)),
+            "output 1: the jitter is 100.0001 ps, with 100 allowed");
 }
 
 TEST(FindingText, ErrorsNeverReadLikeNoneOrLikeWhatIsAllowed) {

@@ -131,7 +131,7 @@ TEST(ReportText, AnUnknownJitterHasNoColumn) {
   const Answer answer = MadeLoop(request, Primitive::kTsyn, Bandwidth::kHigh, 44 * 8, 1,
                                  {64, 128, 352}, std::nullopt);
   const std::string text = Text(request, answer);
-  EXPECT_NE(text.find("D      1\n\noutput  divider  requested MHz  actual MHz  error ppm\n"),
+  EXPECT_NE(text.find("D       1\n\noutput  divider  requested MHz  actual MHz  error ppm\n"),
             std::string::npos)
       << text;
   EXPECT_EQ(text.find("jitter"), std::string::npos);
@@ -192,7 +192,7 @@ TEST(ReportText, SettingsThatNoPinUsesAreLeftOut) {
   settings.divide_halves = 8;
   settings.pins = {Pin::kClkfx, Pin::kClkfxdv};
   const Answer answer = MadeKru(request, settings, {Rational(8, 5), Rational(2, 5)}, 180);
-  EXPECT_EQ(Text(request, answer).substr(0, 130),
+  EXPECT_EQ(Text(request, answer).substr(0, 128),
             "device       vk40b484-2 KRU_CLKGEN\n"
             "input        100 MHz\n"
             "M            8\n"

@@ -133,8 +133,8 @@ TEST(Sdc, OutputsOnTheSamePinAreOneClock) {
   const Answer answer =
       MadeKru(request, settings, {Rational(3, 2), 1, Rational(3, 2)}, std::nullopt);
   const std::string text = Sdc(request, MadeDevice(), answer);
-  EXPECT_NE(text.find("# vk40b484-2 KRU_SP: CLKIN_DIVIDE_BY_2 false, M 3, D 2, phase offset 0\n"
-                      "#   degrees, PHASE_SHIFT 0\n"),
+  EXPECT_NE(text.find("# vk40b484-2 KRU_SP: CLKIN_DIVIDE_BY_2 false, M 3, D 2, phase offset 0 "
+                      "degrees,\n#   PHASE_SHIFT 0\n"),
             std::string::npos)
       << text;
   EXPECT_NE(Clock(text, "clk_out0").find("[get_pins $primitive/CLKFX]"), std::string::npos);
