@@ -81,11 +81,12 @@ int RunCheck(std::string_view command, const std::vector<std::string>& words,
   const std::string name = LastPart(path);
   const auto checked =
       planner::device::Check(text, path, name.substr(0, name.size() - kEnding.size()));
+  const std::string shown = planner::read::ShownWhole(path);
   if (!checked.mistakes.empty()) {
-    WriteError(planner::report::MistakesText(checked, path, {false, setting.err_width}));
+    WriteError(planner::report::MistakesText(checked, shown, {false, setting.err_width}));
     return kWrong;
   }
-  WriteOut(planner::report::CheckText(checked, path,
+  WriteOut(planner::report::CheckText(checked, shown,
                                       {setting.out_has_colour, setting.out_width}));
   return kDone;
 }

@@ -21,9 +21,10 @@ std::unique_ptr<const planner::device::Files> DeviceFiles(const Setting& setting
 // The device that a request is for. Throws Failure when there is none, or it has not the primitive.
 planner::Device FindDevice(const planner::read::Reading& reading, const Setting& setting);
 
-// Why a name stands for no part, as one line.
-std::string TextOf(const planner::device::PartError& error);
-std::string TextOf(const planner::device::FileComplaint& complaint);
+// The limits of a device that contradict each other so that a primitive can do nothing, as a
+// sentence: "The reason: ..."; mostly nothing.
+std::string LimitsInTheWay(const planner::Device& device, planner::Primitive primitive,
+                           const Setting& setting);
 
 }  // namespace cli
 

@@ -11,6 +11,7 @@
 #include "cli/Words.h"
 #include "planner/read/Shown.h"
 #include "planner/report/DevicesText.h"
+#include "planner/report/PartText.h"
 
 namespace cli {
 
@@ -43,7 +44,7 @@ planner::device::Catalogue::Selection Selected(const planner::device::Files& fil
   try {
     return planner::device::Catalogue(files).Select(name);
   } catch (const planner::device::PartError& error) {
-    throw Failure::OfUsage(TextOf(error),
+    throw Failure::OfUsage(planner::report::PartText(error),
                            error.kind != planner::device::PartError::Kind::kBadFile);
   }
 }

@@ -1,6 +1,7 @@
 #include "cli/EngineCommand.h"
 
 #include "cli/Call.h"
+#include "cli/Devices.h"
 #include "cli/Failure.h"
 #include "cli/Options.h"
 #include "planner/engine/Ask.h"
@@ -62,8 +63,10 @@ int RunEngine(std::string_view command, const std::vector<std::string>& words,
     const planner::report::Style style{false, setting.err_width};
     planner::report::Calls calls;
     calls.explain = ExplainCall(call, primitive, setting);
-    throw Failure(kUnsolved, planner::report::UnsolvedText(answer, call.device, "", style, calls) +
-                                 DoubtLines(call, style));
+    const std::string cause = LimitsInTheWay(call.device, primitive, setting);
+    throw Failure(kUnsolved,
+                  planner::report::UnsolvedText(answer, call.device, cause, style, calls) +
+                      DoubtLines(call, style));
   }
   Write(call, InFormat(call, answer, setting), setting);
   return answer.within ? kDone : kOff;

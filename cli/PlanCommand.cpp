@@ -5,11 +5,13 @@
 #include <cstddef>
 
 #include "cli/Call.h"
+#include "cli/Devices.h"
 #include "cli/Failure.h"
 #include "planner/plan/Plan.h"
 #include "planner/report/Json.h"
 #include "planner/report/PlanText.h"
 #include "planner/report/Sdc.h"
+#include "planner/report/Table.h"
 
 namespace cli {
 
@@ -83,6 +85,19 @@ std::string InFormat(const Call& call, const Plan& plan, std::size_t number, std
   return planner::report::Sdc(call.request(), call.device, *plan.Pick(number));
 }
 
+// Why there is nothing at all, with what of the device's limits is to blame.
+std::string UnsolvedText(const Call& call, const Plan& plan, const Setting& setting) {
+  const Style style{false, setting.err_width};
+  std::string text = planner::report::UnsolvedText(plan, call.device, style, {});
+  for (const planner::Answer& answer : plan.refused) {
+    const std::string cause = LimitsInTheWay(call.device, answer.primitive, setting);
+    if (cause.empty()) continue;
+    text += planner::report::Prose(style, std::string(Name(answer.primitive)) + ": ", cause);
+  }
+  return text + "hint: what stands in the way: " + PastedCall("explain", call, setting) + "\n" +
+         DoubtLines(call, style);
+}
+
 }  // namespace
 
 int RunPlan(std::string_view command, const std::vector<std::string>& words,
@@ -93,11 +108,7 @@ int RunPlan(std::string_view command, const std::vector<std::string>& words,
   const auto number = static_cast<std::size_t>(
       WholeNumber(call.given, "--pick", 1, kMostPick).value_or(1));
   const Plan plan = planner::plan::Make(call.request(), call.device);
-  if (!plan.IsSolved()) {
-    const Style style{false, setting.err_width};
-    throw Failure(kUnsolved, UnsolvedText(plan, call.device, style, CallsOf(call, setting)) +
-                                 DoubtLines(call, style));
-  }
+  if (!plan.IsSolved()) throw Failure(kUnsolved, UnsolvedText(call, plan, setting));
   if (number > plan.ranked.size()) {
     throw Failure::OfUsage(fmt::format("--pick: there are {} candidates, and no number {}",
                                        plan.ranked.size(), number));

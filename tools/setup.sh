@@ -11,7 +11,7 @@ VORKEL_ROOT=$(cd -P -- "$(dirname -- "${BASH_SOURCE[0]}")/.." && pwd -P)
 
 # The folders that the package is built from. A tree that is configured with tests builds the
 # package alone by the targets of these folders.
-readonly PROGRAM_FOLDERS=(hardware host engine planner binding)
+readonly PROGRAM_FOLDERS=(hardware host engine planner cli binding)
 readonly PROGRAM_SOURCES=(CMakeLists.txt devices doc examples "${PROGRAM_FOLDERS[@]}")
 readonly TEST_SOURCES=(tests)
 

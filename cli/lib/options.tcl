@@ -152,7 +152,7 @@ proc ::vorkel::options::shown {text} {
     return $text
   }
   return [join [lmap letter [split $text ""] {
-    expr {[string is control $letter] ? [format \\u%04x [scan $letter %c]] : $letter}
+    expr {[string is control $letter] ? [format \\x%02x [scan $letter %c]] : $letter}
   }] ""]
 }
 

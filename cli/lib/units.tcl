@@ -22,8 +22,8 @@ namespace eval ::vorkel::units {
     duty {unit percent article "a duty cycle" examples "50, 50% or 33.3"
       check percentage units {% {* 1.0} percent {* 1.0}} known "%"}
     jitter {unit ps article "a jitter" examples "50, 50ps or 0.05ns"
-      check jitter units {fs {/ 1e3} ps {* 1.0} ns {* 1e3} us {* 1e6}}
-      known "fs, ps, ns and us"}
+      check jitter units {fs {/ 1e3} ps {* 1.0} ns {* 1e3} us {* 1e6} ms {* 1e9}}
+      known "fs, ps, ns, us and ms"}
     tolerance {unit ppm article "a tolerance" examples "100, 100ppm or 0.01%"
       check notNegative units {ppm {* 1.0} ppb {/ 1e3} % {* 1e4}} known "ppm, ppb and %"
       range {0 1e9} bounds "0 to 1000000000 ppm"}

@@ -150,8 +150,9 @@ Part Catalogue::Resolve(std::string_view name) const {
     try {
       part.file = Read(name.substr(0, length));
     } catch (const PartError& error) {
-      const bool is_all = length == name.size();
-      if (is_all || error.kind != PartError::Kind::kBadFile) throw;
+      // The rest may else be a package of this device, or the name that of another one.
+      const bool names_device = length == name.size() || name[length] == '-';
+      if (names_device || error.kind != PartError::Kind::kBadFile) throw;
       bad_files.push_back(error.complaints.front());
       continue;
     }

@@ -35,10 +35,11 @@ std::string DecimalComma(std::string_view text, bool is_input) {
   if (comma == std::string_view::npos) return "";
   const std::string_view whole = list.substr(0, comma);
   const std::string_view decimals = list.substr(comma + 1);
-  const auto is_bare = [](std::string_view part) {
-    return !part.empty() && part.size() <= 6 && std::all_of(part.begin(), part.end(), IsDigit);
+  const auto is_bare = [](std::string_view part, std::size_t most) {
+    return !part.empty() && part.size() <= most && std::all_of(part.begin(), part.end(), IsDigit);
   };
-  if (!is_bare(whole) || !is_bare(decimals)) return "";
+  // A number of MHz: below 1 GHz, down to 1 Hz.
+  if (!is_bare(whole, 3) || !is_bare(decimals, 6)) return "";
   const long first = std::stol(std::string(whole));
   const long second = std::stol(std::string(decimals));
   const bool is_far = is_input ? first > 4 * second || second > 4 * first

@@ -200,15 +200,18 @@ class TreeReader {
     const Place place = At(node.position, "outputs", number);
     if (!IsOf(node, {NodeType::kNumber, NodeType::kString, NodeType::kObject}, place)) return;
     if (node.type != NodeType::kObject) return ReadFrequency(node, index, place);
+    bool is_known = true;
     for (const Member& member : node.members) {
       const Place at = At(member.value.position, "outputs", number, member.name);
       if (member.name == "frequency") {
         ReadFrequency(member.value, index, at);
       } else {
+        is_known = is_known && KindOf(member.name);
         ReadOfOutput(member, index, at);
       }
     }
-    if (node.Find("frequency")) return;
+    // An entry that there is not may have been meant for it.
+    if (node.Find("frequency") || !is_known) return;
     Mistake mistake;
     mistake.kind = MistakeKind::kNoFrequency;
     mistake.place = place;

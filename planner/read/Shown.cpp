@@ -12,9 +12,6 @@ namespace planner::read {
 
 namespace {
 
-// Of a text that is wrong a message shows so many letters.
-constexpr std::size_t kMostShown = 60;
-
 // Letters that move the cursor, or change the direction of what follows.
 bool IsControl(char32_t letter) {
   return letter < 0x20 || (letter >= 0x7f && letter <= 0x9f) ||
@@ -37,8 +34,9 @@ std::string Escaped(std::string_view text, std::size_t most) {
       shown += "\\x";
       AppendHex(static_cast<unsigned char>(text[place]), 2, &shown);
     } else if (IsControl(letter.code)) {
-      shown += "\\u";
-      AppendHex(letter.code, 4, &shown);
+      const bool is_short = letter.code < 0x100;
+      shown += is_short ? "\\x" : "\\u";
+      AppendHex(letter.code, is_short ? 2 : 4, &shown);
     } else {
       shown += text.substr(place, letter.size);
     }
@@ -68,7 +66,7 @@ std::size_t Distance(std::string_view one, std::string_view other) {
 
 }  // namespace
 
-std::string Shown(std::string_view text) { return Escaped(text, kMostShown); }
+std::string Shown(std::string_view text, std::size_t most) { return Escaped(text, most); }
 std::string ShownWhole(std::string_view text) { return Escaped(text, text.size()); }
 
 std::string Enumerated(std::span<const std::string> names, std::string_view last) {

@@ -4,6 +4,7 @@
 #ifndef VORKEL_PLANNER_READ_SHOWN_H_
 #define VORKEL_PLANNER_READ_SHOWN_H_
 
+#include <cstddef>
 #include <span>
 #include <string>
 #include <string_view>
@@ -11,9 +12,12 @@
 
 namespace planner::read {
 
+// Of a text that is wrong a message shows so many letters.
+inline constexpr std::size_t kMostShown = 60;
+
 // A text on one line, and not without end: control letters and bytes that are no UTF-8 as escapes
-// (\u001b, \xff), and "..." behind the first 60 letters of a longer one.
-std::string Shown(std::string_view text);
+// (\x1b, \u202e, \xff), and "..." behind the first letters of a longer one.
+std::string Shown(std::string_view text, std::size_t most = kMostShown);
 
 // The same without an end: for what must be complete, such as a path.
 std::string ShownWhole(std::string_view text);

@@ -8,9 +8,11 @@
 #include "hardware/Kru.h"
 #include "hardware/Loop.h"
 #include "planner/device/Check.h"
+#include "planner/read/Shown.h"
 #include "planner/report/DoubtText.h"
 #include "planner/report/Limits.h"
 #include "planner/report/Numbers.h"
+#include "planner/report/PartText.h"
 #include "planner/report/Table.h"
 #include "planner/report/Words.h"
 
@@ -71,11 +73,13 @@ string DoubtLines(const Style& style, const string& whose, const std::vector<dev
   return text;
 }
 
-string ComplaintText(const device::FileComplaint& complaint) {
-  string place = complaint.file;
-  if (complaint.line) place += ":" + std::to_string(*complaint.line);
-  if (complaint.line && complaint.column) place += ":" + std::to_string(*complaint.column);
-  return (place.empty() ? "" : place + ": ") + complaint.reason;
+// A description on one line, without what a terminal would obey, and not without end.
+string Described(string about) {
+  constexpr std::size_t kMost = 1000;
+  std::replace_if(
+      about.begin(), about.end(),
+      [](char letter) { return letter == '\n' || letter == '\r' || letter == '\t'; }, ' ');
+  return read::Shown(about, kMost);
 }
 
 bool HasPrimitive(const std::vector<Row>& rows, Primitive primitive) {
@@ -262,7 +266,7 @@ string DevicesText(const std::vector<device::Listed>& devices, const Style& styl
   for (const device::Listed& listed : devices) {
     if (listed.complaint) {
       troubles +=
-          Prose(style, listed.name + " cannot be used: ", ComplaintText(*listed.complaint));
+          Prose(style, read::ShownWhole(listed.name) + " cannot be used: ", ComplaintText(*listed.complaint));
       continue;
     }
     const GradeDescription* const grade = DefaultGrade(*listed.description);
@@ -293,8 +297,8 @@ string DeviceText(const Description& description, const std::vector<string>& gra
   string text;
   for (const auto& [label, value] :
        Pairs{{"device", description.name},
-             {"about", description.about},
-             {"file", description.file},
+             {"about", Described(description.about)},
+             {"file", read::ShownWhole(description.file)},
              {"packages", Choice(description.packages, description.default_package) + ")"},
              {"grades", GradesChoice(description)}}) {
     text += Labelled(style, kLabelWidth, label, value);

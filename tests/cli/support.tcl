@@ -8,7 +8,15 @@ namespace import -force ::tcltest::test
 namespace eval ::cli {
   variable folder [file dirname [file normalize [info script]]]
   variable checkout [file dirname [file dirname $folder]]
-  variable program [file join $checkout cli vorkel.tcl]
+  # The words that start the program.
+  variable program [list [info nameofexecutable] [file join $checkout cli vorkel.tcl]]
+  if {[info exists ::env(VORKEL_NEW)] && $::env(VORKEL_NEW) eq "1"} {
+    set build [file join $checkout build]
+    if {[info exists ::env(VORKEL_PACKAGE_DIR)]} {
+      set build [file dirname [file normalize $::env(VORKEL_PACKAGE_DIR)]]
+    }
+    set program [list [file join $build vorkel]]
+  }
   # A folder of the test file's own, gone when it ends.
   variable scratch [exec mktemp -d]
   variable counter 0
@@ -18,6 +26,15 @@ namespace eval ::cli {
     CLKIN_DIVIDE_BY_2 CLKDV CLKFXDV {phase offset} PHASE_SHIFT
   } |]
 }
+
+# What a test expects of the Tcl program, and of the compiled one where that is another text.
+proc ::cli::either {old new} {
+  variable program
+  return [expr {[llength $program] == 1 ? $new : $old}]
+}
+# Tests that are of one of the two.
+::tcltest::testConstraint old [expr {[llength $::cli::program] == 2}]
+::tcltest::testConstraint new [expr {[llength $::cli::program] == 1}]
 
 # Ends a test file.
 proc ::cli::finish {} {
@@ -59,6 +76,12 @@ proc ::cli::write {name text} {
   return $path
 }
 
+# The words that start the program as a shell takes them.
+proc ::cli::quoted {} {
+  variable program
+  return [join [lmap word $program {string cat ' [string map {' '\\''} $word] '}]]
+}
+
 # The text of a file.
 proc ::cli::contents {path} {
   set channel [open $path]
@@ -73,9 +96,9 @@ proc ::cli::joined {text} {
   return [regsub -all {\n  (?=\S)} $text { }]
 }
 
-# What a terminal gets from a Tcl program, run with some words and assignments of the environment.
-proc ::cli::onTerminal {assignments program args} {
-  set line [join [lmap word [list [info nameofexecutable] $program {*}$args] {
+# What a terminal gets from a program, run with some words and assignments of the environment.
+proc ::cli::onTerminal {assignments args} {
+  set line [join [lmap word $args {
     string cat ' $word '
   }]]
   return [dict get [execute env TERM=xterm {*}$assignments script --quiet --return \
@@ -85,7 +108,7 @@ proc ::cli::onTerminal {assignments program args} {
 # Runs the command line with the given words, in this interpreter's environment.
 proc ::cli::vorkel {args} {
   variable program
-  return [execute [info nameofexecutable] $program {*}$args]
+  return [execute {*}$program {*}$args]
 }
 
 # Runs the command line, which must succeed and say nothing on standard error; its output.

@@ -109,7 +109,7 @@ TEST(JsonTree, TakesANulByteForWhatItIs) {
   Mistakes mistakes;
   EXPECT_FALSE(ReadJsonTree(std::string_view("[1\0]", 4), "f", &mistakes));
   EXPECT_THAT(TextsOf(mistakes),
-              ElementsAre("f:1:3: no valid JSON: a comma or ] must be here, not \"\\u0000\""));
+              ElementsAre("f:1:3: no valid JSON: a comma or ] must be here, not \"\\x00\""));
 }
 
 }  // namespace

@@ -14,7 +14,7 @@ TEST(PlaceText, NamesOptionsEntriesAndOutputs) {
   EXPECT_EQ(TextOf(Place{"f.tcl", 3, 0, "input", -1, ""}), "f.tcl:3: input");
   EXPECT_EQ(TextOf(Place{"f.tcl", 0, 0, "", -1, ""}), "f.tcl");
   // A name that would move the cursor.
-  EXPECT_EQ(TextOf(Place{"f\n\x1b", 1, 0, "", -1, ""}), "f\\u000a\\u001b:1");
+  EXPECT_EQ(TextOf(Place{"f\n\x1b", 1, 0, "", -1, ""}), "f\\x0a\\x1b:1");
 }
 
 TEST(MistakeText, KeepsSentencesOfScriptsOnOneLine) {

@@ -170,6 +170,7 @@ TEST(DecimalCommas, AreDoubtedWhereAListOfTwoIsOdd) {
   EXPECT_THAT(DoubtsOf("25,50", "200,50"), IsEmpty());
   EXPECT_THAT(DoubtsOf("100,400", "148,74"), IsEmpty());
   EXPECT_THAT(DoubtsOf("148MHz,5MHz", "148.5,1"), IsEmpty());
+  EXPECT_THAT(DoubtsOf("100", "5000,100"), IsEmpty());
   EXPECT_THAT(DoubtsOf("100", "148,5,20"), IsEmpty());
 }
 

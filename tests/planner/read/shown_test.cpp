@@ -11,9 +11,9 @@ namespace {
 TEST(Shown, IsOnOneLineAndNotWithoutEnd) {
   EXPECT_EQ(Shown("plain text, \xc3\xa4 \xe2\x82\xac \xf0\x9f\x95\x90"),
             "plain text, \xc3\xa4 \xe2\x82\xac \xf0\x9f\x95\x90");
-  EXPECT_EQ(Shown("1\n2\t\x1b[2J\x7f"), "1\\u000a2\\u0009\\u001b[2J\\u007f");
-  EXPECT_EQ(Shown(std::string("a\0b", 3)), "a\\u0000b");
-  EXPECT_EQ(Shown("\xc2\x9b"), "\\u009b");              // a control letter beyond ASCII
+  EXPECT_EQ(Shown("1\n2\t\x1b[2J\x7f"), "1\\x0a2\\x09\\x1b[2J\\x7f");
+  EXPECT_EQ(Shown(std::string("a\0b", 3)), "a\\x00b");
+  EXPECT_EQ(Shown("\xc2\x9b"), "\\x9b");              // a control letter beyond ASCII
   EXPECT_EQ(Shown("\xe2\x80\xae"), "\\u202e");          // what follows would run backwards
   EXPECT_EQ(Shown(std::string(60, 'x')), std::string(60, 'x'));
   EXPECT_EQ(Shown(std::string(61, 'x')), std::string(60, 'x') + "...");
@@ -21,6 +21,7 @@ TEST(Shown, IsOnOneLineAndNotWithoutEnd) {
   for (int i = 0; i < 60; ++i) letters += "\xc3\xa4";
   EXPECT_EQ(Shown(letters), letters);
   EXPECT_EQ(Shown(letters + "b"), letters + "...");
+  EXPECT_EQ(Shown("abcd", 3), "abc...");
   EXPECT_EQ(ShownWhole(std::string(100, 'x')), std::string(100, 'x'));
 }
 

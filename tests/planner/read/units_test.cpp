@@ -95,7 +95,7 @@ INSTANTIATE_TEST_SUITE_P(
         Bad{"", kF, Not("")}, Bad{"MHz", kF, Not("MHz")}, Bad{"50 25", kF, Not("50 25")},
         Bad{"1/2/3", kF, Not("1/2/3")}, Bad{"0x64", kF, Not("0x64")}, Bad{"inf", kF, Not("inf")},
         Bad{"-", kF, Not("-")}, Bad{".", kF, Not(".")}, Bad{"1;2", kF, Not("1;2")},
-        Bad{"1\n2", kF, Not("1\\u000a2")}, Bad{"1.2.3", kF, Not("1.2.3")},
+        Bad{"1\n2", kF, Not("1\\x0a2")}, Bad{"1.2.3", kF, Not("1.2.3")},
         Bad{"0ns", kF, "0ns must be greater than 0"},
         Bad{"-5MHz", kF, "-5MHz must be greater than 0"},
         Bad{"-0.0", kF, "-0.0 must be greater than 0"}, Bad{"1/0", kF, "\"1/0\" divides by 0"},
