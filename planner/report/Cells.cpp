@@ -35,22 +35,39 @@ std::vector<Row> RowsOf(const std::vector<MarkedRow>& marked, bool is_short) {
   return rows;
 }
 
+// The names of rows at rising places; three and more that follow each other are one: "2 to 5".
+std::vector<string> NamesOf(const std::vector<MarkedRow>& rows,
+                            const std::vector<std::size_t>& places) {
+  std::vector<string> names;
+  for (std::size_t i = 0; i < places.size();) {
+    std::size_t end = i + 1;
+    while (end < places.size() && places[end] == places[end - 1] + 1) ++end;
+    if (end - i >= 3) {
+      names.push_back(rows[places[i]].name + " to " + rows[places[end - 1]].name);
+      i = end;
+    } else {
+      names.push_back(rows[places[i++]].name);
+    }
+  }
+  return names;
+}
+
 // What is off, for a table without room for it: "OFF: frequency of 2 and 3; phase of 4".
 string OffLine(const Style& style, const std::vector<MarkedRow>& rows) {
-  std::vector<std::pair<std::vector<string>, std::vector<string>>> groups;
-  for (const MarkedRow& row : rows) {
-    if (row.off.empty()) continue;
+  std::vector<std::pair<std::vector<string>, std::vector<std::size_t>>> groups;
+  for (std::size_t i = 0; i < rows.size(); ++i) {
+    if (rows[i].off.empty()) continue;
     const auto group = std::find_if(groups.begin(), groups.end(),
-                                    [&](const auto& one) { return one.first == row.off; });
+                                    [&](const auto& one) { return one.first == rows[i].off; });
     if (group == groups.end()) {
-      groups.push_back({row.off, {row.name}});
+      groups.push_back({rows[i].off, {i}});
     } else {
-      group->second.push_back(row.name);
+      group->second.push_back(i);
     }
   }
   std::vector<string> parts;
-  for (const auto& [off, names] : groups) {
-    parts.push_back(Enumerated(off) + " of " + Enumerated(names));
+  for (const auto& [off, places] : groups) {
+    parts.push_back(Enumerated(off) + " of " + Enumerated(NamesOf(rows, places)));
   }
   return Prose(style, string(kOff) + ": ", Join(parts, "; "));
 }

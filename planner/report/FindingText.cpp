@@ -5,6 +5,7 @@
 #include <cstddef>
 #include <string_view>
 
+#include "planner/answer/Demands.h"
 #include "planner/report/Numbers.h"
 #include "planner/report/Words.h"
 
@@ -81,6 +82,22 @@ string MissText(const std::vector<Finding>& misses) {
   std::vector<string> parts;
   for (const Finding& miss : misses) parts.push_back(MissPart(miss));
   return Outputs({misses.front().output}) + ": the " + Join(parts, "; the ");
+}
+
+// How much a miss weighs, in units of its tolerance (answer/Demands.h).
+Rational Weight(const Finding& miss) {
+  const Rational& allowed = miss.range.highest;
+  const Rational error = miss.value.Absolute();
+  switch (miss.quantity) {
+    case Quantity::kPhase:
+      return error / answer::PhaseUnit(allowed);
+    case Quantity::kDuty:
+      return error / answer::DutyUnit(allowed);
+    case Quantity::kJitter:
+      return error / answer::JitterUnit(allowed);
+    default:
+      return error / answer::FrequencyUnit(allowed);
+  }
 }
 
 // Numbers as the engine shows them.
@@ -233,6 +250,21 @@ std::vector<string> MissTexts(const Answer& answer) {
     if (!output.misses.empty()) texts.push_back(MissText(output.misses));
   }
   return texts;
+}
+
+string WorstMissText(const Answer& answer) {
+  const Finding* worst = nullptr;
+  std::size_t outputs = 0;
+  for (const OutputAnswer& output : answer.outputs) {
+    if (!output.misses.empty()) ++outputs;
+    for (const Finding& miss : output.misses) {
+      if (worst == nullptr || Weight(miss) > Weight(*worst)) worst = &miss;
+    }
+  }
+  string text = MissText({*worst});
+  if (outputs == 2) text += ", and 1 more output is off";
+  if (outputs > 2) text += ", and " + std::to_string(outputs - 1) + " more outputs are off";
+  return text;
 }
 
 std::vector<string> RemarkTexts(const Answer& answer, const Device& device) {

@@ -24,6 +24,10 @@ std::vector<std::string> FindingTexts(const std::vector<Finding>& findings, cons
 // What of the outputs of an answer is not as asked for, a sentence for each of them.
 std::vector<std::string> MissTexts(const Answer& answer);
 
+// The miss that weighs most, in units of its tolerance, and how many other outputs miss something.
+// The answer misses something.
+std::string WorstMissText(const Answer& answer);
+
 // All that a user should know about an answer: what is not as asked for, what is outside of the
 // device's limits, and the notes.
 std::vector<std::string> RemarkTexts(const Answer& answer, const Device& device);

@@ -8,6 +8,7 @@
 #include "planner/report/Numbers.h"
 #include "planner/report/SettingsText.h"
 #include "planner/report/Table.h"
+#include "planner/report/Why.h"
 #include "planner/report/Words.h"
 
 namespace planner::report {
@@ -104,6 +105,9 @@ std::vector<const Answer*> Tradeoffs(const plan::Plan& plan) {
   if (IsByJitter(plan)) std::reverse(all.begin(), all.end());
   std::vector<const Answer*> shown;
   for (const Answer* answer : all) {
+    // What is nowhere near what was asked for is no trade for anything.
+    const bool is_best = answer == (IsByJitter(plan) ? &plan.front.back() : &plan.front.front());
+    if (!is_best && answer->worst_ppm > Rational(kFarPpm)) continue;
     const bool is_same =
         !shown.empty() &&
         ErrorText(plan.request, *answer) == ErrorText(plan.request, *shown.back()) &&

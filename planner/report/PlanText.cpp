@@ -61,7 +61,7 @@ class Texts {
  private:
   const Answer& At(std::size_t place) const { return plan_.ranked[place]; }
   MarkedRow ContestRow(const plan::Reason& reason) const;
-  string Silence() const;
+  string Silence(Primitive primitive) const;
 
   const plan::Plan& plan_;
   const Request& request_;
@@ -156,13 +156,13 @@ string Texts::JitterNote() const {
   return is_shown ? Prose(style_, "jitter: ", "peak to peak, at a bit error rate of 1e-12.") : "";
 }
 
-// Why the engine answers nothing, of each primitive for which the search has found something.
-string Texts::Silence() const {
-  std::vector<string> reasons;
+// What the engine says of a primitive for which it has nothing.
+string Texts::Silence(Primitive primitive) const {
   for (const Answer& answer : plan_.engine_refused) {
-    reasons.push_back(NameOf(answer) + ": " + RefusalText(answer, device_));
+    if (answer.primitive != primitive) continue;
+    return "; of the " + NameOf(answer) + " it says: " + RefusalText(answer, device_);
   }
-  return reasons.empty() ? "." : "; " + Join(reasons, " ");
+  return ".";
 }
 
 string Texts::Engine(std::size_t number) const {
@@ -176,7 +176,9 @@ string Texts::Engine(std::size_t number) const {
                  whose + "takes these settings" + (variant.empty() ? "" : ": " + variant) + ".");
   }
   const Answer* first = plan_.FirstOfEngine();
-  if (first == nullptr) return Prose(style_, label, whose + "has no answer to this" + Silence());
+  if (first == nullptr) {
+    return Prose(style_, label, whose + "has no answer to this" + Silence(chosen.primitive));
+  }
   const auto place = static_cast<std::size_t>(first - plan_.ranked.data());
   string text = whose + "does not take these settings; its best answer, number " +
                 std::to_string(place + 1) + " of compare, is a " + NameOf(*first) + " with " +

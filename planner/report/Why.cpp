@@ -178,14 +178,16 @@ string WhyMissed(const plan::Plan& plan, const std::vector<Best>& best) {
   string text = "nothing is as asked for; of all ";
   text += first.source.search ? "settings in the device's range" : "that the engine answers";
   if (equal.size() == 1) {
-    return text + " those of the " + NameOf(first) + " come nearest: " +
-           Join(MissTexts(first), "; ");
+    return text + " those of the " + NameOf(first) + " come nearest: " + WorstMissText(first);
   }
   return text + " those of " + Enumerated(NamesOf(equal)) + " come equally near, and the " +
          NameOf(first) + " " +
          Advantage(plan.request, first, *equal[1].answer, equal[1].decided, "has",
                    "the " + NameOf(*equal[1].answer));
 }
+
+// Whether nothing of an answer is near what was asked for.
+bool IsFar(const Answer& answer) { return answer.worst_ppm > Rational(kFarPpm); }
 
 string WhyBroken(const Answer& first, const Device& device) {
   string text = "nothing is as asked for and in the device's range: with the " + NameOf(first) +
@@ -204,7 +206,10 @@ string WhyText(const plan::Plan& plan, const Device& device) {
   const Answer& first = plan.ranked.front();
   if (!first.violations.empty()) return WhyBroken(first, device) + ".";
   const std::vector<Best> best = BestOfEach(plan);
-  if (!first.within) return WhyMissed(plan, best) + ".";
+  if (!first.within) {
+    const string far = " No setting comes near what is asked for; explain tells why.";
+    return WhyMissed(plan, best) + "." + (IsFar(first) ? far : "");
+  }
   return WhyMet(plan, best) + WhyOwn(plan) + ".";
 }
 
@@ -215,7 +220,7 @@ string LossText(const Request& request, const Device& device, const Answer& bett
       if (!answer.violations.empty()) {
         return "but " + FindingText(answer.violations.front(), device);
       }
-      return "but " + Join(MissTexts(answer), "; ");
+      return "but " + WorstMissText(answer);
     case Criterion::kWorstError:
       return "with an error of " + ErrorFigure(request, answer) + " instead of " +
              ErrorFigure(request, better);

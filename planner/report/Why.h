@@ -12,6 +12,9 @@
 
 namespace planner::report {
 
+// With a larger error of a frequency, ppm, there is nothing near what was asked for.
+inline constexpr int kFarPpm = 100000;
+
 // Why the first of a solved plan is the first: before other primitives, and before the other
 // settings of its own.
 std::string WhyText(const plan::Plan& plan, const Device& device);

@@ -82,6 +82,15 @@ TEST(Cells, WithoutRoomALineBelowSaysIt) {
             "  and range of 3\n");
 }
 
+TEST(Cells, RowsThatFollowEachOtherAreToldTogether) {
+  std::vector<MarkedRow> rows;
+  for (const char* name : {"1", "2", "3", "4", "5", "6"}) {
+    rows.push_back({name, {name}, "", "", {std::string(name) == "4" ? "range" : "phase"}});
+  }
+  EXPECT_EQ(MarkedTable({.width = 10}, {{Align::kRight, "#"}}, "off", rows).substr(49),
+            "OFF:\n  phase of\n  1 to 3,\n  5 and 6;\n  range of\n  4\n");
+}
+
 TEST(Cells, TheBestIsColouredAndTheMarksOfTheOthers) {
   EXPECT_EQ(MarkedTable({.colour = true}, {{Align::kRight, "#"}}, "off", {kRows[0], kRows[1]}),
             "\033[1m#  off\033[0m\n"

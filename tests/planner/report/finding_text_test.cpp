@@ -84,6 +84,24 @@ TEST(FindingText, TheMissesOfAnOutputAreOneSentence) {
                           "output 1: the phase is off by 7.00 degrees, with 0.5 allowed"));
 }
 
+TEST(FindingText, TheMissThatWeighsMost) {
+  const Request request = MadeRequest({100}, {160, 80, 40});
+  Answer answer = MadeLoop(request, Primitive::kTsyn, Bandwidth::kLow, 80, 1, {50, 100, 200}, 100);
+  Miss(&answer, 0, Quantity::kFrequency, 900, 100);
+  EXPECT_EQ(WorstMissText(answer),
+            "output 0: the frequency is off by 900.00 ppm, with 100 allowed");
+  // 10 degrees are 20 tolerances, 900 ppm are 9.
+  Miss(&answer, 1, Quantity::kPhase, -10, Rational(1, 2));
+  EXPECT_EQ(WorstMissText(answer),
+            "output 1: the phase is off by -10.00 degrees, with 0.5 allowed, and 1 more output is "
+            "off");
+  // A tolerance of 0 counts as 0.5 points: 11 are 22.
+  Miss(&answer, 2, Quantity::kDuty, 11, 0);
+  EXPECT_EQ(WorstMissText(answer),
+            "output 2: the duty cycle is off by 11.00 percent points, with 0 allowed, and 2 more "
+            "outputs are off");
+}
+
 TEST(FindingText, NotesOnTheEngine) {
   EXPECT_EQ(Text({.kind = FindingKind::kSearchedVco, .value = Rational(816734, 1000)}),
             "the search took the VCO as 816.734 MHz");

@@ -58,6 +58,20 @@ TEST(FrontText, WhatLooksTheSameIsNotThereTwice) {
   EXPECT_EQ(Tradeoffs(plan).size(), 3U);
 }
 
+TEST(FrontText, WhatIsNowhereNearIsNoTrade) {
+  plan::Plan plan = Made();
+  for (Answer& answer : plan.front) answer.within = false;
+  plan.front[1].worst_ppm = 100001;
+  EXPECT_EQ(Tradeoffs(plan).size(), 1U);
+  plan.front[1].worst_ppm = 100000;
+  EXPECT_EQ(Tradeoffs(plan).size(), 2U);
+  // The first is shown whatever it is.
+  plan.front[0].worst_ppm = 900000;
+  plan.front[1].worst_ppm = 900001;
+  ASSERT_EQ(Tradeoffs(plan).size(), 1U);
+  EXPECT_EQ(Tradeoffs(plan)[0], &plan.front[0]);
+}
+
 TEST(FrontText, NoTradeoffs) {
   plan::Plan plan = Made();
   plan.front.resize(1);

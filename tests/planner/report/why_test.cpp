@@ -151,6 +151,14 @@ TEST(Why, NothingIsAsAskedFor) {
             "equally near, and the PLL comes first, with all that counts the same.");
 }
 
+TEST(Why, NothingIsNear) {
+  plan::Plan plan = Missed();
+  plan.ranked[0].worst_ppm = 100001;
+  EXPECT_NE(Why(plan).find("with 100 allowed. No setting comes near what is asked for; explain tells "
+                           "why."),
+            std::string::npos);
+}
+
 TEST(Why, NothingIsInTheDevicesRange) {
   plan::Plan plan = Missed();
   Break(&plan.ranked[0], Outside(Quantity::kFrequency, 0, 0, 700, {3, 400}));
