@@ -25,10 +25,28 @@ using std::string;
 
 constexpr int kVersion = 3;
 
-class Verifier {
+// A request as it stands in a document, word for word.
+string TextOf(const Node& node) {
+  string text = Shown(node);
+  for (const read::Member& member : node.members) {
+    text += " " + member.name + ":" + TextOf(member.value);
+  }
+  for (const Node& item : node.items) text += "," + TextOf(item);
+  return text;
+}
+
+// What all settings make of a request.
+struct OfRequest {
+  string text;
+  Request request;
+  Standing standing;
+};
+
+class Work {
  public:
-  Verifier(const Node& document, const Device& device, const Sentences* sentences)
-      : document_(document), device_(device), sentences_(sentences) {}
+  Work(const Node& document, const Device& device, const Sentences* sentences,
+       std::optional<OfRequest>* kept)
+      : document_(document), device_(device), sentences_(sentences), kept_(*kept) {}
 
   Discrepancies Do() {
     if (document_.type != NodeType::kObject) {
@@ -37,8 +55,10 @@ class Verifier {
     }
     const std::optional<Request> request = ReadRequest(document_, device_, &found_);
     if (request) {
-      request_ = *request;
-      standing_ = StandingOf(request_, device_);
+      string text = TextOf(*document_.Find("request"));
+      if (!kept_ || kept_->text != text) {
+        kept_ = {std::move(text), *request, StandingOf(*request, device_)};
+      }
       DoAnswers();
       DoHead();
     }
@@ -57,7 +77,7 @@ class Verifier {
     head["version"] = kVersion;
     head["units"] = Units();
     head["tradeoffs_cut"] = ordered_json::array();
-    for (const Primitive one : standing_.cut) head["tradeoffs_cut"].push_back(Name(one));
+    for (const Primitive one : kept_->standing.cut) head["tradeoffs_cut"].push_back(Name(one));
     // The request and the answers are held on their own.
     Node rest = document_;
     std::erase_if(rest.members, [](const read::Member& member) {
@@ -79,19 +99,19 @@ class Verifier {
       if (answers == nullptr) found_.back().found.clear();
       return;
     }
-    HoldRequest(request_, document_, &found_);
+    HoldRequest(kept_->request, document_, &found_);
     std::vector<Claim> claims;
     for (std::size_t i = 0; i < answers->items.size(); ++i) {
       DoAnswer(answers->items[i], "answers[" + std::to_string(i) + "]", &claims);
     }
-    if (claims.size() == answers->items.size()) HoldSequence(standing_, claims, &found_);
+    if (claims.size() == answers->items.size()) HoldSequence(kept_->standing, claims, &found_);
   }
 
   // --- One answer -------------------------------------------------------------------------
 
   void DoAnswer(const Node& node, const string& path, std::vector<Claim>* claims) {
     Discrepancies wrong;
-    const std::optional<Claim> claim = ReadClaim(request_, device_, node, path, &wrong);
+    const std::optional<Claim> claim = ReadClaim(kept_->request, device_, node, path, &wrong);
     if (claim) {
       Differ(claim->solved ? Solved(*claim) : Unsolved(*claim), node, path, &wrong);
       if (claim->solved) HoldPlace(*claim, &wrong);
@@ -104,29 +124,29 @@ class Verifier {
   }
 
   ordered_json EntriesOfCandidate(const Candidate& candidate) const {
-    const Answer answer = Recompute(request_, device_, candidate.ranked.settings,
+    const Answer answer = Recompute(kept_->request, device_, candidate.ranked.settings,
                                     candidate.order, candidate.origin);
     ordered_json entries = Numbered(candidate.ranked.settings, candidate.order);
-    entries.update(EntriesOf(request_, device_, answer, candidate.order, sentences_));
+    entries.update(EntriesOf(kept_->request, device_, answer, candidate.order, sentences_));
     return entries;
   }
 
   ordered_json Numbered(const Settings& settings, const PlaceOrder& order) const {
-    const auto place = standing_.PlaceOf(settings, order);
+    const auto place = kept_->standing.PlaceOf(settings, order);
     ordered_json entries;
     entries["number"] = place ? ordered_json(*place + 1) : ordered_json(nullptr);
-    entries["tradeoff"] = standing_.TradeoffOf(settings, order).has_value();
+    entries["tradeoff"] = kept_->standing.TradeoffOf(settings, order).has_value();
     return entries;
   }
 
   // Where the settings of an answer come from.
   Candidate CandidateOf(const Claim& claim) const {
-    for (const auto* const all : {&standing_.candidates, &standing_.tradeoffs}) {
+    for (const auto* const all : {&kept_->standing.candidates, &kept_->standing.tradeoffs}) {
       for (const Candidate& one : *all) {
         if (one.ranked.settings == claim.settings && one.order == claim.order) return one;
       }
     }
-    for (const Candidate& one : standing_.as_requested) {
+    for (const Candidate& one : kept_->standing.as_requested) {
       if (one.ranked.settings == claim.settings && one.order == claim.order) return one;
     }
     return {{claim.settings, {}}, claim.order, {.source = {.search = true}}};
@@ -134,8 +154,9 @@ class Verifier {
 
   // Whether an answer is one of a command that asks the engine for nothing else.
   bool IsAsRequested(const Claim& claim) const {
+    if (document_.Find("answers")->items.size() != 1) return false;
     if (claim.number || !claim.is_engine || !claim.variant.empty()) return false;
-    return std::any_of(standing_.as_requested.begin(), standing_.as_requested.end(),
+    return std::any_of(kept_->standing.as_requested.begin(), kept_->standing.as_requested.end(),
                        [&](const Candidate& one) {
                          return one.ranked.settings == claim.settings &&
                                 one.order == claim.order;
@@ -144,7 +165,7 @@ class Verifier {
 
   ordered_json Solved(const Claim& claim) const {
     if (!IsAsRequested(claim)) return EntriesOfCandidate(CandidateOf(claim));
-    for (const Candidate& one : standing_.as_requested) {
+    for (const Candidate& one : kept_->standing.as_requested) {
       if (!(one.ranked.settings == claim.settings)) continue;
       ordered_json entries = EntriesOfCandidate(one);
       entries["number"] = nullptr;
@@ -156,7 +177,7 @@ class Verifier {
   ordered_json Unsolved(const Claim& claim) const {
     Answer answer;
     answer.primitive = claim.primitive;
-    const auto& all = claim.is_engine ? standing_.engine_refusals : standing_.refusals;
+    const auto& all = claim.is_engine ? kept_->standing.engine_refusals : kept_->standing.refusals;
     answer.source.engine = claim.is_engine;
     const auto refusals = all.find(claim.primitive);
     // The reason is told by who makes the document; that there is one is not so where it is solved.
@@ -172,19 +193,19 @@ class Verifier {
       entries["solved"] = true;
       return entries;
     }
-    entries.update(EntriesOf(request_, device_, answer, OwnPlaces(request_), sentences_));
+    entries.update(EntriesOf(kept_->request, device_, answer, OwnPlaces(kept_->request), sentences_));
     return entries;
   }
 
   // What says that it is a candidate, and is none.
   void HoldPlace(const Claim& claim, Discrepancies* wrong) const {
-    if (!claim.number || standing_.PlaceOf(claim.settings, claim.order)) return;
+    if (!claim.number || kept_->standing.PlaceOf(claim.settings, claim.order)) return;
     Candidate candidate = CandidateOf(claim);
-    candidate.ranked.figures = FiguresOf(Recompute(request_, device_, claim.settings, claim.order,
+    candidate.ranked.figures = FiguresOf(Recompute(kept_->request, device_, claim.settings, claim.order,
                                                    candidate.origin));
-    if (*claim.number > standing_.candidates.size()) return;
-    const Candidate& right = standing_.candidates[*claim.number - 1];
-    if (!IsBefore(request_, right.ranked, candidate.ranked)) return;
+    if (*claim.number > kept_->standing.candidates.size()) return;
+    const Candidate& right = kept_->standing.candidates[*claim.number - 1];
+    if (!IsBefore(kept_->request, right.ranked, candidate.ranked)) return;
     Discrepancy discrepancy = At(*claim.node, DiscrepancyKind::kRanksBefore, claim.path, "");
     discrepancy.settings = right.ranked.settings;
     wrong->push_back(std::move(discrepancy));
@@ -193,7 +214,7 @@ class Verifier {
   // The only entry with which an answer is not one that the request has; nothing when it is more
   // than one.
   std::optional<Discrepancy> OnlyOne(const Node& node, const string& path) const {
-    for (const auto* const all : {&standing_.candidates, &standing_.tradeoffs}) {
+    for (const auto* const all : {&kept_->standing.candidates, &kept_->standing.tradeoffs}) {
       for (const Candidate& one : *all) {
         Discrepancies wrong;
         Differ(EntriesOfCandidate(one), node, path, &wrong);
@@ -210,8 +231,7 @@ class Verifier {
   const Node& document_;
   const Device& device_;
   const Sentences* const sentences_;
-  Request request_;
-  Standing standing_;
+  std::optional<OfRequest>& kept_;
   Discrepancies found_;
 };
 
@@ -230,7 +250,20 @@ std::optional<string> PartOf(std::string_view json) {
   return part->text;
 }
 
+struct Verifier::Kept {
+  std::optional<OfRequest> last;
+};
+
+Verifier::Verifier(const Device& device, const Sentences* sentences)
+    : device_(device), sentences_(sentences), kept_(std::make_unique<Kept>()) {}
+
+Verifier::~Verifier() = default;
+
 Discrepancies Verify(std::string_view json, const Device& device, const Sentences* sentences) {
+  return Verifier(device, sentences).Verify(json);
+}
+
+Discrepancies Verifier::Verify(std::string_view json) {
   read::Mistakes mistakes;
   const std::optional<Node> document = ReadDocument(json, &mistakes);
   Discrepancies discrepancies;
@@ -244,7 +277,7 @@ Discrepancies Verify(std::string_view json, const Device& device, const Sentence
                              .mistake = mistake});
   }
   if (!document) return discrepancies;
-  return Verifier(*document, device, sentences).Do();
+  return Work(*document, device_, sentences_, &kept_->last).Do();
 }
 
 }  // namespace planner::verify

@@ -13,6 +13,7 @@
 #ifndef VORKEL_PLANNER_VERIFY_VERIFY_H_
 #define VORKEL_PLANNER_VERIFY_VERIFY_H_
 
+#include <memory>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -74,6 +75,24 @@ std::optional<std::string> PartOf(std::string_view json);
 // right. `device` is the one that PartOf names. Whatever the text is, nothing is thrown.
 std::vector<Discrepancy> Verify(std::string_view json, const Device& device,
                                 const Sentences* sentences = nullptr);
+
+// The same for many plans of one device, which must outlive it. What all settings make of a request
+// is kept for the next plan of the same request.
+class Verifier {
+ public:
+  explicit Verifier(const Device& device, const Sentences* sentences = nullptr);
+  ~Verifier();
+  Verifier(const Verifier&) = delete;
+  Verifier& operator=(const Verifier&) = delete;
+
+  std::vector<Discrepancy> Verify(std::string_view json);
+
+ private:
+  struct Kept;
+  const Device& device_;
+  const Sentences* sentences_;
+  std::unique_ptr<Kept> kept_;
+};
 
 }  // namespace planner::verify
 
