@@ -1,4 +1,4 @@
-// Tested by vorkel_devices.test.
+// Tested by devices.test.
 #include <nlohmann/json.hpp>
 
 #include "planner/device/Check.h"

@@ -1,4 +1,4 @@
-// Tested by vorkel_commands.test.
+// Tested by commands.test.
 #include "tcl/Commands.h"
 
 #include <exception>

@@ -1,4 +1,4 @@
-// Tested by vorkel_devices.test.
+// Tested by devices.test.
 #include "planner/device/Describe.h"
 #include "planner/report/DevicesText.h"
 #include "tcl/Commands.h"

@@ -1,6 +1,6 @@
 // What the interpreter sees of the library: the entry that `load` calls.
 //
-// Tested by vorkel_commands.test.
+// Tested by commands.test.
 #include <tcl.h>
 
 #include "tcl/Commands.h"

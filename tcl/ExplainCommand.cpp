@@ -1,4 +1,4 @@
-// Tested by vorkel_explain.test.
+// Tested by explain.test.
 #include "planner/explain/Explain.h"
 
 #include <optional>

@@ -1,4 +1,4 @@
-// Tested by vorkel_errors.test.
+// Tested by requests.test.
 #include "tcl/Failure.h"
 
 #include <nlohmann/json.hpp>

@@ -1,4 +1,4 @@
-// Tested by vorkel_requests.test.
+// Tested by requests.test.
 #include "tcl/Given.h"
 
 #include <algorithm>

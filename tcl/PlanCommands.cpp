@@ -1,4 +1,4 @@
-// Tested by vorkel_commands.test.
+// Tested by commands.test.
 #include "planner/plan/Plan.h"
 #include "planner/report/Json.h"
 #include "tcl/Commands.h"

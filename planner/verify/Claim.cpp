@@ -1,4 +1,4 @@
-// Tested by claim_test.cpp.
+// Tested by mutation_test.cpp.
 #include "planner/verify/Claim.h"
 
 #include <algorithm>
@@ -166,7 +166,7 @@ class ClaimReader {
 
   void ReadOutputs() {
     const Node* const outputs = read_.Entry(node_, claim_.path, "outputs", NodeType::kArray);
-    if (outputs == nullptr) return;
+    if (outputs == nullptr) return read_.Refuse(node_, claim_.path, "solved", "false");
     const std::size_t count = request_.outputs.size();
     for (std::size_t i = 0; i < count; ++i) {
       const string path = claim_.path + ".outputs[" + std::to_string(i) + "]";

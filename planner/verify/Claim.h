@@ -1,6 +1,6 @@
 // What an answer of a document claims to be, typed: its settings, and how its outputs stand.
 //
-// Tested by claim_test.cpp.
+// Tested by mutation_test.cpp.
 #ifndef VORKEL_PLANNER_VERIFY_CLAIM_H_
 #define VORKEL_PLANNER_VERIFY_CLAIM_H_
 

@@ -116,7 +116,7 @@ class Work {
       Differ(claim->solved ? Solved(*claim) : Unsolved(*claim), node, path, &wrong);
       if (claim->solved) HoldPlace(*claim, &wrong);
     }
-    if (!wrong.empty() && node.type == NodeType::kObject) {
+    if (wrong.size() > 1 && node.type == NodeType::kObject) {
       if (auto one = OnlyOne(node, path)) wrong = {*std::move(one)};
     }
     found_.insert(found_.end(), wrong.begin(), wrong.end());

@@ -1,0 +1,234 @@
+// Whole plans: one written by hand, those that the planner makes, and texts that are no plan.
+#include "planner/verify/Verify.h"
+
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+#include "verify_support.h"
+
+namespace planner::verify_test {
+
+namespace {
+
+using std::string;
+using verify::Discrepancy;
+using verify::DiscrepancyKind;
+
+// 100 MHz through kOnePll: a PFD of 100 and a VCO of 800 MHz leave D = 1 and M = 8, and 200 MHz
+// take a divider of 4. Three bandwidths are alike, and the default comes first. VCO and PFD are at
+// their limits: a margin of 0. The device has no coefficients, so there are two notes.
+string ByHand() {
+  return R"({
+  "format": "vorkel-plan",
+  "version": 3,
+  "units": {
+    "frequency": "MHz", "frequency_error": "ppm", "phase": "degrees", "duty": "percent",
+    "jitter": "ps, peak to peak at a bit error rate of 1e-12",
+    "jitter_rms": "ps, rms of the random part", "phase_error_of_primitive": "ps"
+  },
+  "request": {"device": "small-1", "inputs": [100], "outputs": [{"frequency": 200, "phase": 90}]},
+  "answers": [{
+    "number": 1, "tradeoff": true, "primitive": "PLL", "source": "both", "variant": "smallest VCO",
+    "solved": true, "within": true, "reason": "", "refusals": [],
+    "settings": {"vco": 800, "vco_exact": "800", "pfd": 100, "pfd_exact": "100",
+                 "m": 8, "m_eighths": 64, "d": 1},
+    "bandwidth": "OPTIMIZED",
+    "limits": {
+      "vco": {"lowest": 800, "lowest_exact": "800", "highest": 800, "highest_exact": "800"},
+      "pfd": {"lowest": 100, "lowest_exact": "100", "highest": 100, "highest_exact": "100"},
+      "largest_count": 64},
+    "search_vco": 800, "input_jitter": 0, "input_jitter_exact": "0", "phase_error": null,
+    "worst_ppm": 0, "worst_ppm_exact": "0", "max_jitter": null,
+    "ranking": {"class": "met", "worst_error": 0, "worst_error_exact": "0", "max_jitter": null,
+                "margin": 0, "margin_exact": "0", "vco": 800, "vco_exact": "800"},
+    "outputs": [{
+      "index": 0, "used": true, "request": 0, "pin": null,
+      "divider": 4, "divider_eighths": 32, "phase_step": 8, "high_time": 0,
+      "multiply": 2, "divide": 1, "requested": 200, "requested_exact": "200",
+      "actual": 200, "actual_exact": "200", "actual_second": null, "actual_second_exact": null,
+      "search": 200, "error_ppm": 0, "error_ppm_exact": "0",
+      "requested_phase": 90, "requested_phase_exact": "90", "phase": 90, "phase_exact": "90",
+      "phase_error": 0, "phase_error_exact": "0",
+      "requested_duty": null, "requested_duty_exact": null, "duty": 50, "duty_exact": "50",
+      "duty_error": null, "duty_error_exact": null, "jitter": null, "jitter_rms": null,
+      "range": {"lowest": 10, "lowest_exact": "10", "highest": 400, "highest_exact": "400"},
+      "within": true}],
+    "misses": [], "violations": [], "notes": ["jitter", "phase error"],
+    "findings": [
+      {"kind": "no_jitter", "primitive": "PLL", "quantity": "jitter", "output": null, "input": 0,
+       "value": 0, "value_exact": "0",
+       "range": {"lowest": 0, "lowest_exact": "0", "highest": 0, "highest_exact": "0"},
+       "pin": null, "feedback_2x": false, "outputs": [], "numbers": [], "words": "",
+       "text": "jitter"},
+      {"kind": "no_phase_error", "primitive": "PLL", "quantity": "phase", "output": null,
+       "input": 0, "value": 0, "value_exact": "0",
+       "range": {"lowest": 0, "lowest_exact": "0", "highest": 0, "highest_exact": "0"},
+       "pin": null, "feedback_2x": false, "outputs": [], "numbers": [], "words": "",
+       "text": "phase error"}]
+  }],
+  "tradeoffs_cut": []
+})";
+}
+
+string With(string text, const string& old, const string& other) {
+  const std::size_t place = text.find(old);
+  EXPECT_NE(place, string::npos) << old;
+  return text.replace(place, old.size(), other);
+}
+
+std::vector<Discrepancy> Wrong(const string& json) {
+  return verify::Verify(json, DeviceOf(kOnePll));
+}
+
+TEST(Verify, APlanByHandIsRight) {
+  EXPECT_EQ(Text(Wrong(ByHand())), Text({}));
+  EXPECT_EQ(verify::PartOf(ByHand()), "small-1");
+}
+
+TEST(Verify, AWrongNumberHasItsPathAndPlace) {
+  const auto wrong = Wrong(With(ByHand(), R"("worst_ppm": 0)", R"("worst_ppm": 1e-9)"));
+  ASSERT_EQ(wrong.size(), 1u);
+  EXPECT_EQ(wrong[0].kind, DiscrepancyKind::kDiffers);
+  EXPECT_EQ(wrong[0].path, "answers[0].worst_ppm");
+  EXPECT_EQ(wrong[0].found, "1e-9");
+  EXPECT_EQ(wrong[0].expected, "0.0");
+  EXPECT_EQ(wrong[0].line, 23);
+  EXPECT_EQ(wrong[0].column, 18);
+}
+
+TEST(Verify, ASettingThatAllElseContradictsIsNamedAlone) {
+  const auto wrong = Wrong(With(ByHand(), R"("phase_step": 8)", R"("phase_step": 7)"));
+  ASSERT_EQ(wrong.size(), 1u);
+  EXPECT_EQ(wrong[0].kind, DiscrepancyKind::kContradicts);
+  EXPECT_EQ(wrong[0].path, "answers[0].outputs[0].phase_step");
+  EXPECT_EQ(wrong[0].expected, "8");
+}
+
+TEST(Verify, SettingsThatThereAreNot) {
+  const auto wrong = Wrong(With(ByHand(), R"("d": 1})", R"("d": 81})"));
+  ASSERT_EQ(wrong.size(), 1u);
+  EXPECT_EQ(wrong[0].kind, DiscrepancyKind::kNoSetting);
+  EXPECT_EQ(wrong[0].path, "answers[0].settings.d");
+  EXPECT_EQ(wrong[0].expected, "1 to 80");
+}
+
+// The plan of the second bandwidth, right in all numbers, that says it is the first.
+TEST(Verify, WhatRanksBeforeTheFirstIsTold) {
+  string second = With(ByHand(), "OPTIMIZED", "LOW");
+  second = With(second, R"("tradeoff": true)", R"("tradeoff": false)");
+  const auto wrong = Wrong(second);
+  ASSERT_FALSE(wrong.empty());
+  bool is_told = false;
+  for (const Discrepancy& one : wrong) {
+    if (one.kind != DiscrepancyKind::kRanksBefore) continue;
+    is_told = true;
+    EXPECT_EQ(one.path, "answers[0]");
+    ASSERT_TRUE(one.settings);
+    EXPECT_EQ(std::get<LoopSettings>(*one.settings).bandwidth, Bandwidth::kOptimized);
+  }
+  EXPECT_TRUE(is_told) << Text(wrong);
+}
+
+TEST(Verify, AnotherDeviceIsNamed) {
+  const auto wrong = Wrong(With(ByHand(), "small-1", "small-2"));
+  ASSERT_EQ(wrong.size(), 1u);
+  EXPECT_EQ(wrong[0].path, "request.device");
+  EXPECT_EQ(wrong[0].expected, "\"small-1\"");
+}
+
+TEST(Verify, ANumberOfTheRequestThatNoAnswerIsFor) {
+  const auto wrong = Wrong(With(ByHand(), R"("inputs": [100])", R"("inputs": [101])"));
+  ASSERT_FALSE(wrong.empty());
+  EXPECT_EQ(wrong[0].path, "request.inputs[0]");
+  EXPECT_EQ(wrong[0].kind, DiscrepancyKind::kContradicts);
+  EXPECT_EQ(wrong[0].expected, "100");
+}
+
+TEST(Verify, TextsThatAreNoPlan) {
+  for (const char* const text : {"", "{", "[]", "null", "7", "{}", "{\"request\": 5}",
+                                 "{\"request\": {}, \"answers\": {}}", "\xff\xfe"}) {
+    EXPECT_FALSE(Wrong(text).empty()) << text;
+  }
+  const auto wrong = Wrong("{\"request\":\n  {]}");
+  ASSERT_EQ(wrong.size(), 1u);
+  EXPECT_EQ(wrong[0].kind, DiscrepancyKind::kNotJson);
+  EXPECT_TRUE(wrong[0].mistake);
+  EXPECT_EQ(wrong[0].line, 2);
+  EXPECT_EQ(wrong[0].column, 4);
+  EXPECT_FALSE(verify::PartOf("{\"request\": []}"));
+}
+
+TEST(Verify, ARequestThatCannotBeReadIsNamed) {
+  const auto wrong = Wrong(With(ByHand(), R"("frequency": 200)", R"("frequency": "2oo")"));
+  ASSERT_EQ(wrong.size(), 1u);
+  EXPECT_EQ(wrong[0].kind, DiscrepancyKind::kNoRequest);
+  EXPECT_EQ(wrong[0].path, "request.outputs[0].frequency");
+  EXPECT_EQ(wrong[0].line, 10);
+}
+
+TEST(Verify, AnswersMustBeThere) {
+  const string none = ByHand().substr(0, ByHand().find("\"answers\"")) +
+                      "\"answers\": [], \"tradeoffs_cut\": []}";
+  const auto wrong = Wrong(none);
+  ASSERT_EQ(wrong.size(), 1u);
+  EXPECT_EQ(wrong[0].path, "answers");
+}
+
+TEST(Verify, HugeNumbersAreNamed) {
+  for (const char* const number : {"1e99999", "-1e400", "123456789012345678901234567890e380"}) {
+    const auto wrong = Wrong(With(ByHand(), R"("m": 8)", string("\"m\": ") + number));
+    ASSERT_EQ(wrong.size(), 1u) << number;
+    EXPECT_EQ(wrong[0].path, "answers[0].settings.m");
+  }
+  const auto wrong =
+      Wrong(With(ByHand(), R"("m_eighths": 64)", "\"m_eighths\": " + string(5000, '9')));
+  ASSERT_EQ(wrong.size(), 1u);
+  EXPECT_EQ(wrong[0].kind, DiscrepancyKind::kAbsurd);
+  EXPECT_EQ(wrong[0].path, "answers[0].settings.m_eighths");
+}
+
+// What the planner makes of some requests, for all that its three documents have.
+TEST(Verify, PlansOfTheBundledDevicesAreRight) {
+  struct Case {
+    const char* device;
+    std::vector<read::Option> options;
+  };
+  const std::vector<Case> cases = {
+      {"vk40", {{"--in", "27"}, {"--out", "148.5,74.25,27"}, {"--primitive", "tsyn"}}},
+      {"vk40", {{"--in", "33.333,50"}, {"--out", "100,50"}, {"--duty", "40,-"}}},
+      {"vk40", {{"--in", "100"}, {"--out", "200,-,50"}, {"--max-jitter", "120"}, {"--rank", "vco"},
+                {"--prefer-max-vco", "1"}, {"--primitive", "pll"}}},
+      {"vk20", {{"--in", "25"}, {"--out", "133.33,66.7"}, {"--phase", "-30,400/3"},
+                {"--rank", "margin"}, {"--primitive", "pll"}}},
+      {"vk10", {{"--in", "50"}, {"--out", "100,20,37.5"}, {"--primitive", "kru_sp"},
+                {"--input-jitter", "30"}}},
+      {"vk40", {{"--in", "27"}, {"--out", "148.5,74.25,27"}, {"--engine", "1"}}},
+      {"vk40", {{"--in", "25"}, {"--out", "66.7,133.33"}, {"--any-order", "1"},
+                {"--primitive", "tsyn"}, {"--rank", "error"}}},
+  };
+  for (const Case& one : cases) {
+    const auto device = device::FromFile(
+        ::Device::DeviceFile::Read(string(BUNDLED_DEVICES) + '/' + one.device + ".toml",
+                                   one.device),
+        "", "1");
+    const plan::Plan plan = plan::Make(RequestOf(one.options), device);
+    ASSERT_TRUE(plan.IsSolved());
+    verify::Verifier verifier(device, &report::JsonSentences());
+    std::vector<std::vector<report::Entry>> documents = {
+        report::CompareEntries(plan), report::BestEntries(plan, 1, 5),
+        report::BestEntries(plan, plan.ranked.size(), 100)};
+    for (std::size_t number = 1; number <= plan.ranked.size(); ++number) {
+      documents.push_back(report::PlanEntries(plan, number));
+    }
+    for (const auto& entries : documents) {
+      const string json = report::Json(plan.request, device, entries, plan.front_cut);
+      EXPECT_EQ(Text(verifier.Verify(json)), Text({})) << one.device << one.options[1].value;
+    }
+  }
+}
+
+}  // namespace
+
+}  // namespace planner::verify_test
