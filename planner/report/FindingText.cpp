@@ -147,9 +147,11 @@ bool IsMissingFigure(const Finding& finding) {
 // it could count with.
 string MissingReason(const Finding& finding, const Device& device) {
   if (!finding.text.empty()) return finding.text;
-  const string has = device.part + " has no calculator coefficients";
-  if (!device.has_loop_jitter && !device.has_kru_jitter) return has;
-  return "Device " + has + (device.has_loop_jitter ? " for a KRU" : " for a PLL or TSYN");
+  const char* const has = " has no calculator coefficients";
+  if (!device.has_loop_jitter && !device.has_kru_jitter) return device.part + has;
+  // As the calculator says it, which knows no packages.
+  return "Device " + device.name + "-" + device.grade + has +
+         (device.has_loop_jitter ? " for KRU_SP and KRU_CLKGEN" : " for PLL and TSYN");
 }
 
 // What figures there are not for a reason: "no jitter of output 1 and no phase error: ...".

@@ -128,6 +128,9 @@ string Texts::RankingNotes() const {
     return std::any_of(plan_.ranked.begin(), plan_.ranked.end(), holds);
   };
   string text;
+  if (any([](const Answer& answer) { return answer.within; })) {
+    text += Prose(style_, "order: ", OrderWords(request_) + ".");
+  }
   if (any([](const Answer& answer) { return !answer.violations.empty(); })) {
     text += Prose(style_, "",
                   "Rows with something out of the device's range come after all others.");

@@ -156,9 +156,10 @@ string WhyMet(const plan::Plan& plan, const std::vector<Best>& best) {
     return "all outputs of the " + NameOf(first) + " " + NearWords(request, false);
   }
   if (met.size() == 1) {
-    const bool is_rivalled = std::any_of(best.begin(), best.end(), [](const Best& one) {
-      return !one.answer->within && HasFrequencies(*one.answer);
-    });
+    const bool is_rivalled =
+        std::any_of(plan.ranked.begin(), plan.ranked.end(), [&](const Answer& other) {
+          return other.primitive != first.primitive && HasFrequencies(other);
+        });
     return NameOf(first) + " is the only primitive " +
            (is_rivalled ? "with everything as asked for and in the device's range"
                         : "whose outputs " + NearWords(request, true));
@@ -211,6 +212,25 @@ string WhyText(const plan::Plan& plan, const Device& device) {
     return WhyMissed(plan, best) + "." + (IsFar(first) ? far : "");
   }
   return WhyMet(plan, best) + WhyOwn(plan) + ".";
+}
+
+string OrderWords(const Request& request) {
+  const string vco = request.prefer_max_vco ? "highest VCO" : "lowest VCO";
+  std::vector<string> words = {"least jitter", "smallest error", vco};
+  switch (request.rank) {
+    case Rank::kJitter:
+      break;
+    case Rank::kError:
+      words = {"smallest error", "least jitter", vco};
+      break;
+    case Rank::kMargin:
+      words.insert(words.begin(), "largest margin to the device's limits");
+      break;
+    case Rank::kVco:
+      words = {vco, "least jitter", "smallest error"};
+      break;
+  }
+  return Join(words, ", then ");
 }
 
 string LossText(const Request& request, const Device& device, const Answer& better,

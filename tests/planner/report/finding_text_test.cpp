@@ -161,8 +161,8 @@ TEST(FindingText, ADeviceWithoutCoefficients) {
   Device device = MadeDevice();
   device.has_kru_jitter = false;
   EXPECT_THAT(Missing(none, device),
-              ElementsAre("no jitter and no phase error: Device vk40b484-2 has no calculator "
-                          "coefficients for a KRU"));
+              ElementsAre("no jitter and no phase error: Device vk40-2 has no calculator "
+                          "coefficients for KRU_SP and KRU_CLKGEN"));
   device.has_loop_jitter = false;
   EXPECT_THAT(Missing(none, device),
               ElementsAre("no jitter and no phase error: vk40b484-2 has no calculator coefficients"));

@@ -137,6 +137,7 @@ TEST(CompareText, AllCandidatesWithTheirNumbers) {
             "1  TSYN       both    HIGH     1188       0.00    128.815\n"
             "2  PLL        engine  HIGH      891       0.00    144.594  phase OFF\n"
             "\n"
+            "order: least jitter, then smallest error, then lowest VCO.\n"
             "Rows that are off are ranked by their worst error, counted in tolerances of\n"
             "  what was asked for.\n"
             "source: engine is what the design flow's own search answers; search is the\n"
@@ -152,7 +153,9 @@ TEST(CompareText, RowsOutOfRangeAreTold) {
   plan::Plan plan = Made();
   Break(&plan.ranked[1], Outside(Quantity::kVco, -1, 0, 1400, {400, 1080}));
   const std::string text = CompareText(plan, MadeDevice(), {}, kCalls);
-  EXPECT_NE(text.find("range OFF\n\nRows with something out of the device's range come after all "
+  EXPECT_NE(text.find("range OFF\n\n"
+                      "order: least jitter, then smallest error, then lowest VCO.\n"
+                      "Rows with something out of the device's range come after all "
                       "others.\nsource: "),
             std::string::npos)
       << text;

@@ -111,6 +111,14 @@ TEST(Why, OthersAreAsNearButNotAsAskedFor) {
   Break(&plan.ranked[1], Outside(Quantity::kFrequency, 0, 0, 700, {3, 400}));
   EXPECT_EQ(Why(plan),
             "TSYN is the only primitive with everything as asked for and in the device's range.");
+  // It need not be the best of the other primitive.
+  Answer worse = plan.ranked[1];
+  plan.ranked[1].violations.clear();
+  Miss(&plan.ranked[1], 0, Quantity::kFrequency, 900, 100);
+  EXPECT_EQ(Why(plan), "TSYN is the only primitive whose outputs are all within 100 ppm.");
+  plan.ranked.push_back(worse);
+  EXPECT_EQ(Why(plan),
+            "TSYN is the only primitive with everything as asked for and in the device's range.");
 }
 
 TEST(Why, SettingsThatOnlyTheEngineWasAskedFor) {
@@ -169,6 +177,20 @@ TEST(Why, NothingIsInTheDevicesRange) {
   Break(&plan.ranked[0], Outside(Quantity::kVco, -1, 0, 1400, {400, 1080}));
   EXPECT_NE(Why(plan).find("of 3 to 400 MHz (1 more such note is above). What"),
             std::string::npos);
+}
+
+TEST(Why, TheOrderInWords) {
+  Request request;
+  EXPECT_EQ(OrderWords(request), "least jitter, then smallest error, then lowest VCO");
+  request.rank = Rank::kError;
+  EXPECT_EQ(OrderWords(request), "smallest error, then least jitter, then lowest VCO");
+  request.rank = Rank::kMargin;
+  EXPECT_EQ(OrderWords(request),
+            "largest margin to the device's limits, then least jitter, then smallest error, then "
+            "lowest VCO");
+  request.rank = Rank::kVco;
+  request.prefer_max_vco = true;
+  EXPECT_EQ(OrderWords(request), "highest VCO, then least jitter, then smallest error");
 }
 
 TEST(Why, WhatAnAnswerLacks) {
