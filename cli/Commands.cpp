@@ -6,6 +6,7 @@
 #include "cli/ExplainCommand.h"
 #include "cli/Help.h"
 #include "cli/PlanCommand.h"
+#include "cli/VerifyCommand.h"
 
 namespace cli {
 
@@ -48,6 +49,11 @@ constexpr Command kCommands[] = {
      "status is 2. Missing keywords and limits that contradict each other are no mistakes: they are "
      "reported with exit status 0.",
      false, RunCheck},
+    {"verify", "FILE", "work every number of a plan in JSON out again", "plan.json",
+     "FILE is what --format json of another command has written; - is standard input. Entries that "
+     "are wrong are on standard error, with line and column, and the exit status is 2. So it is when "
+     "there are settings that rank before a plan's best.",
+     false, RunVerify},
     {"help", "[COMMAND]", "show this help", "plan", "", false, RunHelp},
     {"version", "", "show the version", "", "", false, RunVersion},
 };

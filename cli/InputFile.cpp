@@ -4,6 +4,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
 
 #include "cli/Output.h"
@@ -13,16 +14,16 @@ namespace cli {
 namespace {
 
 std::string ReadAll(int descriptor, std::size_t most) {
-  std::string text(most + 1, '\0');
-  std::size_t length = 0;
-  while (length < text.size()) {
-    const ssize_t count = read(descriptor, text.data() + length, text.size() - length);
+  std::string text;
+  char buffer[65536];
+  while (text.size() <= most) {
+    const std::size_t wanted = std::min(sizeof buffer, most + 1 - text.size());
+    const ssize_t count = read(descriptor, buffer, wanted);
     if (count < 0 && errno == EINTR) continue;
     if (count < 0) throw FileError(SystemReason(errno));
     if (count == 0) break;
-    length += static_cast<std::size_t>(count);
+    text.append(buffer, static_cast<std::size_t>(count));
   }
-  text.resize(length);
   return text;
 }
 

@@ -88,6 +88,7 @@ _vorkel() {
   elif ((COMP_CWORD == 2)) && [[ $previous == "$command" ]]; then
     case $command in
       check) _vorkel_files "$word" '' .toml; return ;;
+      verify) _vorkel_files "$word" '' .json; return ;;
       devices) words=$(_vorkel_parts "$program" "$word") ;;
       help) words=$(_vorkel_listed "$program" Commands help) ;;
     esac
