@@ -11,7 +11,7 @@ VORKEL_ROOT=$(cd -P -- "$(dirname -- "${BASH_SOURCE[0]}")/.." && pwd -P)
 
 # The folders that the package is built from. A tree that is configured with tests builds the
 # package alone by the targets of these folders.
-readonly PROGRAM_FOLDERS=(hardware host engine planner cli binding)
+readonly PROGRAM_FOLDERS=(hardware host engine planner cli tcl binding)
 readonly PROGRAM_SOURCES=(CMakeLists.txt devices doc examples "${PROGRAM_FOLDERS[@]}")
 readonly TEST_SOURCES=(tests)
 
@@ -132,7 +132,7 @@ is_current() {
   local stamp
   # $(<FILE) would end the script when the file is not there any more.
   stamp=$(cat -- "$1/.built-$2" 2>/dev/null) || return 1
-  [[ -e $1/$PACKAGE_LIBRARY ]] || return 1
+  [[ -e $1/$PACKAGE_LIBRARY && -x $1/vorkel ]] || return 1
   command -v tclsh8.6 >/dev/null || return 1
   [[ $(fingerprint "$2") == "$stamp" ]]
 }

@@ -9,14 +9,11 @@ namespace eval ::cli {
   variable folder [file dirname [file normalize [info script]]]
   variable checkout [file dirname [file dirname $folder]]
   # The words that start the program.
-  variable program [list [info nameofexecutable] [file join $checkout cli vorkel.tcl]]
-  if {[info exists ::env(VORKEL_NEW)] && $::env(VORKEL_NEW) eq "1"} {
-    set build [file join $checkout build]
-    if {[info exists ::env(VORKEL_PACKAGE_DIR)]} {
-      set build [file dirname [file normalize $::env(VORKEL_PACKAGE_DIR)]]
-    }
-    set program [list [file join $build vorkel]]
+  variable build [file join $checkout build]
+  if {[info exists ::env(VORKEL_PACKAGE_DIR)]} {
+    set build [file dirname [file normalize $::env(VORKEL_PACKAGE_DIR)]]
   }
+  variable program [list [file join $build vorkel]]
   # A folder of the test file's own, gone when it ends.
   variable scratch [exec mktemp -d]
   variable counter 0
@@ -26,15 +23,6 @@ namespace eval ::cli {
     CLKIN_DIVIDE_BY_2 CLKDV CLKFXDV {phase offset} PHASE_SHIFT
   } |]
 }
-
-# What a test expects of the Tcl program, and of the compiled one where that is another text.
-proc ::cli::either {old new} {
-  variable program
-  return [expr {[llength $program] == 1 ? $new : $old}]
-}
-# Tests that are of one of the two.
-::tcltest::testConstraint old [expr {[llength $::cli::program] == 2}]
-::tcltest::testConstraint new [expr {[llength $::cli::program] == 1}]
 
 # Ends a test file.
 proc ::cli::finish {} {
