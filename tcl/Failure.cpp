@@ -5,6 +5,7 @@
 #include <utility>
 
 #include "planner/read/MistakeText.h"
+#include "planner/read/Options.h"
 #include "planner/report/Data.h"
 #include "planner/report/FindingText.h"
 #include "planner/report/PartText.h"
@@ -98,9 +99,14 @@ string NameOf(PartError::Kind kind) {
   return "bad_file";
 }
 
-// Options have one dash here.
-void NameAsOption(string* word) {
-  if (word->starts_with("--")) word->erase(0, 1);
+// Options have one dash here, alone and in sentences.
+string WithOneDash(string text) {
+  for (const planner::read::OptionFacts& facts : planner::read::RequestOptions()) {
+    for (std::size_t i = text.find(facts.name); i != string::npos; i = text.find(facts.name, i)) {
+      text.erase(i, 1);
+    }
+  }
+  return text;
 }
 
 // A list of dicts with `kind`, and what else an entry has.
@@ -117,13 +123,13 @@ string DictsOf(const std::vector<ordered_json>& entries) {
 ordered_json EntryOf(const Mistake& mistake) {
   ordered_json entry;
   entry["kind"] = NameOf(mistake.kind);
-  entry["entry"] = mistake.place.entry;
+  entry["entry"] = WithOneDash(mistake.place.entry);
   entry["index"] = mistake.place.index < 0 ? ordered_json(nullptr)
                                            : ordered_json(mistake.place.index);
   entry["key"] = mistake.place.key;
   entry["text"] = mistake.text;
   entry["known"] = mistake.known;
-  entry["message"] = TextOf(mistake);
+  entry["message"] = WithOneDash(TextOf(mistake));
   return entry;
 }
 
@@ -138,15 +144,9 @@ Failure UsageOf(const std::vector<ordered_json>& entries) {
 
 }  // namespace
 
-Failure Failure::OfMistakes(planner::read::Mistakes mistakes) {
+Failure Failure::OfMistakes(const planner::read::Mistakes& mistakes) {
   std::vector<ordered_json> entries;
-  for (Mistake& mistake : mistakes) {
-    NameAsOption(&mistake.place.entry);
-    NameAsOption(&mistake.other);
-    NameAsOption(&mistake.text);
-    for (string& name : mistake.known) NameAsOption(&name);
-    entries.push_back(EntryOf(mistake));
-  }
+  for (const Mistake& mistake : mistakes) entries.push_back(EntryOf(mistake));
   return UsageOf(entries);
 }
 

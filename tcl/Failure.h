@@ -19,7 +19,7 @@ struct Failure {
 
   // {VORKEL USAGE mistakes}: each mistake is a dict with `kind`, `entry`, `index`, `key`, `text`,
   // `known` and `message`. Options have one dash.
-  static Failure OfMistakes(planner::read::Mistakes mistakes);
+  static Failure OfMistakes(const planner::read::Mistakes& mistakes);
   // The same for one that is none of a request.
   static Failure OfUsage(const std::string& kind, const std::string& text,
                          const std::string& message);

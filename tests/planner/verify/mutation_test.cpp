@@ -154,7 +154,7 @@ TEST(Mutation, KruSpWithPhases) {
 TEST(Mutation, UnsolvedPrimitives) {
   // Two inputs are too many for a KRU, and no D is 100 MHz.
   ChangeAll(RequestOf({{"--in", "100,200"}, {"--out", "200"}}),
-            DeviceOf(string(kOnePll) + NarrowKrus()), 200, false);
+            DeviceOf(string(kOnePll) + NarrowKrus()), 150, false);
 }
 
 TEST(Mutation, AnswersThatChangePlaces) {
