@@ -41,8 +41,8 @@ string Comment(const string& sentence) {
   return text + "\n";
 }
 
-// Half of a jitter in ps, in ns.
-string Half(const Rational& jitter) { return Short(jitter / 2000, 7); }
+// Half of a jitter in ps, in ns: down to a ten-thousandth of a fs.
+string Half(const Rational& jitter) { return Short(jitter / 2000, 10); }
 
 class Constraints {
  public:
