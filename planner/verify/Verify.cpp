@@ -169,6 +169,7 @@ class Work {
       if (!(one.ranked.settings == claim.settings)) continue;
       ordered_json entries = EntriesOfCandidate(one);
       entries["number"] = nullptr;
+      entries["tradeoff"] = false;
       return entries;
     }
     return {};
