@@ -157,7 +157,7 @@ using ValuesOf = std::function<std::vector<Rational>(const Answer&)>;
 
 std::vector<Rational> WithEachInput(const Question& question, const Rational& value) {
   std::vector<Rational> values = {value};
-  if (question.request.inputs.size() > 1) {
+  if (question.request.inputs.size() > 1 && !question.relaxed.second_input) {
     values.push_back(value / question.request.inputs[0] * question.request.inputs[1]);
   }
   return values;

@@ -13,7 +13,7 @@ namespace planner::explain {
 namespace {
 
 // Only the first conflicts are told with their changes; there can be thousands.
-constexpr std::size_t kMostWithChanges = 12;
+constexpr std::size_t kMostWithChanges = 6;
 
 // The changes of the demands of a conflict with which all demands of a question go.
 std::vector<Change> ChangesIn(const Question& question, const std::vector<Demand>& conflict) {

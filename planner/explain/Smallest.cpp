@@ -1,11 +1,15 @@
 // Tested by smallest_test.cpp.
 #include "planner/explain/Smallest.h"
 
+#include <algorithm>
 #include <utility>
 
 namespace planner::explain {
 
 namespace {
+
+// Each turn halves the interval at least.
+constexpr int kMostTurns = 100;
 
 // Below a value by less than can be told.
 Rational JustBelow(const Rational& value) {
@@ -24,22 +28,26 @@ Rational Between(const Rational& low, const Rational& high) {
 std::optional<Allowance> FindSmallest(
     const std::function<std::optional<Settings>(const Rational&)>& find,
     const std::function<Rational(const Settings&)>& needs, const Rational& most) {
-  std::optional<Settings> found = find(most);
-  if (!found) return std::nullopt;
-  Allowance smallest{needs(*found), std::move(*found)};
+  // What settings take is never more than what they were allowed.
+  const auto ask = [&](const Rational& allowed) -> std::optional<Allowance> {
+    std::optional<Settings> found = find(allowed);
+    if (!found) return std::nullopt;
+    return Allowance{std::min(needs(*found), allowed), std::move(*found)};
+  };
+  std::optional<Allowance> smallest = ask(most);
   Rational low = 0;
-  while (smallest.value > low) {
-    const Rational below = JustBelow(smallest.value);
+  for (int turn = 0; smallest && smallest->value > low && turn < kMostTurns; ++turn) {
+    const Rational below = JustBelow(smallest->value);
     if (below <= low) break;
-    found = find(below);
+    std::optional<Allowance> found = ask(below);
     if (!found) break;
-    smallest = {needs(*found), std::move(*found)};
-    if (smallest.value <= low) break;
+    smallest = std::move(found);
+    if (smallest->value <= low) break;
     // Nearer steps would take too many turns.
-    const Rational middle = Between(low, smallest.value);
-    found = find(middle);
+    const Rational middle = Between(low, smallest->value);
+    found = ask(middle);
     if (found) {
-      smallest = {needs(*found), std::move(*found)};
+      smallest = std::move(found);
     } else {
       low = middle;
     }
