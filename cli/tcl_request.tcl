@@ -11,11 +11,11 @@
 #                  "outputs": [{"frequency": "148.5MHz"},
 #                              {"frequency": "74.25MHz", "phase": "90deg", "duty": "50%"}],
 #                  "input_jitter": "50ps", "bandwidth": "LOW", "primitive": "TSYN",
-#                  "tolerance": "20ppm", "exact": true, "feedback": true, "prefer_max_vco": true,
-#                  "int_div0": true},
+#                  "tolerance": "20ppm", "rank": "error", "exact": true, "feedback": true,
+#                  "prefer_max_vco": true, "int_div0": true},
 #      "lines": {"device": 1, "inputs": [2], "outputs": [3, 4], "input_jitter": 2, "bandwidth": 5,
-#                "primitive": 6, "tolerance": 7, "exact": 8, "feedback": 9, "prefer_max_vco": 10,
-#                "int_div0": 11}}
+#                "primitive": 6, "tolerance": 7, "rank": 8, "exact": 9, "feedback": 10,
+#                "prefer_max_vco": 11, "int_div0": 12}}
 #
 # `request` has what the request says and nothing else, all values as the texts that it says:
 # whether they mean something is for the caller to tell, who has in `lines` the line of each. The
@@ -45,9 +45,11 @@ namespace eval ::tcl_request {
   variable longest 1000
   variable most_clocks 1000
   # The commands that are one text and those that are switches, with the options of the others.
-  variable texts {tolerance device primitive bandwidth}
-  variable switches {exact feedback prefer_max_vco int_div0}
-  variable options {input jitter output {phase duty}}
+  variable texts {tolerance device primitive bandwidth rank phase_tolerance duty_tolerance
+    max_jitter}
+  variable switches {exact feedback prefer_max_vco int_div0 engine any_order}
+  variable options {input jitter
+    output {phase duty tolerance phase_tolerance duty_tolerance max_jitter}}
   # Commands of a safe interpreter that wait, reach other interpreters, or need a channel, of which
   # there is none.
   variable withheld {after vwait update interp
