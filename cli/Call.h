@@ -1,4 +1,6 @@
 // A call of a command that takes a request: options, request file and device, read and checked.
+//
+// Tested by wrong.test and request_file.test.
 #ifndef VORKEL_CLI_CALL_H_
 #define VORKEL_CLI_CALL_H_
 

@@ -1,5 +1,7 @@
 // Which options each command takes, and what its help says of them. What stands here is what the
 // commands accept, what their help lists and what bash completes.
+//
+// Tested by program.test and completion.test.
 #ifndef VORKEL_CLI_OPTIONS_H_
 #define VORKEL_CLI_OPTIONS_H_
 

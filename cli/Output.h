@@ -1,4 +1,6 @@
 // Where the text of a command goes: standard output, or a file that is written whole or not at all.
+//
+// Tested by output.test and wrong.test.
 #ifndef VORKEL_CLI_OUTPUT_H_
 #define VORKEL_CLI_OUTPUT_H_
 

@@ -1,4 +1,6 @@
 // Requests in Tcl: a program of its own reads them, within bounds (tcl_request.tcl).
+//
+// Tested by request_file.test; that program by tcl_request.test.
 #ifndef VORKEL_CLI_TCLREQUEST_H_
 #define VORKEL_CLI_TCLREQUEST_H_
 

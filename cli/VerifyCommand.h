@@ -1,4 +1,6 @@
 // The command verify: whether every number of a plan in JSON is right.
+//
+// Tested by verify.test.
 #ifndef VORKEL_CLI_VERIFYCOMMAND_H_
 #define VORKEL_CLI_VERIFYCOMMAND_H_
 

@@ -7,6 +7,8 @@
 //
 // A value with a unit can come as several words, as a shell makes them of `27 MHz` and of
 // `148.5, 74.25, 27`.
+//
+// Tested by words.test and wrong.test.
 #ifndef VORKEL_CLI_WORDS_H_
 #define VORKEL_CLI_WORDS_H_
 
