@@ -17,7 +17,6 @@ using std::string;
 constexpr const char* kNone = "-";
 constexpr const char* kOff = "OFF";
 
-
 string OffCell(const MarkedRow& row, bool is_short) {
   if (row.off.empty()) return row.otherwise;
   if (is_short) return row.before + kOff;

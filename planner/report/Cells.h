@@ -14,8 +14,8 @@ namespace planner::report {
 
 // "-" stands for what there is not, or is not known.
 std::string BandwidthCell(const Answer& answer);
-std::string VcoCell(const Answer& answer);              // MHz
-std::string PpmCell(const Answer& answer);              // the largest error of a frequency
+std::string VcoCell(const Answer& answer);  // MHz
+std::string PpmCell(const Answer& answer);  // the largest error of a frequency
 std::string JitterCell(const std::optional<double>& jitter);
 // Who answers with these settings: "engine", "search" or "both".
 std::string SourceCell(const Answer& answer);

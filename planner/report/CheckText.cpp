@@ -7,6 +7,7 @@
 
 #include "planner/read/Shown.h"
 #include "planner/report/DoubtText.h"
+#include "planner/report/Limits.h"
 #include "planner/report/Table.h"
 #include "planner/report/Words.h"
 
@@ -61,9 +62,9 @@ string Warnings(const Checked& checked, const string& path, const Style& style) 
   }
   for (const GradeDescription& grade : checked.description.grades) {
     if (!grade.primitives.empty() || !checked.mistakes.empty()) continue;
-    text += Prose(style, path + ": warning: ",
-                  "grade " + grade.name +
-                      " has all limits of no primitive: nothing can be planned for it");
+    text += Prose(
+        style, path + ": warning: ",
+        "grade " + grade.name + " has all limits of no primitive: nothing can be planned for it");
   }
   return text;
 }
@@ -78,15 +79,9 @@ string Verdict(const GradeDescription& grade, const device::Coverage& coverage,
     if (Has(doubt.lost, coverage.primitive)) return "NO, there is no " + NothingWords(doubt);
     is_touched = is_touched || Has(doubt.touched, coverage.primitive);
   }
-  const bool has_jitter =
-      IsLoop(coverage.primitive) ? grade.has_loop_jitter : grade.has_kru_jitter;
+  const bool has_jitter = IsLoop(coverage.primitive) ? grade.has_loop_jitter : grade.has_kru_jitter;
   return string("yes, ") + (has_jitter ? "with jitter" : "without jitter") +
          (is_touched ? "; see below" : "");
-}
-
-const char* UnitName(device::Unit unit) {
-  if (unit == device::Unit::kMegahertz) return "MHz";
-  return unit == device::Unit::kNanoseconds ? "ns" : "count";
 }
 
 // The keywords that keep primitives away of which others are there.
@@ -96,15 +91,14 @@ string MissingTable(const GradeDescription& grade, const Style& style) {
     if (missing.costs.empty()) continue;
     std::vector<string> names;
     for (const Primitive primitive : missing.costs) names.emplace_back(Name(primitive));
-    rows.push_back({{string(missing.keyword.name), UnitName(missing.keyword.unit),
-                     Join(names, ", ")}});
+    rows.push_back(
+        {{string(missing.keyword.name), UnitName(missing.keyword.unit), Join(names, ", ")}});
   }
   if (rows.empty()) return "";
-  return "\n" + FittedTable(style,
-                            {{Align::kLeft, "missing"},
-                             {Align::kLeft, "unit"},
-                             {Align::kLeft, "costs"}},
-                            rows);
+  return "\n" +
+         FittedTable(style,
+                     {{Align::kLeft, "missing"}, {Align::kLeft, "unit"}, {Align::kLeft, "costs"}},
+                     rows);
 }
 
 // The primitives of a grade, and the keywords that it lacks.
@@ -139,14 +133,13 @@ string MistakesText(const Checked& checked, const string& path, const Style& sty
     if (mistake.places.empty()) whole += path + ": " + reason + "\n";
     const bool is_merged = mistake.places.size() > kMostPlaces;
     for (const Mistake::Place& place : mistake.places) {
-      lines.push_back({place, PlaceText(path, place) + reason +
-                                  (is_merged ? MorePlaces(mistake) : "") + "\n"});
+      lines.push_back(
+          {place, PlaceText(path, place) + reason + (is_merged ? MorePlaces(mistake) : "") + "\n"});
       if (is_merged) break;
     }
   }
-  std::stable_sort(lines.begin(), lines.end(), [](const PlacedLine& a, const PlacedLine& b) {
-    return a.place < b.place;
-  });
+  std::stable_sort(lines.begin(), lines.end(),
+                   [](const PlacedLine& a, const PlacedLine& b) { return a.place < b.place; });
   for (const PlacedLine& line : lines) whole += line.text;
   if (checked.untold > 0) {
     whole += path + ": " + std::to_string(checked.untold) + " more " +

@@ -284,9 +284,9 @@ std::vector<Finding> FindingsOf(const Answer& answer) {
 void AddSolved(ordered_json* data, const Request& request, const Device& device,
                const Answer& answer) {
   const auto* loop = std::get_if<LoopSettings>(&answer.settings);
-  (*data)["settings"] =
-      loop != nullptr ? LoopData(request, answer, *loop)
-                      : KruData(request, answer, std::get<KruSettings>(answer.settings));
+  (*data)["settings"] = loop != nullptr
+                            ? LoopData(request, answer, *loop)
+                            : KruData(request, answer, std::get<KruSettings>(answer.settings));
   (*data)["bandwidth"] =
       loop != nullptr ? ordered_json(Name(loop->bandwidth)) : ordered_json(nullptr);
   (*data)["limits"] = LimitsData(device, answer.settings);

@@ -40,13 +40,11 @@ ordered_json PrimitiveData(const GradeDescription& grade, Primitive primitive) {
   return data;
 }
 
-const char* UnitName(std::string_view keyword) {
-  for (const device::Keyword& one : device::Keywords()) {
-    if (one.name != keyword) continue;
-    if (one.unit == device::Unit::kMegahertz) return "MHz";
-    if (one.unit == device::Unit::kNanoseconds) return "ns";
-  }
-  return "count";
+const char* UnitOf(std::string_view keyword) {
+  const std::vector<device::Keyword>& all = device::Keywords();
+  const auto found = std::find_if(all.begin(), all.end(),
+                                  [&](const device::Keyword& one) { return one.name == keyword; });
+  return UnitName(found->unit);
 }
 
 ordered_json GradeData(const GradeDescription& grade) {
@@ -60,7 +58,7 @@ ordered_json GradeData(const GradeDescription& grade) {
   for (const device::Limit& limit : grade.limits) {
     ordered_json entry;
     entry["keyword"] = limit.keyword;
-    entry["unit"] = UnitName(limit.keyword);
+    entry["unit"] = UnitOf(limit.keyword);
     AddExact(&entry, "value", limit.value);
     data["limits"].push_back(std::move(entry));
   }

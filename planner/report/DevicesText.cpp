@@ -57,15 +57,16 @@ void AddRows(const Description& description, const GradeDescription& grade,
   string grade_name = grade.name;
   for (const Primitive primitive : grade.primitives) {
     const PrimitiveRanges ranges = RangesOf(grade, primitive);
-    rows->push_back({{name, grade_name, string(Name(primitive)), Span(ranges.vco),
-                      Span(ranges.pfd), Span(ranges.output),
+    rows->push_back({{name, grade_name, string(Name(primitive)), Span(ranges.vco), Span(ranges.pfd),
+                      Span(ranges.output),
                       ranges.output_1 ? "to " + General(ranges.output_1->highest, 6) : ""}});
     name.clear();
     grade_name.clear();
   }
 }
 
-string DoubtLines(const Style& style, const string& whose, const std::vector<device::Doubt>& doubts) {
+string DoubtLines(const Style& style, const string& whose,
+                  const std::vector<device::Doubt>& doubts) {
   string text;
   for (const device::Doubt& doubt : doubts) {
     text += Prose(style, "warning: ", whose + GradesWords(doubt) + ": " + DoubtText(doubt));
@@ -98,10 +99,9 @@ string ListNotes(const std::vector<Row>& rows, const Style& style) {
                                  std::to_string(hardware::kPllLowBandwidthPfd) + " MHz.");
   }
   if (HasPrimitive(rows, Primitive::kKruClkgen)) {
-    text += Paragraph(style, "The engine looks for a KRU_CLKGEN from " +
-                                 string(kClkgenRanges[1].lowest) + " to " +
-                                 string(kClkgenRanges[0].highest) +
-                                 " MHz only, whatever the device.");
+    text += Paragraph(
+        style, "The engine looks for a KRU_CLKGEN from " + string(kClkgenRanges[1].lowest) +
+                   " to " + string(kClkgenRanges[0].highest) + " MHz only, whatever the device.");
   }
   return text;
 }
@@ -116,7 +116,8 @@ string GradesChoice(const Description& description) {
   for (const GradeDescription& grade : description.grades) names.push_back(grade.name);
   string text = Choice(names, description.default_grade);
   if (const std::optional<string> fastest = FastestGrade(description)) {
-    text += fastest == description.default_grade ? ", the fastest" : "; " + *fastest + " is the fastest";
+    text += fastest == description.default_grade ? ", the fastest"
+                                                 : "; " + *fastest + " is the fastest";
   }
   return text + ")";
 }
@@ -125,9 +126,8 @@ string GradesChoice(const Description& description) {
 string SettingsNote(Primitive primitive) {
   const auto number = [](int value) { return std::to_string(value); };
   const string largest_d = number(hardware::kLargestD);
-  const string dividers =
-      "D 1 to " + largest_d + " and each output divider 1 to " +
-      number(hardware::kLargestDivider) + ", at most twice O_MAX_HT_LT";
+  const string dividers = "D 1 to " + largest_d + " and each output divider 1 to " +
+                          number(hardware::kLargestDivider) + ", at most twice O_MAX_HT_LT";
   const string kru_most = number(hardware::LargestKruRatioPart(primitive));
   const string kru = "M of CLKFX is " + number(hardware::kSmallestKruM) + " to " + kru_most +
                      ", D 1 to " + kru_most + ". ";
@@ -180,18 +180,6 @@ string ClkgenNote() {
          Join(ranges, " and from ") +
          ". clkgen, plan and compare mark an answer that is then outside the limits above, with "
          "exit status 3.";
-}
-
-const char* UnitName(device::Unit unit) {
-  switch (unit) {
-    case device::Unit::kMegahertz:
-      return "MHz";
-    case device::Unit::kNanoseconds:
-      return "ns";
-    case device::Unit::kCount:
-      break;
-  }
-  return "count";
 }
 
 // The limits of a primitive in some grades; "-" where one has none.
@@ -265,8 +253,8 @@ string DevicesText(const std::vector<device::Listed>& devices, const Style& styl
   string troubles;
   for (const device::Listed& listed : devices) {
     if (listed.complaint) {
-      troubles +=
-          Prose(style, read::ShownWhole(listed.name) + " cannot be used: ", ComplaintText(*listed.complaint));
+      troubles += Prose(style, read::ShownWhole(listed.name) + " cannot be used: ",
+                        ComplaintText(*listed.complaint));
       continue;
     }
     const GradeDescription* const grade = DefaultGrade(*listed.description);

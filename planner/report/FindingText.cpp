@@ -27,8 +27,7 @@ string Subject(const Finding& finding) {
 string OutsideText(const Finding& finding) {
   const Range& range = finding.range;
   const Rational& broken = finding.value < range.lowest ? range.lowest : range.highest;
-  string text = Subject(finding) + " is at " +
-                Distinct(finding.value, broken, kFrequencyDecimals) +
+  string text = Subject(finding) + " is at " + Distinct(finding.value, broken, kFrequencyDecimals) +
                 " MHz, outside the device's range";
   if (!finding.pin.empty()) text += " for " + finding.pin;
   if (finding.feedback_2x) text += " with feedback from CLK2X";
@@ -135,8 +134,7 @@ string TooManyText(const Finding& finding, bool are_inputs) {
   const string most = Short(finding.range.highest, 0);
   const string what = are_inputs ? most + (most == "1" ? " input clock" : " input clocks")
                                  : "at most " + most + " outputs";
-  return "A " + string(Name(primitive)) + " has " + what + ", not " + Short(finding.value, 0) +
-         ".";
+  return "A " + string(Name(primitive)) + " has " + what + ", not " + Short(finding.value, 0) + ".";
 }
 
 bool IsMissingFigure(const Finding& finding) {
@@ -183,7 +181,8 @@ string FindingText(const Finding& finding, const Device& device, const Answer* a
     case FindingKind::kSearchedFrequencies:
       return SearchedText(finding);
     case FindingKind::kNothingMoves:
-      return "with a fractional " + FractionWords(answer) + " all phases are 0 and all duty cycles 50 %; --int-div0 avoids it";
+      return "with a fractional " + FractionWords(answer) +
+             " all phases are 0 and all duty cycles 50 %; --int-div0 avoids it";
     case FindingKind::kPreferMaxVcoUnused:
       return "--prefer-max-vco counts only with --phase or --duty";
     case FindingKind::kWholeDividerUnused:

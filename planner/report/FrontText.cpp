@@ -72,8 +72,10 @@ Row RowOf(const Request& request, const Answer& answer) {
 // The table; the best of the plan is marked, where there is room.
 string TradeoffTable(const plan::Plan& plan, const std::vector<const Answer*>& answers,
                      const Style& style) {
-  std::vector<Column> columns = {{Align::kLeft, "primitive"}, {Align::kLeft, "loop"},
-                                 {Align::kRight, "M"},        {Align::kRight, "D"},
+  std::vector<Column> columns = {{Align::kLeft, "primitive"},
+                                 {Align::kLeft, "loop"},
+                                 {Align::kRight, "M"},
+                                 {Align::kRight, "D"},
                                  {Align::kRight, "worst ppm"}};
   if (HasOtherErrors(plan.request)) columns.push_back({Align::kRight, "of tolerance"});
   columns.push_back({Align::kRight, "jitter ps"});
@@ -128,13 +130,13 @@ string FrontText(const plan::Plan& plan, std::size_t most, const Style& style) {
   }
   const std::size_t all = shown.size();
   shown.resize(std::min(most, all));
-  string text = string("trade-offs, ") +
-                (is_by_jitter ? "a smaller error for more jitter:\n"
-                              : "less jitter for a larger error:\n") +
-                TradeoffTable(plan, shown, style);
+  string text =
+      string("trade-offs, ") +
+      (is_by_jitter ? "a smaller error for more jitter:\n" : "less jitter for a larger error:\n") +
+      TradeoffTable(plan, shown, style);
   if (shown.size() < all) {
-    text += "and " + std::to_string(all - shown.size()) + " more; --front " +
-            std::to_string(all) + " shows all\n";
+    text += "and " + std::to_string(all - shown.size()) + " more; --front " + std::to_string(all) +
+            " shows all\n";
   }
   return text;
 }

@@ -37,8 +37,7 @@ ordered_json EntryData(const Request& request, const Device& device, const Entry
 }
 
 ordered_json Document(const Request& request, const Device& device,
-                      const std::vector<Entry>& entries,
-                      const std::vector<Primitive>& front_cut) {
+                      const std::vector<Entry>& entries, const std::vector<Primitive>& front_cut) {
   ordered_json data;
   data["format"] = "vorkel-plan";
   data["version"] = kPlanVersion;
@@ -53,8 +52,7 @@ ordered_json Document(const Request& request, const Device& device,
 
 // Whether two answers are the same settings, with the outputs at the same places.
 bool AreSame(const Request& request, const Answer& a, const Answer& b) {
-  return answer::SameSettings(a, b) &&
-         answer::OrderOf(request, a) == answer::OrderOf(request, b);
+  return answer::SameSettings(a, b) && answer::OrderOf(request, a) == answer::OrderOf(request, b);
 }
 
 // The number in the ranking of an answer with such settings; 0 when there is none.
@@ -66,9 +64,8 @@ std::size_t NumberOf(const plan::Plan& plan, const Answer& answer) {
 }
 
 bool IsTradeoff(const plan::Plan& plan, const Answer& answer) {
-  return std::any_of(plan.front.begin(), plan.front.end(), [&](const Answer& one) {
-    return AreSame(plan.request, one, answer);
-  });
+  return std::any_of(plan.front.begin(), plan.front.end(),
+                     [&](const Answer& one) { return AreSame(plan.request, one, answer); });
 }
 
 Entry EntryOf(const plan::Plan& plan, std::size_t number) {

@@ -55,6 +55,18 @@ PrimitiveRanges KruRanges(const device::GradeDescription& grade, Primitive primi
 
 }  // namespace
 
+const char* UnitName(device::Unit unit) {
+  switch (unit) {
+    case device::Unit::kMegahertz:
+      return "MHz";
+    case device::Unit::kNanoseconds:
+      return "ns";
+    case device::Unit::kCount:
+      break;
+  }
+  return "count";
+}
+
 PrimitiveRanges RangesOf(const device::GradeDescription& grade, Primitive primitive) {
   switch (primitive) {
     case Primitive::kPll:

@@ -48,13 +48,14 @@ std::string General(const Rational& value, int digits) {
   if (value == Rational(0)) return "0";
   const Rational size = value.Absolute();
   int exponent = LeadingDigit(size);
-  const auto rounded = [&] { return (size * PowerOfTen(digits - 1 - exponent) + Rational(1, 2)).Floor(); };
+  const auto rounded = [&] {
+    return (size * PowerOfTen(digits - 1 - exponent) + Rational(1, 2)).Floor();
+  };
   // Rounding can make one digit more.
   if (rounded() >= PowerOfTen(digits)) ++exponent;
   const std::string sign = value < Rational(0) ? "-" : "";
   if (exponent >= -4 && exponent < digits) return sign + Short(size, digits - 1 - exponent);
-  const std::string mantissa =
-      Short(rounded() * PowerOfTen(-(digits - 1)), digits - 1);
+  const std::string mantissa = Short(rounded() * PowerOfTen(-(digits - 1)), digits - 1);
   std::string power = std::to_string(exponent < 0 ? -exponent : exponent);
   if (power.size() < 2) power.insert(0, "0");
   return sign + mantissa + (exponent < 0 ? "e-" : "e+") + power;

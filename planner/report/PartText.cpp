@@ -49,11 +49,11 @@ string PartText(const PartError& error) {
     case PartError::Kind::kUnknownDevice:
       break;
   }
-  string text = "unknown device \"" + Shown(error.name) + "\"; the devices are " +
-                Listed(error.candidates);
+  string text =
+      "unknown device \"" + Shown(error.name) + "\"; the devices are " + Listed(error.candidates);
   for (const device::FileComplaint& complaint : error.complaints) {
-    text += "; it could be a part of " + ShownWhole(complaint.device) + ", whose file is bad: " +
-            ComplaintText(complaint);
+    text += "; it could be a part of " + ShownWhole(complaint.device) +
+            ", whose file is bad: " + ComplaintText(complaint);
   }
   return text;
 }

@@ -3,6 +3,7 @@
 
 #include <algorithm>
 #include <set>
+#include <utility>
 #include <vector>
 
 #include "planner/report/Cells.h"
@@ -88,8 +89,8 @@ string Texts::Contest() const {
   std::vector<MarkedRow> rows = {ContestRow({0, 0, Criterion::kNone})};
   for (const plan::Reason& reason : plan_.among_primitives) rows.push_back(ContestRow(reason));
   for (const Answer& answer : plan_.refused) {
-    rows.push_back({NameOf(answer), {NameOf(answer), "-", "-", "-", "-"}, "", "no configuration",
-                    {}});
+    rows.push_back(
+        {NameOf(answer), {NameOf(answer), "-", "-", "-", "-"}, "", "no configuration", {}});
   }
   return MarkedTable(style_,
                      {{Align::kLeft, "primitive"},
@@ -101,6 +102,7 @@ string Texts::Contest() const {
 }
 
 string Texts::Ranking() const {
+  const bool has_margin = request_.rank == Rank::kMargin;
   std::vector<MarkedRow> rows;
   for (std::size_t i = 0; i < plan_.ranked.size(); ++i) {
     const Answer& answer = At(i);
@@ -111,16 +113,14 @@ string Texts::Ranking() const {
                     "",
                     "",
                     OffWords(answer)});
+    if (has_margin) rows.back().cells.push_back(Fixed(answer.margin * 100, 2));
   }
-  return MarkedTable(style_,
-                     {{Align::kRight, "#"},
-                      {Align::kLeft, "primitive"},
-                      {Align::kLeft, "source"},
-                      {Align::kLeft, "loop"},
-                      {Align::kRight, "VCO MHz"},
-                      {Align::kRight, "worst ppm"},
-                      {Align::kRight, "jitter ps"}},
-                     "off", rows);
+  std::vector<Column> columns = {{Align::kRight, "#"},        {Align::kLeft, "primitive"},
+                                 {Align::kLeft, "source"},    {Align::kLeft, "loop"},
+                                 {Align::kRight, "VCO MHz"},  {Align::kRight, "worst ppm"},
+                                 {Align::kRight, "jitter ps"}};
+  if (has_margin) columns.push_back({Align::kRight, "margin %"});
+  return MarkedTable(style_, std::move(columns), "off", rows);
 }
 
 string Texts::RankingNotes() const {
@@ -132,8 +132,8 @@ string Texts::RankingNotes() const {
     text += Prose(style_, "order: ", OrderWords(request_) + ".");
   }
   if (any([](const Answer& answer) { return !answer.violations.empty(); })) {
-    text += Prose(style_, "",
-                  "Rows with something out of the device's range come after all others.");
+    text +=
+        Prose(style_, "", "Rows with something out of the device's range come after all others.");
   }
   if (any([](const Answer& answer) { return !answer.within && answer.violations.empty(); })) {
     text += Prose(style_, "",
@@ -187,8 +187,8 @@ string Texts::Engine(std::size_t number) const {
                 std::to_string(place + 1) + " of compare, is a " + NameOf(*first) + " with " +
                 SettingsWords(first->settings);
   if (place >= number) {
-    text += ", " + LossText(request_, device_, chosen, *first,
-                            answer::Decided(request_, chosen, *first));
+    text += ", " +
+            LossText(request_, device_, chosen, *first, answer::Decided(request_, chosen, *first));
   }
   return Prose(style_, label, text + ".");
 }
@@ -197,11 +197,11 @@ string Texts::Why(std::size_t number) const {
   if (number == 1) return Prose(style_, "why: ", WhyText(plan_, device_));
   const Answer& chosen = At(number - 1);
   const Answer& first = At(0);
-  const string text = "this is number " + std::to_string(number) + " of " +
-                      std::to_string(plan_.ranked.size()) + "; the best is a " + NameOf(first) +
-                      " with " + SettingsWords(first.settings) + ", and this is behind it, " +
-                      LossText(request_, device_, first, chosen,
-                               answer::Decided(request_, first, chosen));
+  const string text =
+      "this is number " + std::to_string(number) + " of " + std::to_string(plan_.ranked.size()) +
+      "; the best is a " + NameOf(first) + " with " + SettingsWords(first.settings) +
+      ", and this is behind it, " +
+      LossText(request_, device_, first, chosen, answer::Decided(request_, first, chosen));
   return Prose(style_, "why: ", text + ".");
 }
 

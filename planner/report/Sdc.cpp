@@ -76,9 +76,8 @@ class Constraints {
 string Constraints::SettingsWords() const {
   std::vector<string> words;
   if (const auto* loop = std::get_if<LoopSettings>(&answer_.settings)) {
-    words = {"VCO " + Figure(answer_.vco), "PFD " + Figure(answer_.pfd),
-             "M " + Eighths(loop->m), "D " + std::to_string(loop->d),
-             "bandwidth " + string(Name(loop->bandwidth))};
+    words = {"VCO " + Figure(answer_.vco), "PFD " + Figure(answer_.pfd), "M " + Eighths(loop->m),
+             "D " + std::to_string(loop->d), "bandwidth " + string(Name(loop->bandwidth))};
   } else {
     for (const auto& [label, value] : SettingsPairs(request_, device_, answer_)) {
       if (label != "device" && label != "input" && label != "phase error") {
@@ -94,7 +93,8 @@ string Constraints::Head() const {
   const string primitive(Name(answer_.primitive));
   string text = Comment(device_.part + " " + primitive + ": " + SettingsWords());
   text += Comment(
-      "Periods and shifts are in ns. The uncertainty of a clock is half of its peak-to-peak jitter, "
+      "Periods and shifts are in ns. The uncertainty of a clock is half of its peak-to-peak "
+      "jitter, "
       "at a bit error rate of 1e-12, by which an edge can be early or late.");
   if (answer_.phase_error) {
     text += Comment("The outputs are up to " + Short(*answer_.phase_error, 6) +
@@ -124,8 +124,8 @@ string Constraints::Input(int input) const {
   text += "create_clock -name clk_in" + n + " -period " + Exact(Rational(1000) / InputOf(input)) +
           " [get_ports $input_port_" + n + "]\n";
   if (request_.input_jitter > Rational(0)) {
-    text += "set_clock_uncertainty " + Half(request_.input_jitter) + " [get_clocks clk_in" + n +
-            "]\n";
+    text +=
+        "set_clock_uncertainty " + Half(request_.input_jitter) + " [get_clocks clk_in" + n + "]\n";
   }
   return text;
 }
@@ -154,9 +154,10 @@ string Constraints::Figures(std::size_t index) const {
                         : string("; jitter unknown");
   if (!output.IsWithin()) text += "; OFF";
   if (Inputs() > 1) {
-    text += "; from input 2 " + Figure(InputOf(1) * output.ratio) +
-            " MHz, whose jitter is unknown: it is worked out for the first input only, so that this "
-            "clock has no uncertainty here and needs one of your own";
+    text +=
+        "; from input 2 " + Figure(InputOf(1) * output.ratio) +
+        " MHz, whose jitter is unknown: it is worked out for the first input only, so that this "
+        "clock has no uncertainty here and needs one of your own";
   }
   return text;
 }

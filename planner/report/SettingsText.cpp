@@ -119,7 +119,8 @@ const Output& RequestedAt(const Request& request, const Answer& answer, int plac
 }
 
 bool IsVcoOff(const Answer& answer) {
-  return answer.searched_vco && std::abs(*answer.searched_vco - answer.vco.ToDouble()) > answer::kVisible;
+  return answer.searched_vco &&
+         std::abs(*answer.searched_vco - answer.vco.ToDouble()) > answer::kVisible;
 }
 
 Rational PhaseOffset(const Request& request, const Answer& answer) {
@@ -139,8 +140,7 @@ Rational PhaseOffset(const Request& request, const Answer& answer) {
 Pairs SettingsPairs(const Request& request, const Device& device, const Answer& answer) {
   Pairs pairs = {{"device", device.part + " " + string(Name(answer.primitive))}};
   const auto* loop = std::get_if<LoopSettings>(&answer.settings);
-  Pairs rest =
-      loop != nullptr ? LoopPairs(request, answer, *loop) : KruPairs(request, answer);
+  Pairs rest = loop != nullptr ? LoopPairs(request, answer, *loop) : KruPairs(request, answer);
   for (auto& pair : rest) pairs.push_back(std::move(pair));
   if (answer.phase_error) pairs.emplace_back("phase error", Ps(*answer.phase_error) + " ps");
   return pairs;

@@ -94,15 +94,14 @@ string DiscrepancyText(const Discrepancy& one, const string& file) {
 string VerifyText(const std::vector<Discrepancy>& discrepancies, const string& file,
                   const Style& style) {
   if (discrepancies.empty()) {
-    return Paint(style, Role::kGood, "every number is right") +
-           "\n";
+    return Paint(style, Role::kGood, "every number is right") + "\n";
   }
   string text;
   for (const Discrepancy& one : discrepancies) text += DiscrepancyText(one, file) + "\n";
   const std::size_t count = discrepancies.size();
-  return text + Paint(style, Role::kOff,
-                      std::to_string(count) + (count == 1 ? " entry is" : " entries are") +
-                          " wrong") +
+  return text +
+         Paint(style, Role::kOff,
+               std::to_string(count) + (count == 1 ? " entry is" : " entries are") + " wrong") +
          "\n";
 }
 

@@ -76,8 +76,8 @@ string SameWords(const Request& request, const Answer& answer, Criterion decided
 
 // What an answer has before another one, behind its name; `verb` is has or have. `whose` is the
 // name of the other.
-string Advantage(const Request& request, const Answer& best, const Answer& other,
-                 Criterion decided, const string& verb, const string& whose) {
+string Advantage(const Request& request, const Answer& best, const Answer& other, Criterion decided,
+                 const string& verb, const string& whose) {
   const string start = SameWords(request, best, decided) + verb + " ";
   switch (decided) {
     case Criterion::kKnownJitter:
@@ -86,8 +86,8 @@ string Advantage(const Request& request, const Answer& best, const Answer& other
       return start + "the least jitter, " + Ps(*best.max_jitter) + " ps; " + whose + " has " +
              Ps(*other.max_jitter) + " ps";
     case Criterion::kWorstError:
-      return start + "the smallest error, " + ErrorFigure(request, best) + "; " + whose +
-             " has " + ErrorFigure(request, other);
+      return start + "the smallest error, " + ErrorFigure(request, best) + "; " + whose + " has " +
+             ErrorFigure(request, other);
     case Criterion::kMargin:
       return start + "the largest margin to the device's limits, " + Percent(best.margin) + "; " +
              whose + " has " + Percent(other.margin);
@@ -130,9 +130,8 @@ std::vector<string> NamesOf(const std::vector<Best>& best) {
 // Whether an answer that is not as asked for has all frequencies near enough.
 bool HasFrequencies(const Answer& answer) {
   return std::all_of(answer.outputs.begin(), answer.outputs.end(), [](const auto& output) {
-    return std::none_of(output.misses.begin(), output.misses.end(), [](const Finding& miss) {
-      return miss.quantity == Quantity::kFrequency;
-    });
+    return std::none_of(output.misses.begin(), output.misses.end(),
+                        [](const Finding& miss) { return miss.quantity == Quantity::kFrequency; });
   });
 }
 
@@ -195,8 +194,8 @@ string WhyBroken(const Answer& first, const Device& device) {
                 ", " + FindingText(first.violations.front(), device);
   const std::size_t more = first.violations.size() - 1;
   if (more > 0) {
-    text += " (" + std::to_string(more) + " more such " +
-            (more > 1 ? "notes are" : "note is") + " above)";
+    text += " (" + std::to_string(more) + " more such " + (more > 1 ? "notes are" : "note is") +
+            " above)";
   }
   return text + ". What is out of range ranks behind all that is only off";
 }
@@ -250,8 +249,7 @@ string LossText(const Request& request, const Device& device, const Answer& bett
       return "with " + Ps(*answer.max_jitter - *better.max_jitter) + " ps more jitter, " +
              Ps(*answer.max_jitter) + " ps";
     case Criterion::kMargin:
-      return "with a margin of " + Percent(answer.margin) + " instead of " +
-             Percent(better.margin);
+      return "with a margin of " + Percent(answer.margin) + " instead of " + Percent(better.margin);
     case Criterion::kVco:
       return "with a VCO of " + Megahertz(answer.vco) + " instead of " + Megahertz(better.vco);
     default:

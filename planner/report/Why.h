@@ -19,8 +19,8 @@ inline constexpr int kFarPpm = 100000;
 // settings of its own.
 std::string WhyText(const plan::Plan& plan, const Device& device);
 
-// By what answers to a request that meet all demands are ranked: "least jitter, then smallest error,
-// then lowest VCO".
+// By what answers to a request that meet all demands are ranked: "least jitter, then smallest
+// error, then lowest VCO".
 std::string OrderWords(const Request& request);
 
 // What an answer lacks beside a better one, as the end of a sentence: "with 15.779 ps more jitter,

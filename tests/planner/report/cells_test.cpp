@@ -14,8 +14,8 @@ TEST(Cells, FiguresOfAnAnswer) {
   const Request request = MadeRequest({100}, {Rational(297, 2)});
   Answer answer = MadeLoop(request, Primitive::kTsyn, Bandwidth::kLow, 499, 7, {48}, 189.2);
   EXPECT_EQ(BandwidthCell(answer), "LOW");
-  EXPECT_EQ(VcoCell(answer), "891.071");   // 100 x 62.375 / 7
-  EXPECT_EQ(PpmCell(answer), "80.17");     // 891.0714 / 6 is 148.511905
+  EXPECT_EQ(VcoCell(answer), "891.071");  // 100 x 62.375 / 7
+  EXPECT_EQ(PpmCell(answer), "80.17");    // 891.0714 / 6 is 148.511905
   EXPECT_EQ(JitterCell(answer.max_jitter), "189.200");
   EXPECT_EQ(JitterCell(std::nullopt), "-");
   answer.worst_ppm = 12345678;
@@ -28,8 +28,7 @@ TEST(Cells, ThereAreNoneOfAnUnsolvedAnswer) {
 }
 
 TEST(Cells, AKruHasNeitherVcoNorBandwidth) {
-  const Answer answer =
-      MadeKru(MadeRequest({100}, {100}), {.pins = {Pin::kClk0}}, {1}, 180);
+  const Answer answer = MadeKru(MadeRequest({100}, {100}), {.pins = {Pin::kClk0}}, {1}, 180);
   EXPECT_EQ(BandwidthCell(answer) + VcoCell(answer), "--");
 }
 

@@ -1,8 +1,7 @@
-#include "planner/report/CheckText.h"
-
 #include <gtest/gtest.h>
 
 #include "descriptions.h"
+#include "planner/report/CheckText.h"
 #include "planner/report/DoubtText.h"
 
 namespace planner::report {
@@ -52,9 +51,10 @@ TEST(CheckText, WhatMissingKeywordsCost) {
   EXPECT_NE(text.find("\nmissing          unit  costs\nVCOCLK_FREQ_MIN  MHz   PLL\n"),
             std::string::npos)
       << text;
-  EXPECT_NE(text.find("\nf: warning: grade a has all limits of no primitive: nothing can be planned "
-                      "for\n  it\n"),
-            std::string::npos)
+  EXPECT_NE(
+      text.find("\nf: warning: grade a has all limits of no primitive: nothing can be planned "
+                "for\n  it\n"),
+      std::string::npos)
       << text;
 }
 
@@ -143,18 +143,21 @@ TEST(DoubtText, LimitsThatCannotBeMeant) {
   EXPECT_EQ(DoubtText(Made(DoubtKind::kLowUnused, 600, 500, 0)),
             "ONE, 600, is above OTHER, 500, which is the highest PFD frequency with bandwidth LOW, "
             "too");
-  EXPECT_EQ(DoubtText(Made(DoubtKind::kTargetOutside, 500, 600, 0)),
-            "ONE, 500, is below OTHER, 600: the VCO frequency that is recommended is outside of its "
-            "range");
-  EXPECT_EQ(DoubtText(Made(DoubtKind::kDoubledAbove, 3, 4, 0)),
-            "ONE, 3, is below OTHER, 4: with feedback from CLK2X, CLK0 would be faster than without");
+  EXPECT_EQ(
+      DoubtText(Made(DoubtKind::kTargetOutside, 500, 600, 0)),
+      "ONE, 500, is below OTHER, 600: the VCO frequency that is recommended is outside of its "
+      "range");
+  EXPECT_EQ(
+      DoubtText(Made(DoubtKind::kDoubledAbove, 3, 4, 0)),
+      "ONE, 3, is below OTHER, 4: with feedback from CLK2X, CLK0 would be faster than without");
   EXPECT_EQ(DoubtText(Made(DoubtKind::kNeverReached, 90000, 500, 32000)),
             "ONE, 90000, is never reached: with OTHER, 500, settings go up to 32000 MHz");
   EXPECT_EQ(DoubtText(Made(DoubtKind::kNeverReached, 1, 500, 3)),
             "ONE, 1, is never reached: with OTHER, 500, settings go down to 3 MHz");
-  EXPECT_EQ(DoubtText(Made(DoubtKind::kFewDividers, 16, 0, 32)),
-            "ONE, 16, is so low that no divider can be above twice that, 32: its high and low times "
-            "do not fit; the engine takes up to 128 all the same");
+  EXPECT_EQ(
+      DoubtText(Made(DoubtKind::kFewDividers, 16, 0, 32)),
+      "ONE, 16, is so low that no divider can be above twice that, 32: its high and low times "
+      "do not fit; the engine takes up to 128 all the same");
 }
 
 TEST(DoubtText, WhatThereIsNoneOf) {

@@ -1,10 +1,9 @@
-#include "planner/report/DevicesText.h"
-
 #include <gtest/gtest.h>
 
 #include <nlohmann/json.hpp>
 
 #include "descriptions.h"
+#include "planner/report/DevicesText.h"
 #include "schema.h"
 
 namespace planner::report {

@@ -1,8 +1,7 @@
-#include "planner/report/FindingText.h"
-
 #include <gmock/gmock.h>
 
 #include "made.h"
+#include "planner/report/FindingText.h"
 
 namespace planner::report {
 namespace {
@@ -20,8 +19,9 @@ TEST(FindingText, FrequenciesOutsideOfTheirRanges) {
   EXPECT_EQ(Text(Outside(Quantity::kFrequency, 2, 0, 1000, {5, 800})),
             "output 2 is at 1000 MHz, outside the device's range of 5 to 800 MHz");
   // What is out of a range by little does not read like its end.
-  EXPECT_EQ(Text(Outside(Quantity::kVco, -1, 0, Rational(400) - Rational(1, 100000000), {400, 1000})),
-            "the VCO is at 399.99999999 MHz, outside the device's range of 400 to 1000 MHz");
+  EXPECT_EQ(
+      Text(Outside(Quantity::kVco, -1, 0, Rational(400) - Rational(1, 100000000), {400, 1000})),
+      "the VCO is at 399.99999999 MHz, outside the device's range of 400 to 1000 MHz");
 }
 
 TEST(FindingText, PinsOutsideOfTheirRanges) {
@@ -36,8 +36,9 @@ TEST(FindingText, PinsOutsideOfTheirRanges) {
 }
 
 TEST(FindingText, DividersBeyondTheCounters) {
-  EXPECT_EQ(Text({.kind = FindingKind::kDividerTooLarge, .output = 0, .value = 125, .range = {1, 16}}),
-            "output 0: divider 125 needs a high or low time above 16 VCO periods, the device's most");
+  EXPECT_EQ(
+      Text({.kind = FindingKind::kDividerTooLarge, .output = 0, .value = 125, .range = {1, 16}}),
+      "output 0: divider 125 needs a high or low time above 16 VCO periods, the device's most");
 }
 
 Finding Off(Quantity quantity, int output, const Rational& error, const Rational& allowed) {
@@ -78,10 +79,11 @@ TEST(FindingText, TheMissesOfAnOutputAreOneSentence) {
   Miss(&answer, 0, Quantity::kPhase, -90, Rational(1, 2));
   Miss(&answer, 0, Quantity::kDuty, 20, Rational(1, 2));
   Miss(&answer, 1, Quantity::kPhase, 7, Rational(1, 2));
-  EXPECT_THAT(MissTexts(answer),
-              ElementsAre("output 0: the phase is off by -90.00 degrees, with 0.5 allowed; the duty "
-                          "cycle is off by 20.00 percent points, with 0.5 allowed",
-                          "output 1: the phase is off by 7.00 degrees, with 0.5 allowed"));
+  EXPECT_THAT(
+      MissTexts(answer),
+      ElementsAre("output 0: the phase is off by -90.00 degrees, with 0.5 allowed; the duty "
+                  "cycle is off by 20.00 percent points, with 0.5 allowed",
+                  "output 1: the phase is off by 7.00 degrees, with 0.5 allowed"));
 }
 
 TEST(FindingText, TheMissThatWeighsMost) {
@@ -131,9 +133,10 @@ TEST(FindingText, WhatIsAFractionIsNamed) {
         MadeLoop(request, Primitive::kTsyn, Bandwidth::kLow, m, 1, {divider}, 100);
     return FindingText(note, MadeDevice(), &answer);
   };
-  EXPECT_EQ(text(80, 50),
-            "with a fractional divider all phases are 0 and all duty cycles 50 %; --int-div0 avoids "
-            "it");
+  EXPECT_EQ(
+      text(80, 50),
+      "with a fractional divider all phases are 0 and all duty cycles 50 %; --int-div0 avoids "
+      "it");
   EXPECT_EQ(text(81, 48),
             "with a fractional M all phases are 0 and all duty cycles 50 %; --int-div0 avoids it");
   EXPECT_EQ(text(95, 95),
@@ -164,8 +167,9 @@ TEST(FindingText, ADeviceWithoutCoefficients) {
               ElementsAre("no jitter and no phase error: Device vk40-2 has no calculator "
                           "coefficients for KRU_SP and KRU_CLKGEN"));
   device.has_loop_jitter = false;
-  EXPECT_THAT(Missing(none, device),
-              ElementsAre("no jitter and no phase error: vk40b484-2 has no calculator coefficients"));
+  EXPECT_THAT(
+      Missing(none, device),
+      ElementsAre("no jitter and no phase error: vk40b484-2 has no calculator coefficients"));
 }
 
 TEST(FindingText, OutputsThatHaveChangedPlaces) {

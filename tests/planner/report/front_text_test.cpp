@@ -1,8 +1,7 @@
-#include "planner/report/FrontText.h"
-
 #include <gtest/gtest.h>
 
 #include "made.h"
+#include "planner/report/FrontText.h"
 
 namespace planner::report {
 namespace {
@@ -11,9 +10,8 @@ namespace {
 plan::Plan Made() {
   plan::Plan plan;
   plan.request = MadeRequest({100}, {Rational(148502994, 1000000)});
-  plan.front = {
-      MadeLoop(plan.request, Primitive::kTsyn, Bandwidth::kHigh, 447, 7, {43}, 198.526),
-      MadeLoop(plan.request, Primitive::kTsyn, Bandwidth::kHigh, 199, 2, {67}, 100.565)};
+  plan.front = {MadeLoop(plan.request, Primitive::kTsyn, Bandwidth::kHigh, 447, 7, {43}, 198.526),
+                MadeLoop(plan.request, Primitive::kTsyn, Bandwidth::kHigh, 199, 2, {67}, 100.565)};
   plan.ranked = {plan.front[1], plan.front[0]};
   return plan;
 }

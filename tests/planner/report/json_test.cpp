@@ -320,8 +320,7 @@ TEST(Entries, OfEachCommand) {
   // The PLL at place 2 is the best of its primitive, and the engine's best.
   EXPECT_THAT(Shown(BestEntries(plan, 1, 6)),
               ElementsAre("TSYN 1 trade-off", "PLL 2", "PLL 0 trade-off"));
-  EXPECT_THAT(Shown(BestEntries(plan, 3, 0)),
-              ElementsAre("PLL 3", "TSYN 1 trade-off", "PLL 2"));
+  EXPECT_THAT(Shown(BestEntries(plan, 3, 0)), ElementsAre("PLL 3", "TSYN 1 trade-off", "PLL 2"));
 }
 
 }  // namespace

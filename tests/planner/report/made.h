@@ -26,8 +26,7 @@ inline Device MadeDevice() {
   device.package = "b484";
   device.grade = "2";
   device.part = "vk40b484-2";
-  device.primitives = {Primitive::kPll, Primitive::kTsyn, Primitive::kKruSp,
-                       Primitive::kKruClkgen};
+  device.primitives = {Primitive::kPll, Primitive::kTsyn, Primitive::kKruSp, Primitive::kKruClkgen};
   device.pll = LoopLimits{{400, 1080}, {19, 500}, {19, 300}, {3, 400}, {3, 1080}, 64, 0};
   device.tsyn = LoopLimits{{600, 1440}, {10, 500}, {10, 300}, {5, 800}, {5, 800}, 64, 1000};
   PinLimits pins;
@@ -156,7 +155,9 @@ inline void Break(Answer* answer, const Finding& violation) {
 }
 
 // 27 MHz to 148.5, 74.25 and 27 MHz: 27 x 44 is 1188, and that divided by 8, 16 and 44.
-inline Request VideoRequest() { return MadeRequest({27}, {Rational(297, 2), Rational(297, 4), 27}); }
+inline Request VideoRequest() {
+  return MadeRequest({27}, {Rational(297, 2), Rational(297, 4), 27});
+}
 inline Answer VideoAnswer(const Request& request) {
   return MadeLoop(request, Primitive::kTsyn, Bandwidth::kHigh, 44 * 8, 1, {64, 128, 352}, 128.815);
 }

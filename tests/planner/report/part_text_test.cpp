@@ -1,7 +1,7 @@
 // Why a name is no part, as sentences.
-#include "planner/report/PartText.h"
-
 #include <gtest/gtest.h>
+
+#include "planner/report/PartText.h"
 
 namespace planner::report {
 

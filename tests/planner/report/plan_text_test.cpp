@@ -1,8 +1,7 @@
-#include "planner/report/PlanText.h"
-
 #include <gtest/gtest.h>
 
 #include "made.h"
+#include "planner/report/PlanText.h"
 #include "planner/report/ReportText.h"
 
 namespace planner::report {
@@ -83,10 +82,11 @@ TEST(PlanText, AnotherCandidate) {
   const plan::Plan plan = Made();
   const std::string text = PlanText(plan, MadeDevice(), 2, {}, kCalls);
   EXPECT_EQ(text.find("device        vk40b484-2 PLL\n"), 0U);
-  EXPECT_NE(text.find("why: this is number 2 of 2; the best is a TSYN with M 44, D 1 and dividers "
-                      "8,\n"
-                      "  16 and 44, and this is behind it, with 15.779 ps more jitter, 144.594 ps.\n"),
-            std::string::npos)
+  EXPECT_NE(
+      text.find("why: this is number 2 of 2; the best is a TSYN with M 44, D 1 and dividers "
+                "8,\n"
+                "  16 and 44, and this is behind it, with 15.779 ps more jitter, 144.594 ps.\n"),
+      std::string::npos)
       << text;
 }
 
@@ -149,6 +149,19 @@ TEST(CompareText, AllCandidatesWithTheirNumbers) {
             "  of yours, which can make another bandwidth the best\n");
 }
 
+TEST(CompareText, MarginsAreThereWhenTheyCount) {
+  plan::Plan plan = Made();
+  plan.request.rank = Rank::kMargin;
+  plan.ranked[0].margin = Rational(1, 8);
+  plan.ranked[1].margin = Rational(-1, 300);
+  const std::string text = CompareText(plan, MadeDevice(), {}, kCalls);
+  EXPECT_EQ(text.find("#  primitive  source  loop  VCO MHz  worst ppm  jitter ps  margin %  off\n"
+                      "1  TSYN       both    HIGH     1188       0.00    128.815     12.50\n"
+                      "2  PLL        engine  HIGH      891       0.00    144.594     -0.33\n"),
+            0U)
+      << text;
+}
+
 TEST(CompareText, RowsOutOfRangeAreTold) {
   plan::Plan plan = Made();
   Break(&plan.ranked[1], Outside(Quantity::kVco, -1, 0, 1400, {400, 1080}));
@@ -173,9 +186,10 @@ TEST(CompareText, LinesFitATerminal) {
   for (const Quantity quantity : {Quantity::kFrequency, Quantity::kPhase, Quantity::kDuty}) {
     Miss(&wide, 0, quantity, 999999, 1);
   }
-  Answer kru = MadeKru(plan.request, {.primitive = Primitive::kKruClkgen,
-                                      .pins = {Pin::kClkfx, Pin::kClkfx, Pin::kClkfx}},
-                       {1, 1, 1}, 9999.999);
+  Answer kru =
+      MadeKru(plan.request,
+              {.primitive = Primitive::kKruClkgen, .pins = {Pin::kClkfx, Pin::kClkfx, Pin::kClkfx}},
+              {1, 1, 1}, 9999.999);
   plan.ranked[10] = kru;
   const std::string text = CompareText(plan, MadeDevice(), {}, {});
   std::size_t begin = 0;

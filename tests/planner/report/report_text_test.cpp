@@ -1,8 +1,7 @@
-#include "planner/report/ReportText.h"
-
 #include <gtest/gtest.h>
 
 #include "made.h"
+#include "planner/report/ReportText.h"
 #include "planner/report/SettingsText.h"
 
 namespace planner::report {
@@ -141,8 +140,9 @@ TEST(ReportText, AJitterAboveWhatIsAllowedMarksTheRow) {
   const Request request = MadeRequest({100}, {100});
   Answer answer = MadeLoop(request, Primitive::kPll, Bandwidth::kHigh, 80, 1, {80}, 144);
   Miss(&answer, 0, Quantity::kJitter, 144, 100);
-  EXPECT_NE(Text(request, answer).find("0.00    144.000  OFF\n\nnote: output 0: the jitter is "
-                                       "144.000 ps, with 100 allowed\n"),
+  EXPECT_NE(Text(request, answer)
+                .find("0.00    144.000  OFF\n\nnote: output 0: the jitter is "
+                      "144.000 ps, with 100 allowed\n"),
             std::string::npos);
 }
 

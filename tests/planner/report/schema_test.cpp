@@ -44,8 +44,7 @@ TEST(Schema, Choices) {
   EXPECT_EQ(Fault("1", rules), "");
   EXPECT_EQ(Fault("\"b\"", rules), "");
   EXPECT_EQ(Fault("2", rules), " is 2 or  is 2");
-  EXPECT_EQ(Fault("1", R"({"oneOf": [{"type": "number"}, {"const": 1}]})"),
-            " is of several kinds");
+  EXPECT_EQ(Fault("1", R"({"oneOf": [{"type": "number"}, {"const": 1}]})"), " is of several kinds");
   const char* const conditions = R"({"allOf": [{"if": {"type": "number"}, "then": {"const": 1}}]})";
   EXPECT_EQ(Fault("1", conditions), "");
   EXPECT_EQ(Fault("2", conditions), " is 2");

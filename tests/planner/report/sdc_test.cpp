@@ -110,10 +110,8 @@ TEST(Sdc, TwoInputsAndTheJitterOfTheFirst) {
             std::string::npos);
   EXPECT_NE(Clock(text, "clk_out0_in1").find("-master_clock clk_in1 \\\n  -multiply_by 2 \\\n"),
             std::string::npos);
-  EXPECT_NE(Clock(text, "clk_out0_in2").find("-master_clock clk_in2 -add \\\n"),
-            std::string::npos);
-  EXPECT_NE(text.find("set_clock_uncertainty 0.05 [get_clocks clk_out0_in1]\n"),
-            std::string::npos);
+  EXPECT_NE(Clock(text, "clk_out0_in2").find("-master_clock clk_in2 -add \\\n"), std::string::npos);
+  EXPECT_NE(text.find("set_clock_uncertainty 0.05 [get_clocks clk_out0_in1]\n"), std::string::npos);
   EXPECT_EQ(text.find("uncertainty 0.05 [get_clocks clk_out0_in2]"), std::string::npos);
   EXPECT_NE(text.find("from input 2 100 MHz"), std::string::npos);
   EXPECT_NE(text.find("# The outputs follow one input or the other.\n"
@@ -154,9 +152,10 @@ TEST(Sdc, WhatIsOffIsTold) {
   Miss(&answer, 0, Quantity::kPhase, 5, Rational(1, 2));
   Break(&answer, Outside(Quantity::kVco, -1, 0, 1000, {400, 900}));
   const std::string text = Sdc(request, MadeDevice(), answer);
-  EXPECT_NE(text.find("# OFF: not everything is as asked for, or in the device's range.\n"
-                      "# OFF: the VCO is at 1000 MHz, outside the device's range of 400 to 900 MHz\n"),
-            std::string::npos)
+  EXPECT_NE(
+      text.find("# OFF: not everything is as asked for, or in the device's range.\n"
+                "# OFF: the VCO is at 1000 MHz, outside the device's range of 400 to 900 MHz\n"),
+      std::string::npos)
       << text;
   EXPECT_NE(text.find("phase 15 degrees, 10 asked for, 5 off; duty 50 percent; jitter 144 ps\n"
                       "#   peak to peak; OFF\n"),

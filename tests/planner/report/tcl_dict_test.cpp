@@ -1,8 +1,8 @@
-#include "planner/report/TclDict.h"
-
 #include <gtest/gtest.h>
 
 #include <nlohmann/json.hpp>
+
+#include "planner/report/TclDict.h"
 
 namespace planner::report {
 namespace {
@@ -22,12 +22,9 @@ TEST(TclDict, WordsOfAList) {
 }
 
 TEST(TclDict, AnEntryALine) {
-  const ordered_json data = {{"text", "a b"},
-                             {"none", nullptr},
-                             {"flag", true},
-                             {"number", 1188.0},
-                             {"list", {1, 2.5, "x y"}},
-                             {"empty", ordered_json::array()}};
+  const ordered_json data = {
+      {"text", "a b"},    {"none", nullptr},         {"flag", true},
+      {"number", 1188.0}, {"list", {1, 2.5, "x y"}}, {"empty", ordered_json::array()}};
   EXPECT_EQ(TclDict(data),
             "text {a b}\n"
             "none {}\n"

@@ -1,7 +1,7 @@
 // What is wrong in a plan, as sentences.
-#include "planner/report/VerifyText.h"
-
 #include <gtest/gtest.h>
+
+#include "planner/report/VerifyText.h"
 
 namespace planner::report {
 
@@ -11,7 +11,11 @@ using verify::Discrepancy;
 using verify::DiscrepancyKind;
 
 Discrepancy Of(DiscrepancyKind kind, const std::string& found, const std::string& expected) {
-  return {.kind = kind, .path = "answers[0].d", .found = found, .expected = expected, .line = 3,
+  return {.kind = kind,
+          .path = "answers[0].d",
+          .found = found,
+          .expected = expected,
+          .line = 3,
           .column = 7};
 }
 

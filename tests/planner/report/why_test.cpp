@@ -124,17 +124,17 @@ TEST(Why, OthersAreAsNearButNotAsAskedFor) {
 TEST(Why, SettingsThatOnlyTheEngineWasAskedFor) {
   plan::Plan plan = Met();
   for (Answer& answer : plan.ranked) answer.source = {.engine = true, .search = false};
-  EXPECT_NE(Why(plan).find(". Of the settings of the TSYN that the engine answers, these have the "),
-            std::string::npos);
+  EXPECT_NE(
+      Why(plan).find(". Of the settings of the TSYN that the engine answers, these have the "),
+      std::string::npos);
 }
 
 // 333.333333 is 1001.00 ppm more than 333.
 plan::Plan Missed() {
   plan::Plan plan;
   plan.request = MadeRequest({100}, {333});
-  plan.ranked = {
-      MadeLoop(plan.request, Primitive::kPll, Bandwidth::kHigh, 80, 1, {24}, 100),
-      MadeLoop(plan.request, Primitive::kTsyn, Bandwidth::kHigh, 80, 1, {24}, 110)};
+  plan.ranked = {MadeLoop(plan.request, Primitive::kPll, Bandwidth::kHigh, 80, 1, {24}, 100),
+                 MadeLoop(plan.request, Primitive::kTsyn, Bandwidth::kHigh, 80, 1, {24}, 110)};
   for (Answer& answer : plan.ranked) {
     Miss(&answer, 0, Quantity::kFrequency, answer.outputs[0].error_ppm, 100);
   }
@@ -162,21 +162,22 @@ TEST(Why, NothingIsAsAskedFor) {
 TEST(Why, NothingIsNear) {
   plan::Plan plan = Missed();
   plan.ranked[0].worst_ppm = 100001;
-  EXPECT_NE(Why(plan).find("with 100 allowed. No setting comes near what is asked for; explain tells "
-                           "why."),
-            std::string::npos);
+  EXPECT_NE(
+      Why(plan).find("with 100 allowed. No setting comes near what is asked for; explain tells "
+                     "why."),
+      std::string::npos);
 }
 
 TEST(Why, NothingIsInTheDevicesRange) {
   plan::Plan plan = Missed();
   Break(&plan.ranked[0], Outside(Quantity::kFrequency, 0, 0, 700, {3, 400}));
-  EXPECT_EQ(Why(plan),
-            "nothing is as asked for and in the device's range: with the PLL, output 0 is at 700 "
-            "MHz, outside the device's range of 3 to 400 MHz. What is out of range ranks behind all "
-            "that is only off.");
+  EXPECT_EQ(
+      Why(plan),
+      "nothing is as asked for and in the device's range: with the PLL, output 0 is at 700 "
+      "MHz, outside the device's range of 3 to 400 MHz. What is out of range ranks behind all "
+      "that is only off.");
   Break(&plan.ranked[0], Outside(Quantity::kVco, -1, 0, 1400, {400, 1080}));
-  EXPECT_NE(Why(plan).find("of 3 to 400 MHz (1 more such note is above). What"),
-            std::string::npos);
+  EXPECT_NE(Why(plan).find("of 3 to 400 MHz (1 more such note is above). What"), std::string::npos);
 }
 
 TEST(Why, TheOrderInWords) {
