@@ -81,8 +81,8 @@ class KruJitter {
 
   // Whether the jitter of CLKFX, CLKFX180 and CLKFXDV does not fall when M or D rises and all else
   // stays: the ring of the synthesiser runs freely for D input periods, and M of its own are
-  // rounded to taps. Nor does that of any pin with a PHASE_SHIFT above 0 in place of 0, which adds a
-  // tap. That is so of the doubles, too, as each step that works them out keeps the order of its
+  // rounded to taps. Nor does that of any pin with a PHASE_SHIFT above 0 in place of 0, which adds
+  // a tap. That is so of the doubles, too, as each step that works them out keeps the order of its
   // arguments.
   bool RisesWithSettings() const { return true; }
 

@@ -100,6 +100,21 @@ TEST(KruJitter, RisesWithMAndD) {
   }
 }
 
+TEST(KruJitter, RisesWithAPhaseShift) {
+  const KruJitter jitter(Bundled("vk40", "2"), Ask({100}, {100}), Primitive::kKruSp);
+  KruSettings settings;
+  settings.m = 3;
+  settings.d = 2;
+  for (const hardware::PinFacts& facts : hardware::kPins) {
+    if (!facts.is_sp) continue;
+    settings.phase_shift = 0;
+    const double still = jitter.PeakToPeak(settings, facts.pin);
+    settings.phase_shift = 1;
+    // One length more that is set in taps of 30 ps.
+    EXPECT_NEAR(jitter.PeakToPeak(settings, facts.pin), still + 30, 1e-9) << facts.name;
+  }
+}
+
 // --- The calculator's figures ------------------------------------------------------------------
 
 struct GradeName {
