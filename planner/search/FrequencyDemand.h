@@ -7,9 +7,13 @@
 #define VORKEL_PLANNER_SEARCH_FREQUENCYDEMAND_H_
 
 #include <cmath>
+#include <compare>
 #include <cstdint>
+#include <cstdlib>
+#include <optional>
 
 #include "planner/Request.h"
+#include "planner/search/Factor.h"
 #include "planner/search/Near.h"
 
 namespace planner::search {
@@ -27,6 +31,16 @@ class FrequencyDemand {
     const std::int64_t whole = q_ * b;
     const std::int64_t rest = std::abs(p_ * a - whole);
     return Rounded(static_cast<double>(rest) / static_cast<double>(whole) * per_unit_);
+  }
+  // The order of the errors in units of two outputs; nothing where it takes more than words.
+  static std::optional<std::strong_ordering> Compare(const FrequencyDemand& one, std::int64_t a,
+                                                     std::int64_t b, const FrequencyDemand& other,
+                                                     std::int64_t other_a, std::int64_t other_b) {
+    if (one.q_ == 0 || other.q_ == 0 || one.unit_ != other.unit_) return std::nullopt;
+    const std::int64_t whole = one.q_ * b;
+    const std::int64_t other_whole = other.q_ * other_b;
+    return Wide{std::abs(one.p_ * a - whole)} * other_whole <=>
+           Wide{std::abs(other.p_ * other_a - other_whole)} * whole;
   }
   bool IsMet(std::int64_t a, std::int64_t b) const;
   // |error| in ppm, exactly.

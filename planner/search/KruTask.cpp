@@ -95,10 +95,16 @@ KruTask::KruTask(const Request& request, const Device& device, Primitive primiti
     const Range& usual = limits.Of(facts.pin, false);
     const Range& doubled = IsSp() ? limits.Of(facts.pin, true) : usual;
     is_narrower = is_narrower && usual.lowest <= doubled.lowest && doubled.highest <= usual.highest;
-    pins_.push_back({&facts, facts.phase / 90, RatioRange(inputs_, usual),
-                     RatioRange(inputs_, doubled)});
+    pins_.push_back({&facts, facts.phase / 90, Shared(usual), Shared(doubled)});
   }
   is_jitter_all_known_ = is_narrower || !jitter_.IsKnown();
+}
+
+const RatioRange* KruTask::Shared(const Range& range) {
+  for (const auto& [known, ratios] : ranges_) {
+    if (known == range) return &ratios;
+  }
+  return &ranges_.emplace_back(range, RatioRange(inputs_, range)).second;
 }
 
 double KruTask::JitterOf(const KruBase& base, Pin pin, bool shifted) const {
@@ -113,6 +119,39 @@ double KruTask::JitterOf(const KruBase& base, Pin pin, bool shifted) const {
   return jitter_.PeakToPeak(settings, pin);
 }
 
+KruError KruTask::FrequencyError(std::size_t place, const KruRatio& ratio) const {
+  return {.near = outputs_[place].Frequency().Error(ratio.a, ratio.b),
+          .demand = KruError::Demand::kFrequency,
+          .output = static_cast<std::uint8_t>(place),
+          .a = static_cast<std::int32_t>(ratio.a),
+          .b = static_cast<std::int32_t>(ratio.b)};
+}
+
+KruError KruTask::PhaseError(std::size_t place, int quarter, int shift) const {
+  return {.near = outputs_[place].Phases()->Error(static_cast<std::size_t>(quarter),
+                                                  static_cast<std::size_t>(shift)),
+          .demand = KruError::Demand::kPhase,
+          .output = static_cast<std::uint8_t>(place),
+          .a = quarter,
+          .b = shift};
+}
+
+KruError KruTask::DutyError(std::size_t place, PinSource source, int divide_halves) const {
+  const bool is_divided = source == PinSource::kDivider;
+  return {.near = outputs_[place].DutyError(source, divide_halves),
+          .demand = KruError::Demand::kDuty,
+          .output = static_cast<std::uint8_t>(place),
+          .a = is_divided ? 1 : 0,
+          .b = is_divided ? divide_halves : 0};
+}
+
+KruError KruTask::JitterError(std::size_t place, double jitter) const {
+  return {.near = outputs_[place].Jitter().Error(jitter),
+          .demand = KruError::Demand::kJitter,
+          .output = static_cast<std::uint8_t>(place),
+          .jitter = jitter};
+}
+
 Rational KruTask::Exact(const KruError& error) const {
   const KruOutput& output = outputs_[error.output];
   const Output& asked = output.Asked();
@@ -120,16 +159,16 @@ Rational KruTask::Exact(const KruError& error) const {
     case KruError::Demand::kNone:
       return 0;
     case KruError::Demand::kFrequency:
-      return output.Frequency().Ppm(error.ratio.a, error.ratio.b) /
+      return output.Frequency().Ppm(error.a, error.b) /
              answer::FrequencyUnit(request_.ToleranceOf(asked));
     case KruError::Demand::kPhase: {
       const Rational made =
-          Rational(90 * error.quarter) + Rational(360 * error.shift, hardware::kShiftSteps);
+          Rational(90 * error.a) + Rational(360 * error.b, hardware::kShiftSteps);
       return hardware::TurnedToHalf(made - *asked.phase).Absolute() /
              answer::PhaseUnit(request_.PhaseToleranceOf(asked));
     }
     case KruError::Demand::kDuty:
-      return output.ExactDutyError(error.source, error.divide_halves);
+      return output.ExactDutyError(error.a != 0 ? PinSource::kDivider : PinSource::kLine, error.b);
     case KruError::Demand::kJitter:
       break;
   }
@@ -137,20 +176,11 @@ Rational KruTask::Exact(const KruError& error) const {
 }
 
 bool KruTask::IsSame(const KruError& a, const KruError& b) {
-  if (a.demand != b.demand || a.output != b.output) return false;
-  switch (a.demand) {
-    case KruError::Demand::kNone:
-      return true;
-    case KruError::Demand::kFrequency:
-      return a.ratio.a * b.ratio.b == b.ratio.a * a.ratio.b;
-    case KruError::Demand::kPhase:
-      return a.quarter == b.quarter && a.shift == b.shift;
-    case KruError::Demand::kDuty:
-      return a.source == b.source && a.divide_halves == b.divide_halves;
-    case KruError::Demand::kJitter:
-      break;
+  if (a.demand != b.demand || a.output != b.output || a.jitter != b.jitter) return false;
+  if (a.demand == KruError::Demand::kFrequency) {
+    return std::int64_t{a.a} * b.b == std::int64_t{b.a} * a.b;
   }
-  return a.jitter == b.jitter;
+  return a.a == b.a && a.b == b.b;
 }
 
 std::strong_ordering KruTask::Compare(const KruError& a, const KruError& b) const {
@@ -158,6 +188,12 @@ std::strong_ordering KruTask::Compare(const KruError& a, const KruError& b) cons
   if (IsSurelyBelow(b.near, a.near)) return std::strong_ordering::greater;
   const bool are_zero = a.near.value + a.near.slack + b.near.value + b.near.slack == 0;
   if (are_zero || IsSame(a, b)) return std::strong_ordering::equal;
+  if (a.demand == KruError::Demand::kFrequency && b.demand == KruError::Demand::kFrequency) {
+    const auto order =
+        FrequencyDemand::Compare(outputs_[a.output].Frequency(), a.a, a.b,
+                                 outputs_[b.output].Frequency(), b.a, b.b);
+    if (order) return *order;
+  }
   return Exact(a) <=> Exact(b);
 }
 

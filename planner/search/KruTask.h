@@ -8,7 +8,9 @@
 #include <compare>
 #include <cstddef>
 #include <cstdint>
+#include <deque>
 #include <memory>
+#include <utility>
 #include <vector>
 
 #include "hardware/Kru.h"
@@ -46,25 +48,48 @@ KruRatio RatioOf(PinSource source, const KruBase& base);
 
 // An error of an output, |error| / unit, with all that it takes to work it out again exactly.
 struct KruError {
-  enum class Demand { kNone, kFrequency, kPhase, kDuty, kJitter };
+  enum class Demand : std::uint8_t { kNone, kFrequency, kPhase, kDuty, kJitter };
   Near near;
   Demand demand = Demand::kNone;
-  std::size_t output = 0;   // the place among the used ones
-  KruRatio ratio = {0, 1};  // kFrequency
-  int quarter = 0;          // kPhase: that of the pin,
-  int shift = 0;            // and PHASE_SHIFT
-  PinSource source = PinSource::kLine;  // kDuty,
-  int divide_halves = 0;                // with the divide
-  double jitter = 0;                    // kJitter
+  std::uint8_t output = 0;  // the place among the used ones
+  // kFrequency: the ratio to the input. kPhase: the quarter of the pin, and PHASE_SHIFT. kDuty:
+  // whether the pin is that of the divider, and its divide in halves.
+  std::int32_t a = 0;
+  std::int32_t b = 0;
+  double jitter = 0;  // kJitter
 };
 
 // A pin that the primitive has.
 struct KruPin {
   const hardware::PinFacts* facts;
   int quarter;
-  RatioRange usual;
-  RatioRange doubled;  // with feedback from CLK2X
+  // That of the family of the pin, which the same ranges share.
+  const RatioRange* usual;
+  const RatioRange* doubled;  // with feedback from CLK2X
 };
+
+inline bool UsesM(PinSource source) {
+  return source == PinSource::kSynthesiser || source == PinSource::kDividedSynthesiser;
+}
+inline bool UsesM(const KruPin& pin) { return UsesM(pin.facts->source); }
+inline bool UsesDivide(PinSource source) {
+  return source == PinSource::kDivider || source == PinSource::kDividedSynthesiser;
+}
+inline bool UsesDivide(const KruPin& pin) { return UsesDivide(pin.facts->source); }
+
+// Whether all that a pin needs is set.
+inline bool IsSet(PinSource source, const KruBase& base) {
+  return (base.m != 0 || !UsesM(source)) && (base.divide_halves != 0 || !UsesDivide(source));
+}
+inline bool IsSet(const KruPin& pin, const KruBase& base) { return IsSet(pin.facts->source, base); }
+
+// Whether an output of a KRU_SP, or of a KRU_CLKGEN, can be on a pin; `doubled` says that output 0
+// of a KRU_SP is on CLK2X, where the feedback then comes from.
+inline bool IsConnected(const KruPin& pin, bool is_sp, int output, bool feedback, bool doubled) {
+  if (pin.facts->needs_feedback && !feedback) return false;
+  if (output != 0) return true;
+  return is_sp ? doubled == (pin.facts->pin == Pin::kClk2x) : pin.facts->pin == Pin::kClkfx;
+}
 
 class KruOutput {
  public:
@@ -104,6 +129,8 @@ class KruTask {
  public:
   // Of a primitive that the device has. Both must outlive it.
   KruTask(const Request& request, const Device& device, Primitive primitive);
+  KruTask(const KruTask&) = delete;
+  KruTask& operator=(const KruTask&) = delete;
 
   const Request& Asked() const { return request_; }
   Primitive Which() const { return primitive_; }
@@ -118,6 +145,12 @@ class KruTask {
 
   double JitterOf(const KruBase& base, Pin pin, bool shifted) const;
 
+  // The errors of an output by their kinds.
+  KruError FrequencyError(std::size_t place, const KruRatio& ratio) const;
+  KruError PhaseError(std::size_t place, int quarter, int shift) const;
+  KruError DutyError(std::size_t place, PinSource source, int divide_halves) const;
+  KruError JitterError(std::size_t place, double jitter) const;
+
   Rational Exact(const KruError& error) const;
   std::strong_ordering Compare(const KruError& a, const KruError& b) const;
   const KruError& LargerOf(const KruError& a, const KruError& b) const {
@@ -126,11 +159,13 @@ class KruTask {
 
  private:
   static bool IsSame(const KruError& a, const KruError& b);
+  const RatioRange* Shared(const Range& range);
 
   const Request& request_;
   Primitive primitive_;
   Inputs inputs_;
   std::vector<KruOutput> outputs_;
+  std::deque<std::pair<Range, RatioRange>> ranges_;
   std::vector<KruPin> pins_;
   bool asks_for_phase_ = false;
   bool is_jitter_all_known_ = false;

@@ -109,7 +109,7 @@ class KruWithin::Question {
     const PinSource source = pin.facts->source;
     const KruRatio ratio = RatioOf(source, base);
     if (!own.frequency && !output.Frequency().IsMet(ratio.a, ratio.b)) return false;
-    if (!own.range && !(doubled_ ? pin.doubled : pin.usual).Contains(ratio.a, ratio.b)) {
+    if (!own.range && !(doubled_ ? pin.doubled : pin.usual)->Contains(ratio.a, ratio.b)) {
       return false;
     }
     if (!own.duty && output.AsksForDuty() && !output.IsDutyMet(source, base.divide_halves)) {
@@ -120,10 +120,7 @@ class KruWithin::Question {
   }
 
   bool IsConnected(const KruPin& pin, const KruOutput& output, const KruBase& base) const {
-    if (pin.facts->needs_feedback && !base.feedback) return false;
-    if (output.Index() != 0) return true;
-    return task_.IsSp() ? doubled_ == (pin.facts->pin == Pin::kClk2x)
-                        : pin.facts->pin == Pin::kClkfx;
+    return search::IsConnected(pin, task_.IsSp(), output.Index(), base.feedback, doubled_);
   }
 
   // The PHASE_SHIFTs with which it then meets its phase.
@@ -137,12 +134,7 @@ class KruWithin::Question {
   template <typename Take>
   void ForEachPin(bool synthesised, bool divided, const Take& take) const {
     for (const KruPin& pin : task_.Pins()) {
-      const PinSource source = pin.facts->source;
-      const bool has_m =
-          source == PinSource::kSynthesiser || source == PinSource::kDividedSynthesiser;
-      const bool has_divide =
-          source == PinSource::kDivider || source == PinSource::kDividedSynthesiser;
-      if (has_m == synthesised && has_divide == divided) take(pin);
+      if (UsesM(pin) == synthesised && UsesDivide(pin) == divided) take(pin);
     }
   }
 
@@ -183,7 +175,7 @@ class KruWithin::Question {
       span.highest = exact * (1 + frequency.Allowed());
     }
     if (!own.range) {
-      const RatioRange& range = doubled_ ? pin.doubled : pin.usual;
+      const RatioRange& range = *(doubled_ ? pin.doubled : pin.usual);
       span.lowest = std::max(span.lowest, scale * range.Lowest());
       span.highest = std::min(span.highest, scale * range.Highest());
     }
@@ -198,8 +190,8 @@ class KruWithin::Question {
   void LeaveKnown(double scale, Span* span) const {
     for (const KruPin& pin : task_.Pins()) {
       if (pin.facts->pin != Pin::kClkfx) continue;
-      const double lowest = pin.usual.Lowest() * (1 - Calculator::kSolverSlack);
-      const double highest = pin.usual.Highest() * (1 + Calculator::kSolverSlack);
+      const double lowest = pin.usual->Lowest() * (1 - Calculator::kSolverSlack);
+      const double highest = pin.usual->Highest() * (1 + Calculator::kSolverSlack);
       span->lowest = std::max(span->lowest, scale * lowest);
       span->highest = std::min(span->highest, scale * highest);
     }
@@ -401,18 +393,6 @@ class KruWithin::Question {
       }
     }
     return settings;
-  }
-
-  static bool UsesM(const KruPin& pin) {
-    return pin.facts->source == PinSource::kSynthesiser ||
-           pin.facts->source == PinSource::kDividedSynthesiser;
-  }
-  static bool UsesDivide(const KruPin& pin) {
-    return pin.facts->source == PinSource::kDivider ||
-           pin.facts->source == PinSource::kDividedSynthesiser;
-  }
-  static bool IsSet(const KruPin& pin, const KruBase& base) {
-    return (base.m != 0 || !UsesM(pin)) && (base.divide_halves != 0 || !UsesDivide(pin));
   }
 
   const KruTask& task_;

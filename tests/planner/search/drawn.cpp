@@ -112,42 +112,62 @@ std::string KruText(Random& random, Primitive primitive, const Rational& input) 
 
 // --- Requests ----------------------------------------------------------------------------------
 
-// A frequency that the primitive makes of an input, MHz.
-Rational Makeable(Random& random, Primitive primitive, const Device& device,
+// The settings behind a request, most of whose outputs they make exactly.
+struct Behind {
+  planner::KruSettings kru;
+  Rational vco;
+};
+
+Behind DrawBehind(Random& random, Primitive primitive, const Device& device,
                   const Rational& input) {
-  if (!hardware::IsLoop(primitive)) {
-    const planner::KruSettings settings{
-        .primitive = primitive,
-        .divide_by_2 = primitive == Primitive::kKruSp && random.OneIn(3),
-        .m = random.Int(2, 12),
-        .d = random.Int(1, 12),
-        .divide_halves = random.Pick(std::vector<int>{4, 5, 8, 16, 32}),
-        .pins = {}};
-    const std::vector<hardware::Pin> sp = {hardware::Pin::kClk0, hardware::Pin::kClk2x,
-                                           hardware::Pin::kClkdv, hardware::Pin::kClkfx};
-    const std::vector<hardware::Pin> clkgen = {hardware::Pin::kClkfx, hardware::Pin::kClkfxdv};
-    return input * PinRatio(random.Pick(primitive == Primitive::kKruSp ? sp : clkgen),
-                            settings.Ratios());
+  Behind behind;
+  if (hardware::IsLoop(primitive)) {
+    const planner::LoopLimits& limits = device.Loop(primitive);
+    // An M near an end of the VCO's range.
+    const int d = random.Int(1, 3);
+    const Rational end = random.OneIn(2) ? limits.vco.lowest : limits.vco.highest;
+    Rational m = (end * d / input).Round();
+    if (primitive == Primitive::kTsyn && random.OneIn(3)) m += Rational(random.Int(-8, 8), 8);
+    behind.vco = m > 0 ? input * m / d : end;
+    return behind;
   }
-  const planner::LoopLimits& limits = device.Loop(primitive);
-  // An M near the VCO's range.
-  const int d = random.Int(1, 3);
-  const Rational vco = random.OneIn(2) ? limits.vco.lowest : limits.vco.highest;
-  Rational m = (vco * d / input).Round();
-  if (primitive == Primitive::kTsyn && random.OneIn(3)) m += Rational(random.Int(-8, 8), 8);
-  return input * m / (d * random.Int(1, 12));
+  const planner::PinLimits& limits = device.Pins(primitive);
+  behind.kru.primitive = primitive;
+  behind.kru.divide_by_2 = primitive == Primitive::kKruSp && random.OneIn(3);
+  behind.kru.divide_halves = random.Pick(
+      primitive == Primitive::kKruSp ? std::vector<int>{4, 5, 6, 7, 8, 10, 13, 16, 18}
+                                     : std::vector<int>{4, 8, 16, 32, 64});
+  // Of some M and D one with which the synthesiser is in its range, if there is one.
+  for (int tries = 0; tries < 200; ++tries) {
+    behind.kru.m = random.Int(2, 12);
+    behind.kru.d = random.Int(1, 12);
+    const Rational made = input * PinRatio(hardware::Pin::kClkfx, behind.kru.Ratios());
+    if (limits.Of(hardware::Pin::kClkfx, false).Contains(made)) break;
+  }
+  return behind;
 }
 
-Rational Frequency(Random& random, Primitive primitive, const Device& device,
-                   const Rational& input) {
-  if (random.OneIn(5)) return Rational(random.Int(1, 4000), random.Pick(std::vector<int>{4, 7, 10}));
+Rational Makeable(Random& random, const Behind& behind, Primitive primitive, int output,
+                  const Rational& input) {
+  if (hardware::IsLoop(primitive)) return behind.vco / random.Int(1, 12);
+  using hardware::Pin;
+  const std::vector<Pin> sp = {Pin::kClk0, Pin::kClk2x, Pin::kClkdv, Pin::kClkfx};
+  const std::vector<Pin> clkgen = {Pin::kClkfx, Pin::kClkfxdv};
+  const Pin pin = primitive == Primitive::kKruSp ? random.Pick(sp)
+                  : output == 0                  ? Pin::kClkfx
+                                                 : random.Pick(clkgen);
+  return input * PinRatio(pin, behind.kru.Ratios());
+}
+
+Rational Frequency(Random& random, const Behind& behind, Primitive primitive, const Device& device,
+                   int output, const Rational& input) {
+  if (random.OneIn(6)) return Rational(random.Int(1, 4000), random.Pick(std::vector<int>{4, 7, 10}));
   if (random.OneIn(6) && hardware::IsLoop(primitive)) {
     const planner::LoopLimits& limits = device.Loop(primitive);
     const planner::Range& range = random.OneIn(2) ? limits.output : limits.vco;
     return random.OneIn(2) ? range.lowest : range.highest;
   }
-  const Rational made = Makeable(random, primitive, device, input);
-  return made > 0 ? made : input;
+  return Makeable(random, behind, primitive, output, input);
 }
 
 void DrawShape(Random& random, bool with_duty, Output* output) {
@@ -234,9 +254,10 @@ Request RequestFor(Random& random, const Device& device, Primitive primitive, co
   const bool shaped = random.OneIn(2);
   const bool with_jitter = random.OneIn(4);
   const Rational million = 1000000;
+  const Behind behind = DrawBehind(random, primitive, device, input);
   for (int i = 0; i < outputs; ++i) {
     Output output;
-    output.frequency = Frequency(random, primitive, device, input);
+    output.frequency = Frequency(random, behind, primitive, device, i, input);
     if (random.OneIn(4)) {
       output.tolerance = random.Pick(std::vector<Rational>{0, 50, 300, 5000, 100000});
     }

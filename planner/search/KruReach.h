@@ -1,0 +1,195 @@
+// The M and D of a KRU with which all outputs can be near enough.
+//
+// Each output must have a source that comes near enough to its frequency: those of the delay line
+// are what they are, those of the synthesiser leave a span of M / D. Where each output has one, with
+// the same divide, is a span of M / D, too. How near is near enough falls while M rises: what has
+// been found with a smaller M and D has less jitter.
+//
+// Tested by search_test.cpp.
+#ifndef VORKEL_PLANNER_SEARCH_KRUREACH_H_
+#define VORKEL_PLANNER_SEARCH_KRUREACH_H_
+
+#include <array>
+#include <bit>
+#include <cstddef>
+#include <cstdint>
+#include <optional>
+#include <span>
+#include <vector>
+
+#include "planner/search/KruPhases.h"
+#include "planner/search/KruTask.h"
+#include "planner/search/VcoSpans.h"
+
+namespace planner::search {
+
+// A set of whole numbers from 0 to 319.
+class SmallSet {
+ public:
+  void Add(int first, int last) {
+    for (int one = first; one <= last; ++one) words_[Word(one)] |= Bit(one);
+  }
+  bool Contains(int one) const { return (words_[Word(one)] & Bit(one)) != 0; }
+  template <typename Take>
+  void ForEach(const Take& take) const {
+    for (std::size_t i = 0; i < words_.size(); ++i) {
+      for (std::uint64_t word = words_[i]; word != 0; word &= word - 1) {
+        take(static_cast<int>(i) * kBits + std::countr_zero(word));
+      }
+    }
+  }
+
+ private:
+  static constexpr int kBits = 64;
+  static std::size_t Word(int one) { return static_cast<std::size_t>(one / kBits); }
+  static std::uint64_t Bit(int one) { return std::uint64_t{1} << (one % kBits); }
+  std::array<std::uint64_t, 5> words_{};
+};
+
+class KruReach {
+ public:
+  // `all_met`: frequencies that do not meet their demands are never near enough. `with_ties`: what
+  // is as near as a bound is near enough.
+  KruReach(const KruTask& task, KruPhases* phases, bool all_met, bool with_ties,
+           std::span<const int> divides, int largest);
+
+  // Begins with a delay line, and no bounds: all errors are near enough.
+  void Start(const KruBase& line);
+
+  // From an M on, only what is below an error is near enough; the D of what is asked for from now on
+  // are not below those of what has the error.
+  void Bind(int m, const KruError& error);
+
+  // Counts what Bind has changed.
+  std::size_t Changes() const { return changes_; }
+
+  // The M that are near enough with a D; and those that would be without any bound.
+  SmallSet MsFor(int d) const { return MsOf(steps_, d); }
+  SmallSet AllMsFor(int d) const { return MsOf(open_, d); }
+
+  // The outputs that are near enough on a source, a bit for each by its place among the used ones.
+  using Outputs = std::uint32_t;
+  struct Served {
+    Outputs line;
+    Outputs doubler;
+    Outputs divide;
+    Outputs synthesiser;
+  };
+  // Calls `take` with the settings that are near enough, with an M and a D and each divide, none
+  // first, and what serves which output. It may call Bind.
+  template <typename Take>
+  void ForEachNear(const KruBase& pair, const Take& take) const {
+    ForEachOf([&]() -> const Step& { return StepOf(pair.m); }, pair, take);
+  }
+  // The same without any bound.
+  template <typename Take>
+  void ForEach(const KruBase& pair, const Take& take) const {
+    ForEachOf([&]() -> const Step& { return open_.front(); }, pair, take);
+  }
+
+  // The same without an M. With a divide, only what is below an error is near enough: that which
+  // `bound_of` tells at the moment; null for any.
+  template <typename BoundOf, typename Take>
+  void ForEachWithoutM(const BoundOf& bound_of, const Take& take) const {
+    KruBase base = line_;
+    if (open_.front().on_line == all_) take(base);
+    bool has_changed = true;
+    std::optional<KruError> bound;
+    Outputs on_line = 0;
+    for (const int halves : divides_) {
+      if (has_changed) {
+        const KruError* const error = bound_of();
+        bound = error == nullptr ? std::nullopt : std::optional(*error);
+        on_line = OnLine(bound);
+        has_changed = false;
+      }
+      base.divide_halves = halves;
+      const Outputs on_divide = NearOn(PinSource::kDivider, base, bound);
+      if (on_divide == 0 || (on_line | on_divide) != all_) continue;
+      take(base);
+      has_changed = true;
+    }
+  }
+
+ private:
+  // From an M on.
+  struct Step {
+    int m;
+    std::optional<KruError> bound;
+    Outputs line;                    // those that the delay line serves near enough,
+    Outputs doubler;
+    Outputs on_line;                 // either of them,
+    std::vector<Outputs> on_divide;  // and a divide of CLKDV
+    Spans spans;                     // of M / D
+    Outputs on_jitter;               // those that need the synthesiser and ask for a jitter
+  };
+
+  template <typename StepNow, typename Take>
+  void ForEachOf(const StepNow& step_now, KruBase pair, const Take& take) const {
+    Outputs on_synthesiser = 0;
+    std::size_t changes = changes_ + 1;
+    for (std::size_t k = 0; k <= divides_.size(); ++k) {
+      const Step& step = step_now();
+      if (changes != changes_) {
+        changes = changes_;
+        on_synthesiser = NearOn(PinSource::kSynthesiser, pair, step.bound);
+      }
+      pair.divide_halves = k == 0 ? 0 : divides_[k - 1];
+      Outputs on_divide = 0;
+      if (k > 0) {
+        on_divide = task_.IsSp() ? step.on_divide[k - 1]
+                                 : NearOn(PinSource::kDividedSynthesiser, pair, step.bound);
+        if (on_divide == 0) continue;
+      }
+      if (on_synthesiser == 0 && (task_.IsSp() || on_divide == 0)) continue;
+      if ((step.on_line | on_synthesiser | on_divide) != all_) continue;
+      const Served served = {step.line, step.doubler, on_divide, on_synthesiser};
+      if (ArePhasesNear(served, step.bound)) take(pair, served);
+    }
+  }
+  SmallSet MsOf(const std::vector<Step>& steps, int d) const;
+  bool ArePhasesNear(const Served& served, const std::optional<KruError>& bound) const;
+  bool IsJitterNear(const Step& step, int d) const;
+  Step StepWith(int m, const std::optional<KruError>& bound) const;
+  const Step& StepOf(int m) const {
+    auto step = steps_.end() - 1;
+    while (step->m > m) --step;
+    return *step;
+  }
+
+  // Whether a pin of a source keeps its range.
+  bool IsInRange(PinSource source, const KruRatio& ratio) const;
+  // Whether an output can be near enough on a source.
+  bool IsNearOn(PinSource source, std::size_t place, const KruBase& base, const KruRatio& ratio,
+                const std::optional<KruError>& bound) const;
+  bool IsJitterNearOn(PinSource source, std::size_t place, const KruBase& base,
+                      const std::optional<KruError>& bound) const;
+  bool IsBelow(const KruError& error, const std::optional<KruError>& bound) const;
+  // The outputs that can.
+  Outputs NearOn(PinSource source, const KruBase& base, const std::optional<KruError>& bound) const;
+  Outputs OnLine(const std::optional<KruError>& bound) const;
+  void AddSpans(Outputs served, int divide_halves, const std::optional<KruError>& bound,
+                Spans* spans) const;
+  // The ratios of M to D with which an output is near enough on a source.
+  Span SpanOn(PinSource source, std::size_t place, int divide_halves,
+              const std::optional<KruError>& bound) const;
+  double MostOf(std::size_t place, const std::optional<KruError>& bound) const;
+  bool IsDutyNearOn(PinSource source, std::size_t place, int divide_halves,
+                    const std::optional<KruError>& bound) const;
+
+  const KruTask& task_;
+  KruPhases& phases_;
+  bool all_met_;
+  bool with_ties_;
+  std::span<const int> divides_;
+  int largest_;
+  Outputs all_ = 0;
+  KruBase line_;
+  std::vector<Step> open_;   // one, without a bound
+  std::vector<Step> steps_;  // by their M
+  std::size_t changes_ = 0;  // of the steps
+};
+
+}  // namespace planner::search
+
+#endif  // VORKEL_PLANNER_SEARCH_KRUREACH_H_
