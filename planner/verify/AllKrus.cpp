@@ -175,7 +175,10 @@ class Krus {
     // All steps of PHASE_SHIFT are alike where no phase is asked for; but one that is 0 is not in
     // the way of the jitter.
     const int last = !is_sp_ ? 0 : has_phase_ ? hardware::kShiftSteps : 1;
-    for (set_.phase_shift = 0; set_.phase_shift <= last; ++set_.phase_shift) {
+    for (int shift = 0; shift <= last; ++shift) {
+      const std::optional<Bound::Figures> bound = RoughBound(shift);
+      if (!bound || IsBehind(*bound)) continue;
+      set_.phase_shift = shift;
       TryShift(options);
     }
     set_.phase_shift = 0;
@@ -187,19 +190,36 @@ class Krus {
     return best_.IsBehind(0, bound.rank_class, bound.error, bound.jitter, bound.margin);
   }
 
-  // Nothing when some output has no pin.
+  // With any PHASE_SHIFT. Nothing when some output has no pin. Keeps what it finds.
   std::optional<Bound::Figures> RoughBound() {
     Bound bound;
     const double input = request_.inputs[0].ToDouble();
+    rough_pins_.clear();
     for (std::size_t i = 0; i < request_.outputs.size(); ++i) {
       if (!request_.outputs[i].used) continue;
       for (const hardware::PinFacts& facts : hardware::kPins) {
         if (!CanBe(i, facts)) continue;
         const auto figures = Rough(i, facts.pin, input * RoughRatio(facts.pin));
-        if (figures) bound.AddPin(facts.pin, *figures);
+        if (!figures) continue;
+        bound.AddPin(facts.pin, *figures);
+        rough_pins_.push_back({i, facts.pin, *figures});
       }
       if (!bound.EndOutput()) return std::nullopt;
     }
+    return bound.Take(set_.m != 0, set_.divide_halves != 0);
+  }
+
+  // The same with the phases that a PHASE_SHIFT makes.
+  std::optional<Bound::Figures> RoughBound(int shift) {
+    Bound bound;
+    for (std::size_t place = 0; place < rough_pins_.size(); ++place) {
+      const RoughPin& one = rough_pins_[place];
+      if (place > 0 && one.output != rough_pins_[place - 1].output) bound.EndOutput();
+      Bound::Figures figures = one.figures;
+      if (request_.outputs[one.output].phase) figures.Worsen(RoughPhase(one, shift));
+      bound.AddPin(one.pin, figures);
+    }
+    bound.EndOutput();
     return bound.Take(set_.m != 0, set_.divide_halves != 0);
   }
 
@@ -322,6 +342,30 @@ class Krus {
     return phases_.emplace(key, error.Absolute()).first->second;
   }
 
+  struct RoughPin {
+    std::size_t output;
+    Pin pin;
+    Bound::Figures figures;
+  };
+
+  // The error of a phase, not above what it is.
+  const Bound::Figures& RoughPhase(const RoughPin& one, int shift) {
+    constexpr double kRounding = 1e-12;
+    auto& known = rough_phases_[one.output][static_cast<std::size_t>(one.pin)];
+    if (known.empty()) {
+      const Output& asked = request_.outputs[one.output];
+      const Rational allowed = asked.phase_tolerance.value_or(request_.phase_tolerance);
+      for (int i = 0; i <= hardware::kShiftSteps; ++i) {
+        const Rational degrees = Turned(verify::PhaseOf(one.pin, i) - *asked.phase).Absolute();
+        Bound::Figures figures;
+        figures.rank_class = degrees <= allowed ? 0 : 1;
+        figures.error = DegreesInUnits(degrees, allowed).ToDouble() * (1 - kRounding);
+        known.push_back(figures);
+      }
+    }
+    return known[static_cast<std::size_t>(shift)];
+  }
+
   // Whether nothing that these options allow could be the best or a trade-off.
   bool IsBehindExactly(const Options& options) const {
     Figures bound{.rank_class = 0, .worst_error = 0, .jitter = 0, .margin = 0, .vco = 0};
@@ -441,6 +485,9 @@ class Krus {
     double tolerance;
   };
   std::vector<RoughDemand> rough_;  // by output
+  std::vector<RoughPin> rough_pins_;  // of what is tried, output by output
+  // By output, pin and PHASE_SHIFT.
+  std::array<std::array<std::vector<Bound::Figures>, hardware::kPins.size() + 1>, 7> rough_phases_;
   std::map<std::tuple<std::size_t, Pin, int>, Rational> phases_;
   // By the code of the pin: its range, as usual and with feedback from CLK2X; and the jitter that
   // was asked for last.

@@ -94,7 +94,7 @@ TEST(Verify, AWrongNumberHasItsPathAndPlace) {
   EXPECT_EQ(wrong[0].path, "answers[0].worst_ppm");
   EXPECT_EQ(wrong[0].found, "1e-9");
   EXPECT_EQ(wrong[0].expected, "0.0");
-  EXPECT_EQ(wrong[0].line, 23);
+  EXPECT_EQ(wrong[0].line, 21);
   EXPECT_EQ(wrong[0].column, 18);
 }
 
@@ -114,21 +114,32 @@ TEST(Verify, SettingsThatThereAreNot) {
   EXPECT_EQ(wrong[0].expected, "1 to 80");
 }
 
-// The plan of the second bandwidth, right in all numbers, that says it is the first.
-TEST(Verify, WhatRanksBeforeTheFirstIsTold) {
-  string second = With(ByHand(), "OPTIMIZED", "LOW");
-  second = With(second, R"("tradeoff": true)", R"("tradeoff": false)");
+// The second bandwidth, right in all numbers, is not the first.
+TEST(Verify, ACandidateHasItsOwnNumber) {
+  const string second = With(With(ByHand(), "OPTIMIZED", "LOW"), R"("tradeoff": true)",
+                             R"("tradeoff": false)");
   const auto wrong = Wrong(second);
-  ASSERT_FALSE(wrong.empty());
-  bool is_told = false;
+  ASSERT_EQ(wrong.size(), 1u) << Text(wrong);
+  EXPECT_EQ(wrong[0].path, "answers[0].number");
+  EXPECT_EQ(wrong[0].expected, "2");
+}
+
+// Four halves of the divider of 4 are the 50 percent that it has anyway, and all numbers are right.
+// But the default comes before them, and before another bandwidth.
+TEST(Verify, WhatRanksBeforeTheFirstIsTold) {
+  const auto wrong = Wrong(With(With(ByHand(), "OPTIMIZED", "HIGH"), R"("high_time": 0)",
+                                R"("high_time": 4)"));
+  int told = 0;
   for (const Discrepancy& one : wrong) {
     if (one.kind != DiscrepancyKind::kRanksBefore) continue;
-    is_told = true;
+    ++told;
     EXPECT_EQ(one.path, "answers[0]");
     ASSERT_TRUE(one.settings);
-    EXPECT_EQ(std::get<LoopSettings>(*one.settings).bandwidth, Bandwidth::kOptimized);
+    const auto& first = std::get<LoopSettings>(*one.settings);
+    EXPECT_EQ(first.bandwidth, Bandwidth::kOptimized);
+    EXPECT_EQ(first.outputs[0].high_time, 0);
   }
-  EXPECT_TRUE(is_told) << Text(wrong);
+  EXPECT_EQ(told, 1) << Text(wrong);
 }
 
 TEST(Verify, AnotherDeviceIsNamed) {
@@ -165,7 +176,7 @@ TEST(Verify, ARequestThatCannotBeReadIsNamed) {
   ASSERT_EQ(wrong.size(), 1u);
   EXPECT_EQ(wrong[0].kind, DiscrepancyKind::kNoRequest);
   EXPECT_EQ(wrong[0].path, "request.outputs[0].frequency");
-  EXPECT_EQ(wrong[0].line, 10);
+  EXPECT_EQ(wrong[0].line, 9);
 }
 
 TEST(Verify, AnswersMustBeThere) {
@@ -200,7 +211,7 @@ TEST(Verify, PlansOfTheBundledDevicesAreRight) {
       {"vk40", {{"--in", "33.333,50"}, {"--out", "100,50"}, {"--duty", "40,-"}}},
       {"vk40", {{"--in", "100"}, {"--out", "200,-,50"}, {"--max-jitter", "120"}, {"--rank", "vco"},
                 {"--prefer-max-vco", "1"}, {"--primitive", "pll"}}},
-      {"vk20", {{"--in", "25"}, {"--out", "133.33,66.7"}, {"--phase", "-30,400/3"},
+      {"vk40", {{"--in", "25"}, {"--out", "133.33,66.7"}, {"--phase", "-30,400/3"},
                 {"--rank", "margin"}, {"--primitive", "pll"}}},
       {"vk10", {{"--in", "50"}, {"--out", "100,20,37.5"}, {"--primitive", "kru_sp"},
                 {"--input-jitter", "30"}}},
