@@ -170,18 +170,21 @@ class Krus {
   void TryPins() {
     const std::optional<Bound::Figures> rough = RoughBound();
     if (!rough || IsBehind(*rough)) return;
-    const Options options = ExactOptions();
-    if (options.empty() || IsBehindExactly(options)) return;
     // All steps of PHASE_SHIFT are alike where no phase is asked for; but one that is 0 is not in
     // the way of the jitter.
     const int last = !is_sp_ ? 0 : has_phase_ ? hardware::kShiftSteps : 1;
+    std::optional<Options> options;
     for (int shift = 0; shift <= last; ++shift) {
       const std::optional<Bound::Figures> bound = RoughBound(shift);
       if (!bound || IsBehind(*bound)) continue;
+      if (!options) {
+        options = ExactOptions();
+        if (options->empty() || IsBehindExactly(*options)) break;
+      }
       set_.phase_shift = shift;
-      TryShift(options);
+      TryShift(*options);
+      set_.phase_shift = 0;
     }
-    set_.phase_shift = 0;
   }
 
   // --- In doubles -------------------------------------------------------------------------
