@@ -87,13 +87,14 @@ class FrontMaker {
   std::vector<Member> members_;
 };
 
-// Answers of the front that are among those ranked, too, are the same in all.
-void TakeSources(const std::vector<Answer>& ranked, const Request& request, Front* front) {
+// Answers of the front that are among those ranked, too, are the same in all: where they come from,
+// and what the engine counted with.
+void TakeRanked(const std::vector<Answer>& ranked, const Request& request, Front* front) {
   for (Answer& answer : *front) {
     for (const Answer& other : ranked) {
       if (answer::SameSettings(answer, other) &&
           answer::OrderOf(request, answer) == answer::OrderOf(request, other)) {
-        answer.source = other.source;
+        answer = other;
       }
     }
   }
@@ -141,7 +142,7 @@ Plan Make(const Request& request, const Device& device, const Options& options) 
   }
   answer::Rank(request, &plan.ranked);
   plan.front = used.search ? FrontMaker(all, device).Make() : answer::FrontOf(request, plan.ranked);
-  TakeSources(plan.ranked, request, &plan.front);
+  TakeRanked(plan.ranked, request, &plan.front);
   Explain(&plan);
   return plan;
 }
