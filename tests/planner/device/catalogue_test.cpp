@@ -153,6 +153,8 @@ TEST_F(CatalogueTest, ABadFileIsToldOfWhenItIsMeant) {
   EXPECT_EQ(error.complaints[0].line, 2u);
   EXPECT_EQ(error.complaints[0].column, 12u);
   EXPECT_EQ(error.complaints[0].reason, "\"packages\" must be a list of texts");
+  // What follows a dash is a grade: no other device can be meant.
+  EXPECT_EQ(ErrorOf("a3-1").kind, Kind::kBadFile);
 }
 
 TEST_F(CatalogueTest, ABadFileBesideIsNotInTheWay) {
