@@ -70,6 +70,10 @@ TEST(Plan, ThreeVideoClocks) {
   ASSERT_FALSE(plan.front.empty());
   EXPECT_EQ(LoopOf(plan.front[0]), LoopOf(first));
   EXPECT_EQ(plan.front[0].source.variant, "largest VCO");
+  // It is the engine's answer in all, with what that counted with.
+  ASSERT_TRUE(first.searched_vco);
+  EXPECT_EQ(plan.front[0].searched_vco, first.searched_vco);
+  EXPECT_EQ(plan.front[0].outputs[0].searched, first.outputs[0].searched);
   EXPECT_EQ(plan.front.size(), 1u);
   EXPECT_TRUE(plan.front_cut.empty());
 
