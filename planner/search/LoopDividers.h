@@ -3,7 +3,8 @@
 // Search.h says which one is preferred. Around the divider that makes the frequency exactly, the
 // error of the frequency grows both ways; so the walk goes outwards from there and ends where the
 // frequency alone is worse than the best so far. Where no phase and no duty cycle is asked for it
-// takes one step each way.
+// takes one step each way. Likewise the margin falls both ways from a divider in the middle of the
+// range.
 //
 // M and dividers are in eighths.
 //
@@ -14,6 +15,7 @@
 #include <algorithm>
 #include <cmath>
 #include <cstddef>
+#include <cstdint>
 #include <vector>
 
 #include "hardware/Loop.h"
@@ -36,18 +38,32 @@ enum class Kind {
   kStillFraction,  // output 0 in eighths that are no whole number; no phase, 50 percent
 };
 
+// An error of an output, |error| / unit, with all that it takes to work it out again exactly.
+struct LoopError {
+  // kShape is the worse of phase and duty cycle. The jitter is that of all outputs.
+  enum class Demand : std::uint8_t { kNone, kFrequency, kShape, kJitter };
+  Near near;
+  Demand demand = Demand::kNone;
+  std::uint8_t place = 0;  // of the output among the used ones
+  // kFrequency: the ratio to the input. kShape: the divider, or 0 where nothing moves.
+  std::int32_t a = 0;
+  std::int32_t b = 0;
+  double jitter = 0;  // kJitter
+};
+
 class LoopDividers {
  public:
   // What a divider makes of its output; 0 where there is none that keeps the output's range.
   struct Choice {
     int divider = 0;
-    Near error;    // the worst of frequency, phase and duty cycle, in units
+    LoopError error;      // the worst of frequency, phase and duty cycle
     bool is_met = false;  // all three
-    Near margin;   // only where the request ranks by it
+    Near margin;          // only where the request ranks by it
   };
 
-  // Of a used output.
-  LoopDividers(const Request& request, int index, const Inputs& inputs, const LoopLimits& limits);
+  // Of a used output, at a place among those.
+  LoopDividers(const Request& request, int index, std::size_t place, const Inputs& inputs,
+               const LoopLimits& limits);
 
   int Index() const { return index_; }
   const FrequencyDemand& Frequency() const { return frequency_; }
@@ -69,16 +85,18 @@ class LoopDividers {
                                   above == 0 ? HUGE_VAL : LeastErrorOf(ideal, above));
     return kind == Kind::kMoving ? error : std::max(error, still_.error.value);
   }
-  Choice Choose(Kind kind, int m, int d) const;
+  Choice Choose(Kind kind, int m, int d) const {
+    const Choice widest = by_margin_ ? ChooseWidest(kind, m, d) : Choice();
+    return widest.divider != 0 ? widest : ChooseNearest(kind, m, d);
+  }
 
   // Phase and duty cycle together.
   const ShapeError& ShapeOf(Kind kind, int divider) const {
     return kind == Kind::kMoving ? moving_[static_cast<std::size_t>(divider / hardware::kEighths)]
                                  : still_;
   }
-  // The errors, exactly, and the largest in units.
-  answer::Errors ErrorsOf(Kind kind, int m, int d, int divider) const;
-  Rational WorstError(Kind kind, int m, int d, int divider) const;
+  // An error of this output, exactly.
+  Rational Exact(const LoopError& error) const;
   // The output as it is set.
   LoopOutput Set(Kind kind, int divider) const;
 
@@ -115,12 +133,17 @@ class LoopDividers {
   }
   bool IsBetter(Kind kind, int m, int d, const Choice& a, const Choice& b) const;
   Choice ChoiceOf(Kind kind, int m, int d, int divider) const;
+  answer::Errors ErrorsOf(Kind kind, int m, int d, int divider) const;
   bool CanMatter(double least_error, const Choice& best) const;
+  Choice ChooseWidest(Kind kind, int m, int d) const;
+  Choice ChooseNearest(Kind kind, int m, int d) const;
+  bool HasShape() const { return shape_.AsksForPhase() || shape_.AsksForDuty(); }
   bool IsWhole(Kind kind) const { return kind == Kind::kMoving || index_ != 0; }
 
   const Request& request_;
   const Output& asked_;
   int index_;
+  std::uint8_t place_;
   bool by_margin_;
   int largest_;  // in eighths
   FrequencyDemand frequency_;

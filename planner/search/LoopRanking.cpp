@@ -32,8 +32,8 @@ Rational ExactMarginOf(const Inputs& inputs, const Rational& ratio, const Range&
                   answer::MarginOf(inputs.highest * ratio, range));
 }
 
-Near SmallerOf(const Near& a, const Near& b) {
-  return {std::min(a.value, b.value), std::max(a.slack, b.slack)};
+bool IsSame(const LoopMargin& a, const LoopMargin& b) {
+  return a.of == b.of && a.a * b.b == b.a * a.b;
 }
 
 }  // namespace
@@ -66,7 +66,8 @@ bool LoopRanking::Choose(Kind kind, int m, int d, bool all_met, LoopPoint* point
   point->is_met = true;
   if (by_margin_) {
     const double vco = point->ratio / hardware::kEighths;
-    point->margin = MarginOf(lowest_input_ * vco, highest_input_ * vco, limits_.vco);
+    point->margin = {MarginOf(lowest_input_ * vco, highest_input_ * vco, limits_.vco),
+                     LoopMargin::Of::kVco, m, d};
   }
   for (std::size_t i = 0; i < outputs_.size(); ++i) {
     const LoopDividers::Choice choice = outputs_[i].Choose(kind, m, d);
@@ -74,7 +75,14 @@ bool LoopRanking::Choose(Kind kind, int m, int d, bool all_met, LoopPoint* point
     point->dividers[i] = static_cast<short>(choice.divider);
     point->error = LargerOf(point->error, choice.error);
     point->is_met = point->is_met && choice.is_met;
-    if (by_margin_) point->margin = SmallerOf(point->margin, choice.margin);
+    if (by_margin_) {
+      const LoopMargin margin = {choice.margin,
+                                 outputs_[i].Index() == 1 ? LoopMargin::Of::kOutput1
+                                                          : LoopMargin::Of::kOutput,
+                                 m, std::int64_t{d} * choice.divider};
+      // No bandwidth counts here.
+      if (IsBelow(margin, point->margin, Bandwidth::kOptimized)) point->margin = margin;
+    }
   }
   return true;
 }
@@ -84,30 +92,49 @@ LoopEntry LoopRanking::EntryOf(const LoopPoint& point, Bandwidth bandwidth) cons
   entry.point = point;
   entry.bandwidth = bandwidth;
   entry.jitter = jitter_.PeakToPeak(point.m, point.d, bandwidth);
-  entry.error = LargerOf(point.error, jitter_demand_.Error(entry.jitter));
+  entry.error = point.error;
+  if (jitter_demand_.IsAsked()) {
+    entry.error = LargerOf(point.error, {.near = jitter_demand_.Error(entry.jitter),
+                                         .demand = LoopError::Demand::kJitter,
+                                         .jitter = entry.jitter});
+  }
   if (by_margin_) {
-    entry.margin = SmallerOf(point.margin,
-                             MarginOf(lowest_input_ / point.d, highest_input_ / point.d,
-                                      limits_.PfdOf(bandwidth)));
+    entry.margin = {MarginOf(lowest_input_ / point.d, highest_input_ / point.d,
+                             limits_.PfdOf(bandwidth)),
+                    LoopMargin::Of::kPfd, 1, point.d};
+    if (IsBelow(point.margin, entry.margin, bandwidth)) entry.margin = point.margin;
   }
   return entry;
 }
 
-std::strong_ordering LoopRanking::CompareErrors(const LoopEntry& a, const LoopEntry& b) const {
-  if (IsSurelyBelow(a.error, b.error)) return std::strong_ordering::less;
-  if (IsSurelyBelow(b.error, a.error)) return std::strong_ordering::greater;
-  // The same ratio has the same dividers, and two errors of 0 are exact.
-  const bool is_same = a.point.ratio == b.point.ratio && a.point.kind == b.point.kind;
-  if (is_same && (!jitter_demand_.IsAsked() || a.jitter == b.jitter)) return kEqual;
-  if (a.error.value + a.error.slack + b.error.value + b.error.slack == 0) return kEqual;
-  return WorstError(a) <=> WorstError(b);
+std::strong_ordering LoopRanking::Compare(const LoopError& a, const LoopError& b) const {
+  if (IsSurelyBelow(a.near, b.near)) return std::strong_ordering::less;
+  if (IsSurelyBelow(b.near, a.near)) return std::strong_ordering::greater;
+  if (a.near.value + a.near.slack + b.near.value + b.near.slack == 0) return kEqual;
+  if (a.demand == LoopError::Demand::kFrequency && b.demand == LoopError::Demand::kFrequency) {
+    const auto order =
+        FrequencyDemand::Compare(outputs_[a.place].Frequency(), a.a, a.b,
+                                 outputs_[b.place].Frequency(), b.a, b.b);
+    if (order) return *order;
+  }
+  const bool is_same = a.demand == b.demand && a.place == b.place && a.a == b.a && a.b == b.b &&
+                       a.jitter == b.jitter;
+  return is_same ? kEqual : Exact(a) <=> Exact(b);
+}
+
+bool LoopRanking::IsBelow(const LoopMargin& a, const LoopMargin& b, Bandwidth bandwidth) const {
+  if (IsSurelyBelow(a.near, b.near)) return true;
+  if (IsSurelyBelow(b.near, a.near) || IsSame(a, b)) return false;
+  return Exact(a, bandwidth) < Exact(b, bandwidth);
 }
 
 // The largest first.
 std::strong_ordering LoopRanking::CompareMargins(const LoopEntry& a, const LoopEntry& b) const {
-  if (IsSurelyBelow(b.margin, a.margin)) return std::strong_ordering::less;
-  if (IsSurelyBelow(a.margin, b.margin)) return std::strong_ordering::greater;
-  return ExactMargin(b) <=> ExactMargin(a);
+  if (IsSurelyBelow(b.margin.near, a.margin.near)) return std::strong_ordering::less;
+  if (IsSurelyBelow(a.margin.near, b.margin.near)) return std::strong_ordering::greater;
+  const bool is_same_range = limits_.PfdOf(a.bandwidth) == limits_.PfdOf(b.bandwidth);
+  if (is_same_range && IsSame(a.margin, b.margin)) return kEqual;
+  return Exact(b.margin, b.bandwidth) <=> Exact(a.margin, a.bandwidth);
 }
 
 std::strong_ordering LoopRanking::CompareVcos(const LoopEntry& a, const LoopEntry& b) const {
@@ -117,7 +144,7 @@ std::strong_ordering LoopRanking::CompareVcos(const LoopEntry& a, const LoopEntr
 
 bool LoopRanking::IsBefore(const LoopEntry& a, const LoopEntry& b, bool are_met) const {
   std::strong_ordering order = kEqual;
-  const auto by_error = [&] { return order = CompareErrors(a, b), order != kEqual; };
+  const auto by_error = [&] { return order = Compare(a.error, b.error), order != kEqual; };
   const auto by_jitter = [&] { return order = CompareJitters(a.jitter, b.jitter), order != kEqual; };
   const auto by_margin = [&] { return order = CompareMargins(a, b), order != kEqual; };
   const auto by_vco = [&] { return order = CompareVcos(a, b), order != kEqual; };
@@ -140,26 +167,25 @@ bool LoopRanking::IsBefore(const LoopEntry& a, const LoopEntry& b, bool are_met)
   return answer::CompareSettings(SettingsOf(a), SettingsOf(b)).order < 0;
 }
 
-Rational LoopRanking::WorstError(const LoopEntry& entry) const {
-  Rational worst = jitter_demand_.ExactError(entry.jitter);
-  for (std::size_t i = 0; i < outputs_.size(); ++i) {
-    worst = std::max(worst, outputs_[i].WorstError(entry.point.kind, entry.point.m, entry.point.d,
-                                                   entry.point.dividers[i]));
-  }
-  return worst;
+Rational LoopRanking::Exact(const LoopError& error) const {
+  if (error.demand == LoopError::Demand::kNone) return 0;
+  if (error.demand == LoopError::Demand::kJitter) return jitter_demand_.ExactError(error.jitter);
+  return outputs_[error.place].Exact(error);
 }
 
-Rational LoopRanking::ExactMargin(const LoopEntry& entry) const {
-  const LoopPoint& point = entry.point;
-  Rational margin =
-      std::min(ExactMarginOf(inputs_, hardware::VcoRatio(point.m, point.d), limits_.vco),
-               ExactMarginOf(inputs_, Rational(1, point.d), limits_.PfdOf(entry.bandwidth)));
-  for (std::size_t i = 0; i < outputs_.size(); ++i) {
-    margin = std::min(
-        margin, outputs_[i].Limits().ExactMargin(
-                    point.m, std::int64_t{point.d} * point.dividers[i]));
+Rational LoopRanking::Exact(const LoopMargin& margin, Bandwidth bandwidth) const {
+  const Rational ratio(margin.a, margin.b);
+  switch (margin.of) {
+    case LoopMargin::Of::kVco:
+      return ExactMarginOf(inputs_, ratio / hardware::kEighths, limits_.vco);
+    case LoopMargin::Of::kPfd:
+      return ExactMarginOf(inputs_, ratio, limits_.PfdOf(bandwidth));
+    case LoopMargin::Of::kOutput:
+      return ExactMarginOf(inputs_, ratio, limits_.output);
+    case LoopMargin::Of::kOutput1:
+      break;
   }
-  return margin;
+  return ExactMarginOf(inputs_, ratio, limits_.output_1);
 }
 
 LoopSettings LoopRanking::SettingsOf(const LoopEntry& entry) const {
@@ -179,7 +205,7 @@ LoopSettings LoopRanking::SettingsOf(const LoopEntry& entry) const {
 Candidate LoopRanking::CandidateOf(const LoopEntry& entry) const {
   Candidate candidate{.settings = SettingsOf(entry),
                       .within = IsMet(entry),
-                      .worst_error = WorstError(entry),
+                      .worst_error = Exact(entry.error),
                       .max_jitter = std::nullopt};
   if (entry.jitter != answer::kUnknownJitter) candidate.max_jitter = entry.jitter;
   return candidate;

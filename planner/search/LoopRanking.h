@@ -9,6 +9,7 @@
 
 #include <array>
 #include <compare>
+#include <cstdint>
 #include <vector>
 
 #include "planner/Device.h"
@@ -21,15 +22,24 @@
 
 namespace planner::search {
 
+// The smallest margin, and of what it is: with the same range and ratio it is the same.
+struct LoopMargin {
+  enum class Of { kVco, kPfd, kOutput, kOutput1 };
+  Near near;
+  Of of = Of::kVco;
+  std::int64_t a = 0;  // the ratio to the input; of the VCO in eighths
+  std::int64_t b = 1;
+};
+
 // An M and a D with a divider for each used output.
 struct LoopPoint {
   int m = 0;  // in eighths
   int d = 0;
   Kind kind = Kind::kMoving;
   double ratio = 0;  // m / d, rounded: two are equal only when the quotients are
-  Near error;        // the worst of all outputs, but for the jitter
+  LoopError error;   // the worst of all outputs, but for the jitter
   bool is_met = false;  // all demands but for the jitter
-  Near margin;          // of VCO and outputs, where the request ranks by it
+  LoopMargin margin;    // of VCO and outputs, where the request ranks by it
   std::array<short, 7> dividers{};  // in eighths, of the used outputs in their order
 };
 
@@ -38,8 +48,8 @@ struct LoopEntry {
   LoopPoint point;
   Bandwidth bandwidth = Bandwidth::kOptimized;
   double jitter = answer::kUnknownJitter;
-  Near error;  // the worst of all demands
-  Near margin;
+  LoopError error;  // the worst of all demands
+  LoopMargin margin;
 };
 
 class LoopRanking {
@@ -57,8 +67,7 @@ class LoopRanking {
     return entry.point.is_met && jitter_demand_.IsMet(entry.jitter);
   }
 
-  // By their worst errors.
-  std::strong_ordering CompareErrors(const LoopEntry& a, const LoopEntry& b) const;
+  std::strong_ordering Compare(const LoopError& a, const LoopError& b) const;
   // Whether `a` ranks before `b`; `are_met` tells the class of both.
   bool IsBefore(const LoopEntry& a, const LoopEntry& b, bool are_met) const;
 
@@ -67,8 +76,12 @@ class LoopRanking {
  private:
   std::strong_ordering CompareMargins(const LoopEntry& a, const LoopEntry& b) const;
   std::strong_ordering CompareVcos(const LoopEntry& a, const LoopEntry& b) const;
-  Rational WorstError(const LoopEntry& entry) const;
-  Rational ExactMargin(const LoopEntry& entry) const;
+  Rational Exact(const LoopError& error) const;
+  const LoopError& LargerOf(const LoopError& a, const LoopError& b) const {
+    return Compare(a, b) < 0 ? b : a;
+  }
+  Rational Exact(const LoopMargin& margin, Bandwidth bandwidth) const;
+  bool IsBelow(const LoopMargin& a, const LoopMargin& b, Bandwidth bandwidth) const;
   LoopSettings SettingsOf(const LoopEntry& entry) const;
 
   const Request& request_;

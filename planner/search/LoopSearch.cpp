@@ -3,6 +3,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <compare>
 #include <cstddef>
 #include <optional>
 #include <tuple>
@@ -38,6 +39,8 @@ struct Group {
   std::vector<Best*> bests;
 };
 
+using Bounds = Staircase<LoopError>;
+
 class LoopSearch {
  public:
   LoopSearch(const Request& request, const Device& device, Primitive primitive)
@@ -72,7 +75,7 @@ class LoopSearch {
     outputs.reserve(request.outputs.size());
     for (std::size_t i = 0; i < request.outputs.size(); ++i) {
       if (request.outputs[i].used) {
-        outputs.emplace_back(request, static_cast<int>(i), inputs, limits);
+        outputs.emplace_back(request, static_cast<int>(i), outputs.size(), inputs, limits);
       }
     }
     return outputs;
@@ -153,7 +156,7 @@ class LoopSearch {
     best->is_met = is_met;
     if (!with_front) return;
     front_.Take(
-        entry, [&](const auto& a, const auto& b) { return ranking_.CompareErrors(a, b); },
+        entry, [&](const auto& a, const auto& b) { return ranking_.Compare(a.error, b.error); },
         [&](const auto& a, const auto& b) { return ranking_.IsBefore(a, b, is_met); });
   }
 
@@ -165,11 +168,11 @@ class LoopSearch {
       if (!best->is_met) open.push_back(best);
     }
     if (open.empty() || group->grid.rows.empty()) return;
-    Staircase staircase(FactorOf(*group));
+    Bounds bounds(FactorOf(*group));
     for (const Row& row : group->grid.rows) {
       for (const Sweep& sweep : sweeps_) {
         ForEachM(row, group->grid.step, sweep.m, kEverywhere, [&](int m) {
-          TakeNear(sweep.kind, m, row.d, open, with_front, &staircase);
+          TakeNear(sweep.kind, m, row.d, open, with_front, &bounds);
           return true;
         });
       }
@@ -177,18 +180,26 @@ class LoopSearch {
   }
 
   void TakeNear(Kind kind, int m, int d, const std::vector<Best*>& bests, bool with_front,
-                Staircase* staircase) {
+                Bounds* bounds) {
     const double ratio = static_cast<double>(m) / d;
     const double key = ratio / d;
-    const double bound = staircase->BoundOf(key);
-    for (const LoopDividers& output : outputs_) {
-      if (output.LeastError(kind, ratio) > bound) return;
+    const LoopError* const bound = bounds->BoundOf(key);
+    if (bound != nullptr) {
+      const double most = bound->near.value + bound->near.slack;
+      for (const LoopDividers& output : outputs_) {
+        if (output.LeastError(kind, ratio) > most) return;
+      }
     }
     LoopPoint point;
     ++counts_.judged;
     if (!ranking_.Choose(kind, m, d, false, &point)) return;
-    if (point.error.value - point.error.slack > bound) return;
-    staircase->Add(key, point.error.value + point.error.slack);
+    const auto compare = [&](const auto& a, const auto& b) { return ranking_.Compare(a, b); };
+    // With the same error, more jitter is behind.
+    if (bound != nullptr) {
+      const std::strong_ordering order = compare(point.error, *bound);
+      if (jitter_.IsKnown() ? order >= 0 : order > 0) return;
+    }
+    bounds->Add(key, point.error, compare);
     for (Best* best : bests) Take(ranking_.EntryOf(point, best->bandwidth), false, with_front, best);
   }
 

@@ -23,6 +23,12 @@ Near RatioRange::Margin(double ratio) const {
   return {margin, kRounding * (2 + std::abs(margin))};
 }
 
+double RatioRange::Middle() const {
+  // Where ratio / lowest - 1 and 1 - ratio / highest are the same.
+  const double per_lowest = has_lowest_ ? lowest_.Approximate() : HUGE_VAL;
+  return 2 / (per_lowest + highest_.Approximate());
+}
+
 Rational RatioRange::ExactMargin(std::int64_t a, std::int64_t b) const {
   const Rational ratio(a, b);
   return std::min(answer::MarginOf(inputs_.lowest * ratio, range_),

@@ -34,6 +34,8 @@ class RatioRange {
   double Lowest() const { return has_lowest_ ? 1 / lowest_.Approximate() : 0; }
   double Highest() const { return is_empty_ ? 0 : 1 / highest_.Approximate(); }
 
+  // The ratio with the largest margin, rounded; margins fall both ways from it.
+  double Middle() const;
   // The smallest distance of the frequency from an end of the range, as a fraction of that end.
   Near Margin(double ratio) const;
   Rational ExactMargin(std::int64_t a, std::int64_t b) const;

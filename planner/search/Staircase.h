@@ -7,37 +7,38 @@
 #ifndef VORKEL_PLANNER_SEARCH_STAIRCASE_H_
 #define VORKEL_PLANNER_SEARCH_STAIRCASE_H_
 
-#include <cmath>
-#include <cstddef>
+#include <utility>
 #include <vector>
 
 namespace planner::search {
 
+template <typename Error>
 class Staircase {
  public:
   // A key counts as larger than another when it is so by this factor: 0 when keys do not matter and
   // the smallest error of all is the bound, HUGE_VAL when nothing is to be left out.
   explicit Staircase(double factor) : factor_(factor) {}
 
-  // Up to which error something with a key can matter.
-  double BoundOf(double key) const {
-    double bound = HUGE_VAL;
+  // Below which error something with a key, which is above 0, can matter; null when any can.
+  const Error* BoundOf(double key) const {
+    const Error* bound = nullptr;
     for (const Step& step : steps_) {
       if (step.key < key * factor_) break;
-      bound = step.error;
+      bound = &step.error;
     }
     return bound;
   }
 
-  // `error` is not below the true one.
-  void Add(double key, double error) {
+  // `compare(a, b)` is the order of two errors.
+  template <typename Compare>
+  void Add(double key, const Error& error, const Compare& compare) {
     // The steps are by their keys, the largest first, and each has a smaller error than those
     // before it.
     auto place = steps_.begin();
     while (place != steps_.end() && place->key >= key) ++place;
-    if (place != steps_.begin() && (place - 1)->error <= error) return;
+    if (place != steps_.begin() && compare((place - 1)->error, error) <= 0) return;
     auto last = place;
-    while (last != steps_.end() && last->error >= error) ++last;
+    while (last != steps_.end() && compare(last->error, error) >= 0) ++last;
     if (last == place) {
       steps_.insert(place, {key, error});
     } else {
@@ -46,13 +47,11 @@ class Staircase {
     }
   }
 
+ private:
   struct Step {
     double key;
-    double error;
+    Error error;
   };
-  const std::vector<Step>& Steps() const { return steps_; }
-
- private:
   double factor_;
   std::vector<Step> steps_;
 };
