@@ -102,7 +102,7 @@ void CompareOnSmallDevices(Primitive primitive, int requests, int most_outputs) 
     ExpectAgreement(request, device, primitive, plain::Effort::kAll);
     tally.Count(Search(request, device, primitive));
   }
-  EXPECT_GT(tally.met, requests / 30);
+  EXPECT_GE(tally.met, requests / 30);
   EXPECT_GT(tally.missed, requests / 30);
 }
 
