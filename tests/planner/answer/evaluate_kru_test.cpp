@@ -1,6 +1,8 @@
 // What settings of a KRU make, worked out by hand.
 #include <gtest/gtest.h>
 
+#include <ostream>
+
 #include "planner/answer/Evaluate.h"
 #include "tests/planner/answer/answer_support.h"
 #include "tests/planner/answer/bundled_device.h"
@@ -118,6 +120,8 @@ struct Edge {
   Range range;
   bool feedback_2x;
 };
+
+void PrintTo(const Edge& edge, std::ostream* stream) { *stream << edge.what; }
 
 class KruEdges : public testing::TestWithParam<Edge> {};
 

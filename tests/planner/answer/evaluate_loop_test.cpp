@@ -1,6 +1,8 @@
 // What settings of a PLL or a TSYN make, worked out by hand.
 #include <gtest/gtest.h>
 
+#include <ostream>
+
 #include "planner/answer/Evaluate.h"
 #include "tests/planner/answer/answer_support.h"
 #include "tests/planner/answer/bundled_device.h"
@@ -109,6 +111,8 @@ struct Edge {
   Quantity quantity;
   Range range;
 };
+
+void PrintTo(const Edge& edge, std::ostream* stream) { *stream << edge.what; }
 
 class Edges : public testing::TestWithParam<Edge> {};
 

@@ -3,6 +3,7 @@
 
 #include <gtest/gtest.h>
 
+#include <ostream>
 #include <random>
 #include <string>
 
@@ -121,6 +122,9 @@ struct GradeName {
   const char* device;
   const char* grade;
 };
+void PrintTo(const GradeName& grade, std::ostream* stream) {
+  *stream << grade.device << " " << grade.grade;
+}
 constexpr GradeName kGrades[] = {{"vk10", "1"}, {"vk20", "2"}, {"vk40", "1"}, {"vk40", "2"}};
 
 class Against : public testing::TestWithParam<GradeName> {

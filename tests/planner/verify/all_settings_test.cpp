@@ -4,8 +4,16 @@
 
 #include <gtest/gtest.h>
 
+#include <ostream>
+
 #include "../search/drawn.h"
 #include "planner/search/Search.h"
+
+namespace hardware {
+
+static void PrintTo(Primitive primitive, std::ostream* stream) { *stream << Name(primitive); }
+
+}  // namespace hardware
 
 namespace planner::verify {
 
