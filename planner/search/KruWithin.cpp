@@ -76,14 +76,9 @@ class KruWithin::Question {
       for (const bool divide_by_2 : {false, true}) {
         for (const bool doubled : {false, true}) {
           if (doubled && (!feedback || task_.Outputs().front().Index() != 0)) continue;
-          for (const bool shifted : {false, true}) {
-            if (shifted && !asks_for_phase_) continue;
-            doubled_ = doubled;
-            shifted_ = shifted;
-            if (auto found = AnswerSp({.feedback = feedback, .divide_by_2 = divide_by_2})) {
-              return found;
-            }
-          }
+          doubled_ = doubled;
+          const KruBase line = {.feedback = feedback, .divide_by_2 = divide_by_2};
+          if (auto found = AnswerSp(line)) return found;
         }
       }
     }
@@ -213,16 +208,26 @@ class KruWithin::Question {
 
   // --- KRU_SP -------------------------------------------------------------------------------------
 
+  // Only the jitter tells a PHASE_SHIFT of 0 from others.
   std::optional<Settings> AnswerSp(const KruBase& line) {
+    shifts_.reset();
+    shifts_[0] = true;
+    shifted_ = false;
+    if (!asks_for_phase_) return AnswerSpWithShifts(line);
+    if (!asks_for_jitter_) {
+      shifts_.set();
+      return AnswerSpWithShifts(line);
+    }
+    if (auto settings = AnswerSpWithShifts(line)) return settings;
+    shifts_.flip();
+    shifted_ = true;
+    return AnswerSpWithShifts(line);
+  }
+
+  std::optional<Settings> AnswerSpWithShifts(const KruBase& line) {
     const Outputs on_line = line.feedback ? ServedBy(false, false, line) : 0;
     std::vector<Served> divides = {{line, 0}};
-    if (line.feedback) {
-      for (const int halves : divides_) {
-        KruBase base = line;
-        base.divide_halves = halves;
-        AddServed({base, ServedBy(false, true, base)}, &divides);
-      }
-    }
+    if (line.feedback) AddDivides(line, &divides);
     for (const Served& ratio : RatiosOf(line)) {
       for (const Served& divide : divides) {
         if ((on_line | ratio.outputs | divide.outputs) != all_) continue;
@@ -236,6 +241,30 @@ class KruWithin::Question {
     return std::nullopt;
   }
 
+  // The divides of CLKDV that serve different outputs.
+  void AddDivides(const KruBase& line, std::vector<Served>* divides) const {
+    // About those with which the frequency of an output is right.
+    std::vector<Span> spans;
+    for (std::size_t i = 0; i < task_.Outputs().size(); ++i) {
+      const FrequencyDemand& frequency = task_.Outputs()[i].Frequency();
+      const double exact = (line.divide_by_2 ? 1 : 2) * frequency.InputPerAsked();
+      const double least = 1 - frequency.Allowed();
+      spans.push_back(OwnOf(i).frequency || least <= 0
+                          ? Span{0, HUGE_VAL}
+                          : Span{exact / (1 + frequency.Allowed()) * (1 - kWider),
+                                 exact / least * (1 + kWider)});
+    }
+    KruBase base = line;
+    for (const int halves : divides_) {
+      const bool is_right = std::any_of(spans.begin(), spans.end(), [&](const Span& span) {
+        return span.lowest <= halves && halves <= span.highest;
+      });
+      if (!is_right) continue;
+      base.divide_halves = halves;
+      AddServed({base, ServedBy(false, true, base)}, divides);
+    }
+  }
+
   // The M and D that serve different outputs, and none, which serve none.
   std::vector<Served> RatiosOf(const KruBase& line) const {
     std::vector<Served> ratios = {{line, 0}};
@@ -244,6 +273,7 @@ class KruWithin::Question {
     std::vector<Span> spans;
     std::vector<double> ends;
     ForEachPin(true, false, [&](const KruPin& pin) {
+      if (pin.facts->pin != Pin::kClkfx) return;  // CLKFX180 has the same
       for (std::size_t i = 0; i < task_.Outputs().size(); ++i) {
         const std::optional<Span> span = SpanOf(pin, i, line);
         if (!span) continue;
@@ -282,8 +312,7 @@ class KruWithin::Question {
   // --- KRU_CLKGEN ---------------------------------------------------------------------------------
 
   std::optional<Settings> AnswerClkgen() {
-    doubled_ = false;
-    shifted_ = false;
+    shifts_[0] = true;
     // First without CLKFXDV.
     if (auto settings = AnswerClkgenWith({})) return settings;
     for (const int halves : divides_) {
@@ -353,13 +382,7 @@ class KruWithin::Question {
 
   // The first PHASE_SHIFT with which each output has a pin, and the first such pins.
   std::optional<Settings> WithPins(const KruBase& base) const {
-    Shifts shifts;
-    if (shifted_) {
-      shifts.set();
-      shifts[0] = false;
-    } else {
-      shifts[0] = true;
-    }
+    Shifts shifts = shifts_;
     const std::size_t count = task_.Outputs().size();
     std::array<std::vector<const KruPin*>, kMostOutputs> pins;
     for (std::size_t i = 0; i < count && shifts.any(); ++i) {
@@ -405,7 +428,8 @@ class KruWithin::Question {
   bool asks_for_phase_ = false;
   std::vector<int> divides_;
   bool doubled_ = false;
-  bool shifted_ = false;
+  Shifts shifts_;  // those that are tried
+  bool shifted_ = false;  // they are above 0
 };
 
 std::optional<Settings> KruWithin::Find(const Relaxed& relaxed) const {
