@@ -24,20 +24,18 @@ Answer AnswerOf(const Request& request, const Device& device, Primitive primitiv
   return answer::Evaluate(request, device, found.settings, source, found.searched);
 }
 
-// The runs for the variants of a PLL or a TSYN. The engine knows bandwidth LOW and no other: the
-// run for OPTIMIZED is that for HIGH, too.
+// The runs for the variants of a PLL or a TSYN, of which several can be the same.
 class LoopRuns {
  public:
   LoopRuns(const Request& request, const Device& device, Primitive primitive)
       : request_(request), device_(device), primitive_(primitive) {}
 
   Outcome Of(const Variant& variant) {
-    Variant key = variant;
-    if (key.bandwidth == Bandwidth::kHigh) key.bandwidth = Bandwidth::kOptimized;
+    const Variant key = Effective(request_, device_, primitive_, variant);
     auto run = std::find_if(runs_.begin(), runs_.end(),
                             [&key](const auto& one) { return one.first == key; });
     if (run == runs_.end()) {
-      runs_.emplace_back(key, RunLoop(request_, device_, primitive_, key, false));
+      runs_.emplace_back(key, RunLoop(request_, device_, primitive_, variant, false));
       run = runs_.end() - 1;
     }
     Outcome outcome = run->second;

@@ -33,6 +33,11 @@ using Outcome = std::variant<Found, Refused>;
 Outcome RunLoop(const Request& request, const Device& device, Primitive primitive,
                 const Variant& variant, bool trace);
 
+// A variant without what makes no difference to the run of a PLL or a TSYN: variants that are then
+// the same have the same outcome, but for the bandwidth of the settings.
+Variant Effective(const Request& request, const Device& device, Primitive primitive,
+                  const Variant& variant);
+
 // A KRU that the device has; with one phase for each output of the request, of which those of
 // unused ones do not count.
 Outcome RunKru(const Request& request, const Device& device, Primitive primitive,

@@ -22,6 +22,17 @@ std::mutex& LoopRuns() {
 // Half an eighth is far more than the engine's doubles are off.
 int Eighths(double value) { return static_cast<int>(std::lround(value * hardware::kEighths)); }
 
+bool IsClosest(const Request& request, const Variant& variant) {
+  return variant.closest || request.AsksForShape();
+}
+
+// The engine gives a fraction to the first output that it is asked for. Only output 0 can have one,
+// and only where there are few outputs, be they used or not.
+bool IsWhole(const Request& request, const Variant& variant) {
+  return variant.whole_divider_0 || !request.outputs.front().used ||
+         request.outputs.size() >= hardware::kWholeOutputs;
+}
+
 class LoopRun {
  public:
   LoopRun(const Request& request, const Device& device, Primitive primitive,
@@ -32,7 +43,7 @@ class LoopRun {
         variant_(variant),
         trace_(trace),
         used_(UsedOutputs(request)),
-        closest_(variant.closest || request.AsksForShape()),
+        closest_(IsClosest(request, variant)),
         object_(MakeObject(device)) {}
 
   Outcome Run() {
@@ -54,13 +65,6 @@ class LoopRun {
                                          : Ip::PllEntry::kTsynFrequencies;
   }
 
-  // The engine gives a fraction to the first output that it is asked for. Only output 0 can have
-  // one, and only where there are few outputs, be they used or not.
-  bool IsWhole() const {
-    return variant_.whole_divider_0 || !request_.outputs.front().used ||
-           request_.outputs.size() >= hardware::kWholeOutputs;
-  }
-
   int Calculate() {
     const double first = request_.inputs[0].ToDouble();
     const double second = request_.inputs.size() > 1 ? request_.inputs[1].ToDouble() : 0.0;
@@ -69,12 +73,14 @@ class LoopRun {
     const std::lock_guard lock(LoopRuns());
     if (!closest_) {
       return object_->CalculateMinPowerOutFreqs(frequencies, first, second, Count(),
-                                                variant_.prefer_max_vco, IsWhole(), Code(),
+                                                variant_.prefer_max_vco, IsWhole(request_, variant_),
+                                                Code(),
                                                 trace_);
     }
     return object_->GetClosestSolution(frequencies, ListOf(Asked(&Output::phase)),
                                        ListOf(Asked(&Output::duty)), first, second, Count(),
-                                       variant_.prefer_max_vco, IsWhole(), Code(), trace_);
+                                       variant_.prefer_max_vco, IsWhole(request_, variant_),
+                                                Code(), trace_);
   }
 
   // 0 of the outputs that ask for none.
@@ -145,6 +151,26 @@ class LoopRun {
 };
 
 }  // namespace
+
+Variant Effective(const Request& request, const Device& device, Primitive primitive,
+                  const Variant& variant) {
+  Variant same = variant;
+  same.name.clear();
+  same.feedback = false;
+  // The engine knows bandwidth LOW and no other, and of LOW only the highest PFD frequency. It takes
+  // a D that is a whole number but for less than a thousandth, so that no PFD frequency is above the
+  // input by more than that; where this is below both limits they are the same to it.
+  const Range& low = device.Loop(primitive).PfdOf(Bandwidth::kLow);
+  const Rational most = request.inputs.front() * Rational(1001, 1000);
+  if (same.bandwidth == Bandwidth::kHigh || most < low.highest) {
+    same.bandwidth = Bandwidth::kOptimized;
+  }
+  same.closest = IsClosest(request, variant);
+  // What takes the smallest VCO prefers none.
+  same.prefer_max_vco = same.closest && variant.prefer_max_vco;
+  same.whole_divider_0 = primitive == Primitive::kTsyn && IsWhole(request, variant);
+  return same;
+}
 
 Outcome RunLoop(const Request& request, const Device& device, Primitive primitive,
                 const Variant& variant, bool trace) {

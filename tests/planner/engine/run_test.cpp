@@ -2,10 +2,14 @@
 
 #include <gtest/gtest.h>
 
+#include <string>
 #include <thread>
+#include <utility>
+#include <vector>
 
 #include "engine/Ip_VorkelImp.h"
 #include "engine/pll/Stages.h"
+#include "tests/compare/Random.h"
 #include "tests/host/device_folder.h"
 #include "tests/planner/engine/devices.h"
 
@@ -212,6 +216,73 @@ TEST_F(RunTest, SaysWhatTheEngineSaysOfAKru) {
             "The KRU_SP cannot support the requested output frequencies and phases.");
   EXPECT_EQ(Sentence(KruRun(Primitive::kKruClkgen, Ask({100}, {Out(1000)}), {0}, false)),
             "The KRU_CLKGEN cannot support the requested output frequency and phase.");
+}
+
+// What one run stands for: all variants of it, run by themselves.
+TEST_F(RunTest, VariantsWithTheSameEffectHaveTheSameOutcome) {
+  compare::Random random(1);
+  int same = 0;
+  int different = 0;
+  const auto text_of = [](Outcome outcome) {
+    if (const auto* const refused = std::get_if<Refused>(&outcome)) return refused->sentence;
+    const Found& found = std::get<Found>(outcome);
+    const auto& loop = std::get<LoopSettings>(found.settings);
+    std::string text = compare::Number("%.17g", *found.searched.vco) + " " +
+                       std::to_string(loop.m) + "/" + std::to_string(loop.d);
+    for (const planner::LoopOutput& output : loop.outputs) {
+      text += " " + std::to_string(output.divider) + "," + std::to_string(output.phase) + "," +
+              std::to_string(output.high_time);
+    }
+    return text;
+  };
+  for (int i = 0; i < 60; ++i) {
+    // The PFD of the TSYN ends at 60 MHz in LOW, that of the PLL at 300.
+    Request request = Ask({random.OneIn(3) ? random.Pick(std::vector<Rational>{300, 400, 60, 61})
+                                           : Rational(random.Int(20, 70))},
+                          {});
+    const int outputs = random.Int(1, 6);
+    const bool shaped = random.OneIn(2);
+    for (int n = 0; n < outputs; ++n) {
+      request.outputs.push_back(Out(Rational(random.Int(20, 2000), 5)));
+      if (shaped && random.OneIn(2)) request.outputs.back().phase = random.Int(0, 359);
+    }
+    if (random.OneIn(4)) request.outputs.insert(request.outputs.begin(), Out({}));
+    for (const Primitive primitive : {Primitive::kPll, Primitive::kTsyn}) {
+      std::vector<std::pair<Variant, std::string>> seen;
+      for (const Variant& variant : planner::engine::Variants(request, primitive)) {
+        const Variant effective =
+            planner::engine::Effective(request, device_, primitive, variant);
+        const std::string outcome = text_of(RunLoop(primitive, request, variant));
+        for (const auto& [other, known] : seen) {
+          if (other != effective) {
+            if (known != outcome) ++different;
+            continue;
+          }
+          EXPECT_EQ(outcome, known) << i << " " << variant.name;
+          ++same;
+        }
+        seen.emplace_back(effective, outcome);
+      }
+    }
+  }
+  EXPECT_GT(same, 300);
+  EXPECT_GT(different, 100);
+}
+
+// The limit of LOW counts for an input above it, and for one that a D just below 1 takes above it.
+TEST_F(RunTest, LowIsTheSameOnlyBelowItsLimit) {
+  const auto is_same = [&](Primitive primitive, const Rational& input) {
+    const Request request = Ask({input}, {Out(200)});
+    return planner::engine::Effective(request, device_, primitive,
+                                      {.bandwidth = Bandwidth::kLow}) ==
+           planner::engine::Effective(request, device_, primitive,
+                                      {.bandwidth = Bandwidth::kHigh});
+  };
+  EXPECT_TRUE(is_same(Primitive::kTsyn, 59));
+  EXPECT_FALSE(is_same(Primitive::kTsyn, Rational(5999, 100)));
+  EXPECT_FALSE(is_same(Primitive::kTsyn, 61));
+  EXPECT_TRUE(is_same(Primitive::kPll, 299));
+  EXPECT_FALSE(is_same(Primitive::kPll, 300));
 }
 
 // What an object answers that looks its device up by the name, and is asked as a script asks.
