@@ -2,6 +2,7 @@
 //
 //   planner_bench [--benchmark_filter=REGEX]
 //
+// plan/NAME is a whole plan, plan/ordinary and plan/any are those of many drawn requests;
 // search/NAME is a request to all primitives of a device; drawn/PRIMITIVE are requests drawn at
 // random on the bundled devices, with the slowest of them beside the mean; within/NAME are
 // questions with demands and limits switched off. Times are those of the processor.
@@ -21,6 +22,8 @@
 #include "hardware/Primitive.h"
 #include "planner/Device.h"
 #include "planner/Request.h"
+#include "bench/PlannerRequests.h"
+#include "planner/plan/Plan.h"
 #include "planner/search/Search.h"
 #include "planner/search/Within.h"
 #include "tests/planner/search/drawn.h"
@@ -29,59 +32,8 @@ namespace bench {
 namespace {
 
 using hardware::Primitive;
-using hardware::Rational;
 using planner::Device;
-using planner::Output;
 using planner::Request;
-
-struct Named {
-  std::string name;
-  Request request;
-};
-
-Output Clock(const Rational& frequency, std::optional<Rational> phase = {},
-             std::optional<Rational> duty = {}) {
-  Output output;
-  output.frequency = frequency;
-  output.phase = std::move(phase);
-  output.duty = std::move(duty);
-  return output;
-}
-
-Request Of(std::vector<Rational> inputs, std::vector<Output> outputs) {
-  Request request;
-  request.inputs = std::move(inputs);
-  request.outputs = std::move(outputs);
-  return request;
-}
-
-// Those of README.md and examples/requests, and some that are slow.
-std::vector<Named> NamedRequests() {
-  const Rational hd(297, 2);
-  const Rational half(297, 4);
-  std::vector<Named> all = {
-      {"video_exact", Of({27}, {Clock(hd), Clock(half), Clock(27)})},
-      {"ethernet", Of({25}, {Clock(125), Clock(Rational(125, 2)), Clock(25)})},
-      {"phase_333", Of({100}, {Clock(333, 90)})},
-      {"video_from_100", Of({100}, {Clock(hd), Clock(half), Clock(27)})},
-      {"video_shape", Of({27}, {Clock(hd), Clock(half, 90, 50), Clock(27)})},
-      {"delay_lines", Of({100}, {Clock(100, 0), Clock(50, 180), Clock(150, 0)})},
-      {"memory", Of({100}, {Clock(400), Clock(200), Clock(200, 90), Clock(100, 0, 50)})},
-      {"odd_from_800",
-       Of({800}, {Clock(Rational(333333, 1000)), Clock(Rational(1481, 10)), Clock(27)})},
-      {"seven", Of({100, 101}, {Clock(Rational(1481, 10), 90, 40), Clock(Rational(747, 10), 33, 60),
-                                Clock(27, 10), Clock(Rational(333, 10), 200),
-                                Clock(Rational(611, 10), 45, 25), Clock(13, 120), Clock(91, 70)})},
-      {"six_delay_lines",
-       Of({50}, {Clock(100, 10), Clock(50, 33), Clock(150, 70), Clock(75, 99), Clock(25, 111),
-                 Clock(60, 123)})},
-  };
-  all[5].request.feedback = true;
-  all[4].request.bandwidth = hardware::Bandwidth::kLow;
-  all[4].request.input_jitter = 50;
-  all[4].request.tolerance = 20;
-  return all;
-}
 
 double Seconds() {
   timespec now{};
@@ -110,6 +62,29 @@ void SearchOne(benchmark::State& state, const Device& device, const Request& req
     const auto found = planner::search::Search(request, device, primitive);
     benchmark::DoNotOptimize(found.best.data());
   }
+}
+
+void MakePlan(benchmark::State& state, const Device& device, const Request& request) {
+  for (auto _ : state) {
+    const planner::plan::Plan plan = planner::plan::Make(request, device);
+    benchmark::DoNotOptimize(plan.ranked.data());
+  }
+}
+
+// Plans of many requests, each once.
+void MakePlans(benchmark::State& state, const Device& device,
+               const std::vector<Request>& requests) {
+  double slowest = 0;
+  for (auto _ : state) {
+    for (const Request& request : requests) {
+      const double start = Seconds();
+      const planner::plan::Plan plan = planner::plan::Make(request, device);
+      benchmark::DoNotOptimize(plan.ranked.data());
+      slowest = std::max(slowest, Seconds() - start);
+    }
+  }
+  state.SetItemsProcessed(state.iterations() * static_cast<std::int64_t>(requests.size()));
+  state.counters["slowest_ms"] = slowest * 1e3;
 }
 
 // Many requests, each once.
@@ -190,7 +165,12 @@ void AskWithin(benchmark::State& state, const Device& device, const Request& req
 
 void RegisterAll() {
   static const Device device = drawn::Bundled("vk40", "2");
-  for (const Named& named : NamedRequests()) {
+  std::vector<Named> all = ReadmeRequests();
+  for (Named& slow : SlowRequests()) all.push_back(std::move(slow));
+  for (const Named& named : all) {
+    benchmark::RegisterBenchmark(("plan/" + named.name).c_str(), [named](auto& state) {
+      MakePlan(state, device, named.request);
+    })->Unit(benchmark::kMicrosecond);
     benchmark::RegisterBenchmark(("search/" + named.name).c_str(), [named](auto& state) {
       SearchAll(state, device, named.request);
     })->Unit(benchmark::kMicrosecond);
@@ -204,6 +184,20 @@ void RegisterAll() {
       })->Unit(benchmark::kMicrosecond);
     }
   }
+  constexpr int kPlans = 300;
+  drawn::Random random(1);
+  std::vector<Request> ordinary;
+  std::vector<Request> any;
+  for (int i = 0; i < kPlans; ++i) {
+    ordinary.push_back(OrdinaryRequest(random));
+    any.push_back(AnyRequest(random, device));
+  }
+  benchmark::RegisterBenchmark("plan/ordinary", [ordinary](auto& state) {
+    MakePlans(state, device, ordinary);
+  })->Unit(benchmark::kMillisecond);
+  benchmark::RegisterBenchmark("plan/any", [any](auto& state) {
+    MakePlans(state, device, any);
+  })->Unit(benchmark::kMillisecond);
   for (const Primitive primitive : device.primitives) {
     for (const bool large : {false, true}) {
       const std::string name =
