@@ -1,7 +1,6 @@
 #include "cli/Devices.h"
 
 #include <fmt/format.h>
-#include <sys/stat.h>
 
 #include <algorithm>
 #include <utility>
@@ -9,6 +8,7 @@
 
 #include "cli/Failure.h"
 #include "host/bundled/device/DeviceCatalogue.h"
+#include "host/bundled/device/Shipped.h"
 #include "planner/device/Check.h"
 #include "planner/read/MistakeText.h"
 #include "planner/report/DoubtText.h"
@@ -20,21 +20,12 @@ namespace {
 
 using planner::device::PartError;
 
-bool IsFolder(const std::string& path) {
-  struct stat status {};
-  return stat(path.c_str(), &status) == 0 && S_ISDIR(status.st_mode);
-}
-
 }  // namespace
 
 std::unique_ptr<const planner::device::Files> DeviceFiles(const Setting& setting) {
   std::vector<std::string> folders = setting.device_folders;
-  // Installed, the program stands beside the folder; in the build tree, above the package.
-  for (const char* const folder : {"/devices", "/ip_vorkel1.1/devices"}) {
-    if (!IsFolder(setting.folder + folder)) continue;
-    folders.push_back(setting.folder + folder);
-    break;
-  }
+  std::string own = ::Device::Shipped(setting.folder, "devices");
+  if (!own.empty()) folders.push_back(std::move(own));
   return planner::device::HostFiles(::Device::DeviceCatalogue::ListFolders(std::move(folders)));
 }
 

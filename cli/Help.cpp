@@ -21,8 +21,6 @@ namespace {
 using planner::report::Pairs;
 using planner::report::Style;
 
-constexpr const char* kVersion = "1.1";
-
 // How values are written, with an option that a command has for them.
 struct ValueHelp {
   std::string_view option;
@@ -41,18 +39,6 @@ constexpr ValueHelp kValues[] = {
      "ns; write 8ns,16ns. A decimal number has a point, 148.5."},
 };
 
-const Pairs& Statuses() {
-  static const Pairs kStatuses = {
-      {"0", "solved, or shown what was asked for; explain: also what is not possible"},
-      {"1", "there is no configuration; the reason is on standard error"},
-      {"2", "wrong usage, or a file or standard output that cannot be read or written"},
-      {"3", "solved, but something is outside its tolerance or range"},
-      {"4", "the program itself failed"},
-      {"5", "it could not be set up: packages cannot be installed, or the build fails"},
-  };
-  return kStatuses;
-}
-
 Style StyleOfHelp(const Setting& setting) { return {false, setting.out_width}; }
 
 std::string Section(const std::string& heading, const Pairs& lines, const Style& style) {
@@ -64,7 +50,7 @@ std::string Labelled(const OptionRow& row) {
                                  : fmt::format("{} {}", row.name, row.placeholder);
 }
 
-Pairs Lines(const std::vector<const OptionRow*>& rows) {
+Pairs Described(const std::vector<const OptionRow*>& rows) {
   Pairs lines;
   for (const OptionRow* row : rows) lines.emplace_back(Labelled(*row), row->description);
   return lines;
@@ -90,10 +76,7 @@ Pairs OtherOptions() {
 }
 
 std::string Values(std::string_view command, const Style& style) {
-  Pairs lines;
-  for (const ValueHelp& value : kValues) {
-    if (Takes(command, value.option)) lines.emplace_back(value.name, value.description);
-  }
+  const Pairs lines = ValuesOf(command);
   return lines.empty() ? "" : "\n" + Section("Values", lines, style);
 }
 
@@ -114,12 +97,12 @@ std::string WholeHelp(const Setting& setting) {
       style, "Plans clocks: finds the settings of a device's clock primitives, VCO, M, D, dividers "
              "and pins, with their errors and their jitter.");
   text += "\n" + Section("Commands", commands, style);
-  text += "\n" + Section("Options of plan", Lines(OptionsOf("plan")), style);
+  text += "\n" + Section("Options of plan", Described(OptionsOf("plan")), style);
   text += "\n" + Section("Options of other commands", OtherOptions(), style);
   text += fmt::format("\n{} help COMMAND lists exactly those that a command takes.\n",
                       setting.program);
   text += Values("plan", style);
-  text += "\n" + Section("Exit status", Statuses(), style);
+  text += "\n" + Section("Exit status", ExitStatuses(), style);
   text += "\nExamples:\n";
   for (const Command& command : Commands()) {
     if (command.is_shown) text += Example(command, setting);
@@ -135,7 +118,7 @@ std::string HelpOn(const Command& command, const Setting& setting) {
                      planner::report::Paragraph(style, description + ".");
   const std::vector<const OptionRow*> options = OptionsOf(command.name);
   if (!options.empty()) {
-    text += "\n" + Section("Options", Lines(options), style) + Values(command.name, style);
+    text += "\n" + Section("Options", Described(options), style) + Values(command.name, style);
   }
   if (!command.remark.empty()) {
     text += "\n" + planner::report::Paragraph(style, std::string(command.remark));
@@ -144,6 +127,26 @@ std::string HelpOn(const Command& command, const Setting& setting) {
 }
 
 }  // namespace
+
+Lines ValuesOf(std::string_view command) {
+  Lines lines;
+  for (const ValueHelp& value : kValues) {
+    if (Takes(command, value.option)) lines.emplace_back(value.name, value.description);
+  }
+  return lines;
+}
+
+const Lines& ExitStatuses() {
+  static const Lines kStatuses = {
+      {"0", "solved, or shown what was asked for; explain: also what is not possible"},
+      {"1", "there is no configuration; the reason is on standard error"},
+      {"2", "wrong usage, or a file or standard output that cannot be read or written"},
+      {"3", "solved, but something is outside its tolerance or range"},
+      {"4", "the program itself failed"},
+      {"5", "it could not be set up: packages cannot be installed, or the build fails"},
+  };
+  return kStatuses;
+}
 
 std::string UsageLine(std::string_view name, const Setting& setting) {
   const Command* command = FindCommand(name);

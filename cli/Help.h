@@ -4,11 +4,20 @@
 
 #include <string>
 #include <string_view>
+#include <utility>
 #include <vector>
 
 #include "cli/Setting.h"
 
 namespace cli {
+
+inline constexpr const char* kVersion = "1.1";
+
+// Words and what they mean.
+using Lines = std::vector<std::pair<std::string, std::string>>;
+// How the values are written that a command takes.
+Lines ValuesOf(std::string_view command);
+const Lines& ExitStatuses();
 
 // The usage line of a command; of none, or of one that there is not, that of the program.
 std::string UsageLine(std::string_view command, const Setting& setting);

@@ -4,10 +4,13 @@
 #include <unistd.h>
 
 #include <algorithm>
+#include <cerrno>
 #include <cstdlib>
 #include <filesystem>
 #include <string_view>
 #include <system_error>
+
+#include "host/bundled/device/Shipped.h"
 
 namespace cli {
 
@@ -33,14 +36,33 @@ bool HasColour() {
          isatty(STDOUT_FILENO);
 }
 
+// Whether the program does not stand in a build tree, where a script of the checkout starts it.
+bool IsInstalled(const std::string& folder) {
+  return !::Device::Shipped(folder, "devices").starts_with(folder + "/");
+}
+
+// The word by which the program was called, where it can be pasted into a shell as it is.
+std::string CalledAs() {
+  constexpr std::string_view kPlain =
+      "abcdefghijklmnopqrstuvwxyzABCDEFGHIJKLMNOPQRSTUVWXYZ0123456789_-+./";
+  const std::string_view word = program_invocation_name;
+  const bool is_plain =
+      !word.empty() && word.find_first_not_of(kPlain) == std::string_view::npos;
+  return is_plain ? std::string(word) : "vorkel";
+}
+
 }  // namespace
 
 Setting SettingOfProcess() {
   Setting setting;
-  const std::string program = Variable("VORKEL_PROGRAM");
-  if (!program.empty()) setting.program = program;
   std::error_code error;
   setting.folder = std::filesystem::read_symlink("/proc/self/exe", error).parent_path().native();
+  const std::string program = Variable("VORKEL_PROGRAM");
+  if (!program.empty()) {
+    setting.program = program;
+  } else if (IsInstalled(setting.folder)) {
+    setting.program = CalledAs();
+  }
   std::string_view folders;
   const std::string devices = Variable("VORKEL_DEVICES");
   for (folders = devices; !folders.empty();) {

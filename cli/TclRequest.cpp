@@ -13,6 +13,7 @@
 
 #include "cli/Failure.h"
 #include "cli/Output.h"
+#include "host/bundled/device/Shipped.h"
 
 extern char** environ;  // POSIX declares it nowhere
 
@@ -84,10 +85,12 @@ std::string ReadAll(int descriptor) {
 }  // namespace
 
 std::string AskTcl(const std::string& text, const Setting& setting) {
+  const std::string script = ::Device::Shipped(setting.folder, kScript);
+  if (script.empty()) Fail(fmt::format("{} is not where it belongs", kScript));
   const int input = FileOf(text);
   int ends[2];
   if (pipe2(ends, O_CLOEXEC) != 0) Check(errno, "a pipe");
-  const pid_t process = Start(setting.folder + "/" + kScript, input, ends[1]);
+  const pid_t process = Start(script, input, ends[1]);
   close(input);
   close(ends[1]);
   std::string answer = ReadAll(ends[0]);

@@ -12,7 +12,8 @@ VORKEL_ROOT=$(cd -P -- "$(dirname -- "${BASH_SOURCE[0]}")/.." && pwd -P)
 # The folders that the package is built from. A tree that is configured with tests builds the
 # package alone by the targets of these folders.
 readonly PROGRAM_FOLDERS=(hardware host engine planner cli tcl binding)
-readonly PROGRAM_SOURCES=(CMakeLists.txt devices doc examples "${PROGRAM_FOLDERS[@]}")
+readonly PROGRAM_SOURCES=(CMakeLists.txt devices doc examples hdl library packaging python
+  "${PROGRAM_FOLDERS[@]}")
 readonly TEST_SOURCES=(tests)
 
 # The exit status of a script whose set-up fails. Those that call ./vorkel take 1 for an answer of
@@ -47,7 +48,8 @@ packages_for() {
   printf '%s\n' g++ cmake ninja-build tcl8.6 tcl8.6-dev tcllib libtomlplusplus-dev \
     libboost-dev libcli11-dev libfmt-dev nlohmann-json3-dev
   case $1 in
-    tests) printf '%s\n' libgtest-dev libgmock-dev opensta ;;
+    tests) printf '%s\n' libgtest-dev libgmock-dev opensta \
+      pkg-config pybind11-dev python3-dev python3-pytest python3-yaml man-db ;;
     benchmarks) printf '%s\n' libbenchmark-dev ;;
     libcxx) printf '%s\n' clang-14 libc++-14-dev libc++abi-14-dev ;;
   esac

@@ -5,6 +5,8 @@
 #include <filesystem>
 #include <system_error>
 
+#include "host/bundled/device/Shipped.h"
+
 namespace Device {
 namespace {
 
@@ -18,7 +20,9 @@ std::string FindFolder() {
   std::filesystem::path library = std::filesystem::canonical(info.dli_fname, error);
   if (error) library = std::filesystem::absolute(info.dli_fname, error);
   if (error) return {};
-  return (library.parent_path() / "devices").native();
+  const std::filesystem::path folder = library.parent_path();
+  const std::string found = Shipped(folder.native(), "devices");
+  return found.empty() ? (folder / "devices").native() : found;
 }
 
 // The system may know the library by a path relative to the current directory of the time

@@ -6,8 +6,9 @@
 
 namespace Device {
 
-// The folder "devices" beside the library (or program) that this code is part of, as an
-// absolute path. Empty when the system does not tell where that is.
+// The folder "devices" that comes with the library (or program) that this code is part of, see
+// Shipped.h, as an absolute path; the one beside it when there is none. Empty when the system does
+// not tell where that is.
 const std::string& BundledFolder();
 
 }  // namespace Device
