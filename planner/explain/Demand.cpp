@@ -10,16 +10,13 @@ namespace {
 using Kind = DemandKind;
 
 void AddOfLoop(const Request& request, Primitive primitive, std::vector<Demand>* demands) {
-  bool asks_for_shape = request.AsksForShape();
-  int used = 0;
-  for (const Output& output : request.outputs) used += output.used ? 1 : 0;
   if (request.inputs.size() > 1) demands->push_back({Kind::kSecondInput});
   if (request.bandwidth) demands->push_back({Kind::kBandwidth});
   for (const Kind kind : {Kind::kVco, Kind::kPfd, Kind::kM, Kind::kD, Kind::kDividers}) {
     demands->push_back({kind});
   }
   demands->push_back({Kind::kWhole});
-  if (asks_for_shape &&
+  if (request.AsksForShape() &&
       hardware::HasFractions(primitive, static_cast<int>(request.outputs.size()),
                              request.whole_divider_0)) {
     demands->push_back({Kind::kNothingMoves});

@@ -28,7 +28,10 @@ std::strong_ordering CompareBases(const KruBase& a, const KruBase& b) {
 std::strong_ordering CompareSettings(const KruEntry& a, const KruEntry& b) {
   const std::strong_ordering order = CompareBases(a.base, b.base);
   if (order != kEqual) return order;
-  return std::tie(a.pins, a.shift) <=> std::tie(b.pins, b.shift);
+  // libc++ 14 has only a weak order of arrays.
+  if (a.pins != b.pins) return a.pins < b.pins ? std::strong_ordering::less
+                                               : std::strong_ordering::greater;
+  return a.shift <=> b.shift;
 }
 
 }  // namespace

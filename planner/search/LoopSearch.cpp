@@ -44,8 +44,7 @@ using Bounds = Staircase<LoopError>;
 class LoopSearch {
  public:
   LoopSearch(const Request& request, const Device& device, Primitive primitive)
-      : request_(request),
-        limits_(device.Loop(primitive)),
+      : limits_(device.Loop(primitive)),
         inputs_(InputsOf(request.inputs)),
         fractions_(hardware::HasFractions(primitive, static_cast<int>(request.outputs.size()),
                                           request.whole_divider_0)),
@@ -255,7 +254,6 @@ class LoopSearch {
     return found;
   }
 
-  const Request& request_;
   const LoopLimits& limits_;
   Inputs inputs_;
   bool fractions_;
