@@ -22,7 +22,9 @@ enum class ValueKind {
   kTolerance,       // ppm
   kPhaseTolerance,  // degrees
   kDutyTolerance,   // percent points
-  kMaxJitter        // ps
+  kMaxJitter,       // ps
+  kGap,             // of edges, ns
+  kShare            // percent
 };
 
 // Where something stands, and what it is called there.

@@ -39,6 +39,10 @@ KindText TextOf(ValueKind kind) {
     case ValueKind::kDutyTolerance:
       return {"a tolerance of a duty cycle", "0.5, 0.5% or 5", "%", "0 to 100 percent points",
               "percent"};
+    case ValueKind::kGap:
+      return {"a gap", "0.5, 0.5ns or 500ps", "fs, ps, ns, us and ms", "0 to 1 ms", "ns"};
+    case ValueKind::kShare:
+      return {"a share", "25%", "%", "0 to 100 percent", "percent"};
     case ValueKind::kMaxJitter:
       break;
   }

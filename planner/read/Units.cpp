@@ -32,6 +32,8 @@ constexpr std::array<Unit, 5> kPhaseUnits = {
 constexpr std::array<Unit, 2> kDutyUnits = {{{"%", 0}, {"percent", 0}}};
 constexpr std::array<Unit, 5> kJitterUnits = {
     {{"fs", -3}, {"ps", 0}, {"ns", 3}, {"us", 6}, {"ms", 9}}};
+constexpr std::array<Unit, 5> kGapUnits = {
+    {{"fs", -6}, {"ps", -3}, {"ns", 0}, {"us", 3}, {"ms", 6}}};
 constexpr std::array<Unit, 3> kToleranceUnits = {{{"ppm", 0}, {"ppb", -3}, {"%", 4}}};
 
 std::span<const Unit> UnitsOf(ValueKind kind) {
@@ -43,7 +45,10 @@ std::span<const Unit> UnitsOf(ValueKind kind) {
       return kPhaseUnits;
     case ValueKind::kDuty:
     case ValueKind::kDutyTolerance:
+    case ValueKind::kShare:
       return kDutyUnits;
+    case ValueKind::kGap:
+      return kGapUnits;
     case ValueKind::kTolerance:
       return kToleranceUnits;
     case ValueKind::kJitter:
@@ -72,6 +77,7 @@ std::string_view MeantFor(std::string_view unit) {
 // What a number of a kind must be, and is not.
 NumberDemand DemandOn(const Rational& value, ValueKind kind) {
   static const Rational kMillisecond = 1'000'000'000;  // ps: beyond any clock
+  static const Rational kGapMillisecond = 1'000'000;  // ns
   switch (kind) {
     case ValueKind::kFrequency:
       return value > 0 ? NumberDemand::kNone : NumberDemand::kAboveZero;
@@ -89,6 +95,12 @@ NumberDemand DemandOn(const Rational& value, ValueKind kind) {
     case ValueKind::kPhaseTolerance:
     case ValueKind::kDutyTolerance:
       break;
+    case ValueKind::kGap:
+      if (value > kGapMillisecond) return NumberDemand::kAtMostOneMs;
+      return value > 0 ? NumberDemand::kNone : NumberDemand::kAboveZero;
+    case ValueKind::kShare:
+      if (value > 100) return NumberDemand::kPercentage;
+      return value > 0 ? NumberDemand::kNone : NumberDemand::kAboveZero;
   }
   return value >= 0 ? NumberDemand::kNone : NumberDemand::kNotNegative;
 }
