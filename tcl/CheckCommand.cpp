@@ -2,8 +2,7 @@
 #include <nlohmann/json.hpp>
 
 #include "planner/device/Check.h"
-#include "planner/report/Data.h"
-#include "planner/report/DoubtText.h"
+#include "planner/report/ErrorData.h"
 #include "planner/report/TclDict.h"
 #include "tcl/Commands.h"
 #include "tcl/Failure.h"
@@ -13,7 +12,6 @@ namespace tcl {
 
 namespace {
 
-using nlohmann::ordered_json;
 using std::string;
 
 constexpr std::string_view kEnding = ".toml";
@@ -41,45 +39,6 @@ string Contents(const string& path) {
   return bytes;
 }
 
-ordered_json MistakeData(const planner::device::Mistake& mistake) {
-  ordered_json data;
-  data["places"] = ordered_json::array();
-  for (const auto& place : mistake.places) {
-    data["places"].push_back({{"line", place.line}, {"column", place.column}});
-  }
-  data["unknown"] = mistake.unknown;
-  data["known"] = mistake.known;
-  data["message"] = mistake.reason;
-  return data;
-}
-
-ordered_json DoubtData(const planner::device::Doubt& doubt) {
-  ordered_json data;
-  data["keyword"] = doubt.keyword;
-  planner::report::AddExact(&data, "value", doubt.value);
-  data["other"] = doubt.other;
-  data["grades"] = doubt.grades;
-  data["lines"] = doubt.lines;
-  data["touched"] = ordered_json::array();
-  for (const planner::Primitive one : doubt.touched) data["touched"].push_back(Name(one));
-  data["lost"] = ordered_json::array();
-  for (const planner::Primitive one : doubt.lost) data["lost"].push_back(Name(one));
-  data["message"] = planner::report::DoubtText(doubt);
-  return data;
-}
-
-ordered_json GradeData(const planner::device::GradeDescription& grade) {
-  ordered_json data;
-  data["name"] = grade.name;
-  data["primitives"] = ordered_json::array();
-  for (const planner::Primitive one : grade.primitives) data["primitives"].push_back(Name(one));
-  data["missing"] = ordered_json::array();
-  for (const planner::device::Missing& one : planner::device::MissingOf(grade)) {
-    data["missing"].push_back(one.keyword.name);
-  }
-  return data;
-}
-
 }  // namespace
 
 string Check(Words words) {
@@ -93,17 +52,7 @@ string Check(Words words) {
   }
   const auto checked = planner::device::Check(Contents(path), path,
                                               name.substr(0, name.size() - kEnding.size()));
-  ordered_json data;
-  data["file"] = path;
-  data["usable"] = checked.mistakes.empty();
-  data["mistakes"] = ordered_json::array();
-  for (const auto& mistake : checked.mistakes) data["mistakes"].push_back(MistakeData(mistake));
-  data["untold"] = checked.untold;
-  data["warnings"] = ordered_json::array();
-  for (const auto& doubt : checked.doubts) data["warnings"].push_back(DoubtData(doubt));
-  data["grades"] = ordered_json::array();
-  for (const auto& grade : checked.description.grades) data["grades"].push_back(GradeData(grade));
-  return planner::report::TclDict(data);
+  return planner::report::TclDict(planner::report::CheckData(checked, path));
 }
 
 }  // namespace tcl

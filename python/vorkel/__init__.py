@@ -1,0 +1,96 @@
+"""Plan the clocks of a device: find the settings of its clock primitives.
+
+    >>> import vorkel
+    >>> plan = vorkel.plan(inputs=["27 MHz"], outputs=["148.5 MHz", "74.25 MHz"], device="vk40",
+    ...                    int_div0=True)
+    >>> plan.primitive
+    'TSYN'
+    >>> [str(output.actual) for output in plan.outputs]
+    ['297/2', '297/4']
+    >>> print(plan.to_sdc())    # doctest: +SKIP
+
+Frequencies are in MHz, phases in degrees, duty cycles in percent, jitter in ps peak to peak and
+errors of a frequency in ppm. What is worked out exactly is a `fractions.Fraction`; jitter is a
+float. A request that cannot be read raises `RequestError`, and one that nothing serves
+`UnsolvedError`; both have the findings as data.
+"""
+
+from ._answers import (
+    Answer,
+    Finding,
+    KruSettings,
+    Limits,
+    LoopSettings,
+    OutputAnswer,
+    Range,
+    Ranking,
+    Refusal,
+)
+from ._calls import Plan, best, compare, explain, plan
+from ._devices import (
+    Device,
+    DeviceCheck,
+    DeviceGrade,
+    DeviceLimit,
+    DeviceMistake,
+    DevicePrimitive,
+    DeviceWarning,
+    Discrepancy,
+    GradeCheck,
+    check,
+    devices,
+    verify,
+)
+from ._errors import Mistake, RequestError, UnsolvedError, VorkelError
+from ._explanation import (
+    Change,
+    Conflict,
+    Demand,
+    Explanation,
+    InputThatServes,
+    PrimitiveExplanation,
+)
+from ._planner import version as __version__
+from ._request import Output, Value
+
+__all__ = [
+    "Answer",
+    "Change",
+    "Conflict",
+    "Demand",
+    "Device",
+    "DeviceCheck",
+    "DeviceGrade",
+    "DeviceLimit",
+    "DeviceMistake",
+    "DevicePrimitive",
+    "DeviceWarning",
+    "Discrepancy",
+    "Explanation",
+    "Finding",
+    "GradeCheck",
+    "InputThatServes",
+    "KruSettings",
+    "Limits",
+    "LoopSettings",
+    "Mistake",
+    "Output",
+    "OutputAnswer",
+    "Plan",
+    "PrimitiveExplanation",
+    "Range",
+    "Ranking",
+    "Refusal",
+    "RequestError",
+    "UnsolvedError",
+    "Value",
+    "VorkelError",
+    "__version__",
+    "best",
+    "check",
+    "compare",
+    "devices",
+    "explain",
+    "plan",
+    "verify",
+]

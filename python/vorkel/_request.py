@@ -1,0 +1,87 @@
+"""Requests: what a caller says, as the JSON that the planner reads. Numbers stay exact."""
+
+from __future__ import annotations
+
+import json
+from dataclasses import dataclass, fields
+from decimal import Decimal
+from fractions import Fraction
+from typing import Any, Iterable, List, Mapping, Optional, Union
+
+from ._errors import mistake
+
+Value = Union[int, float, str, Fraction, Decimal]
+"""A number, in MHz, degrees, percent, ps or ppm; or a text with a unit, such as "148.5 MHz", "8 ns",
+"90deg", "50%" or "100/3". A float is the decimal that it is shown as."""
+
+
+@dataclass(frozen=True)
+class Output:
+    """An output that is asked for, with its demands; None where there is none."""
+
+    frequency: Value
+    phase: Optional[Value] = None
+    duty: Optional[Value] = None
+    tolerance: Optional[Value] = None
+    phase_tolerance: Optional[Value] = None
+    duty_tolerance: Optional[Value] = None
+    max_jitter: Optional[Value] = None
+
+
+AnyOutput = Union[Value, Output, Mapping[str, Any], None]
+AnyInputs = Union[Value, Iterable[Value]]
+
+
+def written(value: Any, entry: str) -> Any:
+    """A value as JSON has it."""
+    if value is None or isinstance(value, (str, bool, int)):
+        return value
+    if isinstance(value, float):
+        # The decimal is what is meant: 33.3 is 333/10.
+        return value if value - value == 0 else repr(value)
+    if isinstance(value, Fraction):
+        return f"{value.numerator}/{value.denominator}"
+    if isinstance(value, Decimal):
+        return str(value) if not value.is_finite() else f"{value:f}"
+    if isinstance(value, Output):
+        return output_data(value)
+    if isinstance(value, Mapping):
+        return {str(key): written(one, entry) for key, one in value.items() if one is not None}
+    if isinstance(value, Iterable):
+        return [written(one, entry) for one in value]
+    kind = type(value).__name__
+    raise mistake("wrong_type", kind, f"{entry}: no {kind} can be read", entry)
+
+
+def output_data(output: Output) -> Any:
+    return written({one.name: getattr(output, one.name) for one in fields(output)}, "outputs")
+
+
+def listed(value: Any) -> List[Any]:
+    """A single value as a list of one."""
+    if isinstance(value, (str, int, float, Fraction, Decimal, Mapping, Output)):
+        return [value]
+    return list(value)
+
+
+def request_json(request: Optional[Mapping[str, Any]], entries: Mapping[str, Any]) -> str:
+    """The entries of a request and, in place of them, those that are not None."""
+    whole = dict(request or {})
+    whole.update({name: value for name, value in entries.items() if value is not None})
+    # What stands for all tolerances and what stands for one do not go together.
+    if entries.get("tolerance") is not None and entries.get("exact") is None:
+        whole.pop("exact", None)
+    if entries.get("exact") is not None and entries.get("tolerance") is None:
+        whole.pop("tolerance", None)
+    for name in ("inputs", "outputs"):
+        try:
+            whole[name] = listed(whole[name])
+        except (KeyError, TypeError):
+            pass  # told below, or by `written`
+    for name, what in (("inputs", "frequencies of the inputs"), ("outputs", "outputs")):
+        if name not in whole or whole[name] is None or whole[name] == []:
+            raise mistake("missing", "", f"{name}: the {what} are missing", name)
+    if isinstance(whole["outputs"], list):
+        whole["outputs"] = ["-" if one is None else one for one in whole["outputs"]]
+    data = {name: written(one, name) for name, one in whole.items() if one is not None}
+    return json.dumps(data, ensure_ascii=False)
