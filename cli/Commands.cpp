@@ -1,5 +1,6 @@
 #include "cli/Commands.h"
 
+#include "cli/BatchCommand.h"
 #include "cli/CheckCommand.h"
 #include "cli/DevicesCommand.h"
 #include "cli/EngineCommand.h"
@@ -40,6 +41,14 @@ constexpr Command kCommands[] = {
      "--in 100 --out 100,50,150 --phase 0,180,0 --feedback", "", true, RunEngine},
     {"clkgen", kKruArguments, "find the settings of a KRU_CLKGEN", "--in 100 --out 150,75", "",
      true, RunEngine},
+    {"batch", "[FILE] [OPTION...]", "plan many requests, one on each line",
+     "examples/batch/requests.jsonl",
+     "FILE has a request in JSON on each line, as --request takes it, and maybe an \"id\"; without "
+     "it, or with -, that is standard input. Options replace what the lines say. Each line gets a "
+     "line of JSON: its number, its id, a status (within, off, unsolved or wrong) and its plan. The "
+     "exit status is that of the worst: 4 when the program failed, 2 with a line that is wrong, 1 "
+     "with one that is unsolved, 3 with one that is off, else 0.",
+     false, RunBatch},
     {"devices", "[NAME]", "list the devices, or all limits of one", "vk40",
      "NAME is a device, or a part name with package and grade; the beginning is enough where only "
      "one goes on like it.",

@@ -48,24 +48,6 @@ class Descriptor {
   int number_;
 };
 
-// Writes all of a text; the error of the system call, or 0.
-int WriteAll(int descriptor, std::string_view text) {
-  while (!text.empty()) {
-    const ssize_t count = write(descriptor, text.data(), text.size());
-    if (count >= 0) {
-      text.remove_prefix(static_cast<std::size_t>(count));
-    } else if (errno != EINTR) {
-      return errno;
-    }
-  }
-  return 0;
-}
-
-[[noreturn]] void RefuseOut(int error) {
-  throw Failure(kWrong, fmt::format("vorkel: standard output cannot be written: {}\n",
-                                    error == EBADF ? "it is closed" : SystemReason(error)));
-}
-
 std::string FolderOf(const std::string& path) {
   const std::size_t slash = path.rfind('/');
   if (slash == std::string::npos) return "./";
@@ -162,6 +144,37 @@ void WriteWhole(const std::string& text, const std::string& name) {
 
 }  // namespace
 
+int WriteAll(int descriptor, std::string_view text) {
+  while (!text.empty()) {
+    const ssize_t count = write(descriptor, text.data(), text.size());
+    if (count >= 0) {
+      text.remove_prefix(static_cast<std::size_t>(count));
+    } else if (errno != EINTR) {
+      return errno;
+    }
+  }
+  return 0;
+}
+
+void RefuseOut(int error) {
+  throw Failure(kWrong, fmt::format("vorkel: standard output cannot be written: {}\n",
+                                    error == EBADF ? "it is closed" : SystemReason(error)));
+}
+
+std::string TargetOf(const std::string& name) {
+  try {
+    return Target(name);
+  } catch (const FileError& error) {
+    RefuseFile(name, error.reason, error.name_is_wrong);
+  }
+}
+
+void RefuseFile(const std::string& name, const std::string& reason, bool name_is_wrong) {
+  throw Failure::OfUsage(
+      fmt::format("-o: {} cannot be written: {}", planner::read::Shown(name), reason),
+      name_is_wrong);
+}
+
 void PrepareStreams() {
   std::signal(SIGPIPE, SIG_IGN);
   // A file that grows beyond the limit of its size is an error, too.
@@ -189,9 +202,7 @@ void WriteFile(const std::string& text, const std::string& name) {
   try {
     WriteWhole(text, name);
   } catch (const FileError& error) {
-    throw Failure::OfUsage(fmt::format("-o: {} cannot be written: {}", planner::read::Shown(name),
-                                       error.reason),
-                           error.name_is_wrong);
+    RefuseFile(name, error.reason, error.name_is_wrong);
   }
 }
 

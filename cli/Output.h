@@ -5,6 +5,7 @@
 #define VORKEL_CLI_OUTPUT_H_
 
 #include <string>
+#include <string_view>
 
 namespace cli {
 
@@ -25,6 +26,19 @@ void WriteError(const std::string& text);
 // is followed to what it stands for. What is no plain file, such as /dev/null, has nothing to keep
 // whole. Throws Failure.
 void WriteFile(const std::string& text, const std::string& name);
+
+// --- For who writes piece by piece (Stream.h) ---
+
+// Writes all of a text to a file descriptor; the error of the system call, or 0.
+int WriteAll(int descriptor, std::string_view text);
+// The path of the file of -o behind links, also where there is no such file yet. Throws Failure.
+std::string TargetOf(const std::string& name);
+// Throws the Failure that a file of -o cannot be written. The name may be to blame, or what happened
+// later, such as a full disk.
+[[noreturn]] void RefuseFile(const std::string& name, const std::string& reason,
+                             bool name_is_wrong);
+// Throws the Failure that standard output takes nothing, for the error of a system call.
+[[noreturn]] void RefuseOut(int error);
 
 // The error of a system call in words: "no such file or directory".
 std::string SystemReason(int error);

@@ -76,9 +76,11 @@ std::string InFormat(const Call& call, const Plan& plan, std::size_t number, std
     case Format::kText:
       return Text(call, plan, number, most, setting);
     case Format::kJson:
-      return planner::report::Json(call.request(), call.device, Entries(call, plan, number, most));
+      return planner::report::Json(call.request(), call.device, Entries(call, plan, number, most),
+                                   plan.front_cut);
     case Format::kTcl:
-      return planner::report::Tcl(call.request(), call.device, Entries(call, plan, number, most));
+      return planner::report::Tcl(call.request(), call.device, Entries(call, plan, number, most),
+                                  plan.front_cut);
     case Format::kSdc:
       break;
   }

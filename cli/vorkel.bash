@@ -89,6 +89,7 @@ _vorkel() {
     case $command in
       check) _vorkel_files "$word" '' .toml; return ;;
       verify) _vorkel_files "$word" '' .json; return ;;
+      batch) _vorkel_files "$word" ''; return ;;
       devices) words=$(_vorkel_parts "$program" "$word") ;;
       help) words=$(_vorkel_listed "$program" Commands help) ;;
     esac

@@ -117,8 +117,13 @@ std::string Outputs(int count) {
   return count == 1 ? "is 1 output" : fmt::format("are {} outputs", count);
 }
 
-// "--in is missing: the input frequency, such as --in 100".
+// "--in is missing: the input frequency, such as --in 100". A line of a batch has no options beside
+// it: its place says so.
 std::string MissingText(const Mistake& mistake) {
+  if (mistake.place.line > 0) {
+    return fmt::format("{}:{}: the request has no {}", ShownWhole(mistake.place.file),
+                       mistake.place.line, mistake.place.entry);
+  }
   const bool is_input = mistake.place.entry == "--in";
   std::string missing = fmt::format("{} is missing", mistake.place.entry);
   if (mistake.place.IsInFile()) {

@@ -111,6 +111,12 @@ string Json(const Request& request, const Device& device, const std::vector<Entr
          "\n";
 }
 
+string JsonLine(const Request& request, const Device& device, const std::vector<Entry>& entries,
+                const std::vector<Primitive>& front_cut) {
+  return Document(request, device, entries, front_cut)
+      .dump(-1, ' ', false, ordered_json::error_handler_t::replace);
+}
+
 string Tcl(const Request& request, const Device& device, const std::vector<Entry>& entries,
            const std::vector<Primitive>& front_cut) {
   return TclDict(Document(request, device, entries, front_cut));

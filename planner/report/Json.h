@@ -37,6 +37,10 @@ std::vector<Entry> BestEntries(const plan::Plan& plan, std::size_t number, std::
 // in a newline.
 std::string Json(const Request& request, const Device& device, const std::vector<Entry>& entries,
                  const std::vector<Primitive>& front_cut = {});
+// The same in one line, without a newline.
+std::string JsonLine(const Request& request, const Device& device,
+                     const std::vector<Entry>& entries,
+                     const std::vector<Primitive>& front_cut = {});
 // The same as a Tcl dict. What is null in JSON is empty here.
 std::string Tcl(const Request& request, const Device& device, const std::vector<Entry>& entries,
                 const std::vector<Primitive>& front_cut = {});
