@@ -2,6 +2,7 @@
 #ifndef VORKEL_PLANNER_REQUEST_H_
 #define VORKEL_PLANNER_REQUEST_H_
 
+#include <cstddef>
 #include <optional>
 #include <string>
 #include <vector>
@@ -19,6 +20,9 @@ using hardware::Rational;
 // By what settings that meet all demands are ranked: the least jitter, the smallest error, the
 // largest margin to the device's limits, or the lowest VCO (with prefer_max_vco the highest).
 enum class Rank { kJitter, kError, kMargin, kVco };
+
+// Outputs, used and unused, of a request.
+inline constexpr std::size_t kMostPlaces = 7;
 
 // One requested output.
 struct Output {
@@ -65,6 +69,11 @@ struct Request {
   }
   const std::optional<Rational>& MaxJitterOf(const Output& output) const {
     return output.max_jitter ? output.max_jitter : max_jitter;
+  }
+  std::size_t CountOfUsed() const {
+    std::size_t count = 0;
+    for (const Output& output : outputs) count += output.used ? 1 : 0;
+    return count;
   }
   // Whether some used output asks for a phase or a duty cycle.
   bool AsksForShape() const {

@@ -123,7 +123,10 @@ std::vector<Finding> Refusals(const Request& request, Primitive primitive) {
         {.kind = kind, .primitive = primitive, .value = number, .range = {1, most}});
   };
   judge(FindingKind::kTooManyInputs, request.inputs.size(), hardware::MostInputs(primitive));
-  judge(FindingKind::kTooManyOutputs, request.outputs.size(), hardware::MostOutputs(primitive));
+  // A loop has an output for each place; the pins of a KRU go to those that are used.
+  const std::size_t outputs =
+      hardware::IsLoop(primitive) ? request.outputs.size() : request.CountOfUsed();
+  judge(FindingKind::kTooManyOutputs, outputs, hardware::MostOutputs(primitive));
   return refusals;
 }
 

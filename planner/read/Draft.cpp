@@ -102,7 +102,13 @@ class Finisher {
   void Outputs() {
     if (!draft_.outputs) return;
     const Values& frequencies = draft_.outputs->value;
-    Limit(frequencies.size(), hardware::MostOutputs, draft_.outputs->place);
+    // The pins of a KRU go to those outputs that are used.
+    const bool counts_used = reader_.primitive && !hardware::IsLoop(*reader_.primitive) &&
+                             frequencies.size() <= kMostPlaces;
+    const auto used = static_cast<std::size_t>(
+        std::count_if(frequencies.begin(), frequencies.end(),
+                      [](const auto& frequency) { return frequency.has_value(); }));
+    Limit(counts_used ? used : frequencies.size(), hardware::MostOutputs, draft_.outputs->place);
     for (const std::optional<Rational>& frequency : frequencies) {
       Output output;
       output.used = frequency.has_value();

@@ -132,7 +132,7 @@ class Data {
     data["demand"] = Of(change.demand, primitive);
     AddExact(&data, "value", change.value);
     AddExact(&data, "before", change.before);
-    data["text"] = ChangeWords(change, request_, device_, primitive);
+    data["text"] = ChangeWords(change, primitive);
     return data;
   }
 

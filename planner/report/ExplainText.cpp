@@ -32,8 +32,10 @@ constexpr int kFarthest = 10;
 // Of the labels in front of what a primitive has to say.
 constexpr int kLabelWidth = 14;
 
-// So many conflicts of a primitive are told; the data have all.
+// So many conflicts of a primitive are told, and so many changes; the data have all.
 constexpr std::size_t kMostConflicts = 4;
+constexpr std::size_t kMostChanges = 6;
+constexpr const char* kDataHaveAll = "; --format json has all";
 
 string NameOf(const OfPrimitive& one) { return string(Name(one.primitive)); }
 
@@ -49,13 +51,14 @@ class Texts {
         own_inputs_(own_inputs) {}
 
   string All() const {
-    string text = Verdict();
+    string text = Verdict() + EngineOnly();
     for (const OfPrimitive& one : explanation_.primitives) text += Of(one);
     return text + Inputs();
   }
 
  private:
   string Verdict() const;
+  string EngineOnly() const;
   string Of(const OfPrimitive& one) const;
   string Inputs() const;
   string Demands(const std::vector<Demand>& demands, Primitive primitive) const;
@@ -108,11 +111,18 @@ bool IsAdvice(const Change& change) {
 // What works, each once: the changes of some conflicts, in words.
 string Texts::Changes(const std::vector<const Change*>& changes, Primitive primitive) const {
   std::vector<string> words;
+  std::size_t others = 0;
   for (const Change* change : changes) {
-    if (!IsAdvice(*change)) continue;
-    string one = ChangeWords(*change, request_, device_, primitive);
-    if (std::find(words.begin(), words.end(), one) == words.end()) words.push_back(std::move(one));
+    string one = ChangeWords(*change, primitive);
+    if (std::find(words.begin(), words.end(), one) != words.end()) continue;
+    if (!IsAdvice(*change) || words.size() == kMostChanges) {
+      ++others;
+    } else {
+      words.push_back(std::move(one));
+    }
   }
+  if (words.empty()) return "";
+  if (others > 0) words.push_back(std::to_string(others) + " more" + kDataHaveAll);
   return Join(words, "; ");
 }
 
@@ -154,6 +164,14 @@ string Texts::Verdict() const {
   if (!nearest) return text;
   return text +
          Prose(style_, "nearest: ", Together(*nearest) + " (" + NameOf(*nearest) + ")");
+}
+
+// What is explained is what the hardware can do. The engine may still not find it.
+string Texts::EngineOnly() const {
+  if (!request_.engine_only) return "";
+  return Prose(style_, "note: ",
+               "all settings count here, those that the design flow's own search does not find, "
+               "too");
 }
 
 // What single outputs or demands have to go; more at once are no advice.
@@ -202,7 +220,7 @@ string Texts::Of(const OfPrimitive& one) const {
     text += Line(told++ == 0 ? "in the way" : "and", Demands(conflict.demands, one.primitive));
   }
   if (one.conflicts.size() > told) {
-    text += Line("", std::to_string(one.conflicts.size() - told) + " more; --format json has all");
+    text += Line("", std::to_string(one.conflicts.size() - told) + " more" + kDataHaveAll);
   }
   text += Works(one) + Corrections(one);
   if (!one.together.empty() && one.together.front().value <= kLargestTolerance) {

@@ -181,8 +181,7 @@ string DemandWords(const Demand& demand, const Request& request, const Device& d
   return "the second input";
 }
 
-string ChangeWords(const Change& change, const Request& request, const Device& /*device*/,
-                   Primitive primitive) {
+string ChangeWords(const Change& change, Primitive primitive) {
   const Demand& demand = change.demand;
   switch (change.kind) {
     case ChangeKind::kWithout:
@@ -206,7 +205,6 @@ string ChangeWords(const Change& change, const Request& request, const Device& /
       break;
   }
   const auto* settings = std::get_if<LoopSettings>(&change.settings);
-  static_cast<void>(request);
   return "bandwidth " + string(Name(settings ? settings->bandwidth : Bandwidth::kOptimized));
 }
 

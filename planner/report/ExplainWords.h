@@ -19,8 +19,7 @@ std::string DemandWords(const explain::Demand& demand, const Request& request,
 // A change as what would be asked for: "output 1 at 112.5 degrees", "a VCO of 1450 MHz, 10 above
 // the range", "output 0 with a tolerance of 84 ppm". A number that has to be allowed is rounded up,
 // so that what is written works when it is given to the program.
-std::string ChangeWords(const explain::Change& change, const Request& request,
-                        const Device& device, Primitive primitive);
+std::string ChangeWords(const explain::Change& change, Primitive primitive);
 
 // A frequency as it can be given to the program, exactly.
 std::string FrequencyWords(const Rational& frequency);

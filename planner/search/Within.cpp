@@ -1,8 +1,7 @@
 // Tested by within_test.cpp.
 #include "planner/search/Within.h"
 
-#include <cstddef>
-
+#include "planner/answer/Evaluate.h"
 #include "planner/search/KruWithin.h"
 #include "planner/search/LoopWithin.h"
 
@@ -16,10 +15,7 @@ struct Within::Implementation {
 
 Within::Within(const Request& request, const Device& device, Primitive primitive) {
   auto implementation = std::make_unique<Implementation>();
-  const auto inputs = static_cast<std::size_t>(hardware::MostInputs(primitive));
-  const auto outputs = static_cast<std::size_t>(hardware::MostOutputs(primitive));
-  if (request.inputs.size() <= inputs && request.outputs.size() <= outputs &&
-      device.Has(primitive)) {
+  if (device.Has(primitive) && answer::Refusals(request, primitive).empty()) {
     if (hardware::IsLoop(primitive)) {
       implementation->loop.emplace(request, device, primitive);
     } else {

@@ -71,7 +71,11 @@ class OfPrimitive {
       refusals.push_back(std::move(finding));
     };
     hold(FindingKind::kTooManyInputs, request_.inputs.size(), hardware::MostInputs(primitive_));
-    hold(FindingKind::kTooManyOutputs, request_.outputs.size(), hardware::MostOutputs(primitive_));
+    std::size_t outputs = 0;
+    for (const Output& output : request_.outputs) {
+      if (hardware::IsLoop(primitive_) || output.used) ++outputs;
+    }
+    hold(FindingKind::kTooManyOutputs, outputs, hardware::MostOutputs(primitive_));
     return refusals;
   }
 

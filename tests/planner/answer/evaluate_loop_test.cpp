@@ -401,6 +401,11 @@ TEST(Refusals, OfTooManyClocks) {
   EXPECT_EQ(refusals[1].value, Rational(7));
   EXPECT_EQ(refusals[1].range.highest, Rational(6));
   EXPECT_EQ(Refusals(request, Primitive::kKruClkgen).size(), 2u);
+  // A place that stays empty needs no pin.
+  request.inputs.pop_back();
+  request.outputs[3].used = false;
+  EXPECT_TRUE(Refusals(request, Primitive::kKruSp).empty());
+  EXPECT_TRUE(Refusals(request, Primitive::kKruClkgen).empty());
 }
 
 }  // namespace
