@@ -4,15 +4,14 @@
 // of them. What goes wrong is raised by the package's own functions (vorkel/_errors.py), which get it
 // as data.
 //
-// Python's other threads run while something is planned. The engine keeps what its run is about in
-// one place for the whole process, so that only one plan is made at a time.
+// Python's other threads run while something is planned, and can plan themselves: plans share
+// nothing, and runs of the engine take turns (planner/engine/Ask.h).
 //
 // Tested by tests/python.
 #include <pybind11/pybind11.h>
 
 #include <cstddef>
 #include <memory>
-#include <mutex>
 #include <nlohmann/json.hpp>
 #include <optional>
 #include <string>
@@ -71,12 +70,10 @@ string Text(const ordered_json& data) {
   Raise("raise_unsolved", data);
 }
 
-// Does something without Python, and alone.
+// Does something that knows no Python, while that goes on.
 template <typename Work>
-auto Alone(const Work& work) {
-  static std::mutex mutex;
+auto Beside(const Work& work) {
   const py::gil_scoped_release released;
-  const std::lock_guard<std::mutex> locked(mutex);
   return work();
 }
 
@@ -129,7 +126,7 @@ enum class Part { kPlan, kCompare, kBest };
 class Plan {
  public:
   explicit Plan(const string& request) : asked_(Read(request)) {
-    plan_ = Alone([this] { return planner::plan::Make(asked_.request(), asked_.device); });
+    plan_ = Beside([this] { return planner::plan::Make(asked_.request(), asked_.device); });
     if (!plan_.IsSolved()) RaiseUnsolved(plan_, asked_.device);
   }
 
@@ -189,7 +186,7 @@ class Explanation {
       : asked_(Read(request)), has_own_inputs_(oscillators) {
     const std::vector<planner::Rational> inputs =
         oscillators ? Inputs(*oscillators) : planner::explain::StockOscillators();
-    explanation_ = Alone(
+    explanation_ = Beside(
         [&] { return planner::explain::Explain(asked_.request(), asked_.device, inputs); });
   }
 
@@ -247,7 +244,7 @@ string Verify(const string& plan, const string& file) {
       RaisePart(error);
     }
   }
-  const auto wrong = Alone([&] {
+  const auto wrong = Beside([&] {
     return planner::verify::Verify(plan, device, &planner::report::JsonSentences());
   });
   ordered_json data = ordered_json::array();

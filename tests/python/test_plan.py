@@ -172,7 +172,7 @@ def test_the_report(video):
     assert video.to_dict() == json.loads(video.to_json())
 
 
-# The engine keeps its state in one place: plans that are made at the same time get their own.
+# Runs of the engine take turns: plans that are made at the same time get their own.
 def test_threads_plan_beside_each_other():
     requests = [(27, 148.5), (25, 125), (100, 66), (50, 33)]
     expected = [vorkel.plan(*one, primitive="PLL").to_json() for one in requests]
