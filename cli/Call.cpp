@@ -8,6 +8,7 @@
 
 #include "cli/Devices.h"
 #include "cli/Failure.h"
+#include "cli/Hdl.h"
 #include "cli/Options.h"
 #include "cli/Output.h"
 #include "cli/RequestFile.h"
@@ -46,7 +47,11 @@ std::vector<std::pair<std::string, Format>> FormatsOf(std::string_view command) 
   std::vector<std::pair<std::string, Format>> formats = {{"text", Format::kText},
                                                          {"json", Format::kJson},
                                                          {"tcl", Format::kTcl}};
-  if (command != "compare" && command != "explain") formats.emplace_back("sdc", Format::kSdc);
+  if (command == "explain") return formats;
+  if (command != "compare") formats.emplace_back("sdc", Format::kSdc);
+  formats.emplace_back("verilog", Format::kVerilog);
+  formats.emplace_back("vhdl", Format::kVhdl);
+  formats.emplace_back("testbench", Format::kTestbench);
   return formats;
 }
 
@@ -55,8 +60,12 @@ Format ReadFormat(std::string_view command, const Given& given, Complaints* comp
   if (!name) return Format::kText;
   std::vector<std::string> known;
   for (const auto& [word, format] : FormatsOf(command)) {
-    if (word == *name) return format;
     known.push_back(word);
+    if (word != *name) continue;
+    if (command == "compare" && IsHdl(format) && !given.Has("--pick")) {
+      complaints->Add(fmt::format("--format {} is about one candidate: say which with --pick N", word));
+    }
+    return format;
   }
   complaints->Add(command == "compare" && *name == "sdc"
                       ? "compare has no --format sdc: constraints are those of one plan; use plan, "
@@ -127,6 +136,7 @@ Call ReadCall(std::string_view command, const std::vector<std::string>& words,
   draft = Over(planner::read::ReadOptions(options, &mistakes), draft);
   Complaints complaints;
   call.format = ReadFormat(command, call.given, &complaints);
+  for (const std::string& mistake : HdlMistakes(call)) complaints.Add(mistake);
   call.file = call.given.Value("-o").value_or("");
   if (call.file.empty() && call.given.Has("-o")) {
     complaints.Add("-o: the name of the file is empty");

@@ -17,7 +17,12 @@
 
 namespace cli {
 
-enum class Format { kText, kJson, kTcl, kSdc };
+enum class Format { kText, kJson, kTcl, kSdc, kVerilog, kVhdl, kTestbench };
+
+// Whether a format is one for a design or its simulation, see Hdl.h.
+constexpr bool IsHdl(Format format) {
+  return format == Format::kVerilog || format == Format::kVhdl || format == Format::kTestbench;
+}
 
 struct Call {
   std::string_view command;

@@ -3,6 +3,7 @@
 #include "cli/Call.h"
 #include "cli/Devices.h"
 #include "cli/Failure.h"
+#include "cli/Hdl.h"
 #include "cli/Options.h"
 #include "planner/engine/Ask.h"
 #include "planner/report/Json.h"
@@ -40,6 +41,10 @@ std::string InFormat(const Call& call, const planner::Answer& answer, const Sett
       return planner::report::Json(call.request(), call.device, entries);
     case Format::kTcl:
       return planner::report::Tcl(call.request(), call.device, entries);
+    case Format::kVerilog:
+    case Format::kVhdl:
+    case Format::kTestbench:
+      return HdlText(call, answer);
     case Format::kSdc:
       break;
   }

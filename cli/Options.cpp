@@ -61,8 +61,10 @@ constexpr OptionRow kRows[] = {
     {"--front", "N", "best", "trade-offs to show, the best settings as the first; 6 by default"},
     {"--oscillators", "LIST", "explain", "input frequencies to try instead of stock oscillators"},
     {"--request", "FILE", "any", "take from a file what no option says; - is standard input"},
-    {"--format", "NAME", "written", "text (default), json, tcl or sdc"},
-    {"--format", "NAME", "compare explain", "text (default), json or tcl"},
+    {"--format", "NAME", "written", "text (default), json, tcl, sdc, verilog, vhdl or testbench"},
+    {"--format", "NAME", "compare",
+     "text (default), json, tcl, verilog, vhdl or testbench; the last three with --pick"},
+    {"--format", "NAME", "explain", "text (default), json or tcl"},
     {"--format", "NAME", "devices", "text (default) or json"},
     {"--jobs", "N", "batch", "processes to work with, 1 by default; 0 for one on each processor"},
     {"--shard", "I/N", "batch", "only part I of N parts: every N-th line, from line I on"},
@@ -70,6 +72,9 @@ constexpr OptionRow kRows[] = {
     {"--all", "", "batch", "all candidates of each request, not only the best"},
     {"--csv", "", "batch", "rows for a spreadsheet instead of JSON, one for each output"},
     {"--quiet", "", "batch", "no table at the end and no progress"},
+    {"--name", "NAME", "written compare",
+     "of the module or entity, with --format verilog, vhdl or testbench; clocks by default"},
+    {"--language", "NAME", "written compare", "verilog (default) or vhdl; of --format testbench"},
     {"-o", "FILE", "any batch", "write to a file; - is standard output"},
     {"--trace", "", "single",
      "print first what the engine itself tells of its search, a line for each step; text format "
@@ -102,7 +107,8 @@ constexpr Reason kReasons[] = {
 };
 
 // The options that do not ask for anything: they belong to one call.
-constexpr std::string_view kOfOneCall[] = {"--format", "-o", "--trace", "--pick"};
+constexpr std::string_view kOfOneCall[] = {"--format", "--name", "--language",
+                                           "-o",       "--trace", "--pick"};
 
 // Whether a list of words has one.
 bool Has(std::string_view list, std::string_view word) {

@@ -7,6 +7,7 @@
 #include "cli/Call.h"
 #include "cli/Devices.h"
 #include "cli/Failure.h"
+#include "cli/Hdl.h"
 #include "planner/plan/Plan.h"
 #include "planner/report/Json.h"
 #include "planner/report/PlanText.h"
@@ -81,6 +82,10 @@ std::string InFormat(const Call& call, const Plan& plan, std::size_t number, std
     case Format::kTcl:
       return planner::report::Tcl(call.request(), call.device, Entries(call, plan, number, most),
                                   plan.front_cut);
+    case Format::kVerilog:
+    case Format::kVhdl:
+    case Format::kTestbench:
+      return HdlText(call, *plan.Pick(number));
     case Format::kSdc:
       break;
   }

@@ -96,7 +96,7 @@ _vorkel() {
   else
     case $previous in
       -o | --request) _vorkel_files "$word" "$prefix"; return ;;
-      --format | --bandwidth | --primitive | --rank)
+      --format | --bandwidth | --primitive | --rank | --language)
         words=$(_vorkel_values "$program" "$command" "$previous")
         ;;
       --device) words=$(_vorkel_parts "$program" "$word") ;;
