@@ -15,6 +15,7 @@
 #include "planner/read/MistakeText.h"
 #include "planner/read/Options.h"
 #include "planner/read/Shown.h"
+#include "planner/relations/Rule.h"
 #include "planner/report/Table.h"
 
 namespace cli {
@@ -23,6 +24,8 @@ namespace {
 
 using planner::read::Option;
 using planner::read::Shown;
+
+constexpr const char* kPlainSdc = "sdc-plain";
 
 // What is wrong with a call, all of it.
 struct Complaints {
@@ -48,7 +51,10 @@ std::vector<std::pair<std::string, Format>> FormatsOf(std::string_view command) 
                                                          {"json", Format::kJson},
                                                          {"tcl", Format::kTcl}};
   if (command == "explain") return formats;
-  if (command != "compare") formats.emplace_back("sdc", Format::kSdc);
+  if (command != "compare") {
+    formats.emplace_back("sdc", Format::kSdc);
+    formats.emplace_back(kPlainSdc, Format::kSdc);
+  }
   formats.emplace_back("verilog", Format::kVerilog);
   formats.emplace_back("vhdl", Format::kVhdl);
   formats.emplace_back("testbench", Format::kTestbench);
@@ -73,6 +79,36 @@ Format ReadFormat(std::string_view command, const Given& given, Complaints* comp
                       : fmt::format("--format: \"{}\" must be {}", Shown(*name),
                                     planner::read::Enumerated(known, "or")));
   return Format::kText;
+}
+
+// What constraints are to say, and by which rule crossings are told apart. Sets the format, too,
+// for which --sdc-plain is short.
+void ReadSdc(Call* call, Complaints* complaints) {
+  const Given& given = call->given;
+  const std::string format = given.Value("--format").value_or("");
+  if (given.Has("--sdc-plain")) {
+    if (!format.empty() && format != "sdc" && format != kPlainSdc) {
+      complaints->Add(fmt::format("--sdc-plain contradicts --format {}", Shown(format)));
+    }
+    call->format = Format::kSdc;
+  }
+  call->sdc.plain = given.Has("--sdc-plain") || format == kPlainSdc;
+  call->sdc.fifos = given.Has("--sdc-fifos");
+  if (call->sdc.fifos && (call->format != Format::kSdc || call->sdc.plain)) {
+    complaints->Add("--sdc-fifos goes with --format sdc only");
+  }
+  const std::optional<std::string> gap = given.Value("--gap");
+  if (!gap) return;
+  if (call->command != "relations" && (call->format != Format::kSdc || call->sdc.plain)) {
+    complaints->Add("--gap goes with --format sdc only; relations takes it with each format");
+  }
+  planner::read::Place place;
+  place.entry = "--gap";
+  planner::read::Mistakes mistakes;
+  if (const auto rule = planner::relations::ReadRule(*gap, place, &mistakes)) {
+    call->sdc.rule = *rule;
+  }
+  for (const planner::read::Mistake& mistake : mistakes) complaints->Add(mistake);
 }
 
 // Those of the options that make the request.
@@ -136,6 +172,7 @@ Call ReadCall(std::string_view command, const std::vector<std::string>& words,
   draft = Over(planner::read::ReadOptions(options, &mistakes), draft);
   Complaints complaints;
   call.format = ReadFormat(command, call.given, &complaints);
+  ReadSdc(&call, &complaints);
   for (const std::string& mistake : HdlMistakes(call)) complaints.Add(mistake);
   call.file = call.given.Value("-o").value_or("");
   if (call.file.empty() && call.given.Has("-o")) {

@@ -13,6 +13,7 @@
 #include "cli/Words.h"
 #include "planner/Device.h"
 #include "planner/read/Draft.h"
+#include "planner/report/Sdc.h"
 #include "planner/report/Style.h"
 
 namespace cli {
@@ -30,6 +31,7 @@ struct Call {
   planner::read::Reading reading;
   planner::Device device;
   Format format = Format::kText;
+  planner::report::SdcOptions sdc;            // of the format kSdc, and the rule of relations
   std::string file;                           // of -o; empty: standard output
   std::vector<planner::read::Option> pasted;  // options that ask the same once more
 

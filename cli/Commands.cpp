@@ -7,6 +7,7 @@
 #include "cli/ExplainCommand.h"
 #include "cli/Help.h"
 #include "cli/PlanCommand.h"
+#include "cli/RelationsCommand.h"
 #include "cli/VerifyCommand.h"
 
 namespace cli {
@@ -33,6 +34,8 @@ constexpr Command kCommands[] = {
      "The exit status is 0 also when the request is not possible: an explanation is what was asked "
      "for.",
      true, RunExplain},
+    {"relations", kLoopArguments, "tell how the clocks of a plan relate, and how data can cross",
+     "--in 27MHz --out 148.5,74.25,27", "", true, RunRelations},
     {"tsyn", kLoopArguments, "find the settings of a TSYN", "--in 27 --out 148.5,74.25,27", "",
      true, RunEngine},
     {"pll", kLoopArguments, "find the settings of a PLL", "--in 100 --out 200,100 --phase 0,90", "",

@@ -48,7 +48,7 @@ std::string InFormat(const Call& call, const planner::Answer& answer, const Sett
     case Format::kSdc:
       break;
   }
-  return planner::report::Sdc(call.request(), call.device, answer);
+  return planner::report::Sdc(call.request(), call.device, answer, call.sdc);
 }
 
 }  // namespace

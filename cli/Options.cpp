@@ -10,13 +10,13 @@ namespace cli {
 namespace {
 
 constexpr std::pair<std::string_view, std::string_view> kGroups[] = {
-    {"any", "plan compare best explain tsyn pll kru clkgen"},
-    {"planning", "plan compare best explain"},
-    {"loops", "plan compare best explain tsyn pll"},
+    {"any", "plan compare best explain relations tsyn pll kru clkgen"},
+    {"planning", "plan compare best explain relations"},
+    {"loops", "plan compare best explain relations tsyn pll"},
     {"loop", "tsyn pll"},
     {"krus", "kru clkgen"},
     {"single", "tsyn pll kru clkgen"},
-    {"written", "plan best tsyn pll kru clkgen"},
+    {"written", "plan best relations tsyn pll kru clkgen"},
 };
 
 constexpr OptionRow kRows[] = {
@@ -32,7 +32,7 @@ constexpr OptionRow kRows[] = {
      "outputs may change places, where not all places can make a frequency"},
     {"--device", "NAME", "any batch", "DEVICE[PACKAGE][-GRADE] or its beginning; vk40 by default"},
     {"--primitive", "NAME", "planning batch", "auto (default), PLL, TSYN, KRU_SP or KRU_CLKGEN"},
-    {"--engine", "", "plan compare explain batch",
+    {"--engine", "", "plan compare explain relations batch",
      "only what the design flow's own search answers, not all settings"},
     {"--bandwidth", "NAME", "planning batch", "LOW, HIGH or OPTIMIZED; of the loop, all by default"},
     {"--bandwidth", "NAME", "loop",
@@ -57,14 +57,23 @@ constexpr OptionRow kRows[] = {
     {"--phase-tolerance", "DEG", "any batch", "how far a phase may be off, 0.5 by default"},
     {"--duty-tolerance", "POINTS", "loops batch", "how far a duty cycle may be off, 0.5 by default"},
     {"--max-jitter", "PS", "any batch", "the most jitter that an output may have, peak to peak"},
-    {"--pick", "N", "plan compare best", "the candidate to take, by its number in compare"},
+    {"--pick", "N", "plan compare best relations", "the candidate to take, by its number in compare"},
     {"--front", "N", "best", "trade-offs to show, the best settings as the first; 6 by default"},
     {"--oscillators", "LIST", "explain", "input frequencies to try instead of stock oscillators"},
     {"--request", "FILE", "any", "take from a file what no option says; - is standard input"},
-    {"--format", "NAME", "written", "text (default), json, tcl, sdc, verilog, vhdl or testbench"},
+    {"--format", "NAME", "written",
+     "text (default), json, tcl, sdc, sdc-plain, verilog, vhdl or testbench"},
     {"--format", "NAME", "compare",
      "text (default), json, tcl, verilog, vhdl or testbench; the last three with --pick"},
     {"--format", "NAME", "explain", "text (default), json or tcl"},
+    {"--gap", "NS", "written",
+     "the least time between edges of two clocks in which data can cross, or a share of the shorter "
+     "period such as 20%; 25% by default"},
+    {"--sdc-plain", "", "written",
+     "short for --format sdc-plain: create_clock alone, for readers that know nothing else"},
+    {"--sdc-fifos", "", "written",
+     "with --format sdc: all data that needs a FIFO or a handshake to cross goes through one, and "
+     "the constraints say so"},
     {"--format", "NAME", "devices", "text (default) or json"},
     {"--jobs", "N", "batch", "processes to work with, 1 by default; 0 for one on each processor"},
     {"--shard", "I/N", "batch", "only part I of N parts: every N-th line, from line I on"},
@@ -102,13 +111,14 @@ constexpr Reason kReasons[] = {
     {"--any-order", "single", "the engine takes the outputs as they come; use plan"},
     {"--engine", "single", "the command asks the engine anyway"},
     {"--engine", "best", "best searches all settings; use plan"},
-    {"--pick", "single explain", "only plan, compare and best have candidates to pick"},
+    {"--gap", "compare explain", "it is about the clocks of one plan; use relations"},
+    {"--pick", "single explain", "only plan, compare, best and relations have candidates to pick"},
     {"--trace", "planning", "a trace is of one search; take the command of a primitive"},
 };
 
 // The options that do not ask for anything: they belong to one call.
-constexpr std::string_view kOfOneCall[] = {"--format", "--name", "--language",
-                                           "-o",       "--trace", "--pick"};
+constexpr std::string_view kOfOneCall[] = {"--format", "--name",      "--language",  "-o",   "--trace",
+                                           "--pick",   "--sdc-plain", "--sdc-fifos", "--gap"};
 
 // Whether a list of words has one.
 bool Has(std::string_view list, std::string_view word) {
@@ -173,6 +183,7 @@ std::string_view ReasonAgainst(std::string_view command, std::string_view option
 
 std::optional<ValueFacts> ValueOf(std::string_view option) {
   if (option == "--oscillators") return {{planner::read::ValueKind::kFrequency, true}};
+  if (option == "--gap") return {{planner::read::ValueKind::kGap, false}};
   const planner::read::OptionFacts* facts = planner::read::FindOption(option);
   if (!facts || !facts->kind) return std::nullopt;
   return {{*facts->kind, facts->is_list}};

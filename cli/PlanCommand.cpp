@@ -1,18 +1,15 @@
 #include "cli/PlanCommand.h"
 
-#include <fmt/format.h>
-
 #include <cstddef>
 
 #include "cli/Call.h"
-#include "cli/Devices.h"
 #include "cli/Failure.h"
 #include "cli/Hdl.h"
+#include "cli/PickedPlan.h"
 #include "planner/plan/Plan.h"
 #include "planner/report/Json.h"
 #include "planner/report/PlanText.h"
 #include "planner/report/Sdc.h"
-#include "planner/report/Table.h"
 
 namespace cli {
 
@@ -24,7 +21,6 @@ using planner::report::Style;
 
 constexpr int kUsualFront = 6;
 constexpr int kMostFront = 1000;
-constexpr int kMostPick = 1'000'000;
 
 // What a command shows of a plan.
 enum class Part { kCandidate, kRanking, kTradeoffs };
@@ -89,20 +85,7 @@ std::string InFormat(const Call& call, const Plan& plan, std::size_t number, std
     case Format::kSdc:
       break;
   }
-  return planner::report::Sdc(call.request(), call.device, *plan.Pick(number));
-}
-
-// Why there is nothing at all, with what of the device's limits is to blame.
-std::string UnsolvedText(const Call& call, const Plan& plan, const Setting& setting) {
-  const Style style{false, setting.err_width};
-  std::string text = planner::report::UnsolvedText(plan, call.device, style, {});
-  for (const planner::Answer& answer : plan.refused) {
-    const std::string cause = LimitsInTheWay(call.device, answer.primitive, setting);
-    if (cause.empty()) continue;
-    text += planner::report::Prose(style, std::string(Name(answer.primitive)) + ": ", cause);
-  }
-  return text + "hint: what stands in the way: " + PastedCall("explain", call, setting) + "\n" +
-         DoubtLines(call, style);
+  return planner::report::Sdc(call.request(), call.device, *plan.Pick(number), call.sdc);
 }
 
 }  // namespace
@@ -112,16 +95,9 @@ int RunPlan(std::string_view command, const std::vector<std::string>& words,
   const Call call = ReadCall(command, words, std::nullopt, setting);
   const auto most = static_cast<std::size_t>(
       WholeNumber(call.given, "--front", 0, kMostFront).value_or(kUsualFront));
-  const auto number = static_cast<std::size_t>(
-      WholeNumber(call.given, "--pick", 1, kMostPick).value_or(1));
-  const Plan plan = planner::plan::Make(call.request(), call.device);
-  if (!plan.IsSolved()) throw Failure(kUnsolved, UnsolvedText(call, plan, setting));
-  if (number > plan.ranked.size()) {
-    throw Failure::OfUsage(fmt::format("--pick: there are {} candidates, and no number {}",
-                                       plan.ranked.size(), number));
-  }
-  Write(call, InFormat(call, plan, number, most, setting), setting);
-  return plan.Pick(number)->within ? kDone : kOff;
+  const Picked picked = PickedPlan(call, setting);
+  Write(call, InFormat(call, picked.plan, picked.number, most, setting), setting);
+  return picked.answer().within ? kDone : kOff;
 }
 
 }  // namespace cli

@@ -2,16 +2,16 @@
 #include "planner/report/Sdc.h"
 
 #include <algorithm>
-#include <cctype>
 #include <cstddef>
 #include <map>
 #include <optional>
 #include <vector>
 
-#include "planner/report/FindingText.h"
 #include "planner/report/Numbers.h"
+#include "planner/report/SdcCrossings.h"
+#include "planner/report/SdcPlain.h"
+#include "planner/report/SdcWords.h"
 #include "planner/report/SettingsText.h"
-#include "planner/report/Table.h"
 #include "planner/report/Words.h"
 
 namespace planner::report {
@@ -20,40 +20,24 @@ namespace {
 
 using std::string;
 
-constexpr int kCommentWidth = 78;
-// Decimals of ns and percent, as exactly as a double has them.
-constexpr int kExactDecimals = 15;
 // A clock that is more than so many times as fast as the input has all its edges from one edge of
 // the input. A timing tool may count in floats, of which little is left where a shift takes away
 // nearly all of a period of the input.
 constexpr int kFast = 4;
-
-string Exact(const Rational& value) { return Short(value, kExactDecimals); }
-string Figure(const Rational& value) { return Short(value, 6); }
-
-// Lines of comment.
-string Comment(const string& sentence) {
-  string text = "# ";
-  for (const char letter : Filled(sentence, kCommentWidth)) {
-    text += letter;
-    if (letter == '\n') text += "#   ";
-  }
-  return text + "\n";
-}
 
 // Half of a jitter in ps, in ns: down to a ten-thousandth of a fs.
 string Half(const Rational& jitter) { return Short(jitter / 2000, 10); }
 
 class Constraints {
  public:
-  Constraints(const Request& request, const Device& device, const Answer& answer)
-      : request_(request), device_(device), answer_(answer) {}
+  Constraints(const Request& request, const Device& device, const Answer& answer,
+              const SdcOptions& options)
+      : request_(request), device_(device), answer_(answer), options_(options) {}
 
   string Text() const;
 
  private:
   string Head() const;
-  string SettingsWords() const;
   string Input(int input) const;
   string Clock(std::size_t index, std::map<string, string>* at) const;
   string Figures(std::size_t index) const;
@@ -61,7 +45,6 @@ class Constraints {
   string Uncertainty(std::size_t index) const;
   string Groups() const;
   string ClockName(std::size_t index, int input) const;
-  string PinName(std::size_t index) const;
 
   int Inputs() const { return static_cast<int>(request_.inputs.size()); }
   const Rational& InputOf(int input) const {
@@ -71,58 +54,33 @@ class Constraints {
   const Request& request_;
   const Device& device_;
   const Answer& answer_;
+  const SdcOptions& options_;
 };
-
-string Constraints::SettingsWords() const {
-  std::vector<string> words;
-  if (const auto* loop = std::get_if<LoopSettings>(&answer_.settings)) {
-    words = {"VCO " + Figure(answer_.vco), "PFD " + Figure(answer_.pfd), "M " + Eighths(loop->m),
-             "D " + std::to_string(loop->d), "bandwidth " + string(Name(loop->bandwidth))};
-  } else {
-    for (const auto& [label, value] : SettingsPairs(request_, device_, answer_)) {
-      if (label != "device" && label != "input" && label != "phase error") {
-        words.push_back(label + " " + value);
-      }
-    }
-  }
-  return Join(words, ", ");
-}
 
 // What the file is about, what is off, and the names that a design has its own for.
 string Constraints::Head() const {
-  const string primitive(Name(answer_.primitive));
-  string text = Comment(device_.part + " " + primitive + ": " + SettingsWords());
-  text += Comment(
+  string text = SdcSettings(request_, device_, answer_);
+  text += SdcComment(
       "Periods and shifts are in ns. The uncertainty of a clock is half of its peak-to-peak "
-      "jitter, "
-      "at a bit error rate of 1e-12, by which an edge can be early or late.");
+      "jitter, at a bit error rate of 1e-12, by which an edge can be early or late.");
   if (answer_.phase_error) {
-    text += Comment("The outputs are up to " + Short(*answer_.phase_error, 6) +
-                    " ps beside the phase of the input, which no constraint here counts.");
+    text += SdcComment("The outputs are up to " + Short(*answer_.phase_error, 6) +
+                       " ps beside the phase of the input.");
   }
-  if (!answer_.within) {
-    text += Comment("OFF: not everything is as asked for, or in the device's range.");
-    for (const Finding& violation : answer_.violations) {
-      text += Comment("OFF: " + FindingText(violation, device_));
-    }
-  }
-  text += "\n" + Comment("The names of the input ports and of the primitive in the design.");
+  text += SdcOff(device_, answer_);
+  text += "\n" + SdcComment("The names of the input ports and of the primitive in the design.");
   for (int n = 1; n <= Inputs(); ++n) {
     text += "set input_port_" + std::to_string(n) + " clk_in" + std::to_string(n) + "\n";
   }
-  string instance = primitive;
-  for (char& letter : instance) {
-    letter = static_cast<char>(std::tolower(static_cast<unsigned char>(letter)));
-  }
-  return text + "set primitive " + instance + "_inst\n";
+  return text + "set primitive " + SdcInstance(answer_) + "\n";
 }
 
 string Constraints::Input(int input) const {
   const string n = std::to_string(input + 1);
-  string text = Comment("Input " + n + ": " + Figure(InputOf(input)) + " MHz, jitter " +
-                        Figure(request_.input_jitter) + " ps peak to peak");
-  text += "create_clock -name clk_in" + n + " -period " + Exact(Rational(1000) / InputOf(input)) +
-          " [get_ports $input_port_" + n + "]\n";
+  string text = SdcComment("Input " + n + ": " + SdcFigure(InputOf(input)) + " MHz, jitter " +
+                           SdcFigure(request_.input_jitter) + " ps peak to peak");
+  text += "create_clock -name clk_in" + n + " -period " +
+          SdcExact(Rational(1000) / InputOf(input)) + " [get_ports $input_port_" + n + "]\n";
   if (request_.input_jitter > Rational(0)) {
     text +=
         "set_clock_uncertainty " + Half(request_.input_jitter) + " [get_clocks clk_in" + n + "]\n";
@@ -133,9 +91,9 @@ string Constraints::Input(int input) const {
 // A phase or a duty cycle, what was asked for, and the difference.
 string ShapeWords(const char* what, const char* unit, const Rational& actual,
                   const std::optional<Rational>& requested, const std::optional<Rational>& error) {
-  string text = string("; ") + what + " " + Figure(actual) + " " + unit;
+  string text = string("; ") + what + " " + SdcFigure(actual) + " " + unit;
   if (requested) {
-    text += ", " + Figure(*requested) + " asked for, " + Figure(error.value_or(0)) + " off";
+    text += ", " + SdcFigure(*requested) + " asked for, " + SdcFigure(error.value_or(0)) + " off";
   }
   return text;
 }
@@ -144,9 +102,9 @@ string ShapeWords(const char* what, const char* unit, const Rational& actual,
 string Constraints::Figures(std::size_t index) const {
   const OutputAnswer& output = answer_.outputs[index];
   const Output& asked = RequestedAt(request_, answer_, static_cast<int>(index));
-  string text = "Output " + std::to_string(index) + ": " + Figure(output.frequency) + " MHz, " +
+  string text = "Output " + std::to_string(index) + ": " + SdcFigure(output.frequency) + " MHz, " +
                 output.ratio.NumeratorText() + " / " + output.ratio.DenominatorText() +
-                " of the input, " + Figure(asked.frequency) + " MHz asked for, " +
+                " of the input, " + SdcFigure(asked.frequency) + " MHz asked for, " +
                 Fixed(output.error_ppm, 2) + " ppm off";
   text += ShapeWords("phase", "degrees", output.phase, asked.phase, output.phase_error);
   text += ShapeWords("duty", "percent", output.duty, asked.duty, output.duty_error);
@@ -155,7 +113,7 @@ string Constraints::Figures(std::size_t index) const {
   if (!output.IsWithin()) text += "; OFF";
   if (Inputs() > 1) {
     text +=
-        "; from input 2 " + Figure(InputOf(1) * output.ratio) +
+        "; from input 2 " + SdcFigure(InputOf(1) * output.ratio) +
         " MHz, whose jitter is unknown: it is worked out for the first input only, so that this "
         "clock has no uncertainty here and needs one of your own";
   }
@@ -171,8 +129,8 @@ string EdgesWords(const OutputAnswer& output, const Rational& phase, const Ratio
   const Rational rise = length * phase / 360;
   const Rational fall = rise + length * output.duty / 100 - whole / 2;
   const Rational again = rise + length - whole;
-  return "-edges {1 " + Figure(whole + 1) + " " + Figure(whole * 2 + 1) + "} -edge_shift {" +
-         Exact(rise * source) + " " + Exact(fall * source) + " " + Exact(again * source) + "}";
+  return "-edges {1 " + SdcFigure(whole + 1) + " " + SdcFigure(whole * 2 + 1) + "} -edge_shift {" +
+         SdcExact(rise * source) + " " + SdcExact(fall * source) + " " + SdcExact(again * source) + "}";
 }
 
 // When a clock rises and falls, in the plainest of the descriptions that there are.
@@ -181,7 +139,7 @@ string WaveformWords(const OutputAnswer& output, const Rational& input) {
   const bool is_even = output.duty == Rational(50);
   if (phase == Rational(0) && output.ratio.IsWhole()) {
     return "-multiply_by " + output.ratio.NumeratorText() +
-           (is_even ? "" : " -duty_cycle " + Exact(output.duty));
+           (is_even ? "" : " -duty_cycle " + SdcExact(output.duty));
   }
   if (phase == Rational(0) && output.ratio.NumeratorText() == "1" && is_even) {
     return "-divide_by " + output.ratio.DenominatorText();
@@ -195,12 +153,6 @@ string Constraints::ClockName(std::size_t index, int input) const {
   return name;
 }
 
-// The pin of the primitive at which an output is.
-string Constraints::PinName(std::size_t index) const {
-  if (IsLoop(answer_.primitive)) return "CLKOUT" + std::to_string(index);
-  return Place(answer_.settings, static_cast<int>(index));
-}
-
 // A clock that the primitive makes. With two inputs it is one of two at its pin.
 string Constraints::Generated(std::size_t index, int input) const {
   const string n = std::to_string(input + 1);
@@ -208,7 +160,7 @@ string Constraints::Generated(std::size_t index, int input) const {
          " -source [get_ports $input_port_" + n + "] -master_clock clk_in" + n +
          (input > 0 ? " -add" : "") + " \\\n  " +
          WaveformWords(answer_.outputs[index], InputOf(input)) + " \\\n  [get_pins $primitive/" +
-         PinName(index) + "]\n";
+         SdcPin(answer_, index) + "]\n";
 }
 
 // The jitter is worked out for the first input, and with another one it is another.
@@ -221,11 +173,11 @@ string Constraints::Uncertainty(std::size_t index) const {
 
 // `at` has the clock of each pin that has one.
 string Constraints::Clock(std::size_t index, std::map<string, string>* at) const {
-  string text = "\n" + Comment(Figures(index));
-  const string pin = PinName(index);
+  string text = "\n" + SdcComment(Figures(index));
+  const string pin = SdcPin(answer_, index);
   const auto [place, is_new] = at->emplace(pin, ClockName(index, 0));
   if (!is_new) {
-    return text + Comment("Output " + std::to_string(index) + " is on the pin " + pin +
+    return text + SdcComment("Output " + std::to_string(index) + " is on the pin " + pin +
                           ", too: its clock is " + place->second + ".");
   }
   for (int input = 0; input < Inputs(); ++input) text += Generated(index, input);
@@ -234,7 +186,7 @@ string Constraints::Clock(std::size_t index, std::map<string, string>* at) const
 
 // Only one of two inputs drives the primitive at a time.
 string Constraints::Groups() const {
-  string text = "\n" + Comment("The outputs follow one input or the other.") +
+  string text = "\n" + SdcComment("The outputs follow one input or the other.") +
                 "set_clock_groups -physically_exclusive";
   for (int input = 0; input < Inputs(); ++input) {
     std::vector<string> names;
@@ -253,13 +205,17 @@ string Constraints::Text() const {
   for (std::size_t i = 0; i < answer_.outputs.size(); ++i) {
     if (answer_.outputs[i].used) text += Clock(i, &at);
   }
-  return Inputs() > 1 ? text + Groups() : text;
+  if (Inputs() > 1) text += Groups();
+  return text + SdcInterclockUncertainties(request_, answer_) +
+         SdcCrossings(request_, answer_, options_);
 }
 
 }  // namespace
 
-string Sdc(const Request& request, const Device& device, const Answer& answer) {
-  return Constraints(request, device, answer).Text();
+string Sdc(const Request& request, const Device& device, const Answer& answer,
+           const SdcOptions& options) {
+  if (options.plain) return SdcPlain(request, device, answer);
+  return Constraints(request, device, answer, options).Text();
 }
 
 }  // namespace planner::report

@@ -25,12 +25,22 @@
 #include "planner/Answer.h"
 #include "planner/Device.h"
 #include "planner/Request.h"
+#include "planner/relations/Relations.h"
 
 namespace planner::report {
 
+struct SdcOptions {
+  bool plain = false;  // create_clock alone, for readers that know nothing else
+  // That all data between clocks whose crossing needs a FIFO or a handshake goes through one: what
+  // is said of these then stands as commands, and else in comments only.
+  bool fifos = false;
+  relations::Rule rule;  // by which crossings are told apart
+};
+
 // The constraints of an answer that is solved. Outputs on the same pin of a KRU are one clock: a
 // second one there would replace it or, added to it, have every path counted twice.
-std::string Sdc(const Request& request, const Device& device, const Answer& answer);
+std::string Sdc(const Request& request, const Device& device, const Answer& answer,
+                const SdcOptions& options = {});
 
 }  // namespace planner::report
 
