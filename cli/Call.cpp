@@ -81,27 +81,25 @@ Format ReadFormat(std::string_view command, const Given& given, Complaints* comp
   return Format::kText;
 }
 
-// What constraints are to say, and by which rule crossings are told apart. Sets the format, too,
-// for which --sdc-plain is short.
+// What constraints are to say, and by which rule crossings are told apart. Sets the format, too:
+// --sdc-plain and --sdc-fifos are about one.
 void ReadSdc(Call* call, Complaints* complaints) {
   const Given& given = call->given;
   const std::string format = given.Value("--format").value_or("");
-  if (given.Has("--sdc-plain")) {
+  call->sdc.plain = given.Has("--sdc-plain") || format == kPlainSdc;
+  call->sdc.fifos = given.Has("--sdc-fifos");
+  for (const char* const option : {"--sdc-plain", "--sdc-fifos"}) {
+    if (!given.Has(option)) continue;
     if (!format.empty() && format != "sdc" && format != kPlainSdc) {
-      complaints->Add(fmt::format("--sdc-plain contradicts --format {}", Shown(format)));
+      complaints->Add(fmt::format("{} contradicts --format {}", option, Shown(format)));
     }
     call->format = Format::kSdc;
   }
-  call->sdc.plain = given.Has("--sdc-plain") || format == kPlainSdc;
-  call->sdc.fifos = given.Has("--sdc-fifos");
-  if (call->sdc.fifos && (call->format != Format::kSdc || call->sdc.plain)) {
-    complaints->Add("--sdc-fifos goes with --format sdc only");
+  if (call->sdc.fifos && call->sdc.plain) {
+    complaints->Add("--sdc-fifos has no place in the plain form, which has create_clock alone");
   }
   const std::optional<std::string> gap = given.Value("--gap");
   if (!gap) return;
-  if (call->command != "relations" && (call->format != Format::kSdc || call->sdc.plain)) {
-    complaints->Add("--gap goes with --format sdc only; relations takes it with each format");
-  }
   planner::read::Place place;
   place.entry = "--gap";
   planner::read::Mistakes mistakes;

@@ -67,13 +67,13 @@ constexpr OptionRow kRows[] = {
      "text (default), json, tcl, verilog, vhdl or testbench; the last three with --pick"},
     {"--format", "NAME", "explain", "text (default), json or tcl"},
     {"--gap", "NS", "written",
-     "the least time between edges of two clocks in which data can cross, or a share of the shorter "
-     "period such as 20%; 25% by default"},
+     "the least gap between edges of two clocks in which data can cross, or a share of the shorter "
+     "period such as 20%; 25% by default; of relations and --format sdc"},
     {"--sdc-plain", "", "written",
      "short for --format sdc-plain: create_clock alone, for readers that know nothing else"},
     {"--sdc-fifos", "", "written",
-     "with --format sdc: all data that needs a FIFO or a handshake to cross goes through one, and "
-     "the constraints say so"},
+     "short for --format sdc, where all data that needs a FIFO or a handshake to cross goes through "
+     "one: the constraints then say so"},
     {"--format", "NAME", "devices", "text (default) or json"},
     {"--jobs", "N", "batch", "processes to work with, 1 by default; 0 for one on each processor"},
     {"--shard", "I/N", "batch", "only part I of N parts: every N-th line, from line I on"},

@@ -2,6 +2,7 @@
 
 #include "cli/Call.h"
 #include "cli/Failure.h"
+#include "cli/Hdl.h"
 #include "cli/PickedPlan.h"
 #include "planner/report/Relations.h"
 #include "planner/report/Sdc.h"
@@ -22,9 +23,11 @@ std::string InFormat(const Call& call, const planner::Answer& answer, const Sett
     case Format::kTcl:
       return planner::report::RelationsTcl(request, call.device, answer, rule);
     case Format::kSdc:
+      return planner::report::Sdc(request, call.device, answer, call.sdc);
+    default:
       break;
   }
-  return planner::report::Sdc(request, call.device, answer, call.sdc);
+  return HdlText(call, answer);
 }
 
 }  // namespace

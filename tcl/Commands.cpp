@@ -21,6 +21,7 @@ struct Entry {
 constexpr Entry kEntries[] = {
     {"::vorkel::plan", Plan},       {"::vorkel::compare", Compare}, {"::vorkel::best", Best},
     {"::vorkel::explain", Explain}, {"::vorkel::devices", Devices}, {"::vorkel::check", Check},
+    {"::vorkel::relations", Relations},
 };
 
 // Tcl is C: nothing may be thrown through it.

@@ -20,6 +20,9 @@ std::string Compare(Words words);
 // vorkel::best ?request? ?-option value ...? ?-pick N? ?-front N?
 //   The best, that of each other primitive, trade-offs, at most N, and the engine's best.
 std::string Best(Words words);
+// vorkel::relations ?request? ?-option value ...? ?-pick N? ?-gap gap?
+//   How the clocks of the answer that ranks first, or of the N-th, relate.
+std::string Relations(Words words);
 // vorkel::explain ?request? ?-option value ...? ?-oscillators list?
 //   What is in the way of a request, and what would do.
 std::string Explain(Words words);

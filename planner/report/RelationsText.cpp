@@ -1,4 +1,5 @@
 // Tested by relations_text_test.cpp.
+#include <algorithm>
 #include <cstddef>
 #include <set>
 #include <vector>
@@ -211,19 +212,26 @@ string Texts::Meanings() const {
                       "hold check.");
 }
 
-// Of two inputs, both make the same crossings, but for a least gap in ns.
+// A pair that needs one in both directions is named once.
 string Texts::Fifos() const {
+  const auto needs = [&](std::size_t from, std::size_t to) {
+    return std::any_of(relations_.all.begin(), relations_.all.end(), [&](const Relation& one) {
+      return one.from == from && one.to == to && one.crossing == Crossing::kFifo;
+    });
+  };
   std::vector<string> pairs;
   for (const Relation& one : relations_.all) {
     if (one.crossing != Crossing::kFifo) continue;
-    string pair = ClockWord(one.from) + " to " + ClockWord(one.to);
+    const bool is_both = needs(one.to, one.from);
+    if (is_both && one.from > one.to) continue;
+    string pair = ClockWord(one.from) + (is_both ? " and " : " to ") + ClockWord(one.to);
     if (HasTwoInputs()) {
       pair += " with input " + std::to_string(relations_.clocks[one.from].input + 1);
     }
     pairs.push_back(pair);
   }
   if (pairs.empty()) return "FIFO or handshake: no crossing needs one\n";
-  return Prose(style_, "FIFO or handshake: ", Join(pairs, ", "));
+  return Prose(style_, "FIFO or handshake: ", Join(pairs, "; "));
 }
 
 string Texts::TwoInputs() const {

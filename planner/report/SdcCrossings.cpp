@@ -129,7 +129,8 @@ string CrossingsText::Head(bool any) const {
             "and not been checked.";
   } else {
     text += "The commands in comments are right where all data that crosses goes through a FIFO or "
-            "a handshake; else they would hide paths that fail.";
+            "a handshake; else they would hide paths that fail. They keep its bits within a period "
+            "of the faster clock of each other.";
   }
   return SdcComment(text);
 }
@@ -147,8 +148,7 @@ string CrossingsText::Gap(const Relation& relation) const {
 // No more than one period of the faster clock: then the bits of a pointer in Gray code, of which
 // one changes at a time, come in their order. Hold has nothing to protect there.
 string CrossingsText::Fifo(const Relation& relation) const {
-  return SdcComment(Gap(relation) + ". A FIFO or a handshake; its bits then differ by less than a "
-                                    "period of the faster clock.") +
+  return SdcComment(Gap(relation) + ": a FIFO or a handshake.") +
          Commands("set_max_delay " + SdcExact(Shorter(relation)) + FromTo(relation) +
                       "set_false_path -hold" + FromTo(relation),
                   options_.fifos);

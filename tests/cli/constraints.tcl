@@ -6,6 +6,8 @@ namespace eval ::constraints {
   # generated one also description, the options that describe it, in alphabetical order.
   variable clocks {}
   variable groups {}
+  # From name to name: the uncertainty of paths between two clocks.
+  variable between {}
 }
 
 # The clocks of a file, with every name of a port and pin that it mentions. Only commands of SDC
@@ -13,6 +15,7 @@ namespace eval ::constraints {
 proc ::constraints::evaluate {text} {
   variable clocks {}
   variable groups {}
+  variable between {}
   set interp [interp create -safe]
   try {
     foreach command [$interp eval {info commands}] {
@@ -136,10 +139,25 @@ proc ::constraints::create_generated_clock {args} {
     description $description]
 }
 
-proc ::constraints::set_clock_uncertainty {value names} {
+# Of a clock, or of all paths from some clocks to others.
+proc ::constraints::set_clock_uncertainty {args} {
   variable clocks
-  foreach name $names {
+  variable between
+  set given [Options $args {-from -to} {}]
+  set names [lassign [dict get $given ""] value]
+  if {[dict exists $given -from] != [dict exists $given -to] ||
+      [dict exists $given -from] != ($names eq "")} {
+    error "an uncertainty is of a clock, or from one to another"
+  }
+  foreach name [concat {*}$names] {
     dict set clocks $name uncertainty $value
+  }
+  if {$names eq ""} {
+    foreach from [lindex [dict get $given -from] 0] {
+      foreach to [lindex [dict get $given -to] 0] {
+        dict set between $from $to $value
+      }
+    }
   }
 }
 
