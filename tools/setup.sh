@@ -43,7 +43,7 @@ end_set_up() {
 
 # --- Debian packages ---------------------------------------------------------------------
 
-# Prints the Debian packages that a job needs: `packages_for program|tests|benchmarks|libcxx`.
+# Prints the Debian packages that a job needs: `packages_for program|tests|benchmarks|packages|libcxx`.
 packages_for() {
   printf '%s\n' g++ cmake ninja-build tcl8.6 tcl8.6-dev tcllib libtomlplusplus-dev \
     libboost-dev libcli11-dev libfmt-dev nlohmann-json3-dev
@@ -51,6 +51,7 @@ packages_for() {
     tests) printf '%s\n' libgtest-dev libgmock-dev opensta parallel procps \
       pkg-config pybind11-dev python3-dev python3-pytest python3-yaml man-db ;;
     benchmarks) printf '%s\n' libbenchmark-dev ;;
+    packages) printf '%s\n' pybind11-dev python3-dev dpkg-dev file ;;
     libcxx) printf '%s\n' clang-14 libc++-14-dev libc++abi-14-dev ;;
   esac
 }
@@ -65,7 +66,7 @@ missing_packages() {
   done
 }
 
-# Installs what a job lacks: `install_packages program|tests|benchmarks|libcxx`. Ends the script when
+# Installs what a job lacks: `install_packages WHAT`. Ends the script when
 # that cannot be done. On a system without dpkg the tools are taken as they are, and CMake
 # says what it lacks.
 install_packages() {
@@ -188,7 +189,7 @@ configure() {
   printf '%s\n' "$*" >"$marker"
 }
 
-# `bring_up_to_date FOLDER program|tests OPTION...`: packages, configuration and build, as
+# `bring_up_to_date FOLDER program|tests|... OPTION...`: packages, configuration and build, as
 # far as they are needed. The folder must be locked by the caller.
 bring_up_to_date() {
   local folder=$1 what=$2 state targets=(all)
