@@ -217,8 +217,9 @@ string Course(const Bench& bench) {
 string VhdlModule(const string& name, const Instance& instance) {
   std::vector<string> ports;
   for (const Port& port : instance.ports) ports.push_back(PortLine(port.name, port.is_output));
+  // The models are visible in VHDL-93 only so.
   return kContext +
-         ("\nentity " + name) +
+         ("use work.all;\n\nentity " + name) +
          " is\n"
          "  generic (\n"
          "    -- Of the simulation alone.\n"
