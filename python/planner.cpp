@@ -22,14 +22,20 @@
 #include "planner/device/Check.h"
 #include "planner/device/Files.h"
 #include "planner/explain/Explain.h"
+#include "planner/hdl/Hdl.h"
+#include "planner/hdl/Instance.h"
+#include "planner/hdl/Names.h"
 #include "planner/plan/Plan.h"
 #include "planner/read/RequestJson.h"
+#include "planner/read/Shown.h"
+#include "planner/relations/Rule.h"
 #include "planner/report/DevicesText.h"
 #include "planner/report/ErrorData.h"
 #include "planner/report/ExplainText.h"
 #include "planner/report/Json.h"
 #include "planner/report/PartText.h"
 #include "planner/report/PlanText.h"
+#include "planner/report/Relations.h"
 #include "planner/report/Sdc.h"
 #include "planner/report/VerifyText.h"
 #include "planner/verify/Verify.h"
@@ -151,11 +157,45 @@ class Plan {
     }
     return planner::report::PlanText(plan_, asked_.device, Checked(number), style, {});
   }
-  string Sdc(std::size_t number) const {
-    return planner::report::Sdc(asked_.request(), asked_.device, Candidate(number));
+  string Sdc(std::size_t number, bool plain, bool fifos, const string& rule) const {
+    planner::report::SdcOptions options;
+    options.plain = plain;
+    options.fifos = fifos;
+    options.rule = Rule(rule);
+    return planner::report::Sdc(asked_.request(), asked_.device, Candidate(number), options);
+  }
+  string Relations(std::size_t number, const string& rule) const {
+    return planner::report::RelationsJson(asked_.request(), asked_.device, Candidate(number),
+                                          Rule(rule));
+  }
+  string Hdl(std::size_t number, bool is_vhdl, bool is_testbench, const string& name) const {
+    string wrong = planner::hdl::NameProblem(name);
+    if (!wrong.empty()) wrong = "\"" + planner::read::Shown(name) + "\" " + wrong;
+    if (wrong.empty()) wrong = planner::hdl::Refusal(asked_.request());
+    if (!wrong.empty()) {
+      Raise("raise_request", ordered_json::array({{{"kind", "not_writable"},
+                                                   {"entry", "name"},
+                                                   {"text", planner::read::Shown(name)},
+                                                   {"known", ordered_json::array()},
+                                                   {"message", wrong}}}));
+    }
+    const auto language =
+        is_vhdl ? planner::hdl::Language::kVhdl : planner::hdl::Language::kVerilog;
+    const auto& write = is_testbench ? planner::hdl::Testbench : planner::hdl::Module;
+    return write(language, name, asked_.request(), asked_.device, Candidate(number));
   }
 
  private:
+  // From which gap on data can cross between clocks: "0.5ns", "20%"; empty: the usual.
+  static planner::relations::Rule Rule(const string& text) {
+    if (text.empty()) return {};
+    planner::read::Mistakes mistakes;
+    planner::read::Place place;
+    place.entry = "gap";
+    const auto rule = planner::relations::ReadRule(text, place, &mistakes);
+    if (!rule) RaiseMistakes(mistakes);
+    return *rule;
+  }
   std::size_t Checked(std::size_t number) const {
     if (plan_.Pick(number) == nullptr) throw py::index_error("there is no such candidate");
     return number;
@@ -270,7 +310,9 @@ PYBIND11_MODULE(_planner, module) {
       .def("json", &Plan::Json, arg("part"), arg("number"), arg("most"))
       .def("tcl", &Plan::Tcl, arg("part"), arg("number"), arg("most"))
       .def("report", &Plan::Report, arg("part"), arg("number"), arg("most"), arg("width"))
-      .def("sdc", &Plan::Sdc, arg("number"));
+      .def("sdc", &Plan::Sdc, arg("number"), arg("plain"), arg("fifos"), arg("gap"))
+      .def("relations", &Plan::Relations, arg("number"), arg("gap"))
+      .def("hdl", &Plan::Hdl, arg("number"), arg("vhdl"), arg("testbench"), arg("name"));
 
   py::class_<Explanation>(module, "Explanation", "Why a request fails, and what would do.")
       .def(py::init([](const string& request, const py::object& oscillators) {

@@ -51,11 +51,13 @@ from ._explanation import (
     PrimitiveExplanation,
 )
 from ._planner import version as __version__
+from ._relations import Clock, Relation
 from ._request import Output, Value
 
 __all__ = [
     "Answer",
     "Change",
+    "Clock",
     "Conflict",
     "Demand",
     "Device",
@@ -81,6 +83,7 @@ __all__ = [
     "Range",
     "Ranking",
     "Refusal",
+    "Relation",
     "RequestError",
     "UnsolvedError",
     "Value",

@@ -10,6 +10,7 @@ from ._answers import Answer, KruSettings, LoopSettings, OutputAnswer, Refusal
 from ._data import Data
 from ._errors import mistake
 from ._explanation import Explanation
+from ._relations import Relation, relations_of
 from ._request import AnyInputs, AnyOutput, Value, listed, request_json, written
 
 _USUAL_FRONT = 6
@@ -123,9 +124,45 @@ class Plan:
         """The report that `vorkel` shows, for so many columns."""
         return self._made.report(self._part, self._number, self._most, _count("width", width, 40))
 
-    def to_sdc(self, number: Optional[int] = None) -> str:
-        """Timing constraints of the first answer, or of candidate `number`."""
-        return self._made.sdc(self._chosen(number))
+    def to_sdc(
+        self,
+        number: Optional[int] = None,
+        *,
+        plain: bool = False,
+        fifos: bool = False,
+        gap: Optional[str] = None,
+    ) -> str:
+        """Timing constraints of the first answer, or of candidate `number`.
+
+        plain: `create_clock` alone, for readers that know nothing else.
+        fifos: data between clocks whose crossing needs a FIFO all goes through one.
+        gap: from which gap between edges on a crossing is timed as it stands, such as "0.5ns" or
+            "20%" of the shorter period.
+        """
+        return self._made.sdc(self._chosen(number), bool(plain), bool(fifos), gap or "")
+
+    def relations(
+        self, number: Optional[int] = None, *, gap: Optional[str] = None
+    ) -> Tuple[Relation, ...]:
+        """How data crosses from each clock to each other."""
+        return relations_of(json.loads(self._made.relations(self._chosen(number), gap or "")))
+
+    def to_verilog(self, name: str = "clocks", number: Optional[int] = None) -> str:
+        """A Verilog module with the primitive and all its settings."""
+        return self._made.hdl(self._chosen(number), False, False, name)
+
+    def to_vhdl(self, name: str = "clocks", number: Optional[int] = None) -> str:
+        """The same as a VHDL entity."""
+        return self._made.hdl(self._chosen(number), True, False, name)
+
+    def to_testbench(
+        self, name: str = "clocks", number: Optional[int] = None, *, language: str = "verilog"
+    ) -> str:
+        """A testbench, in verilog or vhdl, that checks every edge of that module."""
+        if language not in ("verilog", "vhdl"):
+            sentence = f"language: {language!r} must be verilog or vhdl"
+            raise mistake("not_a_name", str(language), sentence, "language")
+        return self._made.hdl(self._chosen(number), language == "vhdl", True, name)
 
     def _chosen(self, number: Optional[int]) -> int:
         return self._number if number is None else self._candidate(number)

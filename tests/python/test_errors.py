@@ -127,3 +127,21 @@ def test_widths_and_counts(video):
         video.to_text(width=1)
     with pytest.raises(vorkel.RequestError):
         vorkel.best(27, [27], front=-1)
+
+
+def test_names_that_no_module_can_have(video):
+    for name in ("module", "", "a b", "3clocks", "a\n"):
+        for write in (video.to_verilog, video.to_vhdl, video.to_testbench):
+            with pytest.raises(vorkel.RequestError) as caught:
+                write(name)
+            assert caught.value.mistakes[0].kind == "not_writable"
+    with pytest.raises(vorkel.RequestError):
+        video.to_testbench(language="c")
+
+
+@pytest.mark.parametrize("gap", ["-1ns", "x", "0%", "200%"])
+def test_gaps_that_there_are_not(video, gap):
+    for call in (video.relations, video.to_sdc):
+        with pytest.raises(vorkel.RequestError) as caught:
+            call(gap=gap)
+        assert caught.value.mistakes[0].entry == "gap"

@@ -153,13 +153,42 @@ def test_refused_primitives_of_a_comparison():
     assert refused["KRU_SP"].reason == refused["KRU_SP"].findings[0].text
 
 
-@pytest.mark.parametrize("format, method", [("json", "to_json"), ("sdc", "to_sdc"), ("tcl", "to_tcl")])
-def test_formats_are_those_of_the_program(video, build_dir, format, method):
+@pytest.mark.parametrize(
+    "words, written",
+    [
+        ("--format json", lambda plan: plan.to_json()),
+        ("--format tcl", lambda plan: plan.to_tcl()),
+        ("--format sdc", lambda plan: plan.to_sdc()),
+        ("--format sdc-plain", lambda plan: plan.to_sdc(plain=True)),
+        ("--format sdc --pick 2", lambda plan: plan.to_sdc(2)),
+        ("--format verilog", lambda plan: plan.to_verilog()),
+        ("--format verilog --name video", lambda plan: plan.to_verilog("video")),
+        ("--format vhdl --pick 2", lambda plan: plan.to_vhdl(number=2)),
+        ("--format testbench", lambda plan: plan.to_testbench()),
+        ("--format testbench --language vhdl", lambda plan: plan.to_testbench(language="vhdl")),
+    ],
+)
+def test_formats_are_those_of_the_program(video, build_dir, words, written):
     command = [f"{build_dir}/vorkel", "plan", "--in", "27MHz", "--out", "148.5,74.25,27"]
-    shown = subprocess.run(
-        [*command, "--format", format], check=True, capture_output=True, text=True
-    ).stdout
-    assert getattr(video, method)() == shown
+    shown = subprocess.run([*command, *words.split()], check=True, capture_output=True, text=True)
+    assert written(video) == shown.stdout
+
+
+# Of 148.5 and 74.25 MHz every second edge is the same one: a gap of 1000 / 148.5 ns.
+def test_relations(video):
+    relations = {(one.launching.name, one.capturing.name): one for one in video.relations()}
+    one = relations["clk_out0", "clk_out1"]
+    assert one.synchronous and not one.fifo
+    assert one.ratio == Fraction(1, 2)
+    assert one.gap == one.launching.period == 1000 / Fraction(297, 2)
+    assert (one.launches, one.captures) == (2, 1)
+    assert one.capturing.outputs == (1,)
+    # 148.5 / 27 is 11 / 2.
+    far = relations["clk_in1", "clk_out0"]
+    assert (far.ratio, far.launches, far.captures) == (Fraction(11, 2), 2, 11)
+    assert far.hyperperiod == Fraction(2000, 27)
+    stricter = {(one.launching.name, one.capturing.name): one for one in video.relations(gap="6ns")}
+    assert stricter["clk_in1", "clk_out0"].limit == 6
 
 
 def test_the_report(video):
