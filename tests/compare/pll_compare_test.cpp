@@ -150,15 +150,15 @@ TEST(PllCompare, ProductAnswersAsThePlainSearchWhereEndsMeet) {
 
 INSTANTIATE_TEST_SUITE_P(
     Kinds, PllCompare,
-    testing::Values(Load{Kind::kCommon, 800, 8, 20000, 60, 3},
-                    Load{Kind::kConstructed, 1500, 4, 40000, 60, 2},
-                    Load{Kind::kShifted, 400, 16, 15000, 200, 5},
-                    Load{Kind::kRangeEnds, 600, 4, 15000, 30, 3},
-                    Load{Kind::kMeetingEnds, 300, 6, 10000, 60, 4},
-                    Load{Kind::kRoundFigures, 300, 6, 10000, 60, 4},
-                    Load{Kind::kInfeasible, 100, 12, 4000, 200, 6},
-                    Load{Kind::kLowOutput, 200, 6, 5000, 150, 4},
-                    Load{Kind::kWild, 800, 4, 15000, 20, 3}),
+    testing::Values(Load{Kind::kCommon, 500, 5, 20000, 60, 3},
+                    Load{Kind::kConstructed, 700, 3, 40000, 60, 2},
+                    Load{Kind::kShifted, 250, 9, 15000, 200, 5},
+                    Load{Kind::kRangeEnds, 400, 3, 15000, 30, 3},
+                    Load{Kind::kMeetingEnds, 180, 4, 10000, 60, 4},
+                    Load{Kind::kRoundFigures, 200, 4, 10000, 60, 4},
+                    Load{Kind::kInfeasible, 100, 8, 4000, 200, 6},
+                    Load{Kind::kLowOutput, 60, 2, 5000, 150, 4},
+                    Load{Kind::kWild, 800, 3, 15000, 20, 3}),
     [](const testing::TestParamInfo<Load>& parameter) {
       return KindName(parameter.param.kind);
     });
