@@ -102,9 +102,9 @@ proc ::sta::run {plans} {
     }
     set results {}
     foreach line [split [string trim [::cli::contents report] \n] \n] {
-      lassign $line number faults clocks paths
+      lassign $line number faults clocks paths holds
       dict set results $number [dict create faults $faults warnings {} \
-        clocks $clocks paths $paths]
+        clocks $clocks paths $paths holds $holds]
     }
     foreach line [split [string trim [::cli::contents warnings]] \n] {
       if {![regexp {^plan (\d+)$} $line -> number]} {
@@ -122,8 +122,10 @@ proc ::sta::run {plans} {
   return [dict values $results]
 }
 
-# What differs between a plan and what the engine makes of it, as sentences. Counts the pairs of
-# clocks whose gap must be exact, and the others, in the variables of that name.
+# What differs between a plan and what the engine makes of it, as sentences. Beside what `run` needs,
+# a plan has relations (as in JSON) and form: "" for the usual constraints, "fifos" where all data
+# that needs a FIFO has one, "plain" for create_clock alone. Counts the pairs of clocks whose gap must
+# be exact, and the others, in the variables of that name.
 proc ::sta::differences {plan result exactPairs otherPairs} {
   upvar 1 $exactPairs exact_pairs $otherPairs other_pairs
   set answer [dict get $plan answer]
@@ -140,38 +142,40 @@ proc ::sta::differences {plan result exactPairs otherPairs} {
     }
   }
   lassign [::exact::clocks $answer $inputs $outputs] steps clocks
+  if {[dict get $plan form] eq "plain"} {
+    set clocks [PlainClocks $clocks $inputs]
+  }
   lappend faults {*}[ClockDifferences $steps $clocks [dict get $result clocks]]
 
-  set uncertainties [Uncertainties $answer $inputs $outputs]
-  set slacks [dict create]
-  foreach path [dict get $result paths] {
-    lassign $path from to endpoint slack
-    set edge [expr {[string match fall_* $endpoint] ? "fall" : "rise"}]
-    set slack [expr {$slack * 1e9}]
-    set key [list $from $to $edge]
-    if {![dict exists $slacks $key] || $slack < [dict get $slacks $key]} {
-      dict set slacks $key $slack
-    }
-  }
+  set slacks [Slacks [dict get $result paths]]
+  set holds [Slacks [dict get $result holds]]
   # Pairs of clocks for which it may have found no common period.
   set long {}
   foreach from [dict keys $clocks] {
     foreach to [dict keys $clocks] {
-      foreach edge {rise fall} {
-        set key [list $from $to $edge]
-        if {[AreExclusive $from $to]} {
-          if {[dict exists $slacks $key]} {
-            lappend faults "$from to $to: only one of them is there"
-          }
-          continue
+      set relation [Relation $plan $from $to]
+      if {[AreApart $plan $from $to $relation]} {
+        if {[dict exists $slacks $from $to] || [dict exists $holds $from $to]} {
+          lappend faults "$from to $to: only one of them is there"
         }
-        if {![dict exists $slacks $key]} {
+        continue
+      }
+      set uncertainty [Uncertainty $plan $from $to]
+      foreach edge {rise fall} {
+        if {![dict exists $slacks $from $to $edge]} {
           lappend faults "$from to $to, $edge: no path"
           continue
         }
-        set gap [expr {[dict get $slacks $key] + [dict get $uncertainties $to]}]
+        set gap [expr {[dict get $slacks $from $to $edge] + $uncertainty}]
         lassign [Bounds $steps [dict get $clocks $from] [dict get $clocks $to] $edge] least most \
-          margin isLong
+          margin isLong exact
+        lappend faults {*}[RelationDifferences $relation $steps [dict get $clocks $from] \
+          [dict get $clocks $to] $edge $exact]
+        if {[HasFifo $plan $relation]} {
+          set least [expr {min([lindex [dict get $clocks $from] 0],
+            [lindex [dict get $clocks $to] 0]) / double($steps)}]
+          set most $least
+        }
         if {$gap < $least - $margin || ($most ne "" && $gap > $most + $margin)} {
           lappend faults "$from to $to, $edge: $gap ns, not $least to $most"
         }
@@ -179,12 +183,29 @@ proc ::sta::differences {plan result exactPairs otherPairs} {
         if {$isLong} {
           lappend long [lsort [list $from $to]]
         }
-        dict unset slacks $key
+      }
+      if {[HasFifo $plan $relation]} {
+        if {[dict exists $holds $from $to]} {
+          lappend faults "$from to $to: hold is checked"
+        }
+      } elseif {![dict exists $holds $from $to rise]} {
+        lappend faults "$from to $to: no hold is checked"
+      } elseif {$least eq $most && !$isLong} {
+        set hold [Hold $steps [dict get $clocks $from] [dict get $clocks $to]]
+        set found [expr {[dict get $holds $from $to rise] + $uncertainty}]
+        if {abs($found - $hold) > $margin} {
+          lappend faults "$from to $to: a hold of $found ns, not $hold"
+        }
+      }
+      if {[dict exists $slacks $from]} {
+        dict unset slacks $from $to
       }
     }
   }
-  if {[dict size $slacks] > 0} {
-    lappend faults "further paths: $slacks"
+  foreach from [dict keys $slacks] {
+    if {[dict size [dict get $slacks $from]] > 0} {
+      lappend faults "further paths: $from [dict get $slacks $from]"
+    }
   }
   foreach warning [dict get $result warnings] {
     if {![regexp {^Warning: No common period was found between clocks (\S+) and (\S+)\.$} $warning \
@@ -193,6 +214,110 @@ proc ::sta::differences {plan result exactPairs otherPairs} {
     }
   }
   return $faults
+}
+
+# The least slacks of paths, ns: a dict from launching clock, capturing clock and edge.
+proc ::sta::Slacks {paths} {
+  set slacks [dict create]
+  foreach path $paths {
+    lassign $path from to endpoint slack
+    set edge [expr {[string match fall_* $endpoint] ? "fall" : "rise"}]
+    set slack [expr {$slack * 1e9}]
+    if {![dict exists $slacks $from $to $edge] || $slack < [dict get $slacks $from $to $edge]} {
+      dict set slacks $from $to $edge $slack
+    }
+  }
+  return $slacks
+}
+
+# The clocks that the plain form has: of two inputs the outputs are as with the faster one.
+proc ::sta::PlainClocks {clocks inputs} {
+  if {[llength $inputs] == 1} {
+    return $clocks
+  }
+  lassign $inputs one two
+  set fastest [expr {[lindex $two 0] * [lindex $one 1] > [lindex $one 0] * [lindex $two 1] ? 2 : 1}]
+  set plain [dict create]
+  dict for {name times} $clocks {
+    if {[regexp {^(clk_out\d+)_in(\d)$} $name -> output input]} {
+      if {$input != $fastest} continue
+      set name $output
+    }
+    dict set plain $name $times
+  }
+  return $plain
+}
+
+# What the program says of two clocks, "" for nothing.
+proc ::sta::Relation {plan from to} {
+  if {[dict get $plan form] ne "plain"} {
+    foreach relation [dict get $plan relations] {
+      if {[dict get $relation from] eq $from && [dict get $relation to] eq $to} {
+        return $relation
+      }
+    }
+  }
+  return ""
+}
+
+# Whether there is a crossing that is said to go through a FIFO.
+proc ::sta::HasFifo {plan relation} {
+  return [expr {[dict get $plan form] eq "fifos" && $relation ne "" &&
+    [dict get $relation crossing] eq "fifo"}]
+}
+
+# Whether no path between two clocks is timed: they follow different inputs of the primitive, or
+# have been said to be asynchronous.
+proc ::sta::AreApart {plan from to relation} {
+  return [expr {[AreExclusive $from $to] || ([dict get $plan form] eq "fifos" && $relation ne "" &&
+    ![dict get $relation synchronous])}]
+}
+
+# An exact number of JSON as a ratio.
+proc ::sta::Ratio {text} {
+  lassign [split $text /] a b
+  return [list $a [expr {$b eq "" ? 1 : $b}]]
+}
+
+# What of a relation is not so. `exact` is the gap to an edge, in steps.
+proc ::sta::RelationDifferences {relation steps from to edge exact} {
+  if {$relation eq "" || ![dict get $relation synchronous]} {
+    return {}
+  }
+  set name "[dict get $relation from] to [dict get $relation to]"
+  set gap [dict get $relation [expr {$edge eq "rise" ? "gap_exact" : "gap_rise_fall_exact"}]]
+  set faults {}
+  if {[Ratio $gap] ne [::exact::ratio $exact $steps]} {
+    lappend faults "$name, $edge: the relation has $gap ns, not [::exact::ratio $exact $steps]"
+  }
+  set launches [dict get $relation launches]
+  set captures [dict get $relation captures]
+  set all [expr {$launches * [lindex $from 0]}]
+  if {$all != $captures * [lindex $to 0] || [::exact::gcd $launches $captures] != 1 ||
+      [Ratio [dict get $relation hyperperiod_exact]] ne [::exact::ratio $all $steps]} {
+    lappend faults "$name: $launches and $captures edges in [dict get $relation hyperperiod] ns"
+  }
+  if {[Ratio [dict get $relation hold_exact]] ne [::exact::ratio [HoldSteps $from $to] $steps]} {
+    lappend faults "$name: the relation has a hold of [dict get $relation hold_exact] ns"
+  }
+  return $faults
+}
+
+# The least time by which a rise of the second clock is before one of the first, or at the same
+# time: of as many rises of the first as there are until both come again.
+proc ::sta::HoldSteps {from to} {
+  lassign $from first rise
+  lassign $to second toRise
+  set least $second
+  set count [expr {$second / [::exact::gcd $first $second]}]
+  for {set k 0} {$k < $count} {incr k} {
+    set least [expr {min($least, ($rise + $k * $first - $toRise) % $second)}]
+  }
+  return $least
+}
+
+proc ::sta::Hold {steps from to} {
+  return [expr {[HoldSteps $from $to] / double($steps)}]
 }
 
 # What differs between clocks on a grid of steps and those of the engine.
@@ -220,18 +345,39 @@ proc ::sta::ClockDifferences {steps clocks found} {
   return $faults
 }
 
-# How early or late each clock can be, ns: half of its jitter where that is known.
-proc ::sta::Uncertainties {answer inputs outputs} {
-  set uncertainties [dict create]
-  for {set n 1} {$n <= [llength $inputs]} {incr n} {
-    dict set uncertainties clk_in$n [expr {[dict get $answer input_jitter] / 2000.0}]
-    foreach output $outputs {
-      set name clk_out[dict get $output index][expr {[llength $inputs] > 1 ? "_in$n" : ""}]
-      set jitter [dict get $output jitter]
-      dict set uncertainties $name [expr {$n > 1 || $jitter eq "null" ? 0 : $jitter / 2000.0}]
+# How much nearer the edges of two clocks can be than their times say, ns: half of the jitter of the
+# capturing clock where that is known. Of input and output, and of two pins of a KRU, both count; and
+# of the former the phase error, too. All of it is known for the first input only.
+proc ::sta::Uncertainty {plan from to} {
+  if {[dict get $plan form] eq "plain"} {
+    return 0.0
+  }
+  set answer [dict get $plan answer]
+  set own [Jitter $answer $to]
+  set other [Jitter $answer $from]
+  set is_loop [expr {[dict get $answer primitive] in {PLL TSYN}}]
+  set has_input [expr {[string match clk_in* $from] || [string match clk_in* $to]}]
+  if {$from ne $to && $own ne "" && $other ne "" && ![regexp {in2$} "$from $to"] &&
+      ![regexp {in2 } "$from $to"] && ($has_input || !$is_loop)} {
+    set phase [dict get $answer phase_error]
+    if {!$has_input} {
+      return [expr {($own + $other) / 2000.0}]
+    }
+    if {$phase ne "null"} {
+      return [expr {($own + $other) / 2000.0 + $phase / 1000.0}]
     }
   }
-  return $uncertainties
+  return [expr {$own eq "" ? 0.0 : $own / 2000.0}]
+}
+
+# The jitter of a clock, ps, "" where it is not known.
+proc ::sta::Jitter {answer name} {
+  if {[string match clk_in* $name]} {
+    return [dict get $answer input_jitter]
+  }
+  regexp {^clk_out(\d+)(?:_in(\d))?$} $name -> index input
+  set jitter [dict get [lindex [dict get $answer outputs] $index] jitter]
+  return [expr {$input eq "2" || $jitter eq "null" ? "" : $jitter}]
 }
 
 # Whether two clocks follow different inputs of the primitive.
@@ -241,8 +387,8 @@ proc ::sta::AreExclusive {one two} {
 }
 
 # What the engine's gap between two clocks must be: at least and at most (ns, "" when it can be
-# anything), how far it may be off, and whether it may have found no common period. Clocks are
-# period, rise and fall in steps, of which a nanosecond has `steps`.
+# anything), how far it may be off, whether it may have found no common period, and what the gap is,
+# in steps. Clocks are period, rise and fall in steps, of which a nanosecond has `steps`.
 proc ::sta::Bounds {steps from to edge} {
   variable most_periods
   variable most_slower_periods
@@ -260,6 +406,7 @@ proc ::sta::Bounds {steps from to edge} {
   set grain [::exact::gcd [::exact::gcd $first $second] [expr {$capture - $rise}]]
   set seen [expr {min($periods, $limit, int($grain / ($distinct * $second)))}]
   set least [::exact::gap $first $rise $second $capture $periods 0]
+  set exact $least
   set most $least
   if {$seen < $periods} {
     set most [::exact::gap $first $rise $second $capture $seen 1]
@@ -278,5 +425,5 @@ proc ::sta::Bounds {steps from to edge} {
   set time [expr {($seen * $second + $first + $second) / double($steps)}]
   return [list [expr {$least / double($steps)}] \
     [expr {$most eq "" ? "" : $most / double($steps)}] \
-    [expr {$tolerance * $time + $rounding}] [expr {$periods > $limit}]]
+    [expr {$tolerance * $time + $rounding}] [expr {$periods > $limit}] $exact]
 }

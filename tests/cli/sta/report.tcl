@@ -3,8 +3,19 @@
 # with the number of a plan to standard error before it says anything about it.
 #
 # A line of the report is a list: the number of the plan, what is wrong with its constraints, the
-# clocks (a dict from name to period, rise and fall, in seconds) and the paths (a list of the
-# launching clock, the capturing clock, the endpoint and the slack, in seconds).
+# clocks (a dict from name to period, rise and fall, in seconds), and the paths of setup and those of
+# hold (lists of the launching clock, the capturing clock, the endpoint and the slack, in seconds).
+
+# The paths of setup (max) or of hold (min).
+proc paths {delay} {
+  set paths {}
+  foreach end [find_timing_paths -path_delay $delay -group_count 100000 -endpoint_count 100] {
+    lappend paths [list [get_property [get_property $end startpoint_clock] name] \
+      [get_property [$end target_clk] name] \
+      [get_property [get_property $end endpoint] full_name] [$end slack]]
+  }
+  return $paths
+}
 
 set report [open report w]
 # In this interpreter stderr is the engine's standard output.
@@ -28,12 +39,6 @@ for {set n 0} {[file exists plan-$n.v]} {incr n} {
   foreach clock [all_clocks] {
     lappend clocks [get_property $clock name] [list [$clock period] {*}[$clock waveform]]
   }
-  set paths {}
-  foreach end [find_timing_paths -path_delay max -group_count 100000 -endpoint_count 100] {
-    lappend paths [list [get_property [get_property $end startpoint_clock] name] \
-      [get_property [$end target_clk] name] \
-      [get_property [get_property $end endpoint] full_name] [$end slack]]
-  }
-  puts $report [list $n [string map {\n { }} [string trim $faults]] $clocks $paths]
+  puts $report [list $n [string map {\n { }} [string trim $faults]] $clocks [paths max] [paths min]]
 }
 close $report
