@@ -50,6 +50,9 @@ constexpr OptionRow kRows[] = {
     {"--feedback", "", "planning batch", "a KRU_SP only with its feedback connected; both by default"},
     {"--feedback", "", "kru", "use the feedback, without which there are only CLKFX pins"},
     {"--input-jitter", "PS", "any batch", "peak-to-peak jitter of the input clock, 0 by default"},
+    {"--input-tolerance", "PPM", "any batch",
+     "how far the input can be off over temperature and age, 0 by default; every limit of the "
+     "device has to be kept with all of it"},
     {"--tolerance", "PPM", "any batch",
      "how far a frequency may be off, 100 by default; a list has one for each output, and so has "
      "that of the next options"},

@@ -46,9 +46,9 @@ namespace eval ::tcl_request {
   variable most_clocks 1000
   # The commands that are one text and those that are switches, with the options of the others.
   variable texts {tolerance device primitive bandwidth rank phase_tolerance duty_tolerance
-    max_jitter}
+    max_jitter input_tolerance}
   variable switches {exact feedback prefer_max_vco int_div0 engine any_order}
-  variable options {input jitter
+  variable options {input {jitter tolerance}
     output {phase duty tolerance phase_tolerance duty_tolerance max_jitter}}
   # Commands of a safe interpreter that wait, reach other interpreters, or need a channel, of which
   # there is none.
@@ -153,6 +153,9 @@ proc ::tcl_request::Command {name args} {
       AddClock inputs [Text $value]
       if {[dict exists $options jitter]} {
         dict set said input_jitter [list $line [dict get $options jitter]]
+      }
+      if {[dict exists $options tolerance]} {
+        dict set said input_tolerance [list $line [dict get $options tolerance]]
       }
     }
     output {

@@ -26,13 +26,14 @@ struct OutputAnswer {
   std::optional<double> jitter;         // with that of the input
   std::optional<double> jitter_rms;     // of the random part alone
   std::optional<double> searched;       // MHz: what the engine counted with
+  Rational margin = 0;                  // to the limits of its range: see Answer
   // What is not as asked for (kOffTarget), and what is outside of the device's limits.
   std::vector<Finding> misses;
   std::vector<Finding> violations;
   bool IsWithin() const { return misses.empty() && violations.empty(); }
 };
 
-// Where settings come from.
+// Where settings come from. Those of the user's own come from neither of both.
 struct Source {
   bool engine = false;      // the design flow's own search answers them
   bool search = false;      // the search over all settings has found them
@@ -59,7 +60,11 @@ struct Answer {
   std::optional<double> max_jitter;
   // The worst error of all demands, each in units of its tolerance (see answer/Rank.h).
   Rational worst_error = 0;
-  // The smallest distance of a frequency from a limit of the device, as a fraction of that limit.
+  // The smallest distance of a frequency from a limit of the device, as a fraction of that limit,
+  // with each input at the worst of what it can be (answer/Corners.h): of VCO and PFD, 0 of a KRU,
+  // and of these and all outputs.
+  Rational vco_margin = 0;
+  Rational pfd_margin = 0;
   Rational margin = 0;
   bool within = false;  // all is as asked for and inside of the device's limits
 };

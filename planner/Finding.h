@@ -47,6 +47,9 @@ struct Finding {
   Quantity quantity = Quantity::kNone;
   int output = -1;  // the index in the request; -1: none
   int input = 0;    // 0 or 1
+  // Of kOutsideLimit with a tolerance of the input: by how much this is off where the limit is
+  // broken, ppm; `value` is what it is there.
+  Rational corner = 0;
   Rational value = 0;
   Range range{0, 0};
   std::string pin = {};      // of a KRU: whose range it is

@@ -28,6 +28,9 @@ inline constexpr std::size_t kMostPlaces = 7;
 struct Output {
   bool used = true;    // false: the place stays empty, and nothing else of it counts
   Rational frequency;  // MHz, above 0
+  // false: nobody asked for the frequency; settings that are evaluated make it, exactly, and no
+  // error of it is told.
+  bool asked = true;
   std::optional<Rational> phase;  // degrees, -360 to 360
   std::optional<Rational> duty;   // percent, above 0 and up to 100
   // How far each may be off, either way; where not given, that of the request.
@@ -42,6 +45,10 @@ struct Request {
   std::vector<Rational> inputs;  // one or two, MHz, above 0
   std::vector<Output> outputs;   // one to seven, at least one of them used
   Rational input_jitter = 0;     // ps, peak to peak
+  // How far the inputs can be from their frequencies over temperature and age, ppm either way, 0 to
+  // 100,000. Settings have to keep every limit of the device with all that the inputs can be;
+  // demands are made of what the frequencies as they stand here make.
+  Rational input_tolerance = 0;
 
   Rational tolerance = 100;                     // ppm
   Rational phase_tolerance = Rational(1, 2);   // degrees

@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <utility>
 
+#include "planner/answer/Corners.h"
 #include "planner/answer/Demands.h"
 #include "planner/answer/Jitter.h"
 #include "planner/answer/Judge.h"
@@ -52,15 +53,28 @@ void AddSearched(const Searched& searched, Answer* answer) {
 
 }  // namespace
 
-void Hold(const Rational& value, const Range& range, Finding finding,
-          std::vector<Finding>* violations, std::optional<Rational>* margin) {
-  const Rational own = MarginOf(value, range);
-  if (!*margin || own < **margin) *margin = own;
-  if (range.Contains(value)) return;
-  finding.kind = FindingKind::kOutsideLimit;
-  finding.value = value;
-  finding.range = range;
-  violations->push_back(std::move(finding));
+Rational Hold(const Rational& value, const Rational& tolerance, const Range& range,
+              const Finding& finding, std::vector<Finding>* violations) {
+  const Range narrowed = Narrowed(range, tolerance);
+  const auto add = [&](const Rational& corner) {
+    Finding broken = finding;
+    broken.kind = FindingKind::kOutsideLimit;
+    broken.corner = corner;
+    broken.value = value * CornerFactor(corner);
+    broken.range = range;
+    violations->push_back(std::move(broken));
+  };
+  if (tolerance == Rational(0)) {
+    if (!range.Contains(value)) add(0);
+  } else {
+    if (value < narrowed.lowest) add(-tolerance);
+    if (value > narrowed.highest) add(tolerance);
+  }
+  return MarginOf(value, narrowed);
+}
+
+void Lower(const Rational& margin, std::optional<Rational>* smallest) {
+  if (!*smallest || margin < **smallest) *smallest = margin;
 }
 
 void JudgeOutput(const Request& request, Primitive primitive, int index, OutputAnswer* output) {

@@ -31,17 +31,21 @@ void HoldOutput(const Request& request, const Device& device, const KruSettings&
                 std::size_t index, OutputAnswer* output, std::optional<Rational>* margin) {
   const hardware::Pin pin = settings.pins[index];
   const PinRange limit = RangeOf(device.Pins(settings.primitive), settings, pin);
+  std::optional<Rational> own;
   for (std::size_t i = 0; i < request.inputs.size(); ++i) {
-    Hold(request.inputs[i] * output->ratio, limit.range,
-         {.kind = FindingKind::kOutsideLimit,
-          .primitive = settings.primitive,
-          .quantity = Quantity::kFrequency,
-          .output = static_cast<int>(index),
-          .input = static_cast<int>(i),
-          .pin = std::string(hardware::FactsOf(pin).name),
-          .feedback_2x = limit.feedback_2x},
-         &output->violations, margin);
+    const Finding about = {.kind = FindingKind::kOutsideLimit,
+                           .primitive = settings.primitive,
+                           .quantity = Quantity::kFrequency,
+                           .output = static_cast<int>(index),
+                           .input = static_cast<int>(i),
+                           .pin = std::string(hardware::FactsOf(pin).name),
+                           .feedback_2x = limit.feedback_2x};
+    Lower(Hold(request.inputs[i] * output->ratio, request.input_tolerance, limit.range, about,
+               &output->violations),
+          &own);
   }
+  output->margin = *own;
+  Lower(*own, margin);
 }
 
 void AddJitter(const Request& request, const Device& device, const KruSettings& settings,

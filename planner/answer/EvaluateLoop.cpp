@@ -1,6 +1,7 @@
 // What the settings of a PLL or a TSYN make.
 //
 // Tested by evaluate_loop_test.cpp.
+#include <algorithm>
 #include <cstddef>
 #include <optional>
 
@@ -36,6 +37,8 @@ class LoopJudge {
   // VCO and PFD with each input.
   void HoldLoop() {
     const Rational ratio = hardware::VcoRatio(settings_.m, settings_.d);
+    std::optional<Rational> vco_margin;
+    std::optional<Rational> pfd_margin;
     for (std::size_t i = 0; i < request_.inputs.size(); ++i) {
       const Rational vco = request_.inputs[i] * ratio;
       const Rational pfd = request_.inputs[i] / settings_.d;
@@ -43,10 +46,16 @@ class LoopJudge {
         answer_.vco = vco;
         answer_.pfd = pfd;
       }
-      Hold(vco, limits_.vco, About(Quantity::kVco, i), &answer_.violations, &margin_);
-      Hold(pfd, limits_.PfdOf(settings_.bandwidth), About(Quantity::kPfd, i),
-           &answer_.violations, &margin_);
+      Lower(Hold(vco, request_.input_tolerance, limits_.vco, About(Quantity::kVco, i),
+                 &answer_.violations),
+            &vco_margin);
+      Lower(Hold(pfd, request_.input_tolerance, limits_.PfdOf(settings_.bandwidth),
+                 About(Quantity::kPfd, i), &answer_.violations),
+            &pfd_margin);
     }
+    answer_.vco_margin = *vco_margin;
+    answer_.pfd_margin = *pfd_margin;
+    margin_ = std::min(*vco_margin, *pfd_margin);
     is_in_range_ = limits_.vco.Contains(answer_.vco) &&
                    limits_.PfdOf(settings_.bandwidth).Contains(answer_.pfd);
   }
@@ -79,12 +88,16 @@ class LoopJudge {
   void HoldOutput(std::size_t index, OutputAnswer* output) {
     const int divider = settings_.outputs[index].divider;
     const Range& range = limits_.OutputOf(static_cast<int>(index));
+    std::optional<Rational> margin;
     for (std::size_t i = 0; i < request_.inputs.size(); ++i) {
       Finding about = About(Quantity::kFrequency, i);
       about.output = static_cast<int>(index);
-      Hold(request_.inputs[i] * output->ratio, range, std::move(about), &output->violations,
-           &margin_);
+      Lower(Hold(request_.inputs[i] * output->ratio, request_.input_tolerance, range, about,
+                 &output->violations),
+            &margin);
     }
+    output->margin = *margin;
+    Lower(*margin, &margin_);
     if (divider > hardware::LargestDivider(limits_.max_count) * hardware::kEighths) {
       output->violations.push_back({.kind = FindingKind::kDividerTooLarge,
                                     .primitive = settings_.primitive,

@@ -23,10 +23,14 @@ void JudgeLoop(const Request& request, const Device& device, const LoopSettings&
 void JudgeKru(const Request& request, const Device& device, const KruSettings& settings,
               Answer* answer);
 
-// Judges a frequency: adds to `violations` when it is out of its range, and lowers the margin to
-// the one that is found. `finding` says what it is the frequency of.
-void Hold(const Rational& value, const Range& range, Finding finding,
-          std::vector<Finding>* violations, std::optional<Rational>* margin);
+// Judges a frequency at all that its input can be: adds to `violations` for each end of the range
+// that it is beyond, and answers its margin. `finding` says what it is the frequency of; the
+// tolerance is that of the input, ppm.
+Rational Hold(const Rational& value, const Rational& tolerance, const Range& range,
+              const Finding& finding, std::vector<Finding>* violations);
+
+// Takes a margin for the smallest where it is that, or the first.
+void Lower(const Rational& margin, std::optional<Rational>* smallest);
 
 // Fills in the errors of a used output whose frequency, phase, duty cycle and jitter are there, and
 // what it misses.

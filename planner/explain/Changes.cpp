@@ -163,6 +163,63 @@ std::vector<Rational> WithEachInput(const Question& question, const Rational& va
   return values;
 }
 
+// How far the frequencies of settings can be above or below what they are, as a fraction.
+Rational OffBy(const Question& question) {
+  return question.relaxed.input_tolerance ? Rational(0)
+                                          : question.request.input_tolerance / 1'000'000;
+}
+
+// The largest tolerance of the input, ppm, with which settings keep all limits that count.
+Rational LargestTolerance(const Question& question, const Settings& settings) {
+  Question nominal = question;
+  nominal.request.input_tolerance = 0;
+  const Answer answer = nominal.Judge(settings);
+  std::optional<Rational> least;
+  const auto hold = [&](const Rational& value, const Range& range) {
+    for (const Rational& one : WithEachInput(question, value)) {
+      Rational largest = range.highest / one - 1;
+      if (range.lowest > 0) largest = std::min(largest, 1 - range.lowest / one);
+      if (!least || largest < *least) least = largest;
+    }
+  };
+  const auto* const loop = std::get_if<LoopSettings>(&settings);
+  if (loop != nullptr) {
+    const LoopLimits& limits = nominal.Limits();
+    if (!question.relaxed.vco) hold(answer.vco, limits.vco);
+    if (!question.relaxed.pfd) hold(answer.pfd, limits.PfdOf(loop->bandwidth));
+  }
+  for (std::size_t i = 0; i < answer.outputs.size(); ++i) {
+    if (!answer.outputs[i].used || question.relaxed.outputs[i].range) continue;
+    if (loop != nullptr) {
+      hold(answer.outputs[i].frequency, nominal.Limits().OutputOf(static_cast<int>(i)));
+      continue;
+    }
+    const auto& kru = std::get<KruSettings>(settings);
+    hold(answer.outputs[i].frequency, nominal.device.Pins(question.primitive)
+                                          .Of(kru.pins[i], kru.pins[0] == hardware::Pin::kClk2x));
+  }
+  const Rational asked = question.request.input_tolerance;
+  return least ? std::min(asked, std::max(Rational(0), *least * 1'000'000)) : asked;
+}
+
+// The largest tolerance of the input below the one that is asked for.
+void AddInputTolerance(const Question& question, const Demand& demand,
+                       std::vector<Change>* changes) {
+  const Rational asked = question.request.input_tolerance;
+  const auto find = [&](const Rational& less) {
+    Question changed = question;
+    changed.request.input_tolerance = asked - less;
+    return changed.Ask();
+  };
+  const auto needs = [&](const Settings& settings) {
+    return asked - LargestTolerance(question, settings);
+  };
+  std::optional<Allowance> found = FindSmallest(find, needs, asked);
+  if (!found) return;
+  changes->push_back({ChangeKind::kInputTolerance, demand, asked - found->value, asked,
+                      std::move(found->settings)});
+}
+
 // A range widened at one end.
 void AddRange(const Question& question, const Demand& demand, const ValuesOf& values_of,
               const std::function<Range&(Question*)>& range_of, std::vector<Change>* changes) {
@@ -178,9 +235,10 @@ void AddRange(const Question& question, const Demand& demand, const ValuesOf& va
     };
     const auto needs = [&](const Settings& settings) {
       Rational most = 0;
+      const Rational off = OffBy(question);
       for (const Rational& value : values_of(question.Judge(settings))) {
-        const Rational beyond =
-            side == Side::kBelow ? range.lowest - value : value - range.highest;
+        const Rational beyond = side == Side::kBelow ? range.lowest - value * (1 - off)
+                                                     : value * (1 + off) - range.highest;
         if (beyond > most) most = beyond;
       }
       return most;
@@ -260,6 +318,9 @@ std::vector<Change> ChangesOf(const Question& question, const Demand& demand) {
       break;
     case Kind::kOutputRange:
       if (hardware::IsLoop(question.primitive)) AddLimit(question, demand, &changes);
+      break;
+    case Kind::kInputTolerance:
+      AddInputTolerance(question, demand, &changes);
       break;
     default:
       break;

@@ -23,6 +23,7 @@ enum class ChangeKind {
   kLowest,     // of a range of the device: a minimum of `value` MHz
   kHighest,    // and a maximum
   kBandwidth,  // another bandwidth: that of the settings
+  kInputTolerance,  // an input that is off by `value` ppm at most
 };
 
 struct Change {

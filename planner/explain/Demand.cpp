@@ -41,6 +41,7 @@ std::vector<Demand> DemandsOf(const Request& request, Primitive primitive) {
     if (request.MaxJitterOf(output)) demands.push_back({Kind::kJitter, n});
     demands.push_back({Kind::kOutputRange, n});
   }
+  if (request.input_tolerance > 0) demands.push_back({Kind::kInputTolerance});
   if (hardware::IsLoop(primitive)) {
     AddOfLoop(request, primitive, &demands);
   } else {
@@ -98,6 +99,9 @@ void Relax(const Demand& demand, search::Relaxed* relaxed) {
       break;
     case Kind::kSecondInput:
       relaxed->second_input = true;
+      break;
+    case Kind::kInputTolerance:
+      relaxed->input_tolerance = true;
       break;
   }
 }

@@ -32,6 +32,7 @@ enum class DemandKind {
   kBandwidth,
   kFeedback,
   kSecondInput,  // all of it with the second input, too
+  kInputTolerance,  // all limits with what the inputs can be beside their frequencies, too
 };
 
 struct Demand {

@@ -119,6 +119,11 @@ class Finisher {
                      [](const auto& frequency) { return frequency.has_value(); })) {
       Add(MistakeKind::kNothingUsed, draft_.outputs->place);
     }
+    if (draft_.unasked && reader_.evaluates) {
+      for (std::size_t i = 0; i < frequencies.size(); ++i) {
+        request().outputs[i].asked = !draft_.unasked->value[i];
+      }
+    }
     Spread(draft_.phases, &Output::phase);
     Spread(draft_.duties, &Output::duty);
     // No divider makes a clock without an edge: 0 asks for nothing.
@@ -170,6 +175,7 @@ class Finisher {
     request().any_order = IsSet(draft_.any_order);
     request().engine_only = IsSet(draft_.engine);
     if (draft_.input_jitter) request().input_jitter = draft_.input_jitter->value;
+    if (draft_.input_tolerance) request().input_tolerance = draft_.input_tolerance->value;
     if (IsSet(draft_.exact)) Exact();
     if (draft_.bandwidth) request().bandwidth = draft_.bandwidth->value;
     if (IsSet(draft_.low_bandwidth)) {
@@ -265,6 +271,7 @@ class Finisher {
 Draft Over(const Draft& options, const Draft& file) {
   Draft all = file;
   if (options.outputs) {
+    all.unasked.reset();
     all.phases.reset();
     all.duties.reset();
     for (Entry<Demand>* demand :
@@ -285,6 +292,7 @@ Draft Over(const Draft& options, const Draft& file) {
   Take(options.primitive, &all.primitive);
   Take(options.inputs, &all.inputs);
   Take(options.outputs, &all.outputs);
+  Take(options.unasked, &all.unasked);
   Take(options.phases, &all.phases);
   Take(options.duties, &all.duties);
   Take(options.tolerance, &all.tolerance);
@@ -292,6 +300,7 @@ Draft Over(const Draft& options, const Draft& file) {
   Take(options.duty_tolerance, &all.duty_tolerance);
   Take(options.max_jitter, &all.max_jitter);
   Take(options.input_jitter, &all.input_jitter);
+  Take(options.input_tolerance, &all.input_tolerance);
   Take(options.bandwidth, &all.bandwidth);
   Take(options.rank, &all.rank);
   Take(options.low_bandwidth, &all.low_bandwidth);

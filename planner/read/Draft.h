@@ -35,6 +35,7 @@ struct Draft {
   Entry<std::optional<Primitive>> primitive;  // nothing: auto
   Entry<std::vector<Rational>> inputs;
   Entry<Values> outputs;  // frequencies; nothing: the output is not used
+  Entry<std::vector<bool>> unasked;  // whose frequencies are only what settings make
   Entry<Values> phases;
   Entry<Values> duties;
   Entry<Demand> tolerance;
@@ -42,6 +43,7 @@ struct Draft {
   Entry<Demand> duty_tolerance;
   Entry<Demand> max_jitter;
   Entry<Rational> input_jitter;
+  Entry<Rational> input_tolerance;
   Entry<Bandwidth> bandwidth;
   Entry<Rank> rank;
   // Switches: whether they are set.
@@ -69,8 +71,10 @@ struct Reading {
 // For whom a request is read.
 struct Reader {
   // The command is for this primitive alone: its limits count, and --primitive may name no other.
-  std::optional<Primitive> primitive;
-  std::string file;  // of --request, for what it does not say; empty: there is none
+  std::optional<Primitive> primitive = {};
+  std::string file = {};  // of --request, for what it does not say; empty: there is none
+  // Settings are there, to be evaluated. Else all frequencies are asked for.
+  bool evaluates = false;
 };
 
 // Makes a request of a draft. What is wrong is added to `mistakes`, and there is none then. That

@@ -20,6 +20,7 @@ enum class ValueKind {
   kDuty,            // percent
   kJitter,          // ps
   kTolerance,       // ppm
+  kInputTolerance,  // ppm
   kPhaseTolerance,  // degrees
   kDutyTolerance,   // percent points
   kMaxJitter,       // ps
@@ -79,7 +80,8 @@ enum class MistakeKind {
 };
 
 // What a number must be.
-enum class NumberDemand { kNone, kAboveZero, kNotNegative, kAtMostOneMs, kPercentage, kTurn };
+enum class NumberDemand { kNone, kAboveZero, kNotNegative, kAtMostOneMs, kPercentage, kTurn,
+                          kAtMostTenPercent };
 
 // How a JSON text is no JSON.
 enum class SyntaxFault {

@@ -34,6 +34,9 @@ KindText TextOf(ValueKind kind) {
     case ValueKind::kTolerance:
       return {"a tolerance", "100, 100ppm or 0.01%", "ppm, ppb and %", "0 to 1000000000 ppm",
               "ppm"};
+    case ValueKind::kInputTolerance:
+      return {"a tolerance of the input", "50, 50ppm or 0.005%", "ppm, ppb and %",
+              "0 to 100000 ppm", "ppm"};
     case ValueKind::kPhaseTolerance:
       return {"a tolerance of a phase", "0.5, 0.5deg or 5", "deg", "0 to 360 degrees", "degrees"};
     case ValueKind::kDutyTolerance:
@@ -59,6 +62,8 @@ std::string_view TextOf(NumberDemand demand) {
       return "at most 1 ms";
     case NumberDemand::kPercentage:
       return "between 0 and 100";
+    case NumberDemand::kAtMostTenPercent:
+      return "at most 100000 ppm";
     case NumberDemand::kTurn:
       return "between -360 and 360";
     case NumberDemand::kNone:

@@ -13,7 +13,7 @@ namespace planner::read {
 
 namespace {
 
-constexpr std::array<OptionFacts, 20> kOptions = {{
+constexpr std::array<OptionFacts, 21> kOptions = {{
     {"--in", "F[,F2]", ValueKind::kFrequency, true},
     {"--out", "LIST", ValueKind::kFrequency, true},
     {"--phase", "LIST", ValueKind::kPhase, true},
@@ -29,6 +29,7 @@ constexpr std::array<OptionFacts, 20> kOptions = {{
     {"--int-div0", "", {}},
     {"--feedback", "", {}},
     {"--input-jitter", "PS", ValueKind::kJitter},
+    {"--input-tolerance", "PPM", ValueKind::kInputTolerance},
     {"--tolerance", "PPM", ValueKind::kTolerance, true},
     {"--exact", "", {}},
     {"--phase-tolerance", "DEG", ValueKind::kPhaseTolerance, true},
@@ -57,9 +58,8 @@ class OptionReader {
       ReadSwitch(facts.name);
     } else if (facts.kind && facts.is_list) {
       ReadList(facts);
-    } else if (facts.name == "--input-jitter") {
-      const auto jitter = ReadValue(value, *facts.kind, place_, mistakes_);
-      if (jitter) draft_.input_jitter = {*jitter, place_, value};
+    } else if (facts.kind) {
+      ReadOne(facts);
     } else {
       ReadName(facts.name);
     }
@@ -86,6 +86,13 @@ class OptionReader {
     for (const auto& [switch_name, member] : switches) {
       if (switch_name == name) draft_.*member = {is_set, place_, value_};
     }
+  }
+
+  void ReadOne(const OptionFacts& facts) {
+    const auto value = ReadValue(value_, *facts.kind, place_, mistakes_);
+    if (!value) return;
+    const bool is_jitter = facts.name == "--input-jitter";
+    (is_jitter ? draft_.input_jitter : draft_.input_tolerance) = {*value, place_, value_};
   }
 
   void ReadList(const OptionFacts& facts) {
@@ -176,6 +183,10 @@ class OptionWriter {
     if (draft_.input_jitter) {
       Add("--input-jitter", draft_.input_jitter->text,
           planner::read::Written(draft_.input_jitter->value));
+    }
+    if (draft_.input_tolerance) {
+      Add("--input-tolerance", draft_.input_tolerance->text,
+          planner::read::Written(draft_.input_tolerance->value));
     }
     Tolerance();
     Demands("--phase-tolerance", draft_.phase_tolerance);
@@ -292,6 +303,9 @@ Draft DraftOf(const Request& request) {
   SaySwitch(&draft.int_div0, request.whole_divider_0);
   SaySwitch(&draft.feedback, request.feedback);
   if (request.input_jitter != usual.input_jitter) Say(&draft.input_jitter, request.input_jitter);
+  if (request.input_tolerance != usual.input_tolerance) {
+    Say(&draft.input_tolerance, request.input_tolerance);
+  }
   SayDemand(request, &Output::tolerance, request.tolerance, usual.tolerance, &draft.tolerance);
   SayDemand(request, &Output::phase_tolerance, request.phase_tolerance, usual.phase_tolerance,
             &draft.phase_tolerance);

@@ -41,6 +41,7 @@ constexpr DemandEntry kDemands[] = {
 const std::vector<std::string>& KnownEntries() {
   static const std::vector<std::string> kNames = {
       "device",    "primitive", "inputs",         "outputs",        "input_jitter",
+      "input_tolerance",
       "bandwidth", "tolerance", "exact",          "feedback",       "prefer_max_vco",
       "int_div0",  "rank",      "engine",         "any_order",      "phase_tolerance",
       "duty_tolerance", "max_jitter"};
@@ -48,7 +49,7 @@ const std::vector<std::string>& KnownEntries() {
 }
 const std::vector<std::string>& KnownOutputEntries() {
   static const std::vector<std::string> kNames = {
-      "frequency", "phase", "duty", "tolerance", "phase_tolerance", "duty_tolerance",
+      "frequency", "asked", "phase", "duty", "tolerance", "phase_tolerance", "duty_tolerance",
       "max_jitter"};
   return kNames;
 }
@@ -139,6 +140,11 @@ class TreeReader {
       if (jitter) draft_.input_jitter = {*jitter, place, ""};
       return;
     }
+    if (member.name == "input_tolerance") {
+      const auto tolerance = Value(member.value, ValueKind::kInputTolerance, place);
+      if (tolerance) draft_.input_tolerance = {*tolerance, place, ""};
+      return;
+    }
     ReadName(member, place);
   }
 
@@ -205,6 +211,8 @@ class TreeReader {
       const Place at = At(member.value.position, "outputs", number, member.name);
       if (member.name == "frequency") {
         ReadFrequency(member.value, index, at);
+      } else if (member.name == "asked") {
+        ReadAsked(member.value, index, at);
       } else {
         is_known = is_known && KindOf(member.name);
         ReadOfOutput(member, index, at);
@@ -222,6 +230,12 @@ class TreeReader {
   void ReadFrequency(const Node& node, std::size_t index, const Place& place) {
     if (node.type == NodeType::kString && node.text == "-") return;
     draft_.outputs->value[index] = Value(node, ValueKind::kFrequency, place);
+  }
+
+  void ReadAsked(const Node& node, std::size_t index, const Place& place) {
+    if (!IsOf(node, {NodeType::kBoolean}, place) || node.truth) return;
+    if (!draft_.unasked) draft_.unasked = {std::vector<bool>(outputs_), place, ""};
+    draft_.unasked->value[index] = true;
   }
 
   // Phase, duty cycle and demands; nothing is asked for by null, "-" and an empty text.

@@ -50,6 +50,7 @@ std::span<const Unit> UnitsOf(ValueKind kind) {
     case ValueKind::kGap:
       return kGapUnits;
     case ValueKind::kTolerance:
+    case ValueKind::kInputTolerance:
       return kToleranceUnits;
     case ValueKind::kJitter:
     case ValueKind::kMaxJitter:
@@ -78,6 +79,7 @@ std::string_view MeantFor(std::string_view unit) {
 NumberDemand DemandOn(const Rational& value, ValueKind kind) {
   static const Rational kMillisecond = 1'000'000'000;  // ps: beyond any clock
   static const Rational kGapMillisecond = 1'000'000;  // ns
+  static const Rational kTenPercent = 100'000;         // ppm: beyond any oscillator
   switch (kind) {
     case ValueKind::kFrequency:
       return value > 0 ? NumberDemand::kNone : NumberDemand::kAboveZero;
@@ -90,7 +92,10 @@ NumberDemand DemandOn(const Rational& value, ValueKind kind) {
       [[fallthrough]];
     case ValueKind::kJitter:
       if (value > kMillisecond) return NumberDemand::kAtMostOneMs;
-      [[fallthrough]];
+      break;
+    case ValueKind::kInputTolerance:
+      if (value > kTenPercent) return NumberDemand::kAtMostTenPercent;
+      break;
     case ValueKind::kTolerance:
     case ValueKind::kPhaseTolerance:
     case ValueKind::kDutyTolerance:

@@ -114,6 +114,13 @@ const char* RankName(Rank rank) {
   return "jitter";
 }
 
+const char* SourceName(const Answer& answer) {
+  const Source& source = answer.source;
+  if (source.engine) return source.search ? "both" : "engine";
+  // What has no settings has not been given any.
+  return source.search || !answer.solved ? "search" : "given";
+}
+
 void AddWritten(ordered_json* object, const char* name, const std::optional<Rational>& value) {
   if (value) (*object)[name] = WrittenNumber(*value);
 }
@@ -123,6 +130,7 @@ ordered_json RequestedOutput(const Output& output) {
   if (!output.used) return "-";
   ordered_json data;
   data["frequency"] = WrittenNumber(output.frequency);
+  if (!output.asked) data["asked"] = false;
   AddWritten(&data, "phase", output.phase);
   AddWritten(&data, "duty", output.duty);
   AddWritten(&data, "tolerance", output.tolerance);
@@ -176,14 +184,17 @@ ordered_json KruData(const Request& request, const Answer& answer, const KruSett
   return data;
 }
 
-// The ranges that the settings must keep, beside those of outputs; null for a KRU.
-ordered_json LimitsData(const Device& device, const Settings& settings) {
-  const auto* loop = std::get_if<LoopSettings>(&settings);
+// The ranges that the settings must keep, beside those of outputs, with their margins; null for a
+// KRU.
+ordered_json LimitsData(const Device& device, const Answer& answer) {
+  const auto* loop = std::get_if<LoopSettings>(&answer.settings);
   if (loop == nullptr) return nullptr;
   const LoopLimits& limits = device.Loop(loop->primitive);
   ordered_json data;
   data["vco"] = RangeData(limits.vco);
+  AddExact(&data, "vco_margin", answer.vco_margin);
   data["pfd"] = RangeData(limits.PfdOf(loop->bandwidth));
+  AddExact(&data, "pfd_margin", answer.pfd_margin);
   data["largest_count"] = limits.max_count;
   return data;
 }
@@ -234,11 +245,14 @@ ordered_json OutputData(const Request& request, const Device& device, const Answ
   AddPlace(&data, answer.settings, index);
   data["multiply"] = WholeNumber(output.ratio.NumeratorText());
   data["divide"] = WholeNumber(output.ratio.DenominatorText());
-  AddExact(&data, "requested", asked.frequency);
+  const auto if_asked = [&](const Rational& value) {
+    return asked.asked ? std::optional(value) : std::nullopt;
+  };
+  AddExact(&data, "requested", if_asked(asked.frequency));
   AddExact(&data, "actual", output.frequency);
   AddExact(&data, "actual_second", output.frequency_second);
   data["search"] = OrNull(output.searched);
-  AddExact(&data, "error_ppm", output.error_ppm);
+  AddExact(&data, "error_ppm", if_asked(output.error_ppm));
   AddExact(&data, "requested_phase", asked.phase);
   AddExact(&data, "phase", output.phase);
   AddExact(&data, "phase_error", output.phase_error);
@@ -248,6 +262,7 @@ ordered_json OutputData(const Request& request, const Device& device, const Answ
   data["jitter"] = OrNull(output.jitter);
   data["jitter_rms"] = OrNull(output.jitter_rms);
   data["range"] = RangeData(OutputRange(device, answer.settings, index));
+  AddExact(&data, "margin", output.margin);
   data["within"] = output.IsWithin();
   return data;
 }
@@ -289,9 +304,10 @@ void AddSolved(ordered_json* data, const Request& request, const Device& device,
                             : KruData(request, answer, std::get<KruSettings>(answer.settings));
   (*data)["bandwidth"] =
       loop != nullptr ? ordered_json(Name(loop->bandwidth)) : ordered_json(nullptr);
-  (*data)["limits"] = LimitsData(device, answer.settings);
+  (*data)["limits"] = LimitsData(device, answer);
   (*data)["search_vco"] = OrNull(answer.searched_vco);
   AddExact(data, "input_jitter", request.input_jitter);
+  AddExact(data, "input_tolerance", request.input_tolerance);
   (*data)["phase_error"] = OrNull(answer.phase_error);
   AddExact(data, "worst_ppm", answer.worst_ppm);
   (*data)["max_jitter"] = OrNull(answer.max_jitter);
@@ -341,6 +357,7 @@ ordered_json RequestData(const Request& request, const Device& device) {
   data["outputs"] = ordered_json::array();
   for (const Output& output : request.outputs) data["outputs"].push_back(RequestedOutput(output));
   data["input_jitter"] = WrittenNumber(request.input_jitter);
+  data["input_tolerance"] = WrittenNumber(request.input_tolerance);
   data["tolerance"] = WrittenNumber(request.tolerance);
   data["phase_tolerance"] = WrittenNumber(request.phase_tolerance);
   data["duty_tolerance"] = WrittenNumber(request.duty_tolerance);
@@ -363,6 +380,7 @@ ordered_json FindingData(const Finding& finding, const Device& device, const Ans
   data["quantity"] = QuantityName(finding.quantity);
   data["output"] = finding.output >= 0 ? ordered_json(finding.output) : ordered_json(nullptr);
   data["input"] = finding.input;
+  AddExact(&data, "corner", finding.corner);
   AddExact(&data, "value", finding.value);
   data["range"] = RangeData(finding.range);
   data["pin"] = finding.pin.empty() ? ordered_json(nullptr) : ordered_json(finding.pin);
@@ -378,9 +396,7 @@ ordered_json FindingData(const Finding& finding, const Device& device, const Ans
 ordered_json AnswerData(const Request& request, const Device& device, const Answer& answer) {
   ordered_json data;
   data["primitive"] = Name(answer.primitive);
-  data["source"] = answer.source.engine && answer.source.search ? "both"
-                   : answer.source.engine                       ? "engine"
-                                                                : "search";
+  data["source"] = SourceName(answer);
   data["variant"] = answer.source.variant;
   data["solved"] = answer.solved;
   data["within"] = answer.within;

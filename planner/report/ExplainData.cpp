@@ -53,6 +53,8 @@ std::string_view KindName(DemandKind kind) {
       return "bandwidth";
     case DemandKind::kFeedback:
       return "feedback";
+    case DemandKind::kInputTolerance:
+      return "input_tolerance";
     case DemandKind::kSecondInput:
       break;
   }
@@ -77,6 +79,8 @@ std::string_view KindName(ChangeKind kind) {
       return "minimum";
     case ChangeKind::kHighest:
       return "maximum";
+    case ChangeKind::kInputTolerance:
+      return "input_tolerance";
     case ChangeKind::kBandwidth:
       break;
   }

@@ -124,10 +124,22 @@ string LossWords(const Demand& demand, Primitive primitive) {
       return "any bandwidth";
     case DemandKind::kFeedback:
       return "without feedback";
+    case DemandKind::kInputTolerance:
+      return "an input without a tolerance";
     case DemandKind::kSecondInput:
       break;
   }
   return "without the second input";
+}
+
+// A number above 0 with up to so many decimals, and with more where it would be 0 with these.
+string RoundedDown(const Rational& value, int decimals) {
+  Rational scale = Rational::FromDecimal("1", decimals);
+  while ((value * scale).Floor() == Rational(0)) {
+    scale *= 10;
+    ++decimals;
+  }
+  return Short((value * scale).Floor() / scale, decimals);
 }
 
 }  // namespace
@@ -175,6 +187,8 @@ string DemandWords(const Demand& demand, const Request& request, const Device& d
       return "bandwidth " + string(Name(*request.bandwidth));
     case DemandKind::kFeedback:
       return "the feedback";
+    case DemandKind::kInputTolerance:
+      return "an input that can be off by " + Short(request.input_tolerance, 6) + " ppm";
     case DemandKind::kSecondInput:
       break;
   }
@@ -201,6 +215,10 @@ string ChangeWords(const Change& change, Primitive primitive) {
     case ChangeKind::kLowest:
     case ChangeKind::kHighest:
       return LimitWords(change);
+    case ChangeKind::kInputTolerance:
+      return change.value == Rational(0)
+                 ? string("an input without a tolerance")
+                 : "an input that is off by at most " + RoundedDown(change.value, 2) + " ppm";
     case ChangeKind::kBandwidth:
       break;
   }

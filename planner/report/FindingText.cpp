@@ -21,6 +21,10 @@ string Subject(const Finding& finding) {
                 : finding.quantity == Quantity::kPfd ? "the PFD"
                                                      : Outputs({finding.output});
   if (finding.input > 0) text += " with the second input";
+  if (finding.corner != Rational(0)) {
+    text += finding.input > 0 ? " at " : " with the input at ";
+    text += (finding.corner > Rational(0) ? "+" : "") + Short(finding.corner, 6) + " ppm";
+  }
   return text;
 }
 

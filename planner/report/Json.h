@@ -16,7 +16,7 @@
 namespace planner::report {
 
 // Counts up when an entry goes, is added, or changes its meaning or type.
-inline constexpr int kPlanVersion = 3;
+inline constexpr int kPlanVersion = 4;
 
 // One answer of a document, and what it is there for.
 struct Entry {

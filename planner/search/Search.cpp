@@ -1,6 +1,7 @@
 // Tested by search_test.cpp.
 #include "planner/search/Search.h"
 
+#include "planner/answer/Corners.h"
 #include "planner/answer/Evaluate.h"
 #include "planner/search/KruSearch.h"
 #include "planner/search/LoopSearch.h"
@@ -9,8 +10,9 @@ namespace planner::search {
 
 Found Search(const Request& request, const Device& device, Primitive primitive) {
   if (!device.Has(primitive) || !answer::Refusals(request, primitive).empty()) return {};
-  return hardware::IsLoop(primitive) ? SearchLoop(request, device, primitive)
-                                     : SearchKru(request, device, primitive);
+  const auto search = hardware::IsLoop(primitive) ? SearchLoop : SearchKru;
+  if (request.input_tolerance == 0) return search(request, device, primitive);
+  return search(request, answer::Narrowed(device, request.input_tolerance), primitive);
 }
 
 }  // namespace planner::search

@@ -50,7 +50,10 @@ struct Relaxed {
   bool whole = false;
   bool nothing_moves = false;  // that beside a fraction phases are 0 and duty cycles 50 percent
 
-  // Of all primitives: whole numbers (of M and dividers eighths, where there are fractions) from 1
+  // Of all primitives: what the inputs can be beside their frequencies.
+  bool input_tolerance = false;
+
+  // Likewise: whole numbers (of M and dividers eighths, where there are fractions) from 1
   // to kRelaxedM, kRelaxedD and kRelaxedDivider in place of what the hardware has. Of a KRU
   // `dividers` is the divide of CLKDV, any half from 1, or of CLKFXDV, any whole number.
   bool m = false;

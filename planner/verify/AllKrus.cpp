@@ -104,7 +104,8 @@ class Krus {
         limits_(device.Pins(primitive)),
         is_sp_(primitive == Primitive::kKruSp),
         best_(*best),
-        model_(device, request, primitive) {
+        model_(device, request, primitive),
+        corners_(CornersOf(request.inputs, request.input_tolerance)) {
     set_.primitive = primitive;
     set_.pins.assign(request.outputs.size(), Pin::kNone);
     for (const Output& output : request.outputs) {
@@ -257,7 +258,9 @@ class Krus {
     auto& known = ranges_[doubled_ ? 1 : 0][static_cast<std::size_t>(pin)];
     if (!known) {
       const Range& range = limits_.Of(pin, doubled_);
-      known = {range.lowest.ToDouble(), range.highest.ToDouble()};
+      // Of the nominal frequency, so that the corners of the input are in the range.
+      const double off = request_.input_tolerance.ToDouble() / 1e6;
+      known = {range.lowest.ToDouble() / (1 - off), range.highest.ToDouble() / (1 + off)};
     }
     return *known;
   }
@@ -299,8 +302,12 @@ class Krus {
     const Output& asked = request_.outputs[output];
     const Range& range = limits_.Of(pin, doubled_);
     const Rational made = FrequencyOf(request_.inputs[0], pin, set_.Ratios());
-    if (made < range.lowest || range.highest < made) return;
     Option option{pin, true, 0, MarginIn(range, made), LeastJitter(pin)};
+    for (const Rational& corner : corners_) {
+      const Rational there = FrequencyOf(corner, pin, set_.Ratios());
+      if (there < range.lowest || range.highest < there) return;
+      option.margin = std::min(option.margin, MarginIn(range, there));
+    }
     const Rational tolerance = asked.tolerance.value_or(request_.tolerance);
     const Rational ppm = Ppm(made, asked.frequency).Absolute();
     option.is_met = ppm <= tolerance;
@@ -480,6 +487,7 @@ class Krus {
   const bool is_sp_;
   BestSettings& best_;
   const answer::KruJitter model_;
+  const std::vector<Rational> corners_;  // what the input can be
   bool has_phase_ = false;
   bool doubled_ = false;
   KruSettings set_;  // what the loops are at

@@ -43,6 +43,7 @@ class Loops {
         primitive_(primitive),
         best_(*best),
         model_(device, request),
+        corners_(CornersOf(request.inputs, request.input_tolerance)),
         fractions_(hardware::HasFractions(primitive, static_cast<int>(request.outputs.size()),
                                           request.whole_divider_0)),
         largest_(hardware::LargestDivider(limits_.max_count)) {}
@@ -58,7 +59,7 @@ class Loops {
 
  private:
   bool IsVcoInside(int m, int d) const {
-    for (const Rational& input : request_.inputs) {
+    for (const Rational& input : corners_) {
       const Rational vco = VcoOf(input, m, d);
       if (vco < limits_.vco.lowest || limits_.vco.highest < vco) return false;
     }
@@ -72,7 +73,7 @@ class Loops {
   bool IsPfdInside(int d, Bandwidth bandwidth) const {
     if (request_.bandwidth && *request_.bandwidth != bandwidth) return false;
     const Range& pfds = Pfds(bandwidth);
-    for (const Rational& input : request_.inputs) {
+    for (const Rational& input : corners_) {
       if (input / d < pfds.lowest || pfds.highest < input / d) return false;
     }
     return true;
@@ -112,8 +113,8 @@ class Loops {
   }
 
   Rational MarginOfVco(int m, int d) const {
-    Rational margin = MarginIn(limits_.vco, VcoOf(request_.inputs[0], m, d));
-    for (const Rational& input : request_.inputs) {
+    Rational margin = MarginIn(limits_.vco, VcoOf(corners_[0], m, d));
+    for (const Rational& input : corners_) {
       margin = std::min(margin, MarginIn(limits_.vco, VcoOf(input, m, d)));
     }
     return margin;
@@ -122,7 +123,7 @@ class Loops {
   // What depends on the bandwidth.
   Figures WithJitter(const LoopSettings& set, Figures figures) const {
     figures.jitter = model_.PeakToPeak(set.m, set.d, set.bandwidth);
-    for (const Rational& input : request_.inputs) {
+    for (const Rational& input : corners_) {
       figures.margin = std::min(figures.margin, MarginIn(Pfds(set.bandwidth), input / set.d));
     }
     for (const Output& asked : request_.outputs) {
@@ -183,7 +184,7 @@ class Loops {
 
   // What the second input makes is to the first as these are to each other.
   bool IsInside(std::size_t output, const Rational& vco, int divider) const {
-    for (const Rational& input : request_.inputs) {
+    for (const Rational& input : corners_) {
       const Rational made = FrequencyOf(vco * input / request_.inputs[0], divider);
       if (made < Outputs(output).lowest || Outputs(output).highest < made) return false;
     }
@@ -202,7 +203,7 @@ class Loops {
     if (asked.phase) AddPhase(asked, moves, &choice);
     if (asked.duty) AddDuty(asked, moves, &choice);
     choice.margin = MarginIn(Outputs(output), frequency);
-    for (const Rational& input : request_.inputs) {
+    for (const Rational& input : corners_) {
       const Rational made = frequency * input / request_.inputs[0];
       choice.margin = std::min(choice.margin, MarginIn(Outputs(output), made));
     }
@@ -265,6 +266,7 @@ class Loops {
   const Primitive primitive_;
   BestSettings& best_;
   const answer::LoopJitter model_;
+  const std::vector<Rational> corners_;  // what the inputs can be
   const bool fractions_;
   const int largest_;
   std::map<std::pair<std::size_t, Kind>, std::map<Rational, std::optional<Choice>>> known_;

@@ -84,7 +84,9 @@ class Entries {
   ordered_json All() {
     ordered_json all;
     all["primitive"] = Name(answer_.primitive);
-    all["source"] = verify::WordOf(answer_.source);
+    const Source& source = answer_.source;
+    const bool is_given = answer_.solved && !source.engine && !source.search;
+    all["source"] = is_given ? "given" : verify::WordOf(source);
     all["variant"] = answer_.source.variant;
     all["solved"] = answer_.solved;
     all["within"] = answer_.within;
@@ -106,6 +108,7 @@ class Entries {
     entry["quantity"] = quantity != nullptr ? ordered_json(quantity) : ordered_json(nullptr);
     entry["output"] = finding.output < 0 ? ordered_json(nullptr) : ordered_json(finding.output);
     entry["input"] = finding.input;
+    Put(&entry, "corner", finding.corner);
     Put(&entry, "value", finding.value);
     entry["range"] = Ends(finding.range);
     entry["pin"] = finding.pin.empty() ? ordered_json(nullptr) : ordered_json(finding.pin);
@@ -128,6 +131,7 @@ class Entries {
     (*all)["limits"] = loop != nullptr ? LimitsOf(*loop) : ordered_json(nullptr);
     (*all)["search_vco"] = Number(answer_.searched_vco);
     Put(all, "input_jitter", request_.input_jitter);
+    Put(all, "input_tolerance", request_.input_tolerance);
     (*all)["phase_error"] = Number(answer_.phase_error);
     Put(all, "worst_ppm", answer_.worst_ppm);
     (*all)["max_jitter"] = Number(answer_.max_jitter);
@@ -211,7 +215,9 @@ class Entries {
     const LoopLimits& limits = device_.Loop(set.primitive);
     ordered_json entries;
     entries["vco"] = Ends(limits.vco);
+    Put(&entries, "vco_margin", answer_.vco_margin);
     entries["pfd"] = Ends(set.bandwidth == Bandwidth::kLow ? limits.pfd_low : limits.pfd);
+    Put(&entries, "pfd_margin", answer_.pfd_margin);
     entries["largest_count"] = limits.max_count;
     return entries;
   }
@@ -237,11 +243,11 @@ class Entries {
     AddPlace(place, &entries);
     entries["multiply"] = output.ratio.InWords()->numerator;
     entries["divide"] = output.ratio.InWords()->denominator;
-    Put(&entries, "requested", asked.frequency);
+    Put(&entries, "requested", asked.asked ? std::optional(asked.frequency) : std::nullopt);
     Put(&entries, "actual", output.frequency);
     Put(&entries, "actual_second", output.frequency_second);
     entries["search"] = Number(output.searched);
-    Put(&entries, "error_ppm", output.error_ppm);
+    Put(&entries, "error_ppm", asked.asked ? std::optional(output.error_ppm) : std::nullopt);
     Put(&entries, "requested_phase", asked.phase);
     Put(&entries, "phase", output.phase);
     Put(&entries, "phase_error", output.phase_error);
@@ -251,6 +257,7 @@ class Entries {
     entries["jitter"] = Number(output.jitter);
     entries["jitter_rms"] = Number(output.jitter_rms);
     entries["range"] = Ends(RangeAt(place));
+    Put(&entries, "margin", output.margin);
     entries["within"] = output.misses.empty() && output.violations.empty();
     return entries;
   }

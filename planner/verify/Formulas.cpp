@@ -24,6 +24,20 @@ Rational Turned(Rational degrees) {
   return degrees > Rational(180) ? degrees - 360 : degrees;
 }
 
+std::vector<Rational> CornersOf(const Rational& input, const Rational& tolerance) {
+  if (tolerance == Rational(0)) return {input};
+  const Rational off = input * tolerance / 1'000'000;
+  return {input - off, input + off};
+}
+
+std::vector<Rational> CornersOf(const std::vector<Rational>& inputs, const Rational& tolerance) {
+  std::vector<Rational> corners;
+  for (const Rational& input : inputs) {
+    for (const Rational& one : CornersOf(input, tolerance)) corners.push_back(one);
+  }
+  return corners;
+}
+
 Rational MarginIn(const Range& range, const Rational& frequency) {
   const Rational none = 0;
   const Rational below =

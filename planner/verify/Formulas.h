@@ -4,6 +4,8 @@
 #ifndef VORKEL_PLANNER_VERIFY_FORMULAS_H_
 #define VORKEL_PLANNER_VERIFY_FORMULAS_H_
 
+#include <vector>
+
 #include "hardware/Exact.h"
 #include "hardware/Kru.h"
 #include "planner/Request.h"
@@ -15,6 +17,12 @@ Rational Ppm(const Rational& actual, const Rational& wanted);
 
 // An angle as one above -180 and up to 180 degrees.
 Rational Turned(Rational degrees);
+
+// What an input can be with a tolerance, ppm: its frequency alone where that is 0, else the lowest
+// and the highest.
+std::vector<Rational> CornersOf(const Rational& input, const Rational& tolerance);
+// The same of some inputs.
+std::vector<Rational> CornersOf(const std::vector<Rational>& inputs, const Rational& tolerance);
 
 // The smaller of (f - lowest) / lowest and (highest - f) / highest. An end of 0 is none.
 Rational MarginIn(const Range& range, const Rational& frequency);

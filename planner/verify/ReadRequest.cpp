@@ -198,7 +198,7 @@ std::optional<Request> ReadRequest(const Node& document, const Device& device,
   read::Mistakes mistakes;
   const read::Draft draft = read::ReadTree(*node, "", read::Naming::kEntries, &mistakes);
   std::optional<read::Reading> reading;
-  if (mistakes.empty()) reading = read::Finish(draft, {}, &mistakes);
+  if (mistakes.empty()) reading = read::Finish(draft, {.evaluates = true}, &mistakes);
   AddMistakes(mistakes, discrepancies);
   if (!reading) return std::nullopt;
   const Node* const part = node->Find("device");

@@ -55,38 +55,57 @@ class Work {
  private:
   // --- Limits -----------------------------------------------------------------------------
 
-  void Keep(const Rational& value, const Range& range, Finding finding,
-            std::vector<Finding>* violations) {
-    const Rational margin = MarginIn(range, value);
-    if (!has_margin_ || margin < answer_.margin) answer_.margin = margin;
-    has_margin_ = true;
-    if (range.lowest <= value && value <= range.highest) return;
-    finding.value = value;
+  // What an input makes of a ratio, at both of its corners. `own` is the margin of that alone, if
+  // there is one yet.
+  void Keep(std::size_t input, const Rational& ratio, const Range& range, Finding finding,
+            std::vector<Finding>* violations, std::optional<Rational>* own) {
+    const Rational& tolerance = request_.input_tolerance;
+    finding.input = static_cast<int>(input);
     finding.range = range;
-    violations->push_back(std::move(finding));
+    for (const Rational& corner : CornersOf(request_.inputs[input], tolerance)) {
+      finding.value = corner * ratio;
+      const Rational margin = MarginIn(range, finding.value);
+      if (!has_margin_ || margin < answer_.margin) answer_.margin = margin;
+      has_margin_ = true;
+      if (!*own || margin < **own) *own = margin;
+      const bool is_low = corner < request_.inputs[input];
+      const bool is_high = request_.inputs[input] < corner;
+      if (is_low) finding.corner = -tolerance;
+      if (is_high) finding.corner = tolerance;
+      // What is too high in the low corner is so even more in the high one.
+      const bool is_below = !is_high && finding.value < range.lowest;
+      const bool is_above = !is_low && range.highest < finding.value;
+      if (is_below || is_above) violations->push_back(finding);
+    }
   }
 
-  Finding Outside(Quantity quantity, std::size_t input) const {
+  Finding Outside(Quantity quantity) const {
     Finding finding{.kind = FindingKind::kOutsideLimit};
     finding.primitive = answer_.primitive;
     finding.quantity = quantity;
-    finding.input = static_cast<int>(input);
     return finding;
   }
 
   void DoVcoAndPfd() {
     const LoopLimits& limits = device_.Loop(loop_->primitive);
+    std::optional<Rational> vco_margin;
+    std::optional<Rational> pfd_margin;
     const Range& pfds = loop_->bandwidth == Bandwidth::kLow ? limits.pfd_low : limits.pfd;
     for (std::size_t i = 0; i < request_.inputs.size(); ++i) {
       const Rational vco = VcoOf(request_.inputs[i], loop_->m, loop_->d);
       const Rational pfd = verify::PfdOf(request_.inputs[i], loop_->d);
-      Keep(vco, limits.vco, Outside(Quantity::kVco, i), &answer_.violations);
-      Keep(pfd, pfds, Outside(Quantity::kPfd, i), &answer_.violations);
+      Keep(i, VcoOf(1, loop_->m, loop_->d), limits.vco, Outside(Quantity::kVco),
+           &answer_.violations, &vco_margin);
+      Keep(i, verify::PfdOf(1, loop_->d), pfds, Outside(Quantity::kPfd), &answer_.violations,
+           &pfd_margin);
       if (i > 0) continue;
       answer_.vco = vco;
       answer_.pfd = pfd;
-      is_loop_inside_ = answer_.violations.empty();
+      is_loop_inside_ = limits.vco.lowest <= vco && vco <= limits.vco.highest &&
+                        pfds.lowest <= pfd && pfd <= pfds.highest;
     }
+    answer_.vco_margin = *vco_margin;
+    answer_.pfd_margin = *pfd_margin;
   }
 
   // --- One output -------------------------------------------------------------------------
@@ -105,11 +124,12 @@ class Work {
   void KeepOutput(std::size_t i, const Range& range, Finding finding, OutputAnswer* output) {
     output->frequency = request_.inputs[0] * output->ratio;
     if (request_.inputs.size() > 1) output->frequency_second = request_.inputs[1] * output->ratio;
+    finding.output = static_cast<int>(i);
+    std::optional<Rational> margin;
     for (std::size_t input = 0; input < request_.inputs.size(); ++input) {
-      finding.output = static_cast<int>(i);
-      finding.input = static_cast<int>(input);
-      Keep(request_.inputs[input] * output->ratio, range, finding, &output->violations);
+      Keep(input, output->ratio, range, finding, &output->violations, &margin);
     }
+    output->margin = *margin;
   }
 
   void DoLoopOutput(std::size_t i, OutputAnswer* output) {
@@ -120,7 +140,7 @@ class Work {
     output->phase = is_still ? Rational(0) : verify::PhaseOf(set.phase, set.divider);
     output->duty = is_still || set.high_time == 0 ? Rational(50)
                                                   : verify::DutyOf(set.high_time, set.divider);
-    KeepOutput(i, i == 1 ? limits.output_1 : limits.output, Outside(Quantity::kFrequency, 0),
+    KeepOutput(i, i == 1 ? limits.output_1 : limits.output, Outside(Quantity::kFrequency),
                output);
     if (set.divider > 8 * hardware::LargestDivider(limits.max_count)) {
       Finding finding{.kind = FindingKind::kDividerTooLarge};
@@ -151,7 +171,7 @@ class Work {
     output->ratio = FrequencyOf(1, pin, kru_->Ratios());
     output->phase = verify::PhaseOf(pin, kru_->phase_shift);
     output->duty = verify::DutyOf(pin, kru_->divide_halves);
-    Finding finding = Outside(Quantity::kFrequency, 0);
+    Finding finding = Outside(Quantity::kFrequency);
     finding.pin = std::string(hardware::FactsOf(pin).name);
     finding.feedback_2x = doubled && !(limits.Of(pin, true) == limits.Of(pin, false));
     KeepOutput(i, limits.Of(pin, doubled), std::move(finding), output);

@@ -23,7 +23,9 @@ using read::Node;
 using read::NodeType;
 using std::string;
 
-constexpr int kVersion = 3;
+constexpr int kVersion = 4;
+// The source of settings of the user's own.
+constexpr std::string_view kGiven = "given";
 
 // A request as it stands in a document, word for word.
 string TextOf(const Node& node) {
@@ -55,9 +57,10 @@ class Work {
     }
     const std::optional<Request> request = ReadRequest(document_, device_, &found_);
     if (request) {
-      string text = TextOf(*document_.Find("request"));
+      string text = TextOf(*document_.Find("request")) + (IsGiven() ? " given" : "");
       if (!kept_ || kept_->text != text) {
-        kept_ = {std::move(text), *request, StandingOf(*request, device_)};
+        kept_ = {std::move(text), *request,
+                 IsGiven() ? Standing{} : StandingOf(*request, device_)};
       }
       DoAnswers();
       DoHead();
@@ -70,6 +73,14 @@ class Work {
 
  private:
   // --- The whole --------------------------------------------------------------------------
+
+  // Whether all is about settings of the user's own, which claim no place among others.
+  bool IsGiven() const {
+    const Node* const answers = document_.Find("answers");
+    if (answers == nullptr || answers->items.size() != 1) return false;
+    const Node* const source = answers->items[0].Find("source");
+    return source != nullptr && source->type == NodeType::kString && source->text == kGiven;
+  }
 
   void DoHead() {
     ordered_json head;
@@ -104,7 +115,7 @@ class Work {
     for (std::size_t i = 0; i < answers->items.size(); ++i) {
       DoAnswer(answers->items[i], "answers[" + std::to_string(i) + "]", &claims);
     }
-    if (claims.size() == answers->items.size()) HoldSequence(kept_->standing, claims, &found_);
+    if (claims.size() == answers->items.size() && !IsGiven()) HoldSequence(kept_->standing, claims, &found_);
   }
 
   // --- One answer -------------------------------------------------------------------------
@@ -141,6 +152,7 @@ class Work {
 
   // Where the settings of an answer come from.
   Candidate CandidateOf(const Claim& claim) const {
+    if (IsGiven()) return {{claim.settings, {}}, claim.order, {}};
     for (const auto* const all : {&kept_->standing.candidates, &kept_->standing.tradeoffs}) {
       for (const Candidate& one : *all) {
         if (one.ranked.settings == claim.settings && one.order == claim.order) return one;

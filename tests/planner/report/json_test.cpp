@@ -30,11 +30,14 @@ TEST(Json, AllOfAnAnswer) {
   answer.searched_vco = 999.5;
   answer.outputs[0].searched = 333.25;
   answer.outputs[0].jitter_rms = 5;
+  answer.vco_margin = Rational(2, 27);
+  answer.pfd_margin = Rational(2, 3);
+  answer.outputs[0].margin = Rational(1, 6);
   answer.margin = Rational(2, 27);
   Miss(&answer, 0, Quantity::kFrequency, answer.outputs[0].error_ppm, 100);
   const char* const expected = R"({
     "format": "vorkel-plan",
-    "version": 3,
+    "version": 4,
     "units": {
       "frequency": "MHz", "frequency_error": "ppm", "phase": "degrees", "duty": "percent",
       "jitter": "ps, peak to peak at a bit error rate of 1e-12",
@@ -42,7 +45,7 @@ TEST(Json, AllOfAnAnswer) {
     },
     "request": {
       "device": "vk40b484-2", "inputs": [100], "outputs": [{"frequency": 333}],
-      "input_jitter": 0, "tolerance": 100, "phase_tolerance": 0.5, "duty_tolerance": 0.5,
+      "input_jitter": 0, "input_tolerance": 0, "tolerance": 100, "phase_tolerance": 0.5, "duty_tolerance": 0.5,
       "feedback": false, "prefer_max_vco": false, "int_div0": false, "any_order": false,
       "engine": false, "rank": "jitter"
     },
@@ -56,11 +59,14 @@ TEST(Json, AllOfAnAnswer) {
       "bandwidth": "LOW",
       "limits": {
         "vco": {"lowest": 400.0, "lowest_exact": "400", "highest": 1080.0, "highest_exact": "1080"},
+        "vco_margin": 0.07407407407407407, "vco_margin_exact": "2/27",
         "pfd": {"lowest": 19.0, "lowest_exact": "19", "highest": 300.0, "highest_exact": "300"},
+        "pfd_margin": 0.6666666666666666, "pfd_margin_exact": "2/3",
         "largest_count": 64
       },
       "search_vco": 999.5,
       "input_jitter": 0.0, "input_jitter_exact": "0",
+      "input_tolerance": 0.0, "input_tolerance_exact": "0",
       "phase_error": 77.037,
       "worst_ppm": 1001.001001001001, "worst_ppm_exact": "1000000/999",
       "max_jitter": 90.0,
@@ -81,6 +87,7 @@ TEST(Json, AllOfAnAnswer) {
         "requested_duty": null, "requested_duty_exact": null, "duty": 50.0, "duty_exact": "50",
         "duty_error": null, "duty_error_exact": null, "jitter": 90.0, "jitter_rms": 5.0,
         "range": {"lowest": 3.0, "lowest_exact": "3", "highest": 400.0, "highest_exact": "400"},
+        "margin": 0.16666666666666666, "margin_exact": "1/6",
         "within": false
       }],
       "misses": ["output 0: the frequency is off by 1001.00 ppm, with 100 allowed"],
@@ -88,6 +95,7 @@ TEST(Json, AllOfAnAnswer) {
       "notes": [],
       "findings": [{
         "kind": "off_target", "primitive": "PLL", "quantity": "frequency", "output": 0, "input": 0,
+        "corner": 0.0, "corner_exact": "0",
         "value": 1001.001001001001, "value_exact": "1000000/999",
         "range": {"lowest": 0.0, "lowest_exact": "0", "highest": 100.0, "highest_exact": "100"},
         "pin": null, "feedback_2x": false, "outputs": [], "numbers": [], "words": "",
@@ -111,6 +119,7 @@ TEST(Json, RequestsAreWrittenAsTheyCanBeReadBack) {
   request.outputs[1].max_jitter = 150;
   request.outputs[2].used = false;
   request.input_jitter = Rational(505, 10);
+  request.input_tolerance = Rational(45, 2);
   request.max_jitter = 200;
   request.primitive = Primitive::kTsyn;
   request.bandwidth = Bandwidth::kHigh;
@@ -122,7 +131,7 @@ TEST(Json, RequestsAreWrittenAsTheyCanBeReadBack) {
                 {"frequency": "1/3", "phase": -90, "duty": "100/3", "tolerance": 0,
                  "phase_tolerance": 0.25, "duty_tolerance": 2, "max_jitter": 150},
                 "-"],
-    "input_jitter": 50.5, "tolerance": 100, "phase_tolerance": 0.5, "duty_tolerance": 0.5,
+    "input_jitter": 50.5, "input_tolerance": 22.5, "tolerance": 100, "phase_tolerance": 0.5, "duty_tolerance": 0.5,
     "max_jitter": 200, "bandwidth": "HIGH", "feedback": false, "prefer_max_vco": false,
     "int_div0": true, "any_order": true, "engine": false, "rank": "margin"})"));
 }
@@ -274,7 +283,7 @@ TEST(Tcl, HasTheSame) {
   const Request request = VideoRequest();
   const Answer answer = VideoAnswer(request);
   const std::string text = Tcl(request, MadeDevice(), {{&answer, 1, true}});
-  EXPECT_EQ(text.substr(0, 32), "format vorkel-plan\nversion 3\nuni");
+  EXPECT_EQ(text.substr(0, 32), "format vorkel-plan\nversion 4\nuni");
   EXPECT_NE(text.find("\nanswers {\n  {\n    number 1\n    tradeoff true\n    primitive TSYN\n"),
             std::string::npos);
   EXPECT_NE(text.find("\n      {\n        index 0\n        used true\n"), std::string::npos);

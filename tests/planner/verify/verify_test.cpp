@@ -22,7 +22,7 @@ using verify::DiscrepancyKind;
 string ByHand() {
   return R"({
   "format": "vorkel-plan",
-  "version": 3,
+  "version": 4,
   "units": {
     "frequency": "MHz", "frequency_error": "ppm", "phase": "degrees", "duty": "percent",
     "jitter": "ps, peak to peak at a bit error rate of 1e-12",
