@@ -2,6 +2,7 @@
 #include "hardware/Exact.h"
 
 #include <algorithm>
+#include <bit>
 #include <boost/multiprecision/cpp_int.hpp>
 #include <cmath>
 #include <limits>
@@ -23,31 +24,41 @@ constexpr std::int64_t kMost = std::numeric_limits<std::int64_t>::max();
 bool Fits(Wide value) { return value > kLeast && value <= kMost; }
 bool Fits(const Integer& value) { return value > kLeast && value <= kMost; }
 
+std::uint64_t Magnitude(std::int64_t value) {
+  return value < 0 ? 0 - static_cast<std::uint64_t>(value) : static_cast<std::uint64_t>(value);
+}
+
+// By halving and subtracting, which takes less time than to divide (Stein's algorithm).
 std::uint64_t Gcd(std::uint64_t a, std::uint64_t b) {
-  while (b != 0) a = std::exchange(b, a % b);
-  return a;
-}
-
-Wide Gcd(Wide a, Wide b) {
+  if (a == 0) return b;
+  if (b == 0) return a;
+  if (a == 1 || b == 1) return 1;
+  const int halvings = std::countr_zero(a | b);
+  a >>= std::countr_zero(a);
   while (b != 0) {
-    if (a <= kMost && b <= kMost) {
-      return static_cast<Wide>(Gcd(static_cast<std::uint64_t>(a), static_cast<std::uint64_t>(b)));
-    }
-    a = std::exchange(b, a % b);
+    b >>= std::countr_zero(b);
+    if (a > b) std::swap(a, b);
+    b -= a;
   }
-  return a;
+  return a << halvings;
 }
 
-// The quotient in lowest terms when it fits into two words; `denominator` is above 0.
-bool Reduce(Wide numerator, Wide denominator, std::int64_t* small_numerator,
-            std::int64_t* small_denominator) {
-  const Wide common = Gcd(numerator < 0 ? -numerator : numerator, denominator);
-  numerator /= common;
-  denominator /= common;
+// Of a word that is not the least, and one above 0.
+std::int64_t CommonOf(std::int64_t a, std::int64_t b) {
+  return static_cast<std::int64_t>(Gcd(Magnitude(a), static_cast<std::uint64_t>(b)));
+}
+
+// Keeps a quotient in lowest terms when it fits into two words.
+bool Keep(Wide numerator, Wide denominator, std::int64_t* small_numerator,
+          std::int64_t* small_denominator) {
   if (!Fits(numerator) || !Fits(denominator)) return false;
   *small_numerator = static_cast<std::int64_t>(numerator);
   *small_denominator = static_cast<std::int64_t>(denominator);
   return true;
+}
+
+std::int64_t Divided(std::int64_t value, std::int64_t divisor) {
+  return divisor == 1 ? value : value / divisor;
 }
 
 // The exponent of the leading bit of a quotient above 0: 2^e <= value < 2^(e + 1).
@@ -86,10 +97,17 @@ Rational::Rational(Large large) {
 
 Rational::Rational(std::int64_t numerator, std::int64_t denominator) {
   if (denominator == 0) throw std::domain_error("division by 0");
-  const Wide sign = denominator < 0 ? -1 : 1;
-  if (!Reduce(sign * numerator, sign * denominator, &numerator_, &denominator_)) {
+  if (numerator == kLeast || denominator == kLeast) {
     *this = Rational(Large{Integer(numerator), Integer(denominator)});
+    return;
   }
+  if (denominator < 0) {
+    numerator = -numerator;
+    denominator = -denominator;
+  }
+  const std::int64_t common = CommonOf(numerator, denominator);
+  numerator_ = Divided(numerator, common);
+  denominator_ = Divided(denominator, common);
 }
 
 Rational::Large Rational::Widened() const {
@@ -115,12 +133,21 @@ Rational Rational::FromDouble(double value) {
 
 Rational operator+(const Rational& a, const Rational& b) {
   if (!a.large_ && !b.large_) {
+    // What the denominators have in common is all that the sum can have with theirs.
+    const std::int64_t common = CommonOf(a.denominator_, b.denominator_);
+    const std::int64_t a_rest = Divided(a.denominator_, common);
+    const std::int64_t b_rest = Divided(b.denominator_, common);
     // Two products below 2^126 each.
-    const Wide numerator = static_cast<Wide>(a.numerator_) * b.denominator_ +
-                           static_cast<Wide>(b.numerator_) * a.denominator_;
-    const Wide denominator = static_cast<Wide>(a.denominator_) * b.denominator_;
+    Wide numerator = static_cast<Wide>(a.numerator_) * b_rest +
+                     static_cast<Wide>(b.numerator_) * a_rest;
+    std::int64_t shared = 1;
+    if (common != 1) {
+      shared = CommonOf(static_cast<std::int64_t>(numerator % common), common);
+      if (shared != 1) numerator /= shared;
+    }
+    const Wide denominator = static_cast<Wide>(Divided(common, shared)) * a_rest * b_rest;
     Rational sum;
-    if (Reduce(numerator, denominator, &sum.numerator_, &sum.denominator_)) return sum;
+    if (Keep(numerator, denominator, &sum.numerator_, &sum.denominator_)) return sum;
   }
   const Rational::Large x = a.Widened();
   const Rational::Large y = b.Widened();
@@ -132,10 +159,14 @@ Rational operator-(const Rational& a, const Rational& b) { return a + -b; }
 
 Rational operator*(const Rational& a, const Rational& b) {
   if (!a.large_ && !b.large_) {
+    // Each is in lowest terms: only the numerator of one and the denominator of the other can have
+    // something in common.
+    const std::int64_t first = CommonOf(a.numerator_, b.denominator_);
+    const std::int64_t second = CommonOf(b.numerator_, a.denominator_);
     Rational product;
-    if (Reduce(static_cast<Wide>(a.numerator_) * b.numerator_,
-               static_cast<Wide>(a.denominator_) * b.denominator_, &product.numerator_,
-               &product.denominator_)) {
+    if (Keep(static_cast<Wide>(Divided(a.numerator_, first)) * Divided(b.numerator_, second),
+             static_cast<Wide>(Divided(a.denominator_, second)) * Divided(b.denominator_, first),
+             &product.numerator_, &product.denominator_)) {
       return product;
     }
   }
@@ -163,10 +194,14 @@ Rational Rational::operator-() const {
   return opposite;
 }
 
-bool operator==(const Rational& a, const Rational& b) { return (a <=> b) == 0; }
+bool operator==(const Rational& a, const Rational& b) {
+  if (a.large_ || b.large_) return (a <=> b) == 0;
+  return a.numerator_ == b.numerator_ && a.denominator_ == b.denominator_;
+}
 
 std::strong_ordering operator<=>(const Rational& a, const Rational& b) {
   if (!a.large_ && !b.large_) {
+    if (a.denominator_ == b.denominator_) return a.numerator_ <=> b.numerator_;
     return static_cast<Wide>(a.numerator_) * b.denominator_ <=>
            static_cast<Wide>(b.numerator_) * a.denominator_;
   }

@@ -14,6 +14,7 @@
 #include <compare>
 #include <concepts>
 #include <cstdint>
+#include <limits>
 #include <memory>
 #include <optional>
 #include <string>
@@ -27,7 +28,9 @@ class Rational {
  public:
   Rational() = default;
   template <std::signed_integral T>
-  Rational(T whole) : Rational(std::int64_t{whole}, 1) {}  // NOLINT: it is a quotient
+  Rational(T whole) : numerator_(whole) {  // NOLINT: it is a quotient
+    if (numerator_ == std::numeric_limits<std::int64_t>::min()) *this = Rational(numerator_, 1);
+  }
   // Throws std::domain_error when the denominator is 0.
   Rational(std::int64_t numerator, std::int64_t denominator);
 

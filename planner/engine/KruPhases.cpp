@@ -61,12 +61,14 @@ class PhaseLists {
     const int last = has_shift_ ? LastStep() : 0;
     std::optional<Rational> least;
     Phases best = phases;
+    if (std::all_of(phases.begin(), phases.end(), [](const auto& one) { return !one; })) return best;
     for (int step = first; step <= last; ++step) {
       const Rational offset(360 * step, hardware::kShiftSteps);
       const std::optional<Rational> worst = WorstError(phases, offset);
       if (!worst || (least && *worst >= *least)) continue;
       least = worst;
       best = Made(phases, offset);
+      if (*least == Rational(0)) break;
     }
     return best;
   }

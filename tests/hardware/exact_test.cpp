@@ -163,6 +163,44 @@ TEST(Rational, CountsAlikeInBothForms) {
   }
 }
 
+// Numerator and denominator of sums, products and quotients against cross multiplication and
+// Euclid's algorithm; with words up to the largest.
+TEST(Rational, KeepsSumsAndProductsInLowestTerms) {
+  using Wide = __int128;
+  std::mt19937_64 random(4);
+  const auto expect = [](const Rational& value, Wide numerator, Wide denominator) {
+    Wide a = numerator < 0 ? -numerator : numerator;
+    for (Wide b = denominator; b != 0;) {
+      const Wide rest = a % b;
+      a = b;
+      b = rest;
+    }
+    numerator /= a;
+    denominator /= a;
+    const std::optional<Rational::Words> words = value.InWords();
+    const bool fits = numerator <= kMost && numerator > kLeast && denominator <= kMost;
+    ASSERT_EQ(words.has_value(), fits);
+    if (!fits) return;
+    ASSERT_EQ(words->numerator, static_cast<std::int64_t>(numerator));
+    ASSERT_EQ(words->denominator, static_cast<std::int64_t>(denominator));
+  };
+  for (int i = 0; i < 20000; ++i) {
+    // Few or many bits, and often with factors in common.
+    const auto number = [&] {
+      const auto bits = static_cast<std::int64_t>(random() >> (random() % 62 + 2));
+      return random() % 3 == 0 ? bits / 720720 * 720720 : bits;
+    };
+    const std::int64_t a = random() % 2 == 0 ? number() : -number();
+    const std::int64_t c = random() % 2 == 0 ? number() : -number();
+    const std::int64_t b = number() + (random() % 50 == 0 ? kMost / 2 : 1);
+    const std::int64_t d = random() % 3 == 0 ? b : number() + 1;
+    expect(Rational(a, b), a, b);
+    expect(Rational(a, b) * Rational(c, d), Wide{a} * c, Wide{b} * d);
+    expect(Rational(a, b) + Rational(c, d), Wide{a} * d + Wide{c} * b, Wide{b} * d);
+    if (c > 0) expect(Rational(a, b) / Rational(c, d), Wide{a} * d, Wide{b} * c);
+  }
+}
+
 TEST(Angles, Turn) {
   EXPECT_EQ(TurnedToHalf(-180), Rational(180));
   EXPECT_EQ(TurnedToHalf(180), Rational(180));
