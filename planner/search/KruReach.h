@@ -48,6 +48,8 @@ class SmallSet {
 
 class KruReach {
  public:
+  static constexpr std::size_t kMostDivides = hardware::kClkdvHalves.size();
+
   // `all_met`: frequencies that do not meet their demands are never near enough. `with_ties`: what
   // is as near as a bound is near enough.
   KruReach(const KruTask& task, KruPhases* phases, bool all_met, bool with_ties,
@@ -63,6 +65,8 @@ class KruReach {
   // Counts what Bind has changed.
   std::size_t Changes() const { return changes_; }
 
+  // No D below has an M that is near enough; one above all when none has.
+  int FirstD() const;
   // The M that are near enough with a D; and those that would be without any bound.
   SmallSet MsFor(int d) const { return MsOf(steps_, d); }
   SmallSet AllMsFor(int d) const { return MsOf(open_, d); }
@@ -116,12 +120,27 @@ class KruReach {
   struct Step {
     int m;
     std::optional<KruError> bound;
-    Outputs line;                    // those that the delay line serves near enough,
-    Outputs doubler;
-    Outputs on_line;                 // either of them,
-    std::vector<Outputs> on_divide;  // and a divide of CLKDV
-    Spans spans;                     // of M / D
-    Outputs on_jitter;               // those that need the synthesiser and ask for a jitter
+    Outputs line = 0;     // those that the delay line serves near enough,
+    Outputs doubler = 0;
+    Outputs on_line = 0;  // either of them,
+    std::array<Outputs, kMostDivides> on_divide{};  // and a divide of CLKDV
+    int first_d = 0;         // none below has an M
+    Spans spans;             // of M / D
+    Outputs on_jitter = 0;   // those that need the synthesiser and ask for a jitter
+  };
+  // The spans of a few outputs that two sources have each.
+  class FewSpans {
+   public:
+    void Add(const Span& span) {
+      if (span.lowest <= span.highest) all_[count_++] = span;
+    }
+    void Clear() { count_ = 0; }
+    const Span* begin() const { return all_.data(); }
+    const Span* end() const { return all_.data() + count_; }
+
+   private:
+    std::array<Span, 16> all_;
+    std::size_t count_ = 0;
   };
 
   template <typename StepNow, typename Take>
@@ -149,8 +168,10 @@ class KruReach {
   }
   SmallSet MsOf(const std::vector<Step>& steps, int d) const;
   bool ArePhasesNear(const Served& served, const std::optional<KruError>& bound) const;
-  bool IsJitterNear(const Step& step, int d) const;
-  Step StepWith(int m, const std::optional<KruError>& bound) const;
+  bool IsJitterNear(const Step& step, int m, int d) const;
+  int LastOfJitter(const Step& step, int first, int last, int d) const;
+  // What is not near enough at `wider`, a step with a larger error, is not looked at.
+  Step StepWith(int m, const std::optional<KruError>& bound, const Step* wider) const;
   const Step& StepOf(int m) const {
     auto step = steps_.end() - 1;
     while (step->m > m) --step;
@@ -165,14 +186,20 @@ class KruReach {
   bool IsJitterNearOn(PinSource source, std::size_t place, const KruBase& base,
                       const std::optional<KruError>& bound) const;
   bool IsBelow(const KruError& error, const std::optional<KruError>& bound) const;
-  // The outputs that can.
-  Outputs NearOn(PinSource source, const KruBase& base, const std::optional<KruError>& bound) const;
+  // The outputs that can, of some.
+  Outputs NearOn(PinSource source, const KruBase& base, const std::optional<KruError>& bound,
+                 Outputs some) const;
+  Outputs NearOn(PinSource source, const KruBase& base,
+                 const std::optional<KruError>& bound) const {
+    return NearOn(source, base, bound, all_);
+  }
   Outputs OnLine(const std::optional<KruError>& bound) const;
+  using Mosts = std::array<double, kMostKruOutputs>;
   void AddSpans(Outputs served, int divide_halves, const std::optional<KruError>& bound,
-                Spans* spans) const;
+                const Mosts& mosts, Spans* spans) const;
+  void AddReachable(const Spans& all, Step* step) const;
   // The ratios of M to D with which an output is near enough on a source.
-  Span SpanOn(PinSource source, std::size_t place, int divide_halves,
-              const std::optional<KruError>& bound) const;
+  Span SpanOn(PinSource source, std::size_t place, int divide_halves, double most) const;
   double MostOf(std::size_t place, const std::optional<KruError>& bound) const;
   bool IsDutyNearOn(PinSource source, std::size_t place, int divide_halves,
                     const std::optional<KruError>& bound) const;
@@ -184,6 +211,8 @@ class KruReach {
   std::span<const int> divides_;
   int largest_;
   Outputs all_ = 0;
+  Span whole_;    // of CLKFX and CLKFX180 with any of their ranges, as a ratio to the input
+  Span divided_;  // of CLKFXDV
   KruBase line_;
   std::vector<Step> open_;   // one, without a bound
   std::vector<Step> steps_;  // by their M

@@ -71,7 +71,7 @@ class Walk {
     base.m = hardware::kSmallestKruM;
     Bind(base);
     pairs_ += std::int64_t{largest_} * (largest_ + 1 - hardware::kSmallestKruM);
-    for (base.d = 1; base.d <= largest_; ++base.d) {
+    for (base.d = solver_.IsBestOnFront() ? reach_.FirstD() : 1; base.d <= largest_; ++base.d) {
       SmallSet near = reach_.MsFor(base.d);
       std::size_t changes = reach_.Changes();
       const SmallSet ms = solver_.IsBestOnFront() ? near : reach_.AllMsFor(base.d);

@@ -28,8 +28,6 @@
 
 namespace planner::search {
 
-inline constexpr std::size_t kMostKruOutputs = 6;
-
 // Settings while they are searched.
 struct KruEntry {
   KruBase base;

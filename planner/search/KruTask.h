@@ -29,6 +29,8 @@ namespace planner::search {
 using hardware::Pin;
 using hardware::PinSource;
 
+inline constexpr std::size_t kMostKruOutputs = 6;
+
 // The settings of a KRU but for PHASE_SHIFT and pins. M, D and the divide are 0 where they are not
 // set.
 struct KruBase {
