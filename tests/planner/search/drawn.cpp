@@ -131,18 +131,26 @@ Behind DrawBehind(Random& random, Primitive primitive, const Device& device,
     behind.vco = m > 0 ? input * m / d : end;
     return behind;
   }
+  using hardware::Pin;
   const planner::PinLimits& limits = device.Pins(primitive);
+  const bool is_sp = primitive == Primitive::kKruSp;
+  const auto is_in_range = [&](Pin pin) {
+    return limits.Of(pin, false).Contains(input * PinRatio(pin, behind.kru.Ratios()));
+  };
+  const std::vector<int> divides = is_sp ? std::vector<int>{4, 5, 6, 7, 8, 10, 13, 16, 18}
+                                         : std::vector<int>{4, 8, 16, 32, 64};
   behind.kru.primitive = primitive;
-  behind.kru.divide_by_2 = primitive == Primitive::kKruSp && random.OneIn(3);
-  behind.kru.divide_halves = random.Pick(
-      primitive == Primitive::kKruSp ? std::vector<int>{4, 5, 6, 7, 8, 10, 13, 16, 18}
-                                     : std::vector<int>{4, 8, 16, 32, 64});
-  // Of some M and D one with which the synthesiser is in its range, if there is one.
+  behind.kru.divide_by_2 = is_sp && random.OneIn(3);
+  // Of some M, D and divides those with which the synthesiser and the divider are in their ranges,
+  // if there are any.
   for (int tries = 0; tries < 200; ++tries) {
     behind.kru.m = random.Int(2, 12);
     behind.kru.d = random.Int(1, 12);
-    const Rational made = input * PinRatio(hardware::Pin::kClkfx, behind.kru.Ratios());
-    if (limits.Of(hardware::Pin::kClkfx, false).Contains(made)) break;
+    if (is_in_range(Pin::kClkfx)) break;
+  }
+  for (int tries = 0; tries < 20; ++tries) {
+    behind.kru.divide_halves = random.Pick(divides);
+    if (is_in_range(is_sp ? Pin::kClkdv : Pin::kClkfxdv)) break;
   }
   return behind;
 }

@@ -103,6 +103,7 @@ class Kru {
   void WithDivide(KruSettings settings) {
     // With feedback from CLK2X and without: output 0 is on that pin or it is not.
     for (const bool doubled : {false, true}) {
+      if (doubled && !is_sp_) continue;
       pins_.assign(request_.outputs.size(), {});
       bool uses_m = false;
       bool uses_divide = false;
@@ -127,10 +128,15 @@ class Kru {
         settings.phase_shift = shift;
         // The phases do not matter where none is asked for. That they could all the same is tried
         // with kAll.
-        if (shift > 1 && effort_ == Effort::kLess && !request_.AsksForShape()) break;
+        if (shift > 1 && effort_ == Effort::kLess && !AsksForPhase()) break;
         WithShift(settings, doubled);
       }
     }
+  }
+
+  bool AsksForPhase() const {
+    return std::any_of(request_.outputs.begin(), request_.outputs.end(),
+                       [](const auto& output) { return output.used && output.phase; });
   }
 
   // Whether CLKFX keeps its range, without which M and D are only of use for CLKFXDV.
@@ -172,17 +178,19 @@ class Kru {
                                 UsesDivide(pin) ? settings.divide_halves : 0);
     const auto known = parts_.find(key);
     if (known != parts_.end()) return known->second;
-    planner::Output asked = request_.outputs[output];
-    asked.phase.reset();
     const Rational frequency = request_.inputs[0] * PinRatio(pin, settings.Ratios());
-    const planner::answer::Errors errors = planner::answer::ErrorsOf(
-        asked, frequency, 0, hardware::PinDuty(pin, settings.divide_halves));
     Part part{};
     for (const int doubled : {0, 1}) {
       const hardware::Range& range = limits_.Of(pin, is_sp_ && doubled == 1);
       part.is_inside[doubled] = range.Contains(frequency);
+      if (!part.is_inside[doubled]) continue;
       part.margin[doubled] = planner::answer::MarginOf(frequency, range);
     }
+    if (!part.is_inside[0] && !part.is_inside[1]) return parts_.emplace(key, part).first->second;
+    planner::Output asked = request_.outputs[output];
+    asked.phase.reset();
+    const planner::answer::Errors errors = planner::answer::ErrorsOf(
+        asked, frequency, 0, hardware::PinDuty(pin, settings.divide_halves));
     part.is_met = planner::answer::AreMet(request_, asked, errors);
     part.worst = planner::answer::WorstError(request_, asked, errors);
     return parts_.emplace(key, part).first->second;

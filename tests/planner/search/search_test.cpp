@@ -6,6 +6,7 @@
 #include <gtest/gtest.h>
 
 #include <cstdlib>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -102,14 +103,74 @@ void CompareOnSmallDevices(Primitive primitive, int requests, int most_outputs) 
     ExpectAgreement(request, device, primitive, plain::Effort::kAll);
     tally.Count(Search(request, device, primitive));
   }
-  EXPECT_GE(tally.met, requests / 30);
+  EXPECT_GE(tally.met, requests / 8);
+  EXPECT_GT(tally.missed, requests / 8);
+}
+
+bool IsLong() { return std::getenv("VORKEL_TEST_LONG") != nullptr; }
+
+// On the bundled devices, all of whose settings are tried. `requests` of each primitive that they
+// have.
+void CompareOnBundledDevices(Primitive primitive, int requests) {
+  struct Grade {
+    const char* name;
+    const char* grade;
+  };
+  constexpr Grade kGrades[] = {{"vk40", "2"}, {"vk40", "1"}, {"vk20", "2"}, {"vk10", "1"}};
+  std::vector<Device> devices;
+  for (const Grade& one : kGrades) {
+    Device device = drawn::Bundled(one.name, one.grade);
+    if (device.Has(primitive)) devices.push_back(std::move(device));
+  }
+  Random random(static_cast<std::uint64_t>(primitive) + 50);
+  Tally tally;
+  for (int i = 0; i < requests && !testing::Test::HasFailure(); ++i) {
+    SCOPED_TRACE("request " + std::to_string(i));
+    const Device& device = devices[static_cast<std::size_t>(i) % devices.size()];
+    const Request request = drawn::RequestFor(random, device, primitive, drawn::Input(random),
+                                              hardware::MostOutputs(primitive));
+    ExpectAgreement(request, device, primitive, plain::Effort::kLess);
+    tally.Count(Search(request, device, primitive));
+  }
+  EXPECT_GT(tally.met, requests / 30);
   EXPECT_GT(tally.missed, requests / 30);
 }
 
+// To try all settings of a KRU takes seconds.
+int RequestsOf(Primitive primitive) { return hardware::IsLoop(primitive) ? 4900 : 100; }
+
+class LongSearch : public testing::TestWithParam<Primitive> {
+ protected:
+  void SetUp() override {
+    if (!IsLong()) GTEST_SKIP() << "only with VORKEL_TEST_LONG in the environment";
+  }
+};
+TEST_P(LongSearch, AgreesOnBundledDevices) { CompareOnBundledDevices(GetParam(), RequestsOf(GetParam())); }
+INSTANTIATE_TEST_SUITE_P(Primitives, LongSearch,
+                         testing::Values(Primitive::kPll, Primitive::kTsyn, Primitive::kKruSp,
+                                         Primitive::kKruClkgen));
+
+// CLKFX at 800 MHz is above what the jitter model knows, and CLKFXDV makes 50 MHz of it. A jitter that
+// is not known is no error, and one that is known is above 1 ps, with any M and D.
+TEST(Search, AnUnknownJitterIsNoError) {
+  const Device device = drawn::Bundled("vk40", "2");
+  Request request;
+  request.inputs = {100};
+  request.outputs.resize(2);
+  request.outputs[0].used = false;
+  request.outputs[1].frequency = 50;
+  request.outputs[1].max_jitter = 1;
+  const Found found = Search(request, device, Primitive::kKruClkgen);
+  ASSERT_EQ(found.best.size(), 1u);
+  EXPECT_FALSE(found.best[0].within);
+  EXPECT_EQ(found.best[0].worst_error, Rational(0));
+  EXPECT_EQ(found.best[0].max_jitter, std::nullopt);
+}
+
 TEST(Search, AgreesOnSmallPlls) { CompareOnSmallDevices(Primitive::kPll, 150, 4); }
-TEST(Search, AgreesOnSmallTsyns) { CompareOnSmallDevices(Primitive::kTsyn, 150, 4); }
+TEST(Search, AgreesOnSmallTsyns) { CompareOnSmallDevices(Primitive::kTsyn, 120, 4); }
 TEST(Search, AgreesOnSmallKruSps) { CompareOnSmallDevices(Primitive::kKruSp, 40, 2); }
-TEST(Search, AgreesOnSmallKruClkgens) { CompareOnSmallDevices(Primitive::kKruClkgen, 40, 3); }
+TEST(Search, AgreesOnSmallKruClkgens) { CompareOnSmallDevices(Primitive::kKruClkgen, 60, 3); }
 
 }  // namespace
 }  // namespace planner::search

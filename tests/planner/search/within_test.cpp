@@ -30,7 +30,13 @@ using hardware::PinSource;
 class Judge {
  public:
   Judge(const Request& request, const Device& device, Primitive primitive, const Relaxed& relaxed)
-      : request_(request), device_(device), primitive_(primitive), relaxed_(relaxed) {}
+      : request_(request), device_(device), primitive_(primitive), relaxed_(relaxed) {
+    if (hardware::IsLoop(primitive)) {
+      loop_jitter_.emplace(device, request);
+    } else {
+      kru_jitter_.emplace(device, request, primitive);
+    }
+  }
 
   bool IsLoopWithin(const LoopSettings& settings) const {
     const LoopLimits& limits = device_.Loop(primitive_);
@@ -56,8 +62,7 @@ class Judge {
     for (const LoopOutput& output : settings.outputs) {
       has_fraction = has_fraction || output.divider % 8 != 0;
     }
-    const double jitter = answer::LoopJitter(device_, request_)
-                              .PeakToPeak(settings.m, settings.d, settings.bandwidth);
+    const double jitter = loop_jitter_->PeakToPeak(settings.m, settings.d, settings.bandwidth);
     for (std::size_t i = 0; i < request_.outputs.size(); ++i) {
       if (!request_.outputs[i].used) continue;
       const LoopOutput& set = settings.outputs[i];
@@ -77,7 +82,6 @@ class Judge {
   }
 
   bool IsKruWithin(const KruSettings& settings) const {
-    const answer::KruJitter model(device_, request_, primitive_);
     const bool is_sp = primitive_ == Primitive::kKruSp;
     const int largest = hardware::LargestKruRatioPart(primitive_);
     if (request_.feedback && is_sp && !relaxed_.feedback && !settings.feedback) return false;
@@ -103,7 +107,7 @@ class Judge {
       if (!IsOutputWithin(i, PinRatio(pin, settings.Ratios()),
                           hardware::PinPhase(pin, settings.phase_shift),
                           hardware::PinDuty(pin, settings.divide_halves),
-                          model.PeakToPeak(settings, pin),
+                          kru_jitter_->PeakToPeak(settings, pin),
                           device_.Pins(primitive_).Of(pin, doubled))) {
         return false;
       }
@@ -167,6 +171,8 @@ class Judge {
   const Device& device_;
   Primitive primitive_;
   const Relaxed& relaxed_;
+  std::optional<answer::LoopJitter> loop_jitter_;
+  std::optional<answer::KruJitter> kru_jitter_;
 };
 
 // A switch of Relaxed, to go through them.
@@ -366,22 +372,30 @@ void CompareRelaxedLoops(Primitive primitive) {
 TEST(Within, FindsWhatIsBeyondTheHardwareOfAPll) { CompareRelaxedLoops(Primitive::kPll); }
 TEST(Within, FindsWhatIsBeyondTheHardwareOfATsyn) { CompareRelaxedLoops(Primitive::kTsyn); }
 
-// All settings of a KRU with M, D and divides up to some numbers.
+// All settings of a KRU for its one output, with M, D and divides up to some numbers. What a pin does
+// not use is not gone through.
 bool SomeKru(const Request& request, const Device& device, Primitive primitive,
              const Relaxed& relaxed, int largest_ratio, int largest_halves) {
   const Judge judge(request, device, primitive, relaxed);
   const bool is_sp = primitive == Primitive::kKruSp;
-  for (const bool feedback : {false, true}) {
-    for (const bool divide_by_2 : {false, true}) {
-      if (!is_sp && (feedback || divide_by_2)) continue;
-      for (int d = 1; d <= largest_ratio; ++d) {
-        for (int m = 1; m <= largest_ratio; ++m) {
-          for (int halves = 2; halves <= largest_halves; ++halves) {
-            for (int shift = 0; shift <= (is_sp ? 255 : 0); ++shift) {
-              KruSettings settings{primitive, feedback, divide_by_2, m, d, halves, shift, {}};
-              settings.pins.assign(request.outputs.size(), Pin::kNone);
-              for (const hardware::PinFacts& facts : hardware::kPins) {
-                settings.pins[0] = facts.pin;
+  for (const hardware::PinFacts& facts : hardware::kPins) {
+    const bool is_made = facts.source == PinSource::kSynthesiser ||
+                         facts.source == PinSource::kDividedSynthesiser;
+    const bool is_divided = facts.source == PinSource::kDivider ||
+                            facts.source == PinSource::kDividedSynthesiser;
+    KruSettings settings{.primitive = primitive, .pins = {facts.pin}};
+    for (const bool feedback : {false, true}) {
+      for (const bool divide_by_2 : {false, true}) {
+        if (!is_sp && (feedback || divide_by_2)) continue;
+        settings.feedback = feedback;
+        settings.divide_by_2 = divide_by_2;
+        for (settings.d = 1; settings.d <= (is_made ? largest_ratio : 1); ++settings.d) {
+          for (settings.m = 1; settings.m <= (is_made ? largest_ratio : 1); ++settings.m) {
+            for (settings.divide_halves = 2;
+                 settings.divide_halves <= (is_divided ? largest_halves : 2);
+                 ++settings.divide_halves) {
+              for (settings.phase_shift = 0; settings.phase_shift <= (is_sp ? 255 : 0);
+                   ++settings.phase_shift) {
                 if (judge.IsKruWithin(settings)) return true;
               }
             }
