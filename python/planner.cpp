@@ -18,6 +18,7 @@
 #include <utility>
 #include <vector>
 
+#include "host/bundled/device/Shipped.h"
 #include "planner/device/Catalogue.h"
 #include "planner/device/Check.h"
 #include "planner/device/Files.h"
@@ -330,6 +331,7 @@ PYBIND11_MODULE(_planner, module) {
         return Devices(name.is_none() ? std::nullopt : std::optional(name.cast<string>()));
       },
       arg("name"));
+  module.def("shipped", &Device::Shipped, arg("folder"), arg("name"));
   module.def("check", &Check, arg("text"), arg("file"), arg("device"));
   module.def("verify", &Verify, arg("plan"), arg("file"));
 }

@@ -50,6 +50,7 @@ from ._explanation import (
     InputThatServes,
     PrimitiveExplanation,
 )
+from ._models import models
 from ._planner import version as __version__
 from ._relations import Clock, Relation
 from ._request import Output, Value
@@ -94,6 +95,7 @@ __all__ = [
     "compare",
     "devices",
     "explain",
+    "models",
     "plan",
     "verify",
 ]

@@ -1,0 +1,144 @@
+#!/usr/bin/env python3
+"""A generator for build tools with cores: a request in YAML becomes a core with a clock module.
+
+    vorkel_generator.py REQUEST.yml
+
+The request has `vlnv`, the name of the core, and `parameters`: the entries of a request (inputs,
+outputs, device and so on), and
+
+    name        of the module, "clocks" by default
+    language    verilog (default) or vhdl
+    simulation  whether the core has a target "sim", with a testbench and the models; yes by default
+
+It leaves in the current folder NAME.v or NAME.vhd, NAME.sdc and NAME.core, and for the target "sim"
+NAME_tb and the models, in models/. The exit status is 0; 1 when nothing serves the request; 2 when
+that is wrong, or a file cannot be written; 3 when the best plan misses a demand. Only with 0 there
+are files.
+"""
+
+import os
+import sys
+import tempfile
+
+import yaml
+
+import vorkel
+
+OWN = ("name", "language", "simulation")
+KINDS = {"verilog": (".v", "verilogSource"), "vhdl": (".vhd", "vhdlSource")}
+
+
+class WrongRequest(Exception):
+    """What is wrong with a file, as a sentence."""
+
+
+def read(path):
+    """The name of the core, what is the generator's own, and the request."""
+    try:
+        with open(path, encoding="utf-8") as stream:
+            document = yaml.safe_load(stream)
+    except (OSError, UnicodeDecodeError) as error:
+        raise WrongRequest(f"{path}: {getattr(error, 'strerror', None) or error}") from error
+    except yaml.YAMLError as error:
+        raise WrongRequest(f"{path}: {error}") from error
+    if not isinstance(document, dict) or not isinstance(document.get("parameters"), dict):
+        raise WrongRequest(f"{path}: there are no parameters")
+    core = document.get("vlnv")
+    if not isinstance(core, str) or not core:
+        raise WrongRequest(f"{path}: vlnv is missing, the name of the core")
+    request = dict(document["parameters"])
+    own = {key: request.pop(key) for key in OWN if key in request}
+    own.setdefault("name", "clocks")
+    own.setdefault("language", "verilog")
+    if own["language"] not in KINDS:
+        raise WrongRequest(f"{path}: language: {own['language']!r} must be verilog or vhdl")
+    if not isinstance(own["name"], str):
+        raise WrongRequest(f"{path}: name: {own['name']!r} is no name")
+    if not isinstance(own.setdefault("simulation", True), bool):
+        raise WrongRequest(f"{path}: simulation: {own['simulation']!r} must be true or false")
+    return core, own, request
+
+
+def core_file(core, name, language, simulation):
+    """The description of the core."""
+    ending, kind = KINDS[language]
+    filesets = {
+        "rtl": {"files": [name + ending], "file_type": kind},
+        "constraints": {"files": [name + ".sdc"], "file_type": "SDC"},
+    }
+    targets = {"default": {"filesets": ["rtl", "constraints"]}}
+    if simulation:
+        models = [f"models/{path.name}" for path in vorkel.models(language)]
+        filesets["simulation"] = {"files": [*models, f"{name}_tb{ending}"], "file_type": kind}
+        targets["sim"] = {
+            "default_tool": "icarus" if language == "verilog" else "ghdl",
+            "filesets": ["rtl", "simulation"],
+            "toplevel": f"{name}_tb",
+        }
+    body = {
+        "name": core,
+        "description": "Clocks, planned by vorkel",
+        "filesets": filesets,
+        "targets": targets,
+    }
+    return "CAPI=2:\n" + yaml.safe_dump(body, sort_keys=False)
+
+
+def generate(core, own, request):
+    """The plan, and the files of the core by their names."""
+    plan = vorkel.plan(request=request)
+    name, language = own["name"], own["language"]
+    write = plan.to_verilog if language == "verilog" else plan.to_vhdl
+    ending = KINDS[language][0]
+    files = {name + ending: write(name), name + ".sdc": plan.to_sdc()}
+    if own["simulation"]:
+        files[f"{name}_tb{ending}"] = plan.to_testbench(name, language=language)
+        for path in vorkel.models(language):
+            files[f"models/{path.name}"] = path.read_text(encoding="utf-8")
+    files[name + ".core"] = core_file(core, name, language, own["simulation"])
+    return plan, files
+
+
+def write_all(files):
+    """Writes all files or, when one cannot be written, none."""
+    written = []
+    try:
+        for name, text in files.items():
+            folder, base = os.path.split(name)
+            os.makedirs(folder or ".", exist_ok=True)
+            handle, path = tempfile.mkstemp(prefix=base + ".", dir=folder or ".")
+            written.append((path, name))
+            with os.fdopen(handle, "w", encoding="utf-8") as stream:
+                stream.write(text)
+            os.chmod(path, 0o644)
+        for path, name in written:
+            os.replace(path, name)
+    except OSError:
+        for path, _ in written:
+            if os.path.exists(path):
+                os.unlink(path)
+        raise
+
+
+def main(words):
+    if len(words) != 1:
+        print("usage: vorkel_generator.py REQUEST.yml", file=sys.stderr)
+        return 2
+    try:
+        plan, files = generate(*read(words[0]))
+        if not plan.within:
+            remarks = [*plan.answer.misses, *plan.answer.violations]
+            print("\n".join(remarks), file=sys.stderr)
+            return 3
+        write_all(files)
+    except vorkel.UnsolvedError as error:
+        print(error, file=sys.stderr)
+        return 1
+    except (WrongRequest, vorkel.VorkelError, OSError) as error:
+        print(error, file=sys.stderr)
+        return 2
+    return 0
+
+
+if __name__ == "__main__":
+    sys.exit(main(sys.argv[1:]))

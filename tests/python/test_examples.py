@@ -1,0 +1,176 @@
+"""The examples for Python flows and for build tools with cores."""
+
+import os
+import pathlib
+import re
+import shutil
+import subprocess
+import sys
+
+import pytest
+import yaml
+
+import vorkel
+
+EXAMPLES = pathlib.Path(os.environ["VORKEL_SOURCE_DIR"], "examples")
+GENERATOR = EXAMPLES / "core_generator/vorkel_generator.py"
+VIDEO = EXAMPLES / "core_generator/clocks.yml"
+
+
+def run(script, *words, cwd):
+    return subprocess.run(
+        [sys.executable, script, *words], cwd=cwd, capture_output=True, text=True
+    )
+
+
+def run_tool(*words, cwd):
+    """A simulator, without what the module under test needs loaded first."""
+    environment = {name: value for name, value in os.environ.items() if name != "LD_PRELOAD"}
+    return subprocess.run(words, cwd=cwd, capture_output=True, text=True, env=environment)
+
+
+def test_settings_are_those_of_the_module(tmp_path):
+    result = run(EXAMPLES / "python/clock_settings.py", "27", "148.5", "74.25", cwd=tmp_path)
+    assert result.returncode == 0, result.stderr
+    shown = dict(re.findall(r"^    [pio]_(\w+)='?(\w+)'?,$", result.stdout, re.MULTILINE))
+    module = vorkel.plan(27, [148.5, 74.25]).to_verilog()
+    written = dict(re.findall(r'\.(\w+)\("?(\w+)"?\)', module))
+    assert len(shown) > 10
+    assert {name: written[name] for name in shown} == shown
+    # 1000 / 148.5 is 6.734007.
+    assert re.search(r"^clk_out0: 6.734007 ns, ", result.stdout, re.MULTILINE)
+
+
+@pytest.mark.parametrize(
+    "words, status", [((), 2), (("27",), 2), (("27", "x"), 2), (("1kHz", "5GHz"), 1), (("27", "333"), 3)]
+)
+def test_settings_of_a_bad_request(tmp_path, words, status):
+    result = run(EXAMPLES / "python/clock_settings.py", *words, cwd=tmp_path)
+    assert result.returncode == status
+    assert "Traceback" not in result.stderr
+    assert bool(result.stderr) == (status in (1, 2))
+
+
+def core_of(folder, name):
+    lines = (folder / f"{name}.core").read_text().splitlines()
+    assert lines[0] == "CAPI=2:"
+    return yaml.safe_load("\n".join(lines[1:]))
+
+
+def files_of(core, target):
+    return [
+        path
+        for fileset in core["targets"][target]["filesets"]
+        for path in core["filesets"][fileset]["files"]
+    ]
+
+
+def generated(tmp_path, **parameters):
+    document = yaml.safe_load(VIDEO.read_text())
+    document["parameters"].update(parameters)
+    request = tmp_path / "request.yml"
+    request.write_text(yaml.safe_dump(document))
+    folder = tmp_path / "core"
+    folder.mkdir()
+    return run(GENERATOR, str(request), cwd=folder), folder
+
+
+def test_a_core_in_verilog_simulates(tmp_path):
+    result, folder = generated(tmp_path)
+    assert (result.returncode, result.stdout, result.stderr) == (0, "", "")
+    core = core_of(folder, "video_clocks")
+    assert core["name"] == "example:clocks:video:1.0"
+    assert files_of(core, "default") == ["video_clocks.v", "video_clocks.sdc"]
+    used = {path for target in core["targets"] for path in files_of(core, target)}
+    there = {str(path.relative_to(folder)) for path in folder.rglob("*") if path.is_file()}
+    assert there == used | {"video_clocks.core"}
+    plan = vorkel.plan(
+        "27 MHz", ["148.5MHz", vorkel.Output(74.25, phase=90), 27], input_jitter=50, device="vk40"
+    )
+    assert (folder / "video_clocks.v").read_text() == plan.to_verilog("video_clocks")
+    assert (folder / "video_clocks.sdc").read_text() == plan.to_sdc()
+    if not shutil.which("iverilog"):
+        pytest.skip("there is no iverilog")
+    top = core["targets"]["sim"]["toplevel"]
+    built = run_tool("iverilog", "-g2005", "-Wall", "-s", top, "-o", "sim", *files_of(core, "sim"), cwd=folder)
+    assert (built.returncode, built.stderr) == (0, "")
+    shown = run_tool("vvp", "-n", "sim", cwd=folder)
+    assert shown.returncode == 0 and "PASS" in shown.stdout, shown.stdout
+
+
+def test_a_core_in_vhdl_can_be_compiled_in_its_order(tmp_path):
+    result, folder = generated(tmp_path, language="vhdl", name="pixel")
+    assert result.returncode == 0, result.stderr
+    core = core_of(folder, "pixel")
+    assert core["filesets"]["rtl"] == {"files": ["pixel.vhd"], "file_type": "vhdlSource"}
+    if not shutil.which("ghdl"):
+        pytest.skip("there is no ghdl")
+    models = core["filesets"]["simulation"]["files"]
+    checked = run_tool("ghdl", "-s", "--std=08", *models[:1], cwd=folder)
+    assert checked.returncode == 0, checked.stderr
+    for path in [*models[:-1], "pixel.vhd", models[-1]]:
+        built = run_tool("ghdl", "-a", "--std=08", path, cwd=folder)
+        assert built.returncode == 0, f"{path}\n{built.stderr}"
+
+
+def test_a_core_without_a_simulation(tmp_path):
+    result, folder = generated(tmp_path, simulation=False)
+    assert result.returncode == 0
+    assert sorted(path.name for path in folder.iterdir()) == [
+        "video_clocks.core", "video_clocks.sdc", "video_clocks.v",
+    ]
+
+
+@pytest.mark.parametrize(
+    "parameters, status, said",
+    [
+        (dict(outputs=["148,5"]), 2, "decimal point"),
+        (dict(name="module"), 2, "module"),
+        (dict(name=3), 2, "name"),
+        (dict(language="c"), 2, "language"),
+        (dict(simulation="no"), 2, "simulation"),
+        (dict(colour="red"), 2, "colour"),
+        (dict(device="nothing"), 2, "nothing"),
+        (dict(inputs=["1kHz"], outputs=["5GHz"]), 1, "PLL"),
+        (dict(outputs=[333], tolerance=1), 3, "off by"),
+    ],
+)
+def test_a_bad_request_leaves_no_file(tmp_path, parameters, status, said):
+    result, folder = generated(tmp_path, **parameters)
+    assert result.returncode == status
+    assert said in result.stderr
+    assert "Traceback" not in result.stderr
+    assert list(folder.iterdir()) == []
+
+
+@pytest.mark.parametrize(
+    "text", [None, "", "- 1", "a: [", "vlnv: x", "vlnv: 3\nparameters: {}", "parameters: {}", "\x00"]
+)
+def test_a_file_that_is_no_request(tmp_path, text):
+    request = tmp_path / "request.yml"
+    if text is not None:
+        request.write_text(text)
+    folder = tmp_path / "core"
+    folder.mkdir()
+    result = run(GENERATOR, str(request), cwd=folder)
+    assert result.returncode == 2
+    assert "request.yml" in result.stderr
+    assert "Traceback" not in result.stderr
+    assert list(folder.iterdir()) == []
+
+
+def test_a_folder_that_cannot_be_written(tmp_path):
+    folder = tmp_path / "core"
+    folder.mkdir()
+    (folder / "video_clocks.sdc").mkdir()
+    result = run(GENERATOR, str(VIDEO), cwd=folder)
+    assert result.returncode == 2
+    assert "Traceback" not in result.stderr
+
+
+def test_models():
+    verilog = vorkel.models()
+    assert {path.name for path in verilog} >= {"VORKEL_PLL.v", "VORKEL_TSYN.v", "VORKEL_KRU_SP.v"}
+    assert len(vorkel.models("vhdl")) == len({path.name for path in vorkel.models("vhdl")}) > 5
+    with pytest.raises(vorkel.RequestError):
+        vorkel.models("c")
