@@ -42,6 +42,8 @@ class Finding:
     """The number that it is about."""
     range: Optional[Range]
     """What that may be."""
+    corner: Fraction
+    """By how many ppm the input is off where a limit is broken."""
     text: str
     """All of it as a sentence."""
 
@@ -56,6 +58,7 @@ class Finding:
             pin=data.get("pin"),
             value=exact_or_none(data, "value"),
             range=Range.or_none(data.get("range")),
+            corner=exact_or_none(data, "corner") or Fraction(0),
             text=data["text"],
         )
 
@@ -121,6 +124,10 @@ class Limits:
     pfd: Range
     largest_count: int
     """The most VCO periods for which a divider can hold its output high or low."""
+    vco_margin: Fraction
+    """The smallest distance from an end of the range, as a fraction of that end, with each input and
+    all of its tolerance; negative outside."""
+    pfd_margin: Fraction
 
 
 @dataclass(frozen=True)
@@ -166,6 +173,8 @@ class OutputAnswer:
     """MHz: what the engine counted with, where that differs."""
     range: Optional[Range]
     """The device's, MHz."""
+    margin: Fraction
+    """The smallest distance from an end of that, as a fraction of the end; negative outside."""
     within: bool
     """As asked for, and in the device's range."""
 
@@ -204,6 +213,7 @@ class OutputAnswer:
             jitter_rms=data.get("jitter_rms"),
             searched=data.get("search"),
             range=Range.or_none(data.get("range")),
+            margin=exact_or_none(data, "margin") or zero,
             within=data["within"],
         )
 
@@ -248,6 +258,8 @@ class Answer:
     outputs: Tuple[OutputAnswer, ...]
     input_jitter: float
     """ps: what the figures are for."""
+    input_tolerance: Fraction
+    """ppm: with which limits and margins are judged."""
     phase_error: Optional[float]
     """ps, between input and outputs."""
     worst_ppm: Fraction
@@ -280,6 +292,7 @@ class Answer:
             limits=_limits(data["limits"]),
             outputs=tuple(OutputAnswer.of(one) for one in data["outputs"]),
             input_jitter=data["input_jitter"],
+            input_tolerance=exact(data, "input_tolerance"),
             phase_error=data["phase_error"],
             worst_ppm=exact(data, "worst_ppm"),
             max_jitter=data["max_jitter"],
@@ -320,7 +333,13 @@ def _settings(data: Data) -> Union[LoopSettings, KruSettings]:
 def _limits(data: Optional[Data]) -> Optional[Limits]:
     if data is None:
         return None
-    return Limits(Range.of(data["vco"]), Range.of(data["pfd"]), data["largest_count"])
+    return Limits(
+        vco=Range.of(data["vco"]),
+        pfd=Range.of(data["pfd"]),
+        largest_count=data["largest_count"],
+        vco_margin=exact(data, "vco_margin"),
+        pfd_margin=exact(data, "pfd_margin"),
+    )
 
 
 def _ranking(data: Data) -> Ranking:

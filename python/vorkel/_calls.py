@@ -193,6 +193,7 @@ def plan(
     device: Optional[str] = None,
     primitive: Optional[str] = None,
     input_jitter: Optional[Value] = None,
+    input_tolerance: Optional[Value] = None,
     tolerance: Optional[Value] = None,
     phase_tolerance: Optional[Value] = None,
     duty_tolerance: Optional[Value] = None,
@@ -216,6 +217,8 @@ def plan(
     device: a part name or its beginning; vk40 by default.
     primitive: PLL, TSYN, KRU_SP or KRU_CLKGEN; all of the device by default.
     input_jitter: peak to peak, ps.
+    input_tolerance: how far the inputs can be off over temperature and age, ppm; all limits of the
+        device are kept with all of it.
     tolerance, phase_tolerance, duty_tolerance: how far frequencies, phases and duty cycles may be
         off where an output says nothing else: 100 ppm, 0.5 degrees and 0.5 percent points.
     max_jitter: the most jitter that an output may have, ps.

@@ -100,6 +100,26 @@ def test_a_request_as_a_dictionary_and_arguments_over_it():
     assert again.to_json() == plan.to_json()
 
 
+# A VCO of 1188 MHz, with a 27 MHz that is up to 1 % off, stays below 1440 MHz by 1440 - 1199.88.
+def test_tolerance_of_the_input(video):
+    plan = vorkel.plan(27, [148.5, 74.25, 27], input_tolerance="1%", int_div0=True)
+    assert plan.answer.input_tolerance == 10000
+    limits, settings = plan.answer.limits, plan.settings
+    most, least = Fraction(101, 100), Fraction(99, 100)
+    for value, of, margin in (
+        (settings.vco, limits.vco, limits.vco_margin),
+        (settings.pfd, limits.pfd, limits.pfd_margin),
+        *((one.actual, one.range, one.margin) for one in plan.outputs),
+    ):
+        low = (value * least - of.lowest) / of.lowest
+        high = (of.highest - value * most) / of.highest
+        assert margin == min(low, high)
+    assert plan.answer.ranking.margin == min(
+        limits.vco_margin, limits.pfd_margin, *(one.margin for one in plan.outputs)
+    )
+    assert video.answer.input_tolerance == 0
+
+
 # 100 MHz times 3 on CLKFX, doubled, and as it is with half a turn.
 def test_a_kru():
     plan = vorkel.plan(
