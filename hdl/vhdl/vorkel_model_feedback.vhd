@@ -45,7 +45,7 @@ begin
     session := state.locks;
     before := returned;
     from_edge := state.count;
-    wait until is_over;
+    wait on state until is_over;
     if state.locked and state.locks = session and returned = before then
       assert false report "no edge comes back at " & PIN severity error;
       missing <= true;

@@ -153,7 +153,7 @@ begin
     while ENABLE loop
       level <= '0';
       if not (state.locked and state.locks /= mine) then
-        wait until state.locked and state.locks /= mine;
+        wait on state until state.locked and state.locks /= mine;
       end if;
       mine := state.locks;
       session <= mine;
@@ -163,7 +163,7 @@ begin
       advance(START * SCALE);
       while is_mine loop
         if edges_between(state.count, cycle) > LEAD then
-          wait until not is_mine or edges_between(state.count, cycle) <= LEAD;
+          wait on state until not is_mine or edges_between(state.count, cycle) <= LEAD;
         end if;
         if is_mine then
           aim;
