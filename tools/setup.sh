@@ -48,7 +48,8 @@ packages_for() {
   printf '%s\n' g++ cmake ninja-build tcl8.6 tcl8.6-dev tcllib libtomlplusplus-dev \
     libboost-dev libcli11-dev libfmt-dev nlohmann-json3-dev
   case $1 in
-    tests) printf '%s\n' libgtest-dev libgmock-dev opensta parallel procps \
+    tests) printf '%s\n' libgtest-dev libgmock-dev opensta iverilog verilator make ghdl yosys \
+      parallel procps \
       pkg-config pybind11-dev python3-dev python3-pytest python3-yaml man-db ;;
     benchmarks) printf '%s\n' libbenchmark-dev ;;
     packages) printf '%s\n' pybind11-dev python3-dev dpkg-dev file ;;

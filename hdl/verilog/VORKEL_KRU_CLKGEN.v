@@ -47,6 +47,7 @@ module VORKEL_KRU_CLKGEN #(
   localparam integer FX_D = HAS_FX != 0 ? D : 1;
 
   wire [63:0] locks;
+  wire [63:0] unused_resets;
   wire [63:0] count;
   wire [63:0] stamp;
   wire [63:0] whole;
@@ -70,6 +71,7 @@ module VORKEL_KRU_CLKGEN #(
       .bad(clkfx_is_off || clkfxdv_is_off || is_wrong),
       .locked(LOCKED),
       .locks(locks),
+      .resets(unused_resets),
       .count(count),
       .stamp(stamp),
       .whole(whole),

@@ -79,6 +79,9 @@ module VORKEL_KRU_SP #(
   localparam integer FX_D = HAS_FX != 0 ? D : 1;
 
   wire [63:0] locks;
+  /* verilator lint_off UNUSEDSIGNAL */  // without feedback nothing looks at it
+  wire [63:0] resets;
+  /* verilator lint_on UNUSEDSIGNAL */
   wire [63:0] count;
   wire [63:0] stamp;
   wire [63:0] whole;
@@ -107,6 +110,7 @@ module VORKEL_KRU_SP #(
            clkdv_is_off || clkfx_is_off || is_wrong || has_no_feedback),
       .locked(LOCKED),
       .locks(locks),
+      .resets(resets),
       .count(count),
       .stamp(stamp),
       .whole(whole),
@@ -406,7 +410,7 @@ module VORKEL_KRU_SP #(
       is_wrong = 1'b1;
     end
     if (CLK_FEEDBACK != "NONE" && CLK_FEEDBACK != "1X" && CLK_FEEDBACK != "2X") begin
-      $display("ERROR: %m: CLK_FEEDBACK is %0s", CLK_FEEDBACK);
+      $display("ERROR: %m: CLK_FEEDBACK is none of NONE, 1X and 2X");
       is_wrong = 1'b1;
     end
   end
@@ -421,6 +425,7 @@ module VORKEL_KRU_SP #(
       reg [63:0] session;
       reg [63:0] returned_before;
       reg [63:0] from;
+      reg [63:0] resets_before;
 
       initial returned = 64'd0;
       initial forever begin
@@ -437,7 +442,8 @@ module VORKEL_KRU_SP #(
         if (LOCKED && locks == session && returned == returned_before) begin
           $display("ERROR: %m: no edge comes back at CLKFB, at %0d fs", $time);
           has_no_feedback = 1'b1;
-          wait (RST);
+          resets_before = resets;
+          wait (resets != resets_before);
           has_no_feedback = 1'b0;
         end
       end

@@ -20,6 +20,7 @@ module VORKEL_MODEL_INPUT #(
     input wire bad,
     output reg locked,
     output reg [63:0] locks,  // how many there have been
+    output reg [63:0] resets,
     output reg [63:0] count,  // of the latest edge
     output reg [63:0] stamp,  // its time, fs
     output reg [63:0] whole,  // the period: whole + rest / parts fs
@@ -56,6 +57,7 @@ module VORKEL_MODEL_INPUT #(
   initial begin
     locked = 1'b0;
     locks = 64'd0;
+    resets = 64'd0;
     count = 64'd0;
     stamp = 64'd0;
     whole = 64'd0;
@@ -118,6 +120,7 @@ module VORKEL_MODEL_INPUT #(
       good = 64'd0;
       edges = 64'd0;
       num = 64'd0;
+      if (rst) resets = resets + 64'd1;
       selected = select;
       stopped = stops;
     end else begin

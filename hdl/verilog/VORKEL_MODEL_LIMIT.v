@@ -3,7 +3,7 @@
 `ifndef SYNTHESIS
 `timescale 1fs/1fs
 module VORKEL_MODEL_LIMIT #(
-    parameter [8*10-1:0] WHAT = "clock",
+    parameter WHAT = "clock",
     parameter integer MUL = 1,  // how many times of the input
     parameter integer DIV = 1,
     parameter integer MIN_NUM = 0,

@@ -68,6 +68,7 @@ module VORKEL_MODEL_LOOP #(
   wire [31:0] planned_den = clkinsel ? CLKIN2_MHZ_DEN : CLKIN1_MHZ_DEN;
 
   wire [63:0] locks;
+  wire [63:0] resets;
   wire [63:0] count;
   wire [63:0] stamp;
   wire [63:0] whole;
@@ -92,6 +93,7 @@ module VORKEL_MODEL_LOOP #(
       .bad(vco_is_off || pfd_is_off || output_is_off != 7'd0 || is_wrong || has_no_feedback),
       .locked(locked),
       .locks(locks),
+      .resets(resets),
       .count(count),
       .stamp(stamp),
       .whole(whole),
@@ -195,25 +197,18 @@ module VORKEL_MODEL_LOOP #(
   integer phase;
   integer halves;
   reg is_fraction;
-
-  task refuse_output;
-    begin
-      $display("ERROR: %m: output %0d: divide %0d/8, phase %0d/8, high time %0d/2", at, divide,
-               phase, halves);
-      is_wrong = 1'b1;
-    end
-  endtask
+  reg is_off;
 
   // Fractions of eighths are those of a TSYN with up to five outputs; beside them nothing moves.
   task check_output;
     begin
-      if ((divide != 8 && divide < 16) || divide > 8 * LARGEST_DIVIDE) refuse_output;
-      if (divide % 8 != 0 && (at != 0 || IS_TSYN == 0 || used > 5)) refuse_output;
-      if (is_fraction && (phase != 0 || halves != 0)) refuse_output;
-      if (halves != 0 && divide == 8 && halves != 1) refuse_output;
-      if (halves != 0 && divide != 8 && (halves < 2 || halves > divide / 4 - 1)) refuse_output;
+      is_off = (divide != 8 && divide < 16) || divide > 8 * LARGEST_DIVIDE;
+      if (divide % 8 != 0 && (at != 0 || IS_TSYN == 0 || used > 5)) is_off = 1'b1;
+      if (is_fraction && (phase != 0 || halves != 0)) is_off = 1'b1;
+      if (halves != 0 && divide == 8 && halves != 1) is_off = 1'b1;
+      if (halves != 0 && divide != 8 && (halves < 2 || halves > divide / 4 - 1)) is_off = 1'b1;
       if (halves != 0 && MAX_COUNT != 0 && divide > 8 &&
-          (halves > 2 * MAX_COUNT + 1 || divide / 4 - halves > 2 * MAX_COUNT)) refuse_output;
+          (halves > 2 * MAX_COUNT + 1 || divide / 4 - halves > 2 * MAX_COUNT)) is_off = 1'b1;
     end
   endtask
 
@@ -235,7 +230,7 @@ module VORKEL_MODEL_LOOP #(
       is_wrong = 1'b1;
     end
     if (BANDWIDTH != "LOW" && BANDWIDTH != "HIGH" && BANDWIDTH != "OPTIMIZED") begin
-      $display("ERROR: %m: the bandwidth is %0s", BANDWIDTH);
+      $display("ERROR: %m: the bandwidth is none of LOW, HIGH and OPTIMIZED");
       is_wrong = 1'b1;
     end
     is_fraction = M_EIGHTHS % 8 != 0 || DIVIDES[2:0] != 3'd0;
@@ -243,7 +238,13 @@ module VORKEL_MODEL_LOOP #(
       divide = DIVIDES[32*at+:32];
       phase = PHASES[32*at+:32];
       halves = HIGHS[32*at+:32];
+      is_off = 1'b0;
       if (divide != 0) check_output;
+      if (is_off) begin
+        $display("ERROR: %m: output %0d: divide %0d/8, phase %0d/8, high time %0d/2", at, divide,
+                 phase, halves);
+        is_wrong = 1'b1;
+      end
     end
   end
 
@@ -254,6 +255,7 @@ module VORKEL_MODEL_LOOP #(
   reg [63:0] session;
   reg [63:0] returned_before;
   reg [63:0] from;
+  reg [63:0] resets_before;
 
   initial returned = 64'd0;
   initial forever begin
@@ -270,7 +272,8 @@ module VORKEL_MODEL_LOOP #(
     if (locked && locks == session && returned == returned_before) begin
       $display("ERROR: %m: no edge comes back at CLKFBIN, at %0d fs", $time);
       has_no_feedback = 1'b1;
-      wait (rst);
+      resets_before = resets;
+      wait (resets != resets_before);
       has_no_feedback = 1'b0;
     end
   end

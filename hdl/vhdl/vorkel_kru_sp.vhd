@@ -97,7 +97,7 @@ architecture simulation of VORKEL_KRU_SP is
       right := false;
     end if;
     if CLK_FEEDBACK /= "NONE" and CLK_FEEDBACK /= "1X" and CLK_FEEDBACK /= "2X" then
-      report "CLK_FEEDBACK is " & CLK_FEEDBACK severity error;
+      report "CLK_FEEDBACK is none of NONE, 1X and 2X" severity error;
       right := false;
     end if;
     return right;

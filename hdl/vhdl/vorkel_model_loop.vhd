@@ -115,7 +115,7 @@ architecture simulation of vorkel_model_loop is
       right := false;
     end if;
     if BANDWIDTH /= "LOW" and BANDWIDTH /= "HIGH" and BANDWIDTH /= "OPTIMIZED" then
-      report "the bandwidth is " & BANDWIDTH severity error;
+      report "the bandwidth is none of LOW, HIGH and OPTIMIZED" severity error;
       right := false;
     end if;
     for i in DIVIDES'range loop
@@ -193,7 +193,7 @@ begin
         generic map (
           START => (2 * PHASES(i)) mod (2 * DIVIDES(i)),
           PERIOD => 2 * DIVIDES(i),
-          HIGH => choose(HIGHS(i) /= 0, 8 * HIGHS(i), DIVIDES(i)),
+          HIGH => choose(HIGHS(i) /= 0 and not IS_WRONG, 8 * HIGHS(i), DIVIDES(i)),
           SCALE => D,
           DENOM => 2 * M_EIGHTHS,
           JITTER_RMS_FS => JITTER_RMS_FS,

@@ -117,9 +117,10 @@ string Course(const Bench& bench) {
          "    if (&is_done && is_wrong == 0) begin\n"
          "      $display(\"PASS\");\n"
          "      $finish;\n"
+         "    end else begin\n"
+         "      $display(\"FAIL\");\n"
+         "      $fatal(0);\n"
          "    end\n"
-         "    $display(\"FAIL\");\n"
-         "    $fatal(0);\n"
          "  end\n";
 }
 
