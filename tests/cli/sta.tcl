@@ -124,7 +124,8 @@ proc ::sta::run {plans} {
 
 # What differs between a plan and what the engine makes of it, as sentences. Beside what `run` needs,
 # a plan has relations (as in JSON) and form: "" for the usual constraints, "fifos" where all data
-# that needs a FIFO has one, "plain" for create_clock alone. Counts the pairs of clocks whose gap must
+# that needs a FIFO has one, "all" for these with the commands that usually are comments, and "plain"
+# for create_clock alone. Counts the pairs of clocks whose gap must
 # be exact, and the others, in the variables of that name.
 proc ::sta::differences {plan result exactPairs otherPairs} {
   upvar 1 $exactPairs exact_pairs $otherPairs other_pairs
@@ -171,10 +172,14 @@ proc ::sta::differences {plan result exactPairs otherPairs} {
           margin isLong exact
         lappend faults {*}[RelationDifferences $relation $steps [dict get $clocks $from] \
           [dict get $clocks $to] $edge $exact]
+        set shorter [expr {min([lindex [dict get $clocks $from] 0],
+          [lindex [dict get $clocks $to] 0]) / double($steps)}]
         if {[HasFifo $plan $relation]} {
-          set least [expr {min([lindex [dict get $clocks $from] 0],
-            [lindex [dict get $clocks $to] 0]) / double($steps)}]
+          set least $shorter
           set most $least
+        } elseif {[IsRelaxed $plan $relation]} {
+          set least [expr {$least + $shorter}]
+          set most [expr {$most eq "" ? "" : $most + $shorter}]
         }
         if {$gap < $least - $margin || ($most ne "" && $gap > $most + $margin)} {
           lappend faults "$from to $to, $edge: $gap ns, not $least to $most"
@@ -191,7 +196,8 @@ proc ::sta::differences {plan result exactPairs otherPairs} {
       } elseif {![dict exists $holds $from $to rise]} {
         lappend faults "$from to $to: no hold is checked"
       } elseif {$least eq $most && !$isLong} {
-        set hold [Hold $steps [dict get $clocks $from] [dict get $clocks $to]]
+        set hold [expr {[IsRelaxed $plan $relation] ? -[dict get $relation gap] :
+          [HoldSteps [dict get $clocks $from] [dict get $clocks $to]] / double($steps)}]
         set found [expr {[dict get $holds $from $to rise] + $uncertainty}]
         if {abs($found - $hold) > $margin} {
           lappend faults "$from to $to: a hold of $found ns, not $hold"
@@ -262,14 +268,20 @@ proc ::sta::Relation {plan from to} {
 
 # Whether there is a crossing that is said to go through a FIFO.
 proc ::sta::HasFifo {plan relation} {
-  return [expr {[dict get $plan form] eq "fifos" && $relation ne "" &&
+  return [expr {[dict get $plan form] in {fifos all} && $relation ne "" &&
     [dict get $relation crossing] eq "fifo"}]
+}
+
+# Whether data has a period of the faster clock more. The hold check is then at the near edge.
+proc ::sta::IsRelaxed {plan relation} {
+  return [expr {[dict get $plan form] eq "all" && $relation ne "" &&
+    [dict get $relation crossing] eq "relaxed"}]
 }
 
 # Whether no path between two clocks is timed: they follow different inputs of the primitive, or
 # have been said to be asynchronous.
 proc ::sta::AreApart {plan from to relation} {
-  return [expr {[AreExclusive $from $to] || ([dict get $plan form] eq "fifos" && $relation ne "" &&
+  return [expr {[AreExclusive $from $to] || ([dict get $plan form] in {fifos all} && $relation ne "" &&
     ![dict get $relation synchronous])}]
 }
 
@@ -314,10 +326,6 @@ proc ::sta::HoldSteps {from to} {
     set least [expr {min($least, ($rise + $k * $first - $toRise) % $second)}]
   }
   return $least
-}
-
-proc ::sta::Hold {steps from to} {
-  return [expr {[HoldSteps $from $to] / double($steps)}]
 }
 
 # What differs between clocks on a grid of steps and those of the engine.
