@@ -57,4 +57,10 @@ std::vector<Clock> ClocksOf(const Request& request, const Answer& answer) {
   return clocks;
 }
 
+Request Fastest(const Request& request) {
+  Request fastest = request;
+  for (Rational& input : fastest.inputs) input *= 1 + request.input_tolerance / 1000000;
+  return fastest;
+}
+
 }  // namespace planner::relations

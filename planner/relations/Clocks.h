@@ -34,6 +34,10 @@ struct Clock {
 // and then the same of the second input, where there is one.
 std::vector<Clock> ClocksOf(const Request& request, const Answer& answer);
 
+// The same request with inputs as fast as their tolerance lets them be: then all periods and all gaps
+// are at their shortest, each by the same part.
+Request Fastest(const Request& request);
+
 }  // namespace planner::relations
 
 #endif  // VORKEL_PLANNER_RELATIONS_CLOCKS_H_

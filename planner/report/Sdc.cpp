@@ -32,7 +32,11 @@ class Constraints {
  public:
   Constraints(const Request& request, const Device& device, const Answer& answer,
               const SdcOptions& options)
-      : request_(request), device_(device), answer_(answer), options_(options) {}
+      : request_(request),
+        timed_(relations::Fastest(request)),
+        device_(device),
+        answer_(answer),
+        options_(options) {}
 
   string Text() const;
 
@@ -50,8 +54,12 @@ class Constraints {
   const Rational& InputOf(int input) const {
     return request_.inputs[static_cast<std::size_t>(input)];
   }
+  const Rational& TimedInput(int input) const {
+    return timed_.inputs[static_cast<std::size_t>(input)];
+  }
 
   const Request& request_;
+  const Request timed_;  // what all periods and shifts are counted with
   const Device& device_;
   const Answer& answer_;
   const SdcOptions& options_;
@@ -67,7 +75,7 @@ string Constraints::Head() const {
     text += SdcComment("The outputs are up to " + Short(*answer_.phase_error, 6) +
                        " ps beside the phase of the input.");
   }
-  text += SdcOff(device_, answer_);
+  text += SdcTolerance(request_) + SdcOff(device_, answer_);
   text += "\n" + SdcComment("The names of the input ports and of the primitive in the design.");
   for (int n = 1; n <= Inputs(); ++n) {
     text += "set input_port_" + std::to_string(n) + " clk_in" + std::to_string(n) + "\n";
@@ -80,7 +88,7 @@ string Constraints::Input(int input) const {
   string text = SdcComment("Input " + n + ": " + SdcFigure(InputOf(input)) + " MHz, jitter " +
                            SdcFigure(request_.input_jitter) + " ps peak to peak");
   text += "create_clock -name clk_in" + n + " -period " +
-          SdcExact(Rational(1000) / InputOf(input)) + " [get_ports $input_port_" + n + "]\n";
+          SdcExact(Rational(1000) / TimedInput(input)) + " [get_ports $input_port_" + n + "]\n";
   if (request_.input_jitter > Rational(0)) {
     text +=
         "set_clock_uncertainty " + Half(request_.input_jitter) + " [get_clocks clk_in" + n + "]\n";
@@ -159,7 +167,7 @@ string Constraints::Generated(std::size_t index, int input) const {
   return "create_generated_clock -name " + ClockName(index, input) +
          " -source [get_ports $input_port_" + n + "] -master_clock clk_in" + n +
          (input > 0 ? " -add" : "") + " \\\n  " +
-         WaveformWords(answer_.outputs[index], InputOf(input)) + " \\\n  [get_pins $primitive/" +
+         WaveformWords(answer_.outputs[index], TimedInput(input)) + " \\\n  [get_pins $primitive/" +
          SdcPin(answer_, index) + "]\n";
 }
 
@@ -206,8 +214,8 @@ string Constraints::Text() const {
     if (answer_.outputs[i].used) text += Clock(i, &at);
   }
   if (Inputs() > 1) text += Groups();
-  return text + SdcInterclockUncertainties(request_, answer_) +
-         SdcCrossings(request_, answer_, options_);
+  return text + SdcInterclockUncertainties(timed_, answer_) +
+         SdcCrossings(timed_, answer_, options_);
 }
 
 }  // namespace

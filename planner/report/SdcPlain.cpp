@@ -28,10 +28,12 @@ string InputText(const Request& request, const Clock& clock) {
          Create(clock, name, "get_ports " + name);
 }
 
-string OutputText(const Answer& answer, const Clock& clock) {
+string OutputText(const Request& request, const Answer& answer, const Clock& clock) {
   const auto index = static_cast<std::size_t>(clock.output);
   const string number = std::to_string(clock.output);
-  string text = "Output " + number + ": " + SdcFigure(Rational(1000) / clock.period) + " MHz";
+  const Rational frequency =
+      request.inputs[static_cast<std::size_t>(clock.input)] * answer.outputs[index].ratio;
+  string text = "Output " + number + ": " + SdcFigure(frequency) + " MHz";
   if (!clock.also.empty()) {
     text += "; " + Outputs(clock.also) + (clock.also.size() > 1 ? " are" : " is") +
             " on the same pin";
@@ -56,10 +58,10 @@ string SdcPlain(const Request& request, const Device& device, const Answer& answ
     text += SdcComment("The outputs are as with input " + std::to_string(fastest + 1) +
                        ", the faster one.");
   }
-  text += SdcOff(device, answer);
-  for (const Clock& clock : relations::ClocksOf(request, answer)) {
+  text += SdcTolerance(request) + SdcOff(device, answer);
+  for (const Clock& clock : relations::ClocksOf(relations::Fastest(request), answer)) {
     if (clock.IsInput()) text += InputText(request, clock);
-    if (!clock.IsInput() && clock.input == fastest) text += OutputText(answer, clock);
+    if (!clock.IsInput() && clock.input == fastest) text += OutputText(request, answer, clock);
   }
   return text;
 }

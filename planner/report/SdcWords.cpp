@@ -51,6 +51,13 @@ string SdcSettings(const Request& request, const Device& device, const Answer& a
                     Join(words, ", "));
 }
 
+string SdcTolerance(const Request& request) {
+  if (request.input_tolerance == Rational(0)) return "";
+  return SdcComment("An input can be off by " + SdcFigure(request.input_tolerance) +
+                    " ppm: all periods and shifts are those of the fastest one, which is the worst "
+                    "case of every path. Frequencies in comments are as they are meant.");
+}
+
 string SdcOff(const Device& device, const Answer& answer) {
   if (answer.within) return "";
   string text = SdcComment("OFF: not everything is as asked for, or in the device's range.");

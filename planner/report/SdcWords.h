@@ -19,8 +19,10 @@ std::string SdcFigure(const Rational& value);
 // Lines of comment.
 std::string SdcComment(const std::string& sentence);
 
-// The first lines: the settings. And what is off, where something is.
+// The first lines: the settings; and what is off, where something is.
 std::string SdcSettings(const Request& request, const Device& device, const Answer& answer);
+// That clocks are as fast as the tolerance of the inputs lets them be; empty without a tolerance.
+std::string SdcTolerance(const Request& request);
 std::string SdcOff(const Device& device, const Answer& answer);
 
 // What the primitive is called in the design, where nobody says anything else, and its pin of an

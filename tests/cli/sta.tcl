@@ -123,10 +123,10 @@ proc ::sta::run {plans} {
 }
 
 # What differs between a plan and what the engine makes of it, as sentences. Beside what `run` needs,
-# a plan has relations (as in JSON) and form: "" for the usual constraints, "fifos" where all data
-# that needs a FIFO has one, "all" for these with the commands that usually are comments, and "plain"
-# for create_clock alone. Counts the pairs of clocks whose gap must
-# be exact, and the others, in the variables of that name.
+# a plan has relations (as in JSON), whose inputs are slower by the ratio scale, and form: "" for the
+# usual constraints, "fifos" where all data that needs a FIFO has one, "all" for these with the
+# commands that usually are comments, and "plain" for create_clock alone. Counts the pairs of clocks
+# whose gap must be exact, and the others, in the variables of that name.
 proc ::sta::differences {plan result exactPairs otherPairs} {
   upvar 1 $exactPairs exact_pairs $otherPairs other_pairs
   set answer [dict get $plan answer]
@@ -147,6 +147,9 @@ proc ::sta::differences {plan result exactPairs otherPairs} {
     set clocks [PlainClocks $clocks $inputs]
   }
   lappend faults {*}[ClockDifferences $steps $clocks [dict get $result clocks]]
+
+  # Steps in a nanosecond for the inputs of the relations.
+  set meant [::exact::over [list $steps 1] [dict get $plan scale]]
 
   set slacks [Slacks [dict get $result paths]]
   set holds [Slacks [dict get $result holds]]
@@ -170,7 +173,7 @@ proc ::sta::differences {plan result exactPairs otherPairs} {
         set gap [expr {[dict get $slacks $from $to $edge] + $uncertainty}]
         lassign [Bounds $steps [dict get $clocks $from] [dict get $clocks $to] $edge] least most \
           margin isLong exact
-        lappend faults {*}[RelationDifferences $relation $steps [dict get $clocks $from] \
+        lappend faults {*}[RelationDifferences $relation $meant [dict get $clocks $from] \
           [dict get $clocks $to] $edge $exact]
         set shorter [expr {min([lindex [dict get $clocks $from] 0],
           [lindex [dict get $clocks $to] 0]) / double($steps)}]
@@ -196,7 +199,9 @@ proc ::sta::differences {plan result exactPairs otherPairs} {
       } elseif {![dict exists $holds $from $to rise]} {
         lappend faults "$from to $to: no hold is checked"
       } elseif {$least eq $most && !$isLong} {
-        set hold [expr {[IsRelaxed $plan $relation] ? -[dict get $relation gap] :
+        set hold [expr {[IsRelaxed $plan $relation] ?
+          -[dict get $relation gap] * [lindex [dict get $plan scale] 1] /
+            [lindex [dict get $plan scale] 0] :
           [HoldSteps [dict get $clocks $from] [dict get $clocks $to]] / double($steps)}]
         set found [expr {[dict get $holds $from $to rise] + $uncertainty}]
         if {abs($found - $hold) > $margin} {
@@ -291,7 +296,8 @@ proc ::sta::Ratio {text} {
   return [list $a [expr {$b eq "" ? 1 : $b}]]
 }
 
-# What of a relation is not so. `exact` is the gap to an edge, in steps.
+# What of a relation is not so. `exact` is the gap to an edge, in steps, of which a nanosecond has the
+# ratio `steps`.
 proc ::sta::RelationDifferences {relation steps from to edge exact} {
   if {$relation eq "" || ![dict get $relation synchronous]} {
     return {}
@@ -299,17 +305,19 @@ proc ::sta::RelationDifferences {relation steps from to edge exact} {
   set name "[dict get $relation from] to [dict get $relation to]"
   set gap [dict get $relation [expr {$edge eq "rise" ? "gap_exact" : "gap_rise_fall_exact"}]]
   set faults {}
-  if {[Ratio $gap] ne [::exact::ratio $exact $steps]} {
-    lappend faults "$name, $edge: the relation has $gap ns, not [::exact::ratio $exact $steps]"
+  set right [::exact::over [list $exact 1] $steps]
+  if {[Ratio $gap] ne $right} {
+    lappend faults "$name, $edge: the relation has $gap ns, not $right"
   }
   set launches [dict get $relation launches]
   set captures [dict get $relation captures]
   set all [expr {$launches * [lindex $from 0]}]
   if {$all != $captures * [lindex $to 0] || [::exact::gcd $launches $captures] != 1 ||
-      [Ratio [dict get $relation hyperperiod_exact]] ne [::exact::ratio $all $steps]} {
+      [Ratio [dict get $relation hyperperiod_exact]] ne [::exact::over [list $all 1] $steps]} {
     lappend faults "$name: $launches and $captures edges in [dict get $relation hyperperiod] ns"
   }
-  if {[Ratio [dict get $relation hold_exact]] ne [::exact::ratio [HoldSteps $from $to] $steps]} {
+  if {[Ratio [dict get $relation hold_exact]] ne
+      [::exact::over [list [HoldSteps $from $to] 1] $steps]} {
     lappend faults "$name: the relation has a hold of [dict get $relation hold_exact] ns"
   }
   return $faults

@@ -69,5 +69,13 @@ TEST(Clocks, OutputsOnTheSamePinAreOne) {
   EXPECT_TRUE(clocks[2].also.empty());
 }
 
+// 10 percent more of 100 and of 75 MHz.
+TEST(Clocks, AreFastestWithTheTolerance) {
+  Request request = MadeRequest({100, 75}, {200});
+  EXPECT_EQ(Fastest(request).inputs, request.inputs);
+  request.input_tolerance = 100000;
+  EXPECT_EQ(Fastest(request).inputs, (std::vector<Rational>{110, Rational(165, 2)}));
+}
+
 }  // namespace
 }  // namespace planner::relations

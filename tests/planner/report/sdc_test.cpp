@@ -133,6 +133,34 @@ TEST(Sdc, TwoInputsAndTheJitterOfTheFirst) {
             std::string::npos);
 }
 
+// 80 MHz and a quarter more are 100 MHz.
+TEST(Sdc, TheToleranceOfTheInputShortensAllPeriods) {
+  Request request = MadeRequest({80}, {160, 80});
+  request.input_tolerance = 250000;
+  Answer answer = MadeLoop(request, Primitive::kPll, Bandwidth::kHigh, 80, 1, {40, 80}, 100);
+  answer.outputs[1].phase = 90;
+  const std::string text = Sdc(request, MadeDevice(), answer);
+  EXPECT_NE(text.find("# An input can be off by 250000 ppm: all periods and shifts are those of the\n"
+                      "#   fastest one, which is the worst case of every path. Frequencies in comments\n"
+                      "#   are as they are meant.\n"),
+            std::string::npos)
+      << text;
+  EXPECT_NE(text.find("# Input 1: 80 MHz, jitter"), std::string::npos);
+  EXPECT_NE(text.find("create_clock -name clk_in1 -period 10 "), std::string::npos);
+  EXPECT_NE(text.find("# Output 0: 160 MHz"), std::string::npos);
+  // A quarter of 10 ns.
+  EXPECT_NE(Clock(text, "clk_out1").find("-edges {1 2 3} -edge_shift {2.5 2.5 2.5}"),
+            std::string::npos)
+      << text;
+  SdcOptions options;
+  options.plain = true;
+  const std::string plain = Sdc(request, MadeDevice(), answer, options);
+  EXPECT_NE(plain.find("# An input can be off by 250000 ppm"), std::string::npos);
+  EXPECT_NE(plain.find("# Output 0: 160 MHz\ncreate_clock -name clk_out0 -period 5 -waveform {0 2.5}"),
+            std::string::npos)
+      << plain;
+}
+
 TEST(Sdc, OutputsOnTheSamePinAreOneClock) {
   const Request request = MadeRequest({100}, {150, 100, 150});
   KruSettings settings;
