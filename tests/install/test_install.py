@@ -6,9 +6,14 @@ import subprocess
 
 import pytest
 
-from conftest import BUILD, SOURCE, preloaded, run
+from conftest import BUILD, SOURCE, clean_environment, preloaded, run
 
 VERSION = os.environ["VORKEL_VERSION"]
+
+
+def failing(*words):
+    """The result of a command that may fail."""
+    return subprocess.run(words, capture_output=True, text=True, env=clean_environment(), cwd="/")
 
 
 def test_nothing_knows_the_build_tree(installed):
@@ -54,16 +59,12 @@ def test_the_program_knows_when_something_is_missing(installed, tmp_path):
     alone.mkdir()
     (alone / "vorkel").write_bytes((installed / "bin/vorkel").read_bytes())
     (alone / "vorkel").chmod(0o755)
-    result = subprocess.run(
-        [alone / "vorkel", "plan", "--in", "27", "--out", "27"], capture_output=True, text=True
-    )
+    result = failing(alone / "vorkel", "plan", "--in", "27", "--out", "27")
     assert result.returncode == 2
     assert "unknown device" in result.stderr
     request = tmp_path / "video.tcl"
     request.write_text("device vk40\ninput 27MHz\noutput 27\n")
-    result = subprocess.run(
-        [alone / "vorkel", "plan", "--request", request], capture_output=True, text=True
-    )
+    result = failing(alone / "vorkel", "plan", "--request", request)
     assert result.returncode == 4
     assert "tcl_request.tcl" in result.stderr
 
@@ -129,3 +130,12 @@ def test_documents_models_and_examples(installed):
             assert (installed / "share/vorkel/hdl" / path.relative_to(models)).exists()
     assert list((installed / "share/doc/vorkel/examples").rglob("*"))
     assert not list(installed.rglob("__pycache__"))
+
+
+def test_make_packages_says_what_is_wrong_with_its_words():
+    script = SOURCE / "tools/make_packages"
+    assert run(script, "--help").startswith("usage: tools/make_packages [FOLDER]\n")
+    for words in (["--frob"], ["one", "two"]):
+        result = failing(script, *words)
+        assert (result.returncode, result.stdout) == (2, "")
+        assert "usage: tools/make_packages" in result.stderr
