@@ -156,15 +156,22 @@ std::string Quoted(const std::string& word) {
 
 Call ReadCall(std::string_view command, const std::vector<std::string>& words,
               std::optional<planner::Primitive> primitive, const Setting& setting) {
+  const auto make = [&](const Given& given, const planner::read::Draft& draft,
+                        planner::read::Mistakes* mistakes) {
+    return Finish(draft, {primitive, given.Value("--request").value_or("")}, mistakes);
+  };
+  return ReadCall(command, words, 0, make, setting);
+}
+
+Call ReadCall(std::string_view command, const std::vector<std::string>& words,
+              std::size_t most_operands, const MakeReading& make, const Setting& setting) {
   Call call;
   call.command = command;
-  call.given = ReadWords(command, words);
+  call.given = ReadWords(command, words, most_operands);
   planner::read::Mistakes mistakes;
-  planner::read::Reader reader{primitive, ""};
   planner::read::Draft draft;
   if (const auto file = call.given.Value("--request")) {
     draft = ReadRequestFile(*file, setting, &mistakes);
-    reader.file = *file;
   }
   const std::vector<Option> options = OfRequest(call.given);
   draft = Over(planner::read::ReadOptions(options, &mistakes), draft);
@@ -176,7 +183,7 @@ Call ReadCall(std::string_view command, const std::vector<std::string>& words,
   if (call.file.empty() && call.given.Has("-o")) {
     complaints.Add("-o: the name of the file is empty");
   }
-  std::optional<planner::read::Reading> reading = Finish(draft, reader, &mistakes);
+  std::optional<planner::read::Reading> reading = make(call.given, draft, &mistakes);
   for (const planner::read::Mistake& mistake : mistakes) complaints.Add(mistake);
   complaints.Throw();
   call.reading = std::move(*reading);

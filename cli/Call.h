@@ -4,6 +4,8 @@
 #ifndef VORKEL_CLI_CALL_H_
 #define VORKEL_CLI_CALL_H_
 
+#include <cstddef>
+#include <functional>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -42,6 +44,14 @@ struct Call {
 // all that is wrong at once.
 Call ReadCall(std::string_view command, const std::vector<std::string>& words,
               std::optional<planner::Primitive> primitive, const Setting& setting);
+
+// How a command that has more to read makes its request of what options and --request say. What is
+// wrong is added to the mistakes, and there is nothing then.
+using MakeReading = std::function<std::optional<planner::read::Reading>(
+    const Given& given, const planner::read::Draft& draft, planner::read::Mistakes* mistakes)>;
+// The same for such a command, with at most so many words that are no options.
+Call ReadCall(std::string_view command, const std::vector<std::string>& words,
+              std::size_t most_operands, const MakeReading& make, const Setting& setting);
 
 // The value of an option that is a whole number from `lowest` to `highest`, nothing when it was not
 // given. Throws Failure.

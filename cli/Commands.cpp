@@ -4,6 +4,7 @@
 #include "cli/CheckCommand.h"
 #include "cli/DevicesCommand.h"
 #include "cli/EngineCommand.h"
+#include "cli/EvaluateCommand.h"
 #include "cli/ExplainCommand.h"
 #include "cli/Help.h"
 #include "cli/PlanCommand.h"
@@ -52,6 +53,13 @@ constexpr Command kCommands[] = {
      "exit status is that of the worst: 4 when the program failed, 2 with a line that is wrong, 1 "
      "with one that is unsolved, 3 with one that is off, else 0.",
      false, RunBatch},
+    {"evaluate", "--in F[,F2] --m M --d D --divide LIST [FILE] [OPTION...]",
+     "say what settings of your own make", "--in 27 --m 44 --d 1 --divide 8,16,44",
+     "FILE is a plan as --format json writes it, perhaps edited: its settings and its request count, "
+     "its figures do not; - is standard input. Options replace what it says. Without --out there is "
+     "nothing to compare the frequencies with. Settings that the primitive cannot have are refused; "
+     "those that break a limit of the device end with exit status 3.",
+     true, RunEvaluate},
     {"devices", "[NAME]", "list the devices, or all limits of one", "vk40",
      "NAME is a device, or a part name with package and grade; the beginning is enough where only "
      "one goes on like it.",

@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "cli/Commands.h"
+#include "planner/read/Settings.h"
 
 namespace cli {
 
@@ -16,7 +17,7 @@ constexpr std::pair<std::string_view, std::string_view> kGroups[] = {
     {"loop", "tsyn pll"},
     {"krus", "kru clkgen"},
     {"single", "tsyn pll kru clkgen"},
-    {"written", "plan best relations tsyn pll kru clkgen"},
+    {"written", "plan best relations tsyn pll kru clkgen evaluate"},
 };
 
 constexpr OptionRow kRows[] = {
@@ -25,19 +26,27 @@ constexpr OptionRow kRows[] = {
      "errors are for the first"},
     {"--in", "F", "krus", "input frequency"},
     {"--out", "LIST", "loops", "frequencies of 1 to 7 outputs; - for one that is not used"},
+    {"--in", "F[,F2]", "evaluate",
+     "input frequency; F2 is that of a second input clock, with which all limits count, too"},
+    {"--out", "LIST", "evaluate",
+     "frequencies to compare with, one for each output; - for one that is not asked for"},
     {"--out", "LIST", "krus", "frequencies of 1 to 6 outputs; - for one that is not used"},
-    {"--phase", "LIST", "any", "phase of each output; - where any will do"},
-    {"--duty", "LIST", "loops", "duty cycle of each output; - or 0 where any will do"},
+    {"--phase", "LIST", "any evaluate", "phase of each output; - where any will do"},
+    {"--duty", "LIST", "loops evaluate", "duty cycle of each output; - or 0 where any will do"},
     {"--any-order", "", "planning batch",
      "outputs may change places, where not all places can make a frequency"},
-    {"--device", "NAME", "any batch", "DEVICE[PACKAGE][-GRADE] or its beginning; vk40 by default"},
+    {"--device", "NAME", "any batch evaluate", "DEVICE[PACKAGE][-GRADE] or its beginning; vk40 by default"},
     {"--primitive", "NAME", "planning batch", "auto (default), PLL, TSYN, KRU_SP or KRU_CLKGEN"},
+    {"--primitive", "NAME", "evaluate",
+     "PLL, TSYN, KRU_SP or KRU_CLKGEN; TSYN by default, with --pins KRU_SP, or KRU_CLKGEN where "
+     "CLKFXDV is among them"},
     {"--engine", "", "plan compare explain relations batch",
      "only what the design flow's own search answers, not all settings"},
     {"--bandwidth", "NAME", "planning batch", "LOW, HIGH or OPTIMIZED; of the loop, all by default"},
     {"--bandwidth", "NAME", "loop",
      "LOW, HIGH or OPTIMIZED (default); with LOW, the maximum of the PFD is lower"},
-    {"--low-bandwidth", "", "loops batch", "short for --bandwidth LOW"},
+    {"--bandwidth", "NAME", "evaluate", "LOW, HIGH or OPTIMIZED (default); of the loop"},
+    {"--low-bandwidth", "", "loops batch evaluate", "short for --bandwidth LOW"},
     {"--rank", "NAME", "planning batch",
      "jitter (default), error, margin or vco; what counts first among settings that meet all "
      "demands: the least jitter, the smallest error, the largest margin to the device's limits or "
@@ -49,21 +58,36 @@ constexpr OptionRow kRows[] = {
     {"--int-div0", "", "tsyn", "a whole divider for output 0"},
     {"--feedback", "", "planning batch", "a KRU_SP only with its feedback connected; both by default"},
     {"--feedback", "", "kru", "use the feedback, without which there are only CLKFX pins"},
-    {"--input-jitter", "PS", "any batch", "peak-to-peak jitter of the input clock, 0 by default"},
-    {"--input-tolerance", "PPM", "any batch",
+    {"--feedback", "", "evaluate", "of a KRU_SP: the feedback is connected"},
+    {"--input-jitter", "PS", "any batch evaluate", "peak-to-peak jitter of the input clock, 0 by default"},
+    {"--input-tolerance", "PPM", "any batch evaluate",
      "how far the input can be off over temperature and age, 0 by default; every limit of the "
      "device has to be kept with all of it"},
-    {"--tolerance", "PPM", "any batch",
+    {"--tolerance", "PPM", "any batch evaluate",
      "how far a frequency may be off, 100 by default; a list has one for each output, and so has "
      "that of the next options"},
-    {"--exact", "", "any batch", "short for --tolerance 0"},
-    {"--phase-tolerance", "DEG", "any batch", "how far a phase may be off, 0.5 by default"},
-    {"--duty-tolerance", "POINTS", "loops batch", "how far a duty cycle may be off, 0.5 by default"},
-    {"--max-jitter", "PS", "any batch", "the most jitter that an output may have, peak to peak"},
+    {"--exact", "", "any batch evaluate", "short for --tolerance 0"},
+    {"--phase-tolerance", "DEG", "any batch evaluate", "how far a phase may be off, 0.5 by default"},
+    {"--duty-tolerance", "POINTS", "loops batch evaluate", "how far a duty cycle may be off, 0.5 by default"},
+    {"--max-jitter", "PS", "any batch evaluate", "the most jitter that an output may have, peak to peak"},
     {"--pick", "N", "plan compare best relations", "the candidate to take, by its number in compare"},
     {"--front", "N", "best", "trade-offs to show, the best settings as the first; 6 by default"},
     {"--oscillators", "LIST", "explain", "input frequencies to try instead of stock oscillators"},
-    {"--request", "FILE", "any", "take from a file what no option says; - is standard input"},
+    {"--m", "M", "evaluate", "M; of a TSYN in steps of 1/8, as 41.625"},
+    {"--d", "D", "evaluate", "D"},
+    {"--divide", "LIST", "evaluate",
+     "divider of each output, - for one that is not used; that of output 0 of a TSYN in steps of "
+     "1/8. Of a KRU the divide of CLKDV or CLKFXDV"},
+    {"--phase-steps", "LIST", "evaluate", "phase of each output, in eighths of a VCO period"},
+    {"--set-phase", "LIST", "evaluate", "the same in degrees, each of them on a step"},
+    {"--high-times", "LIST", "evaluate",
+     "how long each output is high, in halves of a VCO period; - for 50 %"},
+    {"--set-duty", "LIST", "evaluate", "the same in percent, each of them a whole number of halves"},
+    {"--pins", "LIST", "evaluate", "pin of each output of a KRU, - for one that is not used"},
+    {"--divide-by-2", "", "evaluate", "of a KRU_SP: CLKIN_DIVIDE_BY_2"},
+    {"--phase-shift", "N", "evaluate", "of a KRU_SP: PHASE_SHIFT, 0 to 255"},
+    {"--pick", "N", "evaluate", "the answer of the plan to take, by its number; the first by default"},
+    {"--request", "FILE", "any evaluate", "take from a file what no option says; - is standard input"},
     {"--format", "NAME", "written",
      "text (default), json, tcl, sdc, sdc-plain, verilog, vhdl or testbench"},
     {"--format", "NAME", "compare",
@@ -87,7 +111,7 @@ constexpr OptionRow kRows[] = {
     {"--name", "NAME", "written compare",
      "of the module or entity, with --format verilog, vhdl or testbench; clocks by default"},
     {"--language", "NAME", "written compare", "verilog (default) or vhdl; of --format testbench"},
-    {"-o", "FILE", "any batch", "write to a file; - is standard output"},
+    {"-o", "FILE", "any batch evaluate", "write to a file; - is standard output"},
     {"--trace", "", "single",
      "print first what the engine itself tells of its search, a line for each step; text format "
      "only"},
@@ -95,7 +119,7 @@ constexpr OptionRow kRows[] = {
 
 // Why some commands have no use for an option, and what to do.
 struct Reason {
-  std::string_view option;
+  std::string_view option;  // or several, with blanks between
   std::string_view commands;
   std::string_view sentence;
 };
@@ -113,6 +137,8 @@ constexpr Reason kReasons[] = {
     {"--rank", "single", "the engine ranks its settings itself; use plan"},
     {"--any-order", "single", "the engine takes the outputs as they come; use plan"},
     {"--engine", "single", "the command asks the engine anyway"},
+    {"--rank --any-order --engine --prefer-max-vco --int-div0 --front", "evaluate",
+     "nothing is chosen where all settings are there"},
     {"--engine", "best", "best searches all settings; use plan"},
     {"--gap", "compare explain", "it is about the clocks of one plan; use relations"},
     {"--pick", "single explain", "only plan, compare, best and relations have candidates to pick"},
@@ -179,7 +205,7 @@ bool IsSwitch(std::string_view option) {
 
 std::string_view ReasonAgainst(std::string_view command, std::string_view option) {
   for (const Reason& reason : kReasons) {
-    if (reason.option == option && Means(reason.commands, command)) return reason.sentence;
+    if (Has(reason.option, option) && Means(reason.commands, command)) return reason.sentence;
   }
   return "";
 }
@@ -188,6 +214,7 @@ std::optional<ValueFacts> ValueOf(std::string_view option) {
   if (option == "--oscillators") return {{planner::read::ValueKind::kFrequency, true}};
   if (option == "--gap") return {{planner::read::ValueKind::kGap, false}};
   const planner::read::OptionFacts* facts = planner::read::FindOption(option);
+  if (!facts) facts = planner::read::FindSettingOption(option);
   if (!facts || !facts->kind) return std::nullopt;
   return {{*facts->kind, facts->is_list}};
 }

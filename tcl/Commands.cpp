@@ -20,7 +20,8 @@ struct Entry {
 
 constexpr Entry kEntries[] = {
     {"::vorkel::plan", Plan},       {"::vorkel::compare", Compare}, {"::vorkel::best", Best},
-    {"::vorkel::explain", Explain}, {"::vorkel::devices", Devices}, {"::vorkel::check", Check},
+    {"::vorkel::explain", Explain}, {"::vorkel::evaluate", Evaluate},
+    {"::vorkel::devices", Devices}, {"::vorkel::check", Check},
     {"::vorkel::relations", Relations},
 };
 

@@ -26,6 +26,9 @@ std::string Relations(Words words);
 // vorkel::explain ?request? ?-option value ...? ?-oscillators list?
 //   What is in the way of a request, and what would do.
 std::string Explain(Words words);
+// vorkel::evaluate ?request? ?-option value ...? ?-m M? ?-d D? ?-divide list? ?-json text? ...
+//   What settings make: those of options, or of a plan in JSON.
+std::string Evaluate(Words words);
 // vorkel::devices ?name?
 //   The devices that there are, or one of them with its limits.
 std::string Devices(Words words);

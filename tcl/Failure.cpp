@@ -5,6 +5,7 @@
 #include <utility>
 
 #include "planner/read/Options.h"
+#include "planner/read/Settings.h"
 #include "planner/report/ErrorData.h"
 #include "planner/report/TclDict.h"
 #include "tcl/Objects.h"
@@ -20,9 +21,13 @@ using std::string;
 
 // Options have one dash here, alone and in sentences.
 string WithOneDash(string text) {
-  for (const planner::read::OptionFacts& facts : planner::read::RequestOptions()) {
-    for (std::size_t i = text.find(facts.name); i != string::npos; i = text.find(facts.name, i)) {
-      text.erase(i, 1);
+  for (const auto options :
+       {planner::read::RequestOptions(), planner::read::SettingOptions()}) {
+    for (const planner::read::OptionFacts& facts : options) {
+      for (std::size_t i = text.find(facts.name); i != string::npos;
+           i = text.find(facts.name, i)) {
+        text.erase(i, 1);
+      }
     }
   }
   return text;

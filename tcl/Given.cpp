@@ -48,9 +48,7 @@ class Reader {
     while (place_ < words_.size()) ReadOption();
     const Draft options = planner::read::ReadOptions(options_, &mistakes_);
     if (!mistakes_.empty()) throw Failure::OfMistakes(mistakes_);
-    auto reading = planner::read::Finish(planner::read::Over(options, draft), {}, &mistakes_);
-    if (!reading) throw Failure::OfMistakes(mistakes_);
-    given_.reading = std::move(*reading);
+    given_.draft = planner::read::Over(options, draft);
     return std::move(given_);
   }
 
@@ -113,6 +111,8 @@ class Reader {
   Given given_;
 };
 
+}  // namespace
+
 planner::Device DeviceOf(const planner::read::Reading& reading) {
   try {
     const auto files = DeviceFiles();
@@ -132,8 +132,6 @@ planner::Device DeviceOf(const planner::read::Reading& reading) {
   }
 }
 
-}  // namespace
-
 std::size_t Given::Count(std::string_view name, std::size_t lowest, std::size_t usual) const {
   const auto found = own.find(name);
   if (found == own.end()) return usual;
@@ -149,8 +147,16 @@ std::size_t Given::Count(std::string_view name, std::size_t lowest, std::size_t 
                              std::to_string(kMostCount));
 }
 
+Given ReadDraft(Words words, std::initializer_list<std::string_view> own) {
+  return Reader(words, own).Read();
+}
+
 Given ReadGiven(Words words, std::initializer_list<std::string_view> own) {
-  Given given = Reader(words, own).Read();
+  Given given = ReadDraft(words, own);
+  Mistakes mistakes;
+  auto reading = planner::read::Finish(given.draft, {}, &mistakes);
+  if (!reading) throw Failure::OfMistakes(mistakes);
+  given.reading = std::move(*reading);
   given.device = DeviceOf(given.reading);
   return given;
 }

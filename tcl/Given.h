@@ -22,6 +22,7 @@ using Words = std::span<Tcl_Obj* const>;
 
 // A request and the device that it is for.
 struct Given {
+  planner::read::Draft draft;  // what both say, before a request is made of it
   planner::read::Reading reading;
   planner::Device device;
   // The options of the command itself, without their dash: "pick".
@@ -36,6 +37,12 @@ struct Given {
 // can stand without its value. `own` are the names of options that are not of a request. Throws
 // Failure.
 Given ReadGiven(Words words, std::initializer_list<std::string_view> own);
+
+// The same without making a request of it: `reading` and `device` are not there.
+Given ReadDraft(Words words, std::initializer_list<std::string_view> own);
+
+// The device that a request is for, which has its primitive. Throws Failure.
+planner::Device DeviceOf(const planner::read::Reading& reading);
 
 }  // namespace tcl
 

@@ -21,6 +21,7 @@ enum class ValueKind {
   kJitter,          // ps
   kTolerance,       // ppm
   kInputTolerance,  // ppm
+  kNumber,          // without unit
   kPhaseTolerance,  // degrees
   kDutyTolerance,   // percent points
   kMaxJitter,       // ps
@@ -66,8 +67,15 @@ enum class MistakeKind {
   kContradiction,    // with the option or entry `other`, whose value is `text`
   kTwice,            // an option
   kOtherPrimitive,   // the request is for a `text`, the command for a `primitive`
+  // Settings.
+  kNoSetting,        // text is no `other`; hint: what it can be
+  kNotOfPrimitive,   // the `primitive` has no such setting
+  kUnset,            // output `count` has no divider or pin, `other`, but is asked for
+  kNotAPlan,         // a JSON text without answers, or an answer without settings
+  kNoAnswer,         // no answer of the plan has the number `count`
   // A request as a whole.
-  kMissing,          // place.entry: what is not said, as an option; file: what does not say it
+  kMissing,          // place.entry: what is not said, as an option; file: what does not say it;
+                     // hint: of settings, what it is
   kUnknownEntry,     // text; known: those there are
   kUnknownOption,    // text; known: those there are
   // JSON and TOML.

@@ -37,6 +37,8 @@ KindText TextOf(ValueKind kind) {
     case ValueKind::kInputTolerance:
       return {"a tolerance of the input", "50, 50ppm or 0.005%", "ppm, ppb and %",
               "0 to 100000 ppm", "ppm"};
+    case ValueKind::kNumber:
+      return {"a number", "44 or 41.625", "", "", ""};
     case ValueKind::kPhaseTolerance:
       return {"a tolerance of a phase", "0.5, 0.5deg or 5", "deg", "0 to 360 degrees", "degrees"};
     case ValueKind::kDutyTolerance:
@@ -125,6 +127,7 @@ std::string Outputs(int count) {
 // "--in is missing: the input frequency, such as --in 100". A line of a batch has no options beside
 // it: its place says so.
 std::string MissingText(const Mistake& mistake) {
+  if (!mistake.hint.empty()) return fmt::format("{} is missing: {}", mistake.place.entry, mistake.hint);
   if (mistake.place.line > 0) {
     return fmt::format("{}:{}: the request has no {}", ShownWhole(mistake.place.file),
                        mistake.place.line, mistake.place.entry);
@@ -188,6 +191,7 @@ std::string ValueText(const Mistake& mistake) {
     case MistakeKind::kOutOfRange:
       return fmt::format("{} is out of range: {} is from {}", shown, kind.article, kind.bounds);
     case MistakeKind::kUnknownUnit:
+      if (kind.units.empty()) return fmt::format("\"{}\" is a number with a unit", shown);
       return fmt::format("unknown unit \"{}\" in \"{}\"; the units of {} are {}",
                          Shown(mistake.other), shown, kind.article, kind.units);
     case MistakeKind::kOtherUnit:
@@ -238,6 +242,24 @@ std::string ListText(const Mistake& mistake) {
     case MistakeKind::kOtherPrimitive:
       return fmt::format("the request is for a {}, this command for a {}", mistake.text,
                          hardware::Name(*mistake.primitive));
+    default:
+      return "";
+  }
+}
+
+// What is wrong with settings.
+std::string SettingText(const Mistake& mistake) {
+  switch (mistake.kind) {
+    case MistakeKind::kNoSetting:
+      return fmt::format("{} is no {}: {}", Shown(mistake.text), mistake.other, mistake.hint);
+    case MistakeKind::kNotOfPrimitive:
+      return fmt::format("a {} has no such setting", hardware::Name(*mistake.primitive));
+    case MistakeKind::kUnset:
+      return fmt::format("output {} has no {}, but is asked for", mistake.count, mistake.other);
+    case MistakeKind::kNotAPlan:
+      return "no plan with settings, such as --format json writes";
+    case MistakeKind::kNoAnswer:
+      return fmt::format("the plan has no answer with number {}", mistake.count);
     default:
       return "";
   }
@@ -294,6 +316,7 @@ std::string TextOf(const Mistake& mistake) {
   if (!text.empty()) return text;
   text = ValueText(mistake);
   if (text.empty()) text = ListText(mistake);
+  if (text.empty()) text = SettingText(mistake);
   if (text.empty()) text = FileText(mistake);
   const std::string place = TextOf(mistake.place);
   if (mistake.kind == MistakeKind::kWrongType && !mistake.place.entry.empty()) {

@@ -52,6 +52,8 @@ std::span<const Unit> UnitsOf(ValueKind kind) {
     case ValueKind::kTolerance:
     case ValueKind::kInputTolerance:
       return kToleranceUnits;
+    case ValueKind::kNumber:
+      return {};
     case ValueKind::kJitter:
     case ValueKind::kMaxJitter:
       break;
@@ -100,6 +102,8 @@ NumberDemand DemandOn(const Rational& value, ValueKind kind) {
     case ValueKind::kPhaseTolerance:
     case ValueKind::kDutyTolerance:
       break;
+    case ValueKind::kNumber:
+      return NumberDemand::kNone;
     case ValueKind::kGap:
       if (value > kGapMillisecond) return NumberDemand::kAtMostOneMs;
       return value > 0 ? NumberDemand::kNone : NumberDemand::kAboveZero;

@@ -95,7 +95,8 @@ string JitterCell(const std::optional<double>& jitter) { return jitter ? Ps(*jit
 string SourceCell(const Answer& answer) {
   if (!answer.solved) return kNone;
   if (answer.source.engine && answer.source.search) return "both";
-  return answer.source.engine ? "engine" : "search";
+  if (answer.source.engine) return "engine";
+  return answer.source.search ? "search" : "given";
 }
 
 std::vector<string> OffWords(const Answer& answer) {

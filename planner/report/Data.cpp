@@ -199,15 +199,6 @@ ordered_json LimitsData(const Device& device, const Answer& answer) {
   return data;
 }
 
-// The range of an output: of a KRU that of its pin, which depends on where output 0 is.
-Range OutputRange(const Device& device, const Settings& settings, std::size_t index) {
-  if (const auto* loop = std::get_if<LoopSettings>(&settings)) {
-    return device.Loop(loop->primitive).OutputOf(static_cast<int>(index));
-  }
-  const auto& kru = std::get<KruSettings>(settings);
-  return device.Pins(kru.primitive).Of(kru.pins[index], kru.pins[0] == hardware::Pin::kClk2x);
-}
-
 ordered_json WholeNumber(const string& digits) { return std::int64_t{std::stoll(digits)}; }
 
 // Where an output is, in whole numbers.

@@ -62,6 +62,16 @@ string NameOf(MistakeKind kind) {
       return "twice";
     case MistakeKind::kOtherPrimitive:
       return "other_primitive";
+    case MistakeKind::kNoSetting:
+      return "no_setting";
+    case MistakeKind::kNotOfPrimitive:
+      return "not_of_primitive";
+    case MistakeKind::kUnset:
+      return "unset";
+    case MistakeKind::kNotAPlan:
+      return "not_a_plan";
+    case MistakeKind::kNoAnswer:
+      return "no_answer";
     case MistakeKind::kMissing:
       return "missing";
     case MistakeKind::kUnknownEntry:

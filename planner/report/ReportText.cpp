@@ -31,6 +31,8 @@ class Report {
   // The frequencies with the second input; empty without one. One table with the above would be
   // wider than a terminal.
   string Second() const;
+  // The limits of the device with their margins, where these count; else empty.
+  string Limits(const Device& device) const;
   // Phases and duty cycles, each if it was asked for or is not as usual; empty without any.
   string Shapes() const;
 
@@ -84,18 +86,27 @@ string Report::Table(std::vector<Column> columns, const std::function<Row(std::s
 
 string Report::Outputs() const {
   const bool has_jitter = HasJitter(answer_);
+  bool has_asked = false;
+  for (const Output& output : request_.outputs) {
+    has_asked = has_asked || (output.used && output.asked);
+  }
   std::vector<Column> columns = {
-      IsLoop(answer_.primitive) ? Column{Align::kRight, "divider"} : Column{Align::kLeft, "pin"},
-      {Align::kRight, "requested MHz"},
-      {Align::kRight, "actual MHz"},
-      {Align::kRight, "error ppm"}};
+      IsLoop(answer_.primitive) ? Column{Align::kRight, "divider"} : Column{Align::kLeft, "pin"}};
+  if (has_asked) columns.push_back({Align::kRight, "requested MHz"});
+  columns.push_back({Align::kRight, "actual MHz"});
+  if (has_asked) columns.push_back({Align::kRight, "error ppm"});
   if (has_jitter) columns.push_back({Align::kRight, "jitter ps"});
   const auto row_of = [&](std::size_t i) {
     const OutputAnswer& output = answer_.outputs[i];
     const auto place = static_cast<int>(i);
-    Row row{{Place(answer_.settings, place),
-             Fixed(RequestedAt(request_, answer_, place).frequency, kFrequencyDecimals),
-             Fixed(output.frequency, kFrequencyDecimals), Fixed(output.error_ppm, 2)}};
+    const Output& asked = RequestedAt(request_, answer_, place);
+    Row row{{Place(answer_.settings, place)}};
+    const auto add_asked = [&](const Rational& value, int decimals) {
+      if (has_asked) row.cells.push_back(asked.asked ? Fixed(value, decimals) : "-");
+    };
+    add_asked(asked.frequency, kFrequencyDecimals);
+    row.cells.push_back(Fixed(output.frequency, kFrequencyDecimals));
+    add_asked(output.error_ppm, 2);
     if (has_jitter) row.cells.push_back(output.jitter ? Ps(*output.jitter) : "-");
     return row;
   };
@@ -115,6 +126,49 @@ string Report::Second() const {
   };
   return Table({{Align::kRight, "MHz with the second input"}}, row_of,
                [](const OutputAnswer& output) { return IsOutside(output, 1); });
+}
+
+string Report::Limits(const Device& device) const {
+  const bool is_given = !answer_.source.engine && !answer_.source.search;
+  if (!is_given && request_.input_tolerance == Rational(0) && request_.rank != Rank::kMargin) {
+    return "";
+  }
+  std::vector<Row> rows;
+  const auto add = [&](const string& name, const Range& range, const Rational& value,
+                       const Rational& margin, bool is_off) {
+    rows.push_back({{name, Short(range.lowest, kFrequencyDecimals),
+                     Short(value, kFrequencyDecimals), Short(range.highest, kFrequencyDecimals),
+                     Fixed(margin * 100, 2), is_off ? kOff : ""},
+                    is_off ? Role::kOff : Role::kNone});
+  };
+  const auto is_off = [&](Quantity quantity) {
+    return std::any_of(answer_.violations.begin(), answer_.violations.end(),
+                       [&](const Finding& one) { return one.quantity == quantity; });
+  };
+  if (const auto* const loop = std::get_if<LoopSettings>(&answer_.settings)) {
+    const LoopLimits& limits = device.Loop(loop->primitive);
+    add("VCO", limits.vco, answer_.vco, answer_.vco_margin, is_off(Quantity::kVco));
+    add("PFD", limits.PfdOf(loop->bandwidth), answer_.pfd, answer_.pfd_margin,
+        is_off(Quantity::kPfd));
+  }
+  for (std::size_t i = 0; i < answer_.outputs.size(); ++i) {
+    const OutputAnswer& output = answer_.outputs[i];
+    if (!output.used) continue;
+    add("output " + std::to_string(i), OutputRange(device, answer_.settings, i), output.frequency,
+        output.margin, !output.violations.empty());
+  }
+  const bool has_marks = !answer_.violations.empty();
+  std::vector<Column> columns = {{Align::kLeft, "limits of"},
+                                 {Align::kRight, "lowest MHz"},
+                                 {Align::kRight, "actual MHz"},
+                                 {Align::kRight, "highest MHz"},
+                                 {Align::kRight, "margin %"}};
+  if (has_marks) {
+    columns.push_back({Align::kLeft, "mark"});
+  } else {
+    for (Row& row : rows) row.cells.pop_back();
+  }
+  return TableText(style_, columns, rows);
 }
 
 // What was asked for, what comes out, and the difference; "-" where nothing was asked for.
@@ -174,7 +228,7 @@ string ReportText(const Request& request, const Device& device, const Answer& an
                   const Style& style) {
   const Report report(request, answer, style);
   string text = PairsText(SettingsPairs(request, device, answer)) + "\n" + report.Outputs();
-  for (const string& table : {report.Second(), report.Shapes()}) {
+  for (const string& table : {report.Second(), report.Shapes(), report.Limits(device)}) {
     if (!table.empty()) text += "\n" + table;
   }
   return text + Notes(answer, device, style);

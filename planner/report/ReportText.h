@@ -1,5 +1,6 @@
 // The report on an answer as text: the settings, a table of the outputs, one of what they have
-// with a second input, one of phases and duty cycles, and notes.
+// with a second input, one of phases and duty cycles, one of the limits where margins count, and
+// notes.
 #ifndef VORKEL_PLANNER_REPORT_REPORTTEXT_H_
 #define VORKEL_PLANNER_REPORT_REPORTTEXT_H_
 

@@ -112,8 +112,11 @@ string Constraints::Figures(std::size_t index) const {
   const Output& asked = RequestedAt(request_, answer_, static_cast<int>(index));
   string text = "Output " + std::to_string(index) + ": " + SdcFigure(output.frequency) + " MHz, " +
                 output.ratio.NumeratorText() + " / " + output.ratio.DenominatorText() +
-                " of the input, " + SdcFigure(asked.frequency) + " MHz asked for, " +
-                Fixed(output.error_ppm, 2) + " ppm off";
+                " of the input";
+  if (asked.asked) {
+    text += ", " + SdcFigure(asked.frequency) + " MHz asked for, " + Fixed(output.error_ppm, 2) +
+            " ppm off";
+  }
   text += ShapeWords("phase", "degrees", output.phase, asked.phase, output.phase_error);
   text += ShapeWords("duty", "percent", output.duty, asked.duty, output.duty_error);
   text += output.jitter ? "; jitter " + Short(*output.jitter, 3) + " ps peak to peak"

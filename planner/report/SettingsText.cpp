@@ -142,6 +142,9 @@ Pairs SettingsPairs(const Request& request, const Device& device, const Answer& 
   const auto* loop = std::get_if<LoopSettings>(&answer.settings);
   Pairs rest = loop != nullptr ? LoopPairs(request, answer, *loop) : KruPairs(request, answer);
   for (auto& pair : rest) pairs.push_back(std::move(pair));
+  if (request.input_tolerance > Rational(0)) {
+    pairs.emplace_back("input tolerance", Short(request.input_tolerance, 6) + " ppm");
+  }
   if (answer.phase_error) pairs.emplace_back("phase error", Ps(*answer.phase_error) + " ps");
   return pairs;
 }
@@ -152,6 +155,14 @@ string Place(const Settings& settings, int output) {
     return Eighths(loop->outputs[index].divider);
   }
   return string(hardware::FactsOf(std::get<KruSettings>(settings).pins[index]).name);
+}
+
+Range OutputRange(const Device& device, const Settings& settings, std::size_t index) {
+  if (const auto* loop = std::get_if<LoopSettings>(&settings)) {
+    return device.Loop(loop->primitive).OutputOf(static_cast<int>(index));
+  }
+  const auto& kru = std::get<KruSettings>(settings);
+  return device.Pins(kru.primitive).Of(kru.pins[index], kru.pins[0] == hardware::Pin::kClk2x);
 }
 
 string SettingsWords(const Settings& settings) {

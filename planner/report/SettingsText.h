@@ -2,6 +2,7 @@
 #ifndef VORKEL_PLANNER_REPORT_SETTINGSTEXT_H_
 #define VORKEL_PLANNER_REPORT_SETTINGSTEXT_H_
 
+#include <cstddef>
 #include <optional>
 #include <string>
 
@@ -25,6 +26,9 @@ const Output& RequestedAt(const Request& request, const Answer& answer, int plac
 
 // Where an output is: its divider, or its pin.
 std::string Place(const Settings& settings, int output);
+
+// The range of an output: of a KRU that of its pin, which depends on where output 0 is.
+Range OutputRange(const Device& device, const Settings& settings, std::size_t index);
 
 // Settings in one line: "M 44, D 1 and dividers 8, 16 and 44".
 std::string SettingsWords(const Settings& settings);

@@ -19,7 +19,7 @@ namespace eval ::cli {
   variable counter 0
   # The names of the values above the tables of a report.
   variable labels [join {
-    device input VCO PFD M D bandwidth {input jitter} {phase error}
+    device input VCO PFD M D bandwidth {input jitter} {input tolerance} {phase error}
     CLKIN_DIVIDE_BY_2 CLKDV CLKFXDV {phase offset} PHASE_SHIFT
   } |]
 }

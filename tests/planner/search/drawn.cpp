@@ -297,6 +297,7 @@ std::string TextOf(const Request& request) {
   std::string all = "inputs";
   for (const Rational& input : request.inputs) all += " " + text(input);
   all += " jitter " + text(request.input_jitter) + " tolerance " + text(request.tolerance);
+  if (request.input_tolerance != 0) all += " input tolerance " + text(request.input_tolerance);
   if (request.max_jitter) all += " max jitter " + text(*request.max_jitter);
   if (request.bandwidth) all += " " + std::string(Name(*request.bandwidth));
   all += " rank " + std::to_string(static_cast<int>(request.rank));

@@ -8,6 +8,16 @@ namespace plain {
 
 using planner::Request;
 
+std::vector<planner::Rational> CornersOf(const planner::Request& request) {
+  std::vector<planner::Rational> corners;
+  for (const planner::Rational& input : request.inputs) {
+    const planner::Rational off = input * request.input_tolerance / 1000000;
+    corners.push_back(input - off);
+    corners.push_back(input + off);
+  }
+  return corners;
+}
+
 bool IsBefore(const Request& request, const Ranked& a, const Ranked& b) {
   const auto by_key = planner::answer::Compare(planner::answer::Order(request), a.key, b.key);
   if (by_key.order != 0) return by_key.order < 0;

@@ -41,6 +41,9 @@ enum class Effort {
 Found Enumerate(const planner::Request& request, const planner::Device& device,
                 planner::Primitive primitive, Effort effort);
 
+// What the inputs of a request can be at the ends of their tolerance, each of them.
+std::vector<planner::Rational> CornersOf(const planner::Request& request);
+
 // The order of all settings.
 bool IsBefore(const planner::Request& request, const Ranked& a, const Ranked& b);
 

@@ -182,9 +182,16 @@ class Kru {
     Part part{};
     for (const int doubled : {0, 1}) {
       const hardware::Range& range = limits_.Of(pin, is_sp_ && doubled == 1);
-      part.is_inside[doubled] = range.Contains(frequency);
+      part.is_inside[doubled] = true;
+      std::optional<Rational> margin;
+      for (const Rational& corner : corners_) {
+        const Rational there = corner * PinRatio(pin, settings.Ratios());
+        part.is_inside[doubled] = part.is_inside[doubled] && range.Contains(there);
+        const Rational own = planner::answer::MarginOf(there, range);
+        if (!margin || own < *margin) margin = own;
+      }
       if (!part.is_inside[doubled]) continue;
-      part.margin[doubled] = planner::answer::MarginOf(frequency, range);
+      part.margin[doubled] = *margin;
     }
     if (!part.is_inside[0] && !part.is_inside[1]) return parts_.emplace(key, part).first->second;
     planner::Output asked = request_.outputs[output];
@@ -338,6 +345,7 @@ class Kru {
 
   const Request& request_;
   const planner::PinLimits& limits_;
+  const std::vector<Rational> corners_ = CornersOf(request_);
   Primitive primitive_;
   bool is_sp_;
   Effort effort_;

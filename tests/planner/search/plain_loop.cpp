@@ -80,7 +80,7 @@ class Loop {
 
  private:
   bool IsInRange(int m, int d, Bandwidth bandwidth) const {
-    for (const Rational& input : request_.inputs) {
+    for (const Rational& input : corners_) {
       if (!limits_.vco.Contains(input * hardware::VcoRatio(m, d))) return false;
       if (!limits_.PfdOf(bandwidth).Contains(input / d)) return false;
     }
@@ -118,7 +118,7 @@ class Loop {
 
   Rational MarginOfLoop(int m, int d, Bandwidth bandwidth) const {
     std::optional<Rational> margin;
-    for (const Rational& input : request_.inputs) {
+    for (const Rational& input : corners_) {
       for (const Rational& own :
            {planner::answer::MarginOf(input * hardware::VcoRatio(m, d), limits_.vco),
             planner::answer::MarginOf(input / d, limits_.PfdOf(bandwidth))}) {
@@ -160,7 +160,7 @@ class Loop {
 
   bool KeepsRange(std::size_t output, int m, int d, int divider) const {
     const hardware::Range& range = limits_.OutputOf(static_cast<int>(output));
-    for (const Rational& input : request_.inputs) {
+    for (const Rational& input : corners_) {
       if (effort_ == Effort::kLess) {
         constexpr double kNear = 1e-9;
         const double frequency = input.ToDouble() * m / d / divider;
@@ -204,9 +204,9 @@ class Loop {
     one.ppm = errors.ppm.Absolute();
     if (errors.phase) one.phase = errors.phase->Absolute();
     if (errors.duty) one.duty = errors.duty->Absolute();
-    for (std::size_t i = 0; i < request_.inputs.size(); ++i) {
+    for (std::size_t i = 0; i < corners_.size(); ++i) {
       const Rational own = planner::answer::MarginOf(
-          request_.inputs[i] * ratio, limits_.OutputOf(static_cast<int>(output)));
+          corners_[i] * ratio, limits_.OutputOf(static_cast<int>(output)));
       one.margin = i == 0 ? own : std::min(one.margin, own);
     }
     return one;
@@ -261,6 +261,7 @@ class Loop {
 
   const Request& request_;
   const planner::LoopLimits& limits_;
+  const std::vector<Rational> corners_ = CornersOf(request_);
   Primitive primitive_;
   Effort effort_;
   bool fractions_;

@@ -107,6 +107,30 @@ void CompareOnSmallDevices(Primitive primitive, int requests, int most_outputs) 
   EXPECT_GT(tally.missed, requests / 8);
 }
 
+// With inputs that can be off, of which the plain enumeration tries both ends.
+TEST(SearchSmall, InputsThatCanBeOffKeepAllLimits) {
+  Random random(77);
+  int changed = 0;
+  for (int i = 0; i < 60 && !testing::Test::HasFailure(); ++i) {
+    SCOPED_TRACE("request " + std::to_string(i));
+    const Primitive primitive = hardware::kPrimitives[static_cast<std::size_t>(i) % 4];
+    const Rational input = drawn::Input(random);
+    const Device device = drawn::SmallDevice(random, primitive, input);
+    Request request = drawn::RequestFor(random, device, primitive, input, 2);
+    const Found nominal = Search(request, device, primitive);
+    request.input_tolerance =
+        random.Pick(std::vector<Rational>{50, 1000, 20000, Rational(100000, 3), 100000});
+    ExpectAgreement(request, device, primitive, plain::Effort::kAll);
+    const Found found = Search(request, device, primitive);
+    if (found.best.size() != nominal.best.size() ||
+        (!found.best.empty() && found.best[0].settings != nominal.best[0].settings)) {
+      ++changed;
+    }
+  }
+  // The tolerance counts.
+  EXPECT_GT(changed, 10);
+}
+
 bool IsLong() { return std::getenv("VORKEL_TEST_LONG") != nullptr; }
 
 // On the bundled devices, all of whose settings are tried. `requests` of each primitive that they

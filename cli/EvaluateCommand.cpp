@@ -1,0 +1,124 @@
+#include "cli/EvaluateCommand.h"
+
+#include <fmt/format.h>
+
+#include <cstddef>
+#include <optional>
+#include <utility>
+
+#include "cli/Call.h"
+#include "cli/Devices.h"
+#include "cli/Failure.h"
+#include "cli/Hdl.h"
+#include "cli/InputFile.h"
+#include "planner/answer/Evaluate.h"
+#include "planner/read/Settings.h"
+#include "planner/read/Shown.h"
+#include "planner/report/Json.h"
+#include "planner/report/ReportText.h"
+#include "planner/report/Sdc.h"
+#include "planner/report/Table.h"
+
+namespace cli {
+
+namespace {
+
+using planner::read::Draft;
+using planner::read::Mistakes;
+using planner::read::Reading;
+
+constexpr std::size_t kLargest = 50'000'000;  // bytes of a plan
+constexpr int kMostPick = 1'000'000;
+
+std::string Contents(const std::string& name) {
+  if (name.empty()) throw Failure::OfUsage("the name of the plan is empty");
+  const std::string shown = planner::read::Shown(name);
+  std::string text;
+  try {
+    text = ReadFile(name, kLargest);
+  } catch (const FileError& error) {
+    throw Failure::OfUsage(fmt::format("{} cannot be read: {}", shown, error.what()));
+  }
+  if (text.size() > kLargest) throw Failure::OfUsage(shown + " is too large for a plan");
+  return text;
+}
+
+// The device of a draft; with a primitive that has been named it has that.
+planner::Device DeviceOf(const Draft& draft, std::optional<planner::Primitive> primitive,
+                         const Setting& setting) {
+  Reading reading;
+  reading.device = draft.device;
+  reading.request.primitive = primitive;
+  return FindDevice(reading, setting);
+}
+
+// The settings and the request of a call.
+std::optional<planner::read::Evaluation> EvaluationOf(const Given& given, const Draft& options,
+                                                      const Setting& setting,
+                                                      Mistakes* mistakes) {
+  planner::read::PlanFile file;
+  const std::optional<int> number = WholeNumber(given, "--pick", 1, kMostPick);
+  if (!given.operands.empty()) {
+    const std::string& name = given.operands.front();
+    if (name == "-" && given.Value("--request") == "-") {
+      throw Failure::OfUsage("the plan and --request cannot both be standard input");
+    }
+    file = ReadPlan(Contents(name), name, number, mistakes);
+  } else if (number) {
+    throw Failure::OfUsage("--pick goes with the file of a plan");
+  }
+  const Draft draft = Over(options, file.request);
+  const planner::read::SettingsDraft settings =
+      Over(planner::read::ReadSettingOptions(given.options, mistakes), file.settings);
+  if (!mistakes->empty()) return std::nullopt;
+  planner::Device device = DeviceOf(draft, std::nullopt, setting);
+  device = DeviceOf(draft, PrimitiveOf(draft, settings, device), setting);
+  return FinishEvaluation(draft, settings, device, mistakes);
+}
+
+std::string InFormat(const Call& call, const planner::Answer& answer, const Setting& setting) {
+  const std::vector<planner::report::Entry> entries = {{&answer}};
+  switch (call.format) {
+    case Format::kText: {
+      const planner::report::Style style = StyleOf(call, setting);
+      std::string text =
+          planner::report::ReportText(call.request(), call.device, answer, style);
+      if (!answer.max_jitter) return text;
+      return text + "\n" +
+             planner::report::Prose(style, "jitter: ",
+                                    "peak to peak, at a bit error rate of 1e-12.");
+    }
+    case Format::kJson:
+      return planner::report::Json(call.request(), call.device, entries);
+    case Format::kTcl:
+      return planner::report::Tcl(call.request(), call.device, entries);
+    case Format::kVerilog:
+    case Format::kVhdl:
+    case Format::kTestbench:
+      return HdlText(call, answer);
+    case Format::kSdc:
+      break;
+  }
+  return planner::report::Sdc(call.request(), call.device, answer, call.sdc);
+}
+
+}  // namespace
+
+int RunEvaluate(std::string_view command, const std::vector<std::string>& words,
+                const Setting& setting) {
+  planner::Settings settings;
+  const auto make = [&](const Given& given, const Draft& draft,
+                        Mistakes* mistakes) -> std::optional<Reading> {
+    auto evaluation = EvaluationOf(given, draft, setting, mistakes);
+    if (!evaluation) return std::nullopt;
+    settings = std::move(evaluation->settings);
+    return std::move(evaluation->reading);
+  };
+  const Call call = ReadCall(command, words, 1, make, setting);
+  const planner::Answer answer =
+      planner::answer::Evaluate(call.request(), call.device, settings, planner::Source{});
+  Write(call, InFormat(call, answer, setting), setting);
+  return answer.within ? kDone : kOff;
+}
+
+}  // namespace cli
