@@ -74,7 +74,9 @@ class Builder {
     instance_.ports.push_back({"locked", true});
   }
 
-  void Set(const string& name, std::int64_t number) { instance_.attributes.push_back({name, number}); }
+  void Set(const string& name, std::int64_t number) {
+    instance_.attributes.push_back({name, number});
+  }
   void SetParts(const string& name, const Parts& parts) {
     Set(name + "_NUM", parts.numerator);
     Set(name + "_DEN", parts.denominator);

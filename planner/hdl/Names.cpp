@@ -57,8 +57,8 @@ constexpr std::string_view kVhdlKeywords[] = {
     "variable", "view", "vmode", "vpkg", "vprop", "vunit", "wait", "when", "while", "with", "xnor",
     "xor"};
 
-// Libraries, packages, types and names of the generated text, which an entity of the same name would
-// hide.
+// Libraries, packages, types and names of the generated text, which an entity of the same name
+// would hide.
 constexpr std::string_view kUsedNames[] = {
     "bit",     "boolean",        "character", "clkfb",   "delay_length",     "false",
     "fs",      "ieee",           "integer",   "locked",  "math_real",        "natural",

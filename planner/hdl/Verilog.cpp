@@ -69,7 +69,8 @@ string Check(const Bench& bench, const Expected& output, int input, int place) {
   set("PHASE", std::to_string(output.phase));
   set("HIGH", std::to_string(output.high));
   set("RISES", (bench.hyperperiod ? "REPEAT * " : "") + std::to_string(output.rises));
-  string text = "  VORKEL_CLOCK_CHECK #(\n" + Listed(lines) + "\n  ) check" + o + "_in" + n + " (\n";
+  string text = "  VORKEL_CLOCK_CHECK #(\n" + Listed(lines) + "\n  ) check" + o + "_in" + n +
+                " (\n";
   lines.clear();
   set("clk", "clk_out" + o);
   set("run", "locked && is_on" + n);

@@ -1,5 +1,5 @@
-// Three PLLs with a jitter of 10 ps rms, two of them with the same seed: 27 MHz times 33 is 891 MHz,
-// and a twelfth of that 74.25 MHz. What it prints is compared with that of the model in VHDL.
+// Three PLLs with a jitter of 10 ps rms, two of them with the same seed: 27 MHz times 33 is 891
+// MHz, and a twelfth of that 74.25 MHz. What it prints is compared with that of the model in VHDL.
 `timescale 1fs/1fs
 module jitter;
   reg enable;
