@@ -8,6 +8,7 @@
 #include "cli/ExplainCommand.h"
 #include "cli/Help.h"
 #include "cli/PlanCommand.h"
+#include "cli/ReachCommand.h"
 #include "cli/RelationsCommand.h"
 #include "cli/VerifyCommand.h"
 
@@ -45,6 +46,11 @@ constexpr Command kCommands[] = {
      "--in 100 --out 100,50,150 --phase 0,180,0 --feedback", "", true, RunEngine},
     {"clkgen", kKruArguments, "find the settings of a KRU_CLKGEN", "--in 100 --out 150,75", "",
      true, RunEngine},
+    {"reach", "--in F[,F2] [OPTION...]", "list the frequencies that an output can have",
+     "--in 27 --primitive PLL --near 148.5",
+     "Without --primitive it asks all that the device has. The output stands alone: the others are "
+     "not used. Each frequency has the settings that plan ranks first for it.",
+     false, RunReach},
     {"batch", "[FILE] [OPTION...]", "plan many requests, one on each line",
      "examples/batch/requests.jsonl",
      "FILE has a request in JSON on each line, as --request takes it, and maybe an \"id\"; without "

@@ -21,7 +21,7 @@ constexpr std::pair<std::string_view, std::string_view> kGroups[] = {
 };
 
 constexpr OptionRow kRows[] = {
-    {"--in", "F[,F2]", "loops",
+    {"--in", "F[,F2]", "loops reach",
      "input frequency; F2 is that of a second input clock, with which all must stay in range; "
      "errors are for the first"},
     {"--in", "F", "krus", "input frequency"},
@@ -35,18 +35,26 @@ constexpr OptionRow kRows[] = {
     {"--duty", "LIST", "loops evaluate", "duty cycle of each output; - or 0 where any will do"},
     {"--any-order", "", "planning batch",
      "outputs may change places, where not all places can make a frequency"},
-    {"--device", "NAME", "any batch evaluate", "DEVICE[PACKAGE][-GRADE] or its beginning; vk40 by default"},
-    {"--primitive", "NAME", "planning batch", "auto (default), PLL, TSYN, KRU_SP or KRU_CLKGEN"},
+    {"--output", "N", "reach", "the place of the output, 0 by default, up to 6"},
+    {"--from", "F", "reach", "only frequencies from this one on"},
+    {"--to", "F", "reach", "only frequencies up to this one"},
+    {"--near", "F", "reach", "the frequencies that are nearest to this one, 5 by default"},
+    {"--gaps", "N", "reach", "the N widest gaps between frequencies"},
+    {"--count", "", "reach", "only how many there are"},
+    {"--most", "N", "reach",
+     "at most so many frequencies, 0 for all; by default 40 as text, else all"},
+    {"--device", "NAME", "any batch evaluate reach", "DEVICE[PACKAGE][-GRADE] or its beginning; vk40 by default"},
+    {"--primitive", "NAME", "planning batch reach", "auto (default), PLL, TSYN, KRU_SP or KRU_CLKGEN"},
     {"--primitive", "NAME", "evaluate",
      "PLL, TSYN, KRU_SP or KRU_CLKGEN; TSYN by default, with --pins KRU_SP, or KRU_CLKGEN where "
      "CLKFXDV is among them"},
     {"--engine", "", "plan compare explain relations batch",
      "only what the design flow's own search answers, not all settings"},
-    {"--bandwidth", "NAME", "planning batch", "LOW, HIGH or OPTIMIZED; of the loop, all by default"},
+    {"--bandwidth", "NAME", "planning batch reach", "LOW, HIGH or OPTIMIZED; of the loop, all by default"},
     {"--bandwidth", "NAME", "loop",
      "LOW, HIGH or OPTIMIZED (default); with LOW, the maximum of the PFD is lower"},
     {"--bandwidth", "NAME", "evaluate", "LOW, HIGH or OPTIMIZED (default); of the loop"},
-    {"--low-bandwidth", "", "loops batch evaluate", "short for --bandwidth LOW"},
+    {"--low-bandwidth", "", "loops batch evaluate reach", "short for --bandwidth LOW"},
     {"--rank", "NAME", "planning batch",
      "jitter (default), error, margin or vco; what counts first among settings that meet all "
      "demands: the least jitter, the smallest error, the largest margin to the device's limits or "
@@ -54,13 +62,13 @@ constexpr OptionRow kRows[] = {
     {"--prefer-max-vco", "", "planning batch",
      "the highest VCO counts instead of the lowest; without --rank it counts first"},
     {"--prefer-max-vco", "", "loop", "with --phase or --duty: take the highest VCO"},
-    {"--int-div0", "", "planning batch", "of a TSYN only whole M and whole dividers"},
+    {"--int-div0", "", "planning batch reach", "of a TSYN only whole M and whole dividers"},
     {"--int-div0", "", "tsyn", "a whole divider for output 0"},
-    {"--feedback", "", "planning batch", "a KRU_SP only with its feedback connected; both by default"},
+    {"--feedback", "", "planning batch reach", "a KRU_SP only with its feedback connected; both by default"},
     {"--feedback", "", "kru", "use the feedback, without which there are only CLKFX pins"},
     {"--feedback", "", "evaluate", "of a KRU_SP: the feedback is connected"},
-    {"--input-jitter", "PS", "any batch evaluate", "peak-to-peak jitter of the input clock, 0 by default"},
-    {"--input-tolerance", "PPM", "any batch evaluate",
+    {"--input-jitter", "PS", "any batch evaluate reach", "peak-to-peak jitter of the input clock, 0 by default"},
+    {"--input-tolerance", "PPM", "any batch evaluate reach",
      "how far the input can be off over temperature and age, 0 by default; every limit of the "
      "device has to be kept with all of it"},
     {"--tolerance", "PPM", "any batch evaluate",
@@ -111,7 +119,8 @@ constexpr OptionRow kRows[] = {
     {"--name", "NAME", "written compare",
      "of the module or entity, with --format verilog, vhdl or testbench; clocks by default"},
     {"--language", "NAME", "written compare", "verilog (default) or vhdl; of --format testbench"},
-    {"-o", "FILE", "any batch evaluate", "write to a file; - is standard output"},
+    {"--format", "NAME", "reach", "text (default), json, csv or tcl"},
+    {"-o", "FILE", "any batch evaluate reach", "write to a file; - is standard output"},
     {"--trace", "", "single",
      "print first what the engine itself tells of its search, a line for each step; text format "
      "only"},
@@ -212,6 +221,9 @@ std::string_view ReasonAgainst(std::string_view command, std::string_view option
 
 std::optional<ValueFacts> ValueOf(std::string_view option) {
   if (option == "--oscillators") return {{planner::read::ValueKind::kFrequency, true}};
+  for (const char* const name : {"--from", "--to", "--near"}) {
+    if (option == name) return {{planner::read::ValueKind::kFrequency, false}};
+  }
   if (option == "--gap") return {{planner::read::ValueKind::kGap, false}};
   const planner::read::OptionFacts* facts = planner::read::FindOption(option);
   if (!facts) facts = planner::read::FindSettingOption(option);

@@ -22,6 +22,7 @@ constexpr Entry kEntries[] = {
     {"::vorkel::plan", Plan},       {"::vorkel::compare", Compare}, {"::vorkel::best", Best},
     {"::vorkel::explain", Explain}, {"::vorkel::evaluate", Evaluate},
     {"::vorkel::devices", Devices}, {"::vorkel::check", Check},
+    {"::vorkel::reach", Reach},
     {"::vorkel::relations", Relations},
 };
 

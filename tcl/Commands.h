@@ -36,6 +36,10 @@ std::string Devices(Words words);
 //   What is wrong with a device file, and what is doubtful.
 std::string Check(Words words);
 
+// vorkel::reach -in frequency ?-option value ...?
+//   Which frequencies an output can have.
+std::string Reach(Words words);
+
 // Makes them in an interpreter.
 void MakeCommands(Tcl_Interp* interp);
 
