@@ -1,5 +1,6 @@
 #include "cli/Setting.h"
 
+#include <sys/auxv.h>
 #include <sys/ioctl.h>
 #include <unistd.h>
 
@@ -36,6 +37,19 @@ bool HasColour() {
          isatty(STDOUT_FILENO);
 }
 
+// The folder of the executable file. Where /proc is not there, as in a plain chroot, the system still
+// tells by which path it was started.
+std::string OwnFolder() {
+  namespace fs = std::filesystem;
+  std::error_code error;
+  fs::path own = fs::read_symlink("/proc/self/exe", error);
+  if (error) {
+    const auto* const started = reinterpret_cast<const char*>(getauxval(AT_EXECFN));
+    own = started != nullptr ? fs::canonical(started, error) : fs::path();
+  }
+  return own.parent_path().native();
+}
+
 // Whether the program does not stand in a build tree, where a script of the checkout starts it.
 bool IsInstalled(const std::string& folder) {
   return !::Device::Shipped(folder, "devices").starts_with(folder + "/");
@@ -55,8 +69,7 @@ std::string CalledAs() {
 
 Setting SettingOfProcess() {
   Setting setting;
-  std::error_code error;
-  setting.folder = std::filesystem::read_symlink("/proc/self/exe", error).parent_path().native();
+  setting.folder = OwnFolder();
   const std::string program = Variable("VORKEL_PROGRAM");
   if (!program.empty()) {
     setting.program = program;
