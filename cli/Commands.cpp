@@ -65,7 +65,7 @@ constexpr Command kCommands[] = {
      "its figures do not; - is standard input. Options replace what it says. Without --out there is "
      "nothing to compare the frequencies with. Settings that the primitive cannot have are refused; "
      "those that break a limit of the device end with exit status 3.",
-     true, RunEvaluate},
+     false, RunEvaluate},
     {"devices", "[NAME]", "list the devices, or all limits of one", "vk40",
      "NAME is a device, or a part name with package and grade; the beginning is enough where only "
      "one goes on like it.",

@@ -49,7 +49,7 @@ const std::vector<std::string>& KnownEntries() {
 }
 const std::vector<std::string>& KnownOutputEntries() {
   static const std::vector<std::string> kNames = {
-      "frequency", "asked", "phase", "duty", "tolerance", "phase_tolerance", "duty_tolerance",
+      "frequency", "phase", "duty", "tolerance", "phase_tolerance", "duty_tolerance",
       "max_jitter"};
   return kNames;
 }
