@@ -35,8 +35,8 @@ std::string UnsolvedText(const Call& call, const Plan& plan, const Setting& sett
 
 Picked PickedPlan(const Call& call, const Setting& setting) {
   Picked picked;
-  picked.number = static_cast<std::size_t>(
-      WholeNumber(call.given, "--pick", 1, kMostPick).value_or(1));
+  picked.number =
+      static_cast<std::size_t>(WholeNumber(call.given, "--pick", 1, kMostPick).value_or(1));
   picked.plan = planner::plan::Make(call.request(), call.device);
   if (!picked.plan.IsSolved()) throw Failure(kUnsolved, UnsolvedText(call, picked.plan, setting));
   if (picked.number > picked.plan.ranked.size()) {

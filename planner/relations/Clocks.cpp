@@ -42,8 +42,7 @@ std::vector<Clock> ClocksOf(const Request& request, const Answer& answer) {
   for (std::size_t n = 0; n < request.inputs.size(); ++n) {
     const auto input = static_cast<int>(n);
     const Rational period = Rational(kNsOfMhz) / request.inputs[n];
-    clocks.push_back(
-        {input, -1, {}, period, 0, period / 2, request.input_jitter.ToDouble()});
+    clocks.push_back({input, -1, {}, period, 0, period / 2, request.input_jitter.ToDouble()});
     for (std::size_t i = 0; i < answer.outputs.size(); ++i) {
       if (!answer.outputs[i].used) continue;
       const auto index = static_cast<int>(i);

@@ -18,12 +18,12 @@ namespace planner::relations {
 // A clock rises at rise, rise + period, rise + 2 * period ... and falls `high` after each of these.
 // Times in ns.
 struct Clock {
-  int input = 0;             // the input that it is, or that the primitive follows when it is there
-  int output = -1;           // the place of the output; -1: it is the input itself
-  std::vector<int> also;     // further outputs on the same pin of a KRU: they are this clock
-  Rational period;           // above 0
-  Rational rise;             // from 0 to below a period
-  Rational high;             // above 0 and below a period
+  int input = 0;          // the input that it is, or that the primitive follows when it is there
+  int output = -1;        // the place of the output; -1: it is the input itself
+  std::vector<int> also;  // further outputs on the same pin of a KRU: they are this clock
+  Rational period;        // above 0
+  Rational rise;          // from 0 to below a period
+  Rational high;          // above 0 and below a period
   std::optional<double> jitter;  // ps, peak to peak; unknown with the second input
 
   bool IsInput() const { return output < 0; }
@@ -34,8 +34,8 @@ struct Clock {
 // and then the same of the second input, where there is one.
 std::vector<Clock> ClocksOf(const Request& request, const Answer& answer);
 
-// The same request with inputs as fast as their tolerance lets them be: then all periods and all gaps
-// are at their shortest, each by the same part.
+// The same request with inputs as fast as their tolerance lets them be: then all periods and all
+// gaps are at their shortest, each by the same part.
 Request Fastest(const Request& request);
 
 }  // namespace planner::relations

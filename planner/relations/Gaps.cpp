@@ -41,8 +41,7 @@ Gaps GapsBetween(const Clock& launching, const Clock& capturing) {
 }
 
 Rational HoldGap(const Clock& launching, const Clock& capturing) {
-  return Modulo(launching.rise - capturing.rise,
-                CommonStep(launching.period, capturing.period));
+  return Modulo(launching.rise - capturing.rise, CommonStep(launching.period, capturing.period));
 }
 
 }  // namespace planner::relations

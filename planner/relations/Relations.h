@@ -36,8 +36,8 @@ enum class Crossing {
 // From which gap on a path can be timed. A crossing that has a whole period of the faster clock is
 // no harder than a path within that clock, whatever the rule says.
 struct Rule {
-  std::optional<Rational> gap;         // ns; where it is not given, the share counts
-  Rational share = Rational(1, 4);     // of the shorter period
+  std::optional<Rational> gap;      // ns; where it is not given, the share counts
+  Rational share = Rational(1, 4);  // of the shorter period
 };
 
 // From clock `from` to clock `to`, places in Relations::clocks.
@@ -51,18 +51,16 @@ struct Relation {
   Rational hyperperiod;  // ns
   Rational launches;     // rising edges of either clock in a hyperperiod, whole numbers
   Rational captures;
-  Rational phase;        // by which the capturing clock is behind the launching one at time 0,
-                         // degrees of the capturing clock, from 0 to below 360
-  Gaps gaps;             // ns
-  Rational hold;         // ns, see HoldGap
-  Rational limit;        // ns: what the rule wants of the gap
+  Rational phase;  // by which the capturing clock is behind the launching one at time 0,
+                   // degrees of the capturing clock, from 0 to below 360
+  Gaps gaps;       // ns
+  Rational hold;   // ns, see HoldGap
+  Rational limit;  // ns: what the rule wants of the gap
   // Where the ratio is whole, periods of the faster clock in one of the slower; 0 else.
   Rational cycles;
 
   bool IsSynchronous() const { return crossing != Crossing::kUnrelated; }
-  bool NeedsFifo() const {
-    return crossing == Crossing::kFifo || crossing == Crossing::kUnrelated;
-  }
+  bool NeedsFifo() const { return crossing == Crossing::kFifo || crossing == Crossing::kUnrelated; }
 };
 
 struct Relations {

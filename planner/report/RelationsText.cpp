@@ -62,7 +62,8 @@ string Meaning(Crossing crossing) {
              "between short.";
     case Crossing::kRelaxed:
       return "the gap is too small, but the same behind every launch. It needs a relaxed "
-             "constraint: a multicycle path of 2 gives data a period of the faster clock more, if no "
+             "constraint: a multicycle path of 2 gives data a period of the faster clock more, if "
+             "no "
              "path is shorter than the gap; else a FIFO or a handshake.";
     case Crossing::kFifo:
       return "synchronous, but the gap is too small: data needs a FIFO or a handshake.";
@@ -153,10 +154,10 @@ string Texts::RelationTable(int input) const {
   std::vector<Row> rows;
   for (const Relation& one : relations_.all) {
     if (!IsOf(one, input)) continue;
-    rows.push_back({{ClockWord(one.from), ClockWord(one.to), Quotient(one.ratio),
-                     Fixed(one.phase, kPhaseDecimals), Time(one.gaps.rise_rise),
-                     Time(one.hyperperiod), Quotient(one.launches) + ":" + Quotient(one.captures),
-                     CrossingWord(one.crossing)}});
+    rows.push_back(
+        {{ClockWord(one.from), ClockWord(one.to), Quotient(one.ratio),
+          Fixed(one.phase, kPhaseDecimals), Time(one.gaps.rise_rise), Time(one.hyperperiod),
+          Quotient(one.launches) + ":" + Quotient(one.captures), CrossingWord(one.crossing)}});
     if (one.NeedsFifo()) rows.back().last = Role::kOff;
   }
   return FittedTable(style_,
@@ -235,10 +236,11 @@ string Texts::Fifos() const {
 }
 
 string Texts::TwoInputs() const {
-  return Prose(style_, "two inputs: ",
-               "they are not related, unless both come from one oscillator: data from one input to "
-               "the other, or to the outputs while they follow the other, needs a FIFO. The outputs "
-               "with one input and those with the other are never there together.");
+  return Prose(
+      style_, "two inputs: ",
+      "they are not related, unless both come from one oscillator: data from one input to "
+      "the other, or to the outputs while they follow the other, needs a FIFO. The outputs "
+      "with one input and those with the other are never there together.");
 }
 
 }  // namespace

@@ -141,7 +141,8 @@ string EdgesWords(const OutputAnswer& output, const Rational& phase, const Ratio
   const Rational fall = rise + length * output.duty / 100 - whole / 2;
   const Rational again = rise + length - whole;
   return "-edges {1 " + SdcFigure(whole + 1) + " " + SdcFigure(whole * 2 + 1) + "} -edge_shift {" +
-         SdcExact(rise * source) + " " + SdcExact(fall * source) + " " + SdcExact(again * source) + "}";
+         SdcExact(rise * source) + " " + SdcExact(fall * source) + " " + SdcExact(again * source) +
+         "}";
 }
 
 // When a clock rises and falls, in the plainest of the descriptions that there are.
@@ -189,7 +190,7 @@ string Constraints::Clock(std::size_t index, std::map<string, string>* at) const
   const auto [place, is_new] = at->emplace(pin, ClockName(index, 0));
   if (!is_new) {
     return text + SdcComment("Output " + std::to_string(index) + " is on the pin " + pin +
-                          ", too: its clock is " + place->second + ".");
+                             ", too: its clock is " + place->second + ".");
   }
   for (int input = 0; input < Inputs(); ++input) text += Generated(index, input);
   return text + Uncertainty(index);

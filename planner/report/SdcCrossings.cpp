@@ -34,7 +34,8 @@ std::optional<Rational> Between(const Answer& answer, const Clock& from, const C
   const bool has_input = from.IsInput() || to.IsInput();
   if (!has_input && IsLoop(answer.primitive)) return std::nullopt;
   if (!from.jitter || !to.jitter || (has_input && !answer.phase_error)) return std::nullopt;
-  Rational picoseconds = (Rational::FromDouble(*from.jitter) + Rational::FromDouble(*to.jitter)) / 2;
+  Rational picoseconds =
+      (Rational::FromDouble(*from.jitter) + Rational::FromDouble(*to.jitter)) / 2;
   if (has_input) picoseconds += Rational::FromDouble(*answer.phase_error);
   return picoseconds / 1000;
 }
@@ -46,13 +47,13 @@ string Uncertainty(const string& value, const std::vector<string>& from,
 }
 
 // From or to one clock: those on the other side with the same figure share a command.
-string Uncertainties(const Request& request, const Answer& answer,
-                     const std::vector<Clock>& clocks, std::size_t one, bool is_from) {
+string Uncertainties(const Request& request, const Answer& answer, const std::vector<Clock>& clocks,
+                     std::size_t one, bool is_from) {
   std::vector<std::pair<string, std::vector<string>>> groups;
   for (std::size_t i = 1; i < clocks.size(); ++i) {
     if (i == one) continue;
-    const auto value = is_from ? Between(answer, clocks[one], clocks[i])
-                               : Between(answer, clocks[i], clocks[one]);
+    const auto value =
+        is_from ? Between(answer, clocks[one], clocks[i]) : Between(answer, clocks[i], clocks[one]);
     if (!value) continue;
     const string text = Short(*value, kUncertaintyDecimals);
     auto group = std::find_if(groups.begin(), groups.end(),
@@ -98,12 +99,9 @@ class CrossingsText {
   string FromTo(const Relation& relation) const;
   string Gap(const Relation& relation) const;
   const Rational& Shorter(const Relation& relation) const {
-    return std::min(relations_.clocks[relation.from].period,
-                    relations_.clocks[relation.to].period);
+    return std::min(relations_.clocks[relation.from].period, relations_.clocks[relation.to].period);
   }
-  string NameAt(std::size_t clock) const {
-    return ClockName(request_, relations_.clocks[clock]);
-  }
+  string NameAt(std::size_t clock) const { return ClockName(request_, relations_.clocks[clock]); }
 
   const Request& request_;
   const SdcOptions& options_;
@@ -125,12 +123,14 @@ string CrossingsText::Head(bool any) const {
       "and a capturing edge. The gaps below are less than " +
       limit + ", too small for a path. ";
   if (options_.fifos) {
-    text += "That all data which crosses there goes through a FIFO or a handshake has been said, "
-            "and not been checked.";
+    text +=
+        "That all data which crosses there goes through a FIFO or a handshake has been said, "
+        "and not been checked.";
   } else {
-    text += "The commands in comments are right where all data that crosses goes through a FIFO or "
-            "a handshake; else they would hide paths that fail. They keep its bits within a period "
-            "of the faster clock of each other.";
+    text +=
+        "The commands in comments are right where all data that crosses goes through a FIFO or "
+        "a handshake; else they would hide paths that fail. They keep its bits within a period "
+        "of the faster clock of each other.";
   }
   return SdcComment(text);
 }
@@ -159,8 +159,9 @@ string CrossingsText::Fifo(const Relation& relation) const {
 string CrossingsText::Relaxed(const Relation& relation) const {
   const bool by_capture = relation.captures >= relation.launches;
   return SdcComment(
-             Gap(relation) + ", the same behind every launch. Where the design counts on data one "
-                             "period of the faster clock later, " +
+             Gap(relation) +
+             ", the same behind every launch. Where the design counts on data one "
+             "period of the faster clock later, " +
              SdcFigure(relation.gaps.rise_rise + Shorter(relation)) +
              " ns, and so does its simulation, this says it; the hold check then asks every path "
              "to take more than the gap.") +
@@ -208,8 +209,9 @@ string SdcInterclockUncertainties(const Request& request, const Answer& answer) 
   }
   if (text.empty()) return "";
   return "\n" +
-         SdcComment("Between two clocks the edges of both can be off, each by half of its jitter, "
-                    "and those of an output also by the phase error to the input.") +
+         SdcComment(
+             "Between two clocks the edges of both can be off, each by half of its jitter, "
+             "and those of an output also by the phase error to the input.") +
          text;
 }
 

@@ -35,8 +35,8 @@ string OutputText(const Request& request, const Answer& answer, const Clock& clo
       request.inputs[static_cast<std::size_t>(clock.input)] * answer.outputs[index].ratio;
   string text = "Output " + number + ": " + SdcFigure(frequency) + " MHz";
   if (!clock.also.empty()) {
-    text += "; " + Outputs(clock.also) + (clock.also.size() > 1 ? " are" : " is") +
-            " on the same pin";
+    text +=
+        "; " + Outputs(clock.also) + (clock.also.size() > 1 ? " are" : " is") + " on the same pin";
   }
   return "\n" + SdcComment(text) +
          Create(clock, "clk_out" + number,

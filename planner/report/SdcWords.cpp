@@ -47,8 +47,7 @@ string SdcSettings(const Request& request, const Device& device, const Answer& a
       }
     }
   }
-  return SdcComment(device.part + " " + string(Name(answer.primitive)) + ": " +
-                    Join(words, ", "));
+  return SdcComment(device.part + " " + string(Name(answer.primitive)) + ": " + Join(words, ", "));
 }
 
 string SdcTolerance(const Request& request) {

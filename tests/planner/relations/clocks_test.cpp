@@ -60,8 +60,8 @@ TEST(Clocks, OutputsOnTheSamePinAreOne) {
   settings.m = 3;
   settings.d = 2;
   settings.pins = {hardware::Pin::kClkfx, hardware::Pin::kClk0, hardware::Pin::kClkfx};
-  const std::vector<Clock> clocks = ClocksOf(
-      request, MadeKru(request, settings, {Rational(3, 2), 1, Rational(3, 2)}, 200));
+  const std::vector<Clock> clocks =
+      ClocksOf(request, MadeKru(request, settings, {Rational(3, 2), 1, Rational(3, 2)}, 200));
   ASSERT_EQ(clocks.size(), 3);
   EXPECT_EQ(clocks[1].output, 0);
   EXPECT_EQ(clocks[1].also, std::vector<int>{2});

@@ -97,8 +97,8 @@ TEST(Gaps, AsWalkedForDrawnClocks) {
 TEST(Gaps, ByHand) {
   EXPECT_EQ(CommonStep(10, Rational(40, 3)), Rational(10, 3));
   EXPECT_EQ(Hyperperiod(10, Rational(40, 3)), Rational(40));
-  const Clock fast = OnGrid({6, 0, 3}, Rational(5, 3));   // rises at 0, falls at 5
-  const Clock slow = OnGrid({8, 1, 2}, Rational(5, 3));   // rises at 5/3, falls at 5
+  const Clock fast = OnGrid({6, 0, 3}, Rational(5, 3));  // rises at 0, falls at 5
+  const Clock slow = OnGrid({8, 1, 2}, Rational(5, 3));  // rises at 5/3, falls at 5
   // Rises 5/3 + 40/3 k against 10 i: 5/3, or that and 10/3 more. Falls 5: 5/3 behind 10/3.
   EXPECT_EQ(GapsBetween(fast, slow),
             (Gaps{Rational(5, 3), Rational(5, 3), Rational(10, 3), Rational(10, 3)}));

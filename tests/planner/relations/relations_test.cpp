@@ -106,8 +106,8 @@ TEST(RelationsOf, AllOrderedPairs) {
 // are no crossing.
 TEST(RelationsOf, TwoInputsAreNotRelated) {
   const Request request = MadeRequest({100, 80}, {200});
-  const Relations relations = RelationsOf(
-      request, MadeLoop(request, Primitive::kPll, Bandwidth::kHigh, 64, 1, {32}, 120));
+  const Relations relations =
+      RelationsOf(request, MadeLoop(request, Primitive::kPll, Bandwidth::kHigh, 64, 1, {32}, 120));
   ASSERT_EQ(relations.clocks.size(), 4);
   ASSERT_EQ(relations.all.size(), 10);
   int related = 0;

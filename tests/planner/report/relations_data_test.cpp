@@ -18,8 +18,7 @@ Answer MadeAnswer(const Request& request) {
   return answer;
 }
 
-ordered_json Made(const Request& request, const Answer& answer,
-                  const relations::Rule& rule = {}) {
+ordered_json Made(const Request& request, const Answer& answer, const relations::Rule& rule = {}) {
   return ordered_json::parse(RelationsJson(request, MadeDevice(), answer, rule));
 }
 

@@ -1,8 +1,7 @@
-#include "planner/report/SdcCrossings.h"
-
 #include <gtest/gtest.h>
 
 #include "made.h"
+#include "planner/report/SdcCrossings.h"
 
 namespace planner::report {
 namespace {
@@ -48,8 +47,9 @@ TEST(SdcCrossings, WhatAFifoWouldAllowIsACommentUnlessItIsSaid) {
   SdcOptions options;
   options.fifos = true;
   const std::string said = Of(two, options);
-  EXPECT_TRUE(Has(said, "\nset_max_delay 10 -from [get_clocks clk_out0] -to [get_clocks "
-                        "clk_out1]\nset_false_path -hold -from"))
+  EXPECT_TRUE(Has(said,
+                  "\nset_max_delay 10 -from [get_clocks clk_out0] -to [get_clocks "
+                  "clk_out1]\nset_false_path -hold -from"))
       << said;
   EXPECT_TRUE(Has(said, "has been said, and not been checked"));
   EXPECT_FALSE(Has(said, "#set_"));
@@ -70,25 +70,27 @@ TEST(SdcCrossings, AMulticycleIsNeverSaidByItself) {
   SdcOptions options;
   options.fifos = true;
   const std::string text = Of(Made(64, 64, 36), options);
-  EXPECT_TRUE(Has(text,
-                  "\n#set_multicycle_path 2 -setup -end -from [get_clocks clk_out0] -to [get_clocks "
-                  "clk_out1]\n"))
+  EXPECT_TRUE(
+      Has(text,
+          "\n#set_multicycle_path 2 -setup -end -from [get_clocks clk_out0] -to [get_clocks "
+          "clk_out1]\n"))
       << text;
   EXPECT_TRUE(Has(text, "clk_out0 to clk_out1: a gap of 1 ns, the same"));
   EXPECT_FALSE(Has(text, "\nset_"));
   // Back there are 9 ns.
   EXPECT_FALSE(Has(text, "-from [get_clocks clk_out1]"));
   // 18 degrees of 20 ns are 1 ns, too, and the launching clock is the faster one.
-  EXPECT_TRUE(Has(Of(Made(64, 128, 18)), "#set_multicycle_path 2 -setup -start -from [get_clocks "
-                                         "clk_out0] -to [get_clocks clk_out1]\n"));
+  EXPECT_TRUE(Has(Of(Made(64, 128, 18)),
+                  "#set_multicycle_path 2 -setup -start -from [get_clocks "
+                  "clk_out0] -to [get_clocks clk_out1]\n"));
 }
 
 TEST(SdcCrossings, TwoInputsAreAsynchronousOnlyWhereTheUserSaysSo) {
   const Request request = MadeRequest({100, 80}, {200});
-  const Answer answer =
-      MadeLoop(request, Primitive::kPll, Bandwidth::kHigh, 64, 1, {32}, 100);
+  const Answer answer = MadeLoop(request, Primitive::kPll, Bandwidth::kHigh, 64, 1, {32}, 100);
   const std::string command =
-      "set_clock_groups -asynchronous -group [get_clocks {clk_in1 clk_out0_in1}] -group [get_clocks "
+      "set_clock_groups -asynchronous -group [get_clocks {clk_in1 clk_out0_in1}] -group "
+      "[get_clocks "
       "{clk_in2 clk_out0_in2}]\n";
   EXPECT_TRUE(Has(SdcCrossings(request, answer, {}), "\n#" + command));
   SdcOptions options;
@@ -100,10 +102,11 @@ TEST(SdcCrossings, TwoInputsAreAsynchronousOnlyWhereTheUserSaysSo) {
 TEST(SdcInterclockUncertainties, OfALoop) {
   Two two = Made(64, 72);
   const std::string text = SdcInterclockUncertainties(two.request, two.answer);
-  EXPECT_TRUE(Has(text, "\nset_clock_uncertainty 0.127037 -from [get_clocks clk_in1] -to "
-                        "[get_clocks {clk_out0 clk_out1}]\n"
-                        "set_clock_uncertainty 0.127037 -from [get_clocks {clk_out0 clk_out1}] -to "
-                        "[get_clocks clk_in1]\n"))
+  EXPECT_TRUE(Has(text,
+                  "\nset_clock_uncertainty 0.127037 -from [get_clocks clk_in1] -to "
+                  "[get_clocks {clk_out0 clk_out1}]\n"
+                  "set_clock_uncertainty 0.127037 -from [get_clocks {clk_out0 clk_out1}] -to "
+                  "[get_clocks clk_in1]\n"))
       << text;
   EXPECT_FALSE(Has(text, "-from [get_clocks clk_out0]"));
   // And half of the input's.
@@ -111,8 +114,9 @@ TEST(SdcInterclockUncertainties, OfALoop) {
   EXPECT_TRUE(Has(SdcInterclockUncertainties(two.request, two.answer), " 0.137037 -from"));
   two.answer.outputs[1].jitter = 60;
   const std::string own = SdcInterclockUncertainties(two.request, two.answer);
-  EXPECT_TRUE(Has(own, "set_clock_uncertainty 0.117037 -from [get_clocks clk_in1] -to [get_clocks "
-                       "clk_out1]\n"))
+  EXPECT_TRUE(Has(own,
+                  "set_clock_uncertainty 0.117037 -from [get_clocks clk_in1] -to [get_clocks "
+                  "clk_out1]\n"))
       << own;
   two.answer.phase_error = std::nullopt;
   EXPECT_EQ(SdcInterclockUncertainties(two.request, two.answer), "");
@@ -128,21 +132,19 @@ TEST(SdcInterclockUncertainties, OfAKru) {
   Answer answer = MadeKru(request, settings, {1, Rational(3, 2)}, 100);
   answer.outputs[1].jitter = 300;
   const std::string text = SdcInterclockUncertainties(request, answer);
-  for (const char* const command :
-       {"0.2 -from [get_clocks clk_in1] -to [get_clocks clk_out0]",
-        "0.3 -from [get_clocks clk_in1] -to [get_clocks clk_out1]",
-        "0.2 -from [get_clocks clk_out0] -to [get_clocks clk_in1]",
-        "0.3 -from [get_clocks clk_out1] -to [get_clocks clk_in1]",
-        "0.2 -from [get_clocks clk_out1] -to [get_clocks clk_out0]",
-        "0.2 -from [get_clocks clk_out0] -to [get_clocks clk_out1]"}) {
+  for (const char* const command : {"0.2 -from [get_clocks clk_in1] -to [get_clocks clk_out0]",
+                                    "0.3 -from [get_clocks clk_in1] -to [get_clocks clk_out1]",
+                                    "0.2 -from [get_clocks clk_out0] -to [get_clocks clk_in1]",
+                                    "0.3 -from [get_clocks clk_out1] -to [get_clocks clk_in1]",
+                                    "0.2 -from [get_clocks clk_out1] -to [get_clocks clk_out0]",
+                                    "0.2 -from [get_clocks clk_out0] -to [get_clocks clk_out1]"}) {
     EXPECT_TRUE(Has(text, std::string("set_clock_uncertainty ") + command + "\n")) << text;
   }
 }
 
 TEST(SdcInterclockUncertainties, OnlyWithTheFirstInput) {
   const Request request = MadeRequest({100, 80}, {200});
-  const Answer answer =
-      MadeLoop(request, Primitive::kPll, Bandwidth::kHigh, 64, 1, {32}, 100);
+  const Answer answer = MadeLoop(request, Primitive::kPll, Bandwidth::kHigh, 64, 1, {32}, 100);
   const std::string text = SdcInterclockUncertainties(request, answer);
   EXPECT_TRUE(Has(text, "-from [get_clocks clk_in1] -to [get_clocks clk_out0_in1]"));
   EXPECT_FALSE(Has(text, "in2"));

@@ -1,9 +1,8 @@
-#include "planner/report/SdcPlain.h"
-
 #include <gtest/gtest.h>
 
 #include "made.h"
 #include "planner/report/Sdc.h"
+#include "planner/report/SdcPlain.h"
 
 namespace planner::report {
 namespace {
