@@ -7,6 +7,7 @@
 #include <utility>
 
 #include "planner/answer/Demands.h"
+#include "planner/answer/Jitter.h"
 #include "planner/explain/Smallest.h"
 
 namespace planner::explain {
@@ -134,6 +135,16 @@ void AddTolerance(const Question& question, const Demand& demand, std::vector<Ch
                       std::move(found->settings)});
 }
 
+// The jitter of an output, ps. An answer has none of settings beyond the ranges of VCO and PFD, which
+// count here where these ranges are left out.
+double JitterOf(const Question& question, const Demand& demand, const Settings& settings) {
+  if (const auto* const loop = std::get_if<LoopSettings>(&settings)) {
+    return answer::LoopJitter(question.device, question.request)
+        .PeakToPeak(loop->m, loop->d, loop->bandwidth);
+  }
+  return AnswerOf(question.Judge(settings), demand).jitter.value_or(answer::kUnknownJitter);
+}
+
 void AddJitter(const Question& question, const Demand& demand, std::vector<Change>* changes) {
   Question original = question;
   const Rational before = *question.request.MaxJitterOf(OutputOf(&original, demand));
@@ -143,8 +154,8 @@ void AddJitter(const Question& question, const Demand& demand, std::vector<Chang
     return changed.Ask();
   };
   const auto needs = [&](const Settings& settings) {
-    const std::optional<double> jitter = AnswerOf(question.Judge(settings), demand).jitter;
-    return jitter ? Rational::FromDouble(*jitter) : before;
+    const double jitter = JitterOf(question, demand, settings);
+    return jitter < answer::kUnknownJitter ? Rational::FromDouble(jitter) : before;
   };
   std::optional<Allowance> found = FindSmallest(find, needs, 1000000000);
   if (!found) return;
