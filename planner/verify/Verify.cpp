@@ -100,14 +100,17 @@ class Work {
   void DoAnswers() {
     const Node* const answers = document_.Find("answers");
     const Node& there = answers != nullptr ? *answers : document_;
-    if (answers == nullptr || answers->type != NodeType::kArray || answers->items.empty()) {
+    if (answers == nullptr || answers->type != NodeType::kArray) {
       found_.push_back(At(there,
                           answers == nullptr ? DiscrepancyKind::kMissing
-                          : answers->items.empty() && answers->type == NodeType::kArray
-                              ? DiscrepancyKind::kDiffers
-                              : DiscrepancyKind::kWrongType,
+                                             : DiscrepancyKind::kWrongType,
                           "answers", "array"));
       if (answers == nullptr) found_.back().found.clear();
+      return;
+    }
+    if (answers->items.empty()) {
+      found_.push_back(At(there, DiscrepancyKind::kMissing, "answers[0]", "object"));
+      found_.back().found.clear();
       return;
     }
     HoldRequest(kept_->request, document_, &found_);
