@@ -12,6 +12,7 @@
 #include "cli/Options.h"
 #include "cli/Output.h"
 #include "cli/RequestFile.h"
+#include "planner/read/Letters.h"
 #include "planner/read/MistakeText.h"
 #include "planner/read/Options.h"
 #include "planner/read/Shown.h"
@@ -67,13 +68,13 @@ Format ReadFormat(std::string_view command, const Given& given, Complaints* comp
   std::vector<std::string> known;
   for (const auto& [word, format] : FormatsOf(command)) {
     known.push_back(word);
-    if (word != *name) continue;
+    if (!planner::read::IsSameWord(word, *name)) continue;
     if (command == "compare" && IsHdl(format) && !given.Has("--pick")) {
       complaints->Add(fmt::format("--format {} is about one candidate: say which with --pick N", word));
     }
     return format;
   }
-  complaints->Add(command == "compare" && *name == "sdc"
+  complaints->Add(command == "compare" && planner::read::IsSameWord(*name, "sdc")
                       ? "compare has no --format sdc: constraints are those of one plan; use plan, "
                         "best or the command of a primitive"
                       : fmt::format("--format: \"{}\" must be {}", Shown(*name),
@@ -86,11 +87,12 @@ Format ReadFormat(std::string_view command, const Given& given, Complaints* comp
 void ReadSdc(Call* call, Complaints* complaints) {
   const Given& given = call->given;
   const std::string format = given.Value("--format").value_or("");
-  call->sdc.plain = given.Has("--sdc-plain") || format == kPlainSdc;
+  const bool is_plain = planner::read::IsSameWord(format, kPlainSdc);
+  call->sdc.plain = given.Has("--sdc-plain") || is_plain;
   call->sdc.fifos = given.Has("--sdc-fifos");
   for (const char* const option : {"--sdc-plain", "--sdc-fifos"}) {
     if (!given.Has(option)) continue;
-    if (!format.empty() && format != "sdc" && format != kPlainSdc) {
+    if (!format.empty() && !is_plain && !planner::read::IsSameWord(format, "sdc")) {
       complaints->Add(fmt::format("{} contradicts --format {}", option, Shown(format)));
     }
     call->format = Format::kSdc;

@@ -9,6 +9,7 @@
 #include "cli/Failure.h"
 #include "cli/Output.h"
 #include "cli/Words.h"
+#include "planner/read/Letters.h"
 #include "planner/read/Shown.h"
 #include "planner/report/DevicesText.h"
 #include "planner/report/PartText.h"
@@ -32,11 +33,12 @@ void TellFolders(const Setting& setting) {
 
 bool IsJson(const Given& given) {
   const std::string format = given.Value("--format").value_or("text");
-  if (format != "text" && format != "json") {
+  const bool is_json = planner::read::IsSameWord(format, "json");
+  if (!is_json && !planner::read::IsSameWord(format, "text")) {
     throw Failure::OfUsage(fmt::format("--format: \"{}\" must be text or json",
                                        planner::read::Shown(format)));
   }
-  return format == "json";
+  return is_json;
 }
 
 planner::device::Catalogue::Selection Selected(const planner::device::Files& files,

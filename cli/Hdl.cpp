@@ -6,6 +6,7 @@
 #include "planner/hdl/Hdl.h"
 #include "planner/hdl/Instance.h"
 #include "planner/hdl/Names.h"
+#include "planner/read/Letters.h"
 #include "planner/read/Shown.h"
 
 namespace cli {
@@ -13,6 +14,7 @@ namespace cli {
 namespace {
 
 using planner::hdl::Language;
+using planner::read::IsSameWord;
 using planner::read::Shown;
 
 std::string NameOf(const Call& call) {
@@ -20,7 +22,8 @@ std::string NameOf(const Call& call) {
 }
 
 Language LanguageOf(const Call& call) {
-  const bool is_vhdl = call.format == Format::kVhdl || call.given.Value("--language") == "vhdl";
+  const bool is_vhdl = call.format == Format::kVhdl ||
+                       IsSameWord(call.given.Value("--language").value_or(""), "vhdl");
   return is_vhdl ? Language::kVhdl : Language::kVerilog;
 }
 
@@ -39,7 +42,7 @@ std::vector<std::string> HdlMistakes(const Call& call) {
   if (const auto language = call.given.Value("--language")) {
     if (call.format != Format::kTestbench) {
       mistakes.emplace_back("--language goes with --format testbench only");
-    } else if (*language != "verilog" && *language != "vhdl") {
+    } else if (!IsSameWord(*language, "verilog") && !IsSameWord(*language, "vhdl")) {
       mistakes.push_back(
           fmt::format("--language: \"{}\" must be verilog or vhdl", Shown(*language)));
     }
