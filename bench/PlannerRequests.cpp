@@ -52,23 +52,43 @@ std::vector<Named> ReadmeRequests() {
 std::vector<Named> SlowRequests() {
   const auto tenths = [](int number) { return Rational(number, 10); };
   return {
-      {"odd_from_800",
-       Of({800}, {Clock(Rational(333333, 1000)), Clock(tenths(1481)), Clock(27)})},
+      {"odd_from_800", Of({800}, {Clock(Rational(333333, 1000)), Clock(tenths(1481)), Clock(27)})},
       {"seven", Of({100, 101}, {Clock(tenths(1481), 90, 40), Clock(tenths(747), 33, 60),
                                 Clock(27, 10), Clock(tenths(333), 200), Clock(tenths(611), 45, 25),
                                 Clock(13, 120), Clock(91, 70)})},
-      {"six_delay_lines",
-       Of({50}, {Clock(100, 10), Clock(50, 33), Clock(150, 70), Clock(75, 99), Clock(25, 111),
-                 Clock(60, 123)})},
+      {"six_delay_lines", Of({50}, {Clock(100, 10), Clock(50, 33), Clock(150, 70), Clock(75, 99),
+                                    Clock(25, 111), Clock(60, 123)})},
   };
 }
 
 Request OrdinaryRequest(drawn::Random& random) {
-  const std::vector<Rational> inputs = {24, 25, 26, 27, Rational(100, 3), 48, 50, 54, kHalfHd, 100,
-                                        125, 156, 200};
-  const std::vector<Rational> usual = {10, 12, Rational(12288, 1000), 25, 27, Rational(100, 3), 40,
-                                       48, 50, Rational(125, 2), 65, kHalfHd, 80, 100, 125, 133,
-                                       kHd, 150, 156, 166, 200, 250, 300, 333, 400};
+  const std::vector<Rational> inputs = {24,  25,  26,  27, Rational(100, 3), 48, 50, 54, kHalfHd,
+                                        100, 125, 156, 200};
+  const std::vector<Rational> usual = {10,
+                                       12,
+                                       Rational(12288, 1000),
+                                       25,
+                                       27,
+                                       Rational(100, 3),
+                                       40,
+                                       48,
+                                       50,
+                                       Rational(125, 2),
+                                       65,
+                                       kHalfHd,
+                                       80,
+                                       100,
+                                       125,
+                                       133,
+                                       kHd,
+                                       150,
+                                       156,
+                                       166,
+                                       200,
+                                       250,
+                                       300,
+                                       333,
+                                       400};
   const std::vector<Rational> phases = {0, 90, 180, 270, 45, Rational(45, 2), -90};
   const std::vector<Rational> duties = {50, 50, 25, 40};
   constexpr int kMostOutputs = 5;
