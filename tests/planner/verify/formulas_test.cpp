@@ -73,6 +73,15 @@ TEST(Formulas, PinsOfAKru) {
   EXPECT_EQ(DutyOf(Pin::kClkfxdv, 8), Rational(50));
 }
 
+// 50 ppm of 100 MHz are 0.005 MHz.
+TEST(Formulas, WhatInputsCanBe) {
+  EXPECT_EQ(CornersOf(Rational(100), 0), (std::vector<Rational>{100}));
+  EXPECT_EQ(CornersOf(Rational(100), 50),
+            (std::vector<Rational>{Rational(99995, 1000), Rational(100005, 1000)}));
+  EXPECT_EQ(CornersOf(std::vector<Rational>{10, 20}, 100000),
+            (std::vector<Rational>{9, 11, 18, 22}));
+}
+
 }  // namespace
 
 }  // namespace planner::verify
