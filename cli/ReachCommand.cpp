@@ -117,7 +117,7 @@ planner::read::Reading ReadRequest(const Given& given, int output) {
   return std::move(*reading);
 }
 
-// Those that can be asked: a KRU has one input and no output 6.
+// Those that can be asked: a KRU has one input.
 std::vector<Primitive> PrimitivesOf(const planner::Request& request,
                                     const planner::Device& device) {
   std::vector<Primitive> primitives;
