@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "planner/answer/Evaluate.h"
+#include "planner/answer/Rank.h"
 #include "planner/report/ExplainWords.h"
 #include "planner/report/FindingText.h"
 #include "planner/report/Numbers.h"
@@ -70,6 +71,8 @@ class Texts {
   string Together(const OfPrimitive& one) const;
   string Corrections(const OfPrimitive& one) const;
   const OfPrimitive* Nearest() const;
+  Rational Distance(const Settings& settings) const;
+  string NearestText() const;
 
   const Explanation& explanation_;
   const Request& request_;
@@ -148,6 +151,37 @@ string Texts::Together(const OfPrimitive& one) const {
          " ppm";
 }
 
+// How far settings are from the request, in tolerances.
+Rational Texts::Distance(const Settings& settings) const {
+  return answer::KeyOf(answer::Evaluate(request_, device_, settings, Source{})).worst_error;
+}
+
+// All outputs moved; or the one phase, duty cycle or jitter that is nearer.
+string Texts::NearestText() const {
+  string text;
+  std::optional<Rational> least;
+  if (const OfPrimitive* const moved = Nearest()) {
+    text = Together(*moved) + " (" + NameOf(*moved) + ")";
+    least = Distance(moved->together.front().settings);
+  }
+  for (const OfPrimitive& one : explanation_.primitives) {
+    for (const Conflict& conflict : one.conflicts) {
+      if (!conflict.lifts_all) continue;
+      for (const Change& change : conflict.changes) {
+        if (change.kind != ChangeKind::kPhase && change.kind != ChangeKind::kDuty &&
+            change.kind != ChangeKind::kJitter) {
+          continue;
+        }
+        const Rational distance = Distance(change.settings);
+        if (least && *least <= distance) continue;
+        least = distance;
+        text = ChangeWords(change, one.primitive) + " (" + NameOf(one) + ")";
+      }
+    }
+  }
+  return text;
+}
+
 string Texts::Verdict() const {
   std::vector<string> able;
   for (const OfPrimitive& one : explanation_.primitives) {
@@ -160,10 +194,8 @@ string Texts::Verdict() const {
   }
   string text = Paragraph(style_, "Not possible as it stands with any primitive of " +
                                       device_.part + ".");
-  const OfPrimitive* nearest = Nearest();
-  if (!nearest) return text;
-  return text +
-         Prose(style_, "nearest: ", Together(*nearest) + " (" + NameOf(*nearest) + ")");
+  const string nearest = NearestText();
+  return nearest.empty() ? text : text + Prose(style_, "nearest: ", nearest);
 }
 
 // What is explained is what the hardware can do. The engine may still not find it.
