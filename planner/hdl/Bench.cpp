@@ -64,17 +64,17 @@ Bench BenchOf(const Request& request, const Answer& answer) {
   bench.hyperperiod = HyperperiodOf(bench.outputs, edges);
   if (bench.hyperperiod) {
     bench.cycles = *bench.hyperperiod;
-    bench.repeat = std::max<std::int64_t>(
-        1, std::min((kFewestCycles + bench.cycles - 1) / bench.cycles,
-                    Whole(Rational(kMostEdges) / (edges * bench.cycles))));
+    bench.repeat =
+        std::max<std::int64_t>(1, std::min((kFewestCycles + bench.cycles - 1) / bench.cycles,
+                                           Whole(Rational(kMostEdges) / (edges * bench.cycles))));
   } else {
     bench.cycles = std::max({std::int64_t{1}, Ceiling(2 * longest),
                              std::min(kMostCycles, Whole(Rational(kMostEdges) / edges))});
   }
   for (Expected& output : bench.outputs) {
     // Those at n + phase periods, below the number of cycles.
-    const Rational periods = Rational(output.ratio.numerator, output.ratio.denominator) *
-                             bench.cycles;
+    const Rational periods =
+        Rational(output.ratio.numerator, output.ratio.denominator) * bench.cycles;
     output.rises = Ceiling(periods - Rational(output.phase, output.shape));
   }
   bench.before = kCyclesToLock;
@@ -92,9 +92,10 @@ std::string BenchText(const Bench& bench) {
             (bench.cycles == 1 ? " cycle" : " cycles") +
             " of the input, the hyperperiod; REPEAT of them are looked at.";
   } else {
-    text += "The hyperperiod, after which the outputs come back to where they were, is too long to "
-            "be simulated: the first " +
-            cycles + " cycles of the input are looked at.";
+    text +=
+        "The hyperperiod, after which the outputs come back to where they were, is too long to "
+        "be simulated: the first " +
+        cycles + " cycles of the input are looked at.";
   }
   return text;
 }

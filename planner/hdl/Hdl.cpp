@@ -10,9 +10,7 @@ namespace planner::hdl {
 
 namespace {
 
-std::string_view MarkOf(Language language) {
-  return language == Language::kVerilog ? "//" : "--";
-}
+std::string_view MarkOf(Language language) { return language == Language::kVerilog ? "//" : "--"; }
 
 std::string Subject(const Device& device, const Answer& answer) {
   return std::string(Name(answer.primitive)) + " of a " + device.part;

@@ -186,8 +186,9 @@ void Builder::AddKru(const KruSettings& kru) {
   if (is_sp) {
     const bool is_doubled = !kru.pins.empty() && kru.pins[0] == hardware::Pin::kClk2x;
     instance_.attributes.push_back({"CLKIN_DIVIDE_BY_2", Flag{kru.divide_by_2}});
-    instance_.attributes.push_back(
-        {"CLK_FEEDBACK", string(!kru.feedback ? "NONE" : is_doubled ? "2X" : "1X")});
+    instance_.attributes.push_back({"CLK_FEEDBACK", string(!kru.feedback ? "NONE"
+                                                           : is_doubled  ? "2X"
+                                                                         : "1X")});
   }
   Set("M", kru.m);
   Set("D", kru.d);

@@ -46,9 +46,9 @@ struct Copy {
 };
 
 struct Instance {
-  std::string model;  // "VORKEL_TSYN"
-  std::string label;  // "tsyn_inst"
-  std::vector<Port> ports;  // of the module
+  std::string model;              // "VORKEL_TSYN"
+  std::string label;              // "tsyn_inst"
+  std::vector<Port> ports;        // of the module
   std::vector<std::string> nets;  // in it, beside its ports
   std::vector<Attribute> attributes;
   std::vector<Connection> connections;  // all pins of the primitive

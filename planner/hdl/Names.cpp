@@ -8,6 +8,7 @@ namespace planner::hdl {
 
 namespace {
 
+// clang-format off: a word to a line is a long list.
 // IEEE 1800-2017, annex B.
 constexpr std::string_view kVerilogKeywords[] = {
     "accept_on", "alias", "always", "always_comb", "always_ff", "always_latch", "and", "assert",
@@ -60,12 +61,12 @@ constexpr std::string_view kVhdlKeywords[] = {
 // Libraries, packages, types and names of the generated text, which an entity of the same name
 // would hide.
 constexpr std::string_view kUsedNames[] = {
-    "bit",     "boolean",        "character", "clkfb",   "delay_length",     "false",
-    "fs",      "ieee",           "integer",   "locked",  "math_real",        "natural",
-    "now",     "numeric_std",    "positive",  "real",    "rst",              "rtl",
-    "sel",     "severity_level", "simulation", "standard", "std",            "std_logic",
-    "std_logic_1164", "std_ulogic", "string", "textio",  "time",             "true",
-    "work",    "clk_in_sel",     "jitter_rms_fs", "jitter_seed"};
+    "bit", "boolean", "character", "clk_in_sel", "clkfb", "delay_length", "false", "fs", "ieee",
+    "integer", "jitter_rms_fs", "jitter_seed", "locked", "math_real", "natural", "now",
+    "numeric_std", "positive", "real", "rst", "rtl", "sel", "severity_level", "simulation",
+    "standard", "std", "std_logic", "std_logic_1164", "std_ulogic", "string", "textio", "time",
+    "true", "work"};
+// clang-format on
 
 bool IsLetter(char c) { return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z'); }
 bool IsDigit(char c) { return c >= '0' && c <= '9'; }

@@ -10,8 +10,8 @@ namespace planner::hdl {
 
 namespace {
 
-using std::string;
 using report::Join;
+using std::string;
 
 string Literal(const Attribute& attribute) {
   if (const auto* number = std::get_if<std::int64_t>(&attribute.value)) {
@@ -69,8 +69,8 @@ string Check(const Bench& bench, const Expected& output, int input, int place) {
   set("PHASE", std::to_string(output.phase));
   set("HIGH", std::to_string(output.high));
   set("RISES", (bench.hyperperiod ? "REPEAT * " : "") + std::to_string(output.rises));
-  string text = "  VORKEL_CLOCK_CHECK #(\n" + Listed(lines) + "\n  ) check" + o + "_in" + n +
-                " (\n";
+  string text =
+      "  VORKEL_CLOCK_CHECK #(\n" + Listed(lines) + "\n  ) check" + o + "_in" + n + " (\n";
   lines.clear();
   set("clk", "clk_out" + o);
   set("run", "locked && is_on" + n);

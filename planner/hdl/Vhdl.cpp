@@ -10,8 +10,8 @@ namespace planner::hdl {
 
 namespace {
 
-using std::string;
 using report::Join;
+using std::string;
 
 constexpr const char* kContext = "library ieee;\nuse ieee.std_logic_1164.all;\n";
 
@@ -120,11 +120,11 @@ string Source(const Parts& mhz, int n) {
                  Bound("MHZ_DEN", std::to_string(mhz.denominator))},
                 ",") +
          "\n    )\n    port map (\n" +
-         Listed("      ",
-                {Bound("enable", "enable"), Bound("clk", "clk_in" + number),
-                 Bound("edge_time", "edge_time" + number),
-                 Bound("edge_rest", "edge_rest" + number)},
-                ",") +
+         Listed(
+             "      ",
+             {Bound("enable", "enable"), Bound("clk", "clk_in" + number),
+              Bound("edge_time", "edge_time" + number), Bound("edge_rest", "edge_rest" + number)},
+             ",") +
          "\n    );\n";
 }
 
@@ -218,8 +218,7 @@ string VhdlModule(const string& name, const Instance& instance) {
   std::vector<string> ports;
   for (const Port& port : instance.ports) ports.push_back(PortLine(port.name, port.is_output));
   // The models are visible in VHDL-93 only so.
-  return kContext +
-         ("use work.all;\n\nentity " + name) +
+  return kContext + ("use work.all;\n\nentity " + name) +
          " is\n"
          "  generic (\n"
          "    -- Of the simulation alone.\n"
