@@ -3,7 +3,7 @@
 //
 // Lists can be longer than memory, so that text, JSON and rows are made piece by piece.
 //
-// Tested by reach_text_test.cpp and reach.test.
+// Tested by reach.test.
 #ifndef VORKEL_PLANNER_REPORT_REACHTEXT_H_
 #define VORKEL_PLANNER_REPORT_REACHTEXT_H_
 
