@@ -8,7 +8,8 @@ namespace planner::hdl {
 
 namespace {
 
-// clang-format off: a word to a line is a long list.
+// Many words to a line.
+// clang-format off
 // IEEE 1800-2017, annex B.
 constexpr std::string_view kVerilogKeywords[] = {
     "accept_on", "alias", "always", "always_comb", "always_ff", "always_latch", "and", "assert",
