@@ -1,9 +1,10 @@
 // Tested by loop_dividers_test.cpp.
 #include "planner/search/LoopDividers.h"
 
+#include <algorithm>
 #include <cstdint>
 #include <tuple>
-
+#include <utility>
 
 namespace planner::search {
 
@@ -49,13 +50,33 @@ LoopDividers::Choice LoopDividers::ChoiceOf(Kind kind, int m, int d, int divider
   choice.error = by_frequency;
   const bool is_shape_off = shape.error.value + shape.error.slack > 0;
   if (is_shape_off && !IsSurelyBelow(by_shape.near, by_frequency.near) &&
-      (IsSurelyBelow(by_frequency.near, by_shape.near) ||
-       Exact(by_frequency) < Exact(by_shape))) {
+      (IsSurelyBelow(by_frequency.near, by_shape.near) || Exact(by_frequency) < Exact(by_shape))) {
     choice.error = by_shape;
   }
   choice.is_met = shape.is_met && frequency_.IsMet(m, whole);
   if (by_margin_) choice.margin = range_.Margin(static_cast<double>(m) / whole);
   return choice;
+}
+
+int LoopDividers::ShapePlace(int divider) const {
+  if (places_.empty()) {
+    const int last = largest_ / kEighths;
+    std::vector<std::pair<Rational, int>> order;
+    for (int whole = 1; whole <= last; ++whole) {
+      LoopError error;
+      error.demand = LoopError::Demand::kShape;
+      error.a = whole * kEighths;
+      order.emplace_back(Exact(error), whole);
+    }
+    std::sort(order.begin(), order.end());
+    places_.resize(static_cast<std::size_t>(last) + 1);
+    int place = 0;
+    for (std::size_t i = 0; i < order.size(); ++i) {
+      if (i > 0 && order[i].first != order[i - 1].first) ++place;
+      places_[static_cast<std::size_t>(order[i].second)] = place;
+    }
+  }
+  return places_[static_cast<std::size_t>(divider / kEighths)];
 }
 
 bool LoopDividers::IsBetter(Kind kind, int m, int d, const Choice& a, const Choice& b) const {
@@ -76,6 +97,16 @@ bool LoopDividers::IsBetter(Kind kind, int m, int d, const Choice& a, const Choi
     if (by_frequency) {
       return *by_frequency != 0 ? *by_frequency < 0 : a.divider < b.divider;
     }
+  }
+  // Where phase or duty cycle are the worst, many dividers have the same error.
+  constexpr auto kShape = LoopError::Demand::kShape;
+  if (kind == Kind::kMoving && a.error.demand == kShape && b.error.demand == kShape) {
+    const int own = ShapePlace(a.divider);
+    const int other = ShapePlace(b.divider);
+    if (own != other) return own < other;
+    const auto by_frequency = FrequencyDemand::Compare(frequency_, m, std::int64_t{d} * a.divider,
+                                                       frequency_, m, std::int64_t{d} * b.divider);
+    if (by_frequency && *by_frequency != 0) return *by_frequency < 0;
   }
   const auto key = [&](const Choice& choice) {
     const answer::Errors errors = ErrorsOf(kind, m, d, choice.divider);
@@ -108,8 +139,8 @@ LoopDividers::Choice LoopDividers::ChooseNearest(Kind kind, int m, int d) const 
     return is_first_best;
   };
   const int middle = static_cast<int>(std::min(ideal, most));
-  // Downwards the frequency rises, and upwards it falls. The first to be asked is one divider beyond
-  // the rounded end of the range.
+  // Downwards the frequency rises, and upwards it falls. The first to be asked is one divider
+  // beyond the rounded end of the range.
   const int last = static_cast<int>(std::min(ratio / range_.Lowest(), most)) + kEighths;
   for (int divider = DownTo(kind, std::min(middle, last)); divider != 0;
        divider = DownTo(kind, divider - 1)) {
@@ -138,12 +169,11 @@ LoopDividers::Choice LoopDividers::ChooseWidest(Kind kind, int m, int d) const {
   // All that meet the frequency and keep the range are between these, rounded outwards.
   const double from = std::max(ideal / (1 + frequency_.Allowed()), ratio / range_.Highest());
   const double least = 1 - frequency_.Allowed();
-  const double to =
-      std::min(least > 0 ? ideal / least : HUGE_VAL, ratio / range_.Lowest());
+  const double to = std::min(least > 0 ? ideal / least : HUGE_VAL, ratio / range_.Lowest());
   const int first = static_cast<int>(std::min(from, most)) - kEighths;
   const int last = static_cast<int>(std::min(to, most)) + kEighths;
-  const int middle = std::clamp(
-      static_cast<int>(std::min(ratio / range_.Middle(), most)), std::min(first, last), last);
+  const int middle = std::clamp(static_cast<int>(std::min(ratio / range_.Middle(), most)),
+                                std::min(first, last), last);
   Choice best;
   const auto take = [&](int divider) {
     const std::int64_t whole = std::int64_t{d} * divider;
@@ -177,8 +207,7 @@ answer::Errors LoopDividers::ErrorsOf(Kind kind, int m, int d, int divider) cons
 
 Rational LoopDividers::Exact(const LoopError& error) const {
   if (error.demand == LoopError::Demand::kFrequency) {
-    return frequency_.Ppm(error.a, error.b) /
-           answer::FrequencyUnit(request_.ToleranceOf(asked_));
+    return frequency_.Ppm(error.a, error.b) / answer::FrequencyUnit(request_.ToleranceOf(asked_));
   }
   // Of phase and duty cycle alone: with the frequency as it is asked for.
   const int divider = error.a != 0 ? error.a : kEighths;

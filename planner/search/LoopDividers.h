@@ -131,6 +131,9 @@ class LoopDividers {
     const double quotient = ideal / divider;
     return frequency_.QuickError(quotient) - frequency_.Slack() * (1 + quotient);
   }
+  // The place of the shape of a whole divider among those of all, by their exact errors; the same
+  // for equal ones. Worked out when it is first asked for, which is seldom.
+  int ShapePlace(int divider) const;
   bool IsBetter(Kind kind, int m, int d, const Choice& a, const Choice& b) const;
   Choice ChoiceOf(Kind kind, int m, int d, int divider) const;
   answer::Errors ErrorsOf(Kind kind, int m, int d, int divider) const;
@@ -151,6 +154,7 @@ class LoopDividers {
   OutputShape shape_;
   std::vector<ShapeError> moving_;  // by the whole divider
   ShapeError still_;
+  mutable std::vector<int> places_;  // of the shapes, by the whole divider
 };
 
 }  // namespace planner::search
