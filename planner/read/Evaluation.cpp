@@ -316,10 +316,11 @@ class Finisher {
     const int above = std::clamp(below + 1, times.shortest, times.longest);
     const std::string first = Written(hardware::DutyOfHighTime(below, divider));
     const std::string second = Written(hardware::DutyOfHighTime(above, divider));
-    const bool is_outside = halves < Rational(times.shortest) || halves > Rational(times.longest);
+    const bool is_short = halves < Rational(times.shortest);
+    const bool is_outside = is_short || halves > Rational(times.longest);
     Refuse(place, Written(value), what,
            first == second || is_outside
-               ? "the nearest is " + (halves < Rational(times.shortest) ? first : second) + " percent"
+               ? "the nearest is " + (is_short ? first : second) + " percent"
                : "the nearest are " + first + " and " + second + " percent");
   }
 

@@ -127,7 +127,9 @@ std::string Outputs(int count) {
 // "--in is missing: the input frequency, such as --in 100". A line of a batch has no options beside
 // it: its place says so.
 std::string MissingText(const Mistake& mistake) {
-  if (!mistake.hint.empty()) return fmt::format("{} is missing: {}", mistake.place.entry, mistake.hint);
+  if (!mistake.hint.empty()) {
+    return fmt::format("{} is missing: {}", mistake.place.entry, mistake.hint);
+  }
   if (mistake.place.line > 0) {
     return fmt::format("{}:{}: the request has no {}", ShownWhole(mistake.place.file),
                        mistake.place.line, mistake.place.entry);

@@ -152,7 +152,8 @@ class PlanReader {
     }
     settings.phase_shift = Number(set, path, "phase_shift");
     for (const auto& [name, entry] :
-         {std::pair{"feedback", &settings.feedback}, {"clkin_divide_by_2", &settings.divide_by_2}}) {
+         {std::pair{"feedback", &settings.feedback},
+          {"clkin_divide_by_2", &settings.divide_by_2}}) {
       const Node* const node = EntryOf(set, path, name, NodeType::kBoolean);
       if (node != nullptr) *entry = {node->truth, At(*node, path + "." + name), ""};
     }
