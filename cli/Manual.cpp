@@ -104,9 +104,10 @@ std::string Examples() {
   std::string text;
   for (const Command& command : Commands()) {
     if (!command.is_shown) continue;
-    text += fmt::format(".PP\n{}:\n.PP\n.RS 4\n.EX\n{}\n.EE\n.RE\n",
-                        Sentence(command.description).substr(0, Sentence(command.description).size() - 1),
-                        Escaped(fmt::format("vorkel {} {}", command.name, command.example)));
+    text += fmt::format(
+        ".PP\n{}:\n.PP\n.RS 4\n.EX\n{}\n.EE\n.RE\n",
+        Sentence(command.description).substr(0, Sentence(command.description).size() - 1),
+        Escaped(fmt::format("vorkel {} {}", command.name, command.example)));
   }
   return text;
 }

@@ -37,8 +37,8 @@ bool HasColour() {
          isatty(STDOUT_FILENO);
 }
 
-// The folder of the executable file. Where /proc is not there, as in a plain chroot, the system still
-// tells by which path it was started.
+// The folder of the executable file. Where /proc is not there, as in a plain chroot, the system
+// still tells by which path it was started.
 std::string OwnFolder() {
   namespace fs = std::filesystem;
   std::error_code error;
@@ -60,8 +60,7 @@ std::string CalledAs() {
   constexpr std::string_view kPlain =
       "abcdefghijklmnopqrstuvwxyzABCDEFGHIJKLMNOPQRSTUVWXYZ0123456789_-+./";
   const std::string_view word = program_invocation_name;
-  const bool is_plain =
-      !word.empty() && word.find_first_not_of(kPlain) == std::string_view::npos;
+  const bool is_plain = !word.empty() && word.find_first_not_of(kPlain) == std::string_view::npos;
   return is_plain ? std::string(word) : "vorkel";
 }
 

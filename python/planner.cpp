@@ -1,8 +1,9 @@
-// The extension vorkel._planner: the planner's library for the Python package that stands around it.
+// The extension vorkel._planner: the planner's library for the Python package that stands around
+// it.
 //
-// What goes in is a request in JSON, and what comes out JSON and other texts; the package makes types
-// of them. What goes wrong is raised by the package's own functions (vorkel/_errors.py), which get it
-// as data.
+// What goes in is a request in JSON, and what comes out JSON and other texts; the package makes
+// types of them. What goes wrong is raised by the package's own functions (vorkel/_errors.py),
+// which get it as data.
 //
 // Python's other threads run while something is planned, and can plan themselves: plans share
 // nothing, and runs of the engine take turns (planner/engine/Ask.h).
@@ -110,15 +111,13 @@ Asked Read(const string& json) {
   try {
     const auto files = planner::device::HostFiles();
     const auto& name = asked.reading.device;
-    asked.device =
-        planner::device::Catalogue(*files).FindDevice(name ? name->value : kUsualDevice);
+    asked.device = planner::device::Catalogue(*files).FindDevice(name ? name->value : kUsualDevice);
   } catch (const planner::device::PartError& error) {
     RaisePart(error);
   }
   const auto& primitive = asked.request().primitive;
   if (asked.device.primitives.empty()) {
-    Raise("raise_request",
-          NoPrimitive(asked.device, planner::report::LacksAllText(asked.device)));
+    Raise("raise_request", NoPrimitive(asked.device, planner::report::LacksAllText(asked.device)));
   }
   if (primitive && !asked.device.Has(*primitive)) {
     Raise("raise_request",
@@ -227,8 +226,8 @@ class Explanation {
       : asked_(Read(request)), has_own_inputs_(oscillators) {
     const std::vector<planner::Rational> inputs =
         oscillators ? Inputs(*oscillators) : planner::explain::StockOscillators();
-    explanation_ = Beside(
-        [&] { return planner::explain::Explain(asked_.request(), asked_.device, inputs); });
+    explanation_ =
+        Beside([&] { return planner::explain::Explain(asked_.request(), asked_.device, inputs); });
   }
 
   string Json() const { return planner::report::ExplainJson(explanation_, asked_.device); }
@@ -264,8 +263,7 @@ string Devices(const std::optional<string>& name) {
   if (!name) return planner::report::DevicesJson(planner::device::List(*files));
   try {
     const auto selection = planner::device::Catalogue(*files).Select(*name);
-    return planner::report::DeviceJson(planner::device::Describe(selection.file),
-                                       selection.grades);
+    return planner::report::DeviceJson(planner::device::Describe(selection.file), selection.grades);
   } catch (const planner::device::PartError& error) {
     RaisePart(error);
   }
@@ -285,9 +283,8 @@ string Verify(const string& plan, const string& file) {
       RaisePart(error);
     }
   }
-  const auto wrong = Beside([&] {
-    return planner::verify::Verify(plan, device, &planner::report::JsonSentences());
-  });
+  const auto wrong = Beside(
+      [&] { return planner::verify::Verify(plan, device, &planner::report::JsonSentences()); });
   ordered_json data = ordered_json::array();
   for (const auto& one : wrong) data.push_back(planner::report::DiscrepancyData(one, file));
   return Text(data);

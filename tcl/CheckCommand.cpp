@@ -50,8 +50,8 @@ string Check(Words words) {
   if (name.size() <= kEnding.size() || !name.ends_with(kEnding)) {
     throw Failure::OfUsage("no_file", path, path + ": a device file is named DEVICE.toml");
   }
-  const auto checked = planner::device::Check(Contents(path), path,
-                                              name.substr(0, name.size() - kEnding.size()));
+  const auto checked =
+      planner::device::Check(Contents(path), path, name.substr(0, name.size() - kEnding.size()));
   return planner::report::TclDict(planner::report::CheckData(checked, path));
 }
 

@@ -21,11 +21,9 @@ using std::string;
 
 // Options have one dash here, alone and in sentences.
 string WithOneDash(string text) {
-  for (const auto options :
-       {planner::read::RequestOptions(), planner::read::SettingOptions()}) {
+  for (const auto options : {planner::read::RequestOptions(), planner::read::SettingOptions()}) {
     for (const planner::read::OptionFacts& facts : options) {
-      for (std::size_t i = text.find(facts.name); i != string::npos;
-           i = text.find(facts.name, i)) {
+      for (std::size_t i = text.find(facts.name); i != string::npos; i = text.find(facts.name, i)) {
         text.erase(i, 1);
       }
     }
@@ -36,7 +34,8 @@ string WithOneDash(string text) {
 // A list of dicts with `kind`, and what else an entry has.
 string DictsOf(const std::vector<ordered_json>& entries) {
   std::vector<Tcl_Obj*> dicts;
-  for (const ordered_json& entry : entries) dicts.push_back(Object(planner::report::TclDict(entry)));
+  for (const ordered_json& entry : entries)
+    dicts.push_back(Object(planner::report::TclDict(entry)));
   Tcl_Obj* const list = ListOf(dicts);
   Tcl_IncrRefCount(list);
   string text = Text(list);

@@ -30,7 +30,7 @@ class Range:
 
 @dataclass(frozen=True)
 class Finding:
-    """What there is to say beside numbers: a limit that is broken, a demand that is missed, a note."""
+    """What there is to say beside numbers: a broken limit, a missed demand, a note."""
 
     kind: str
     quantity: Optional[str]
@@ -125,8 +125,8 @@ class Limits:
     largest_count: int
     """The most VCO periods for which a divider can hold its output high or low."""
     vco_margin: Fraction
-    """The smallest distance from an end of the range, as a fraction of that end, with each input and
-    all of its tolerance; negative outside."""
+    """The smallest distance from an end of the range, as a fraction of that end, with each input
+    and all of its tolerance; negative outside."""
     pfd_margin: Fraction
 
 

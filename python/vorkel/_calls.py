@@ -250,7 +250,7 @@ def compare(
     request: Optional[Mapping[str, Any]] = None,
     **entries: Any,
 ) -> Plan:
-    """All candidates, the best first, and the primitives that have none. Takes what `plan` takes."""
+    """All candidates, the best first, and the primitives without any. Takes what `plan` takes."""
     return plan(inputs, outputs, request=request, **entries).compare()
 
 

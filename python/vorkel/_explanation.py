@@ -88,7 +88,11 @@ class PrimitiveExplanation:
             possible=data["possible"],
             refusals=findings(data["refusals"]),
             conflicts=tuple(
-                Conflict(_demands(one["demands"]), _changes(one["changes"]), one["changes_lift_all"])
+                Conflict(
+                    demands=_demands(one["demands"]),
+                    changes=_changes(one["changes"]),
+                    changes_lift_all=one["changes_lift_all"],
+                )
                 for one in data["conflicts"]
             ),
             corrections=tuple(_demands(one) for one in data["corrections"]),

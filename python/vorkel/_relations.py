@@ -29,7 +29,7 @@ class Clock:
 
 @dataclass(frozen=True)
 class Relation:
-    """From a launching clock to a capturing one. The rest is None where they are not synchronous."""
+    """From a launching clock to a capturing one; None stands for what unrelated ones do not have."""
 
     launching: Clock
     capturing: Clock

@@ -11,8 +11,8 @@ from typing import Any, Iterable, List, Mapping, Optional, Union
 from ._errors import mistake
 
 Value = Union[int, float, str, Fraction, Decimal]
-"""A number, in MHz, degrees, percent, ps or ppm; or a text with a unit, such as "148.5 MHz", "8 ns",
-"90deg", "50%" or "100/3". A float is the decimal that it is shown as."""
+"""A number, in MHz, degrees, percent, ps or ppm; or a text with a unit, such as "148.5 MHz",
+"8 ns", "90deg", "50%" or "100/3". A float is the decimal that it is shown as."""
 
 
 @dataclass(frozen=True)

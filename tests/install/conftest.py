@@ -41,7 +41,6 @@ def installed(tmp_path_factory):
     """The prefix of the installed copy, where it stands now."""
     root = tmp_path_factory.mktemp("root")
     prefix = "/opt/a prefix"
-    run(
-        os.environ["VORKEL_CMAKE"], "--install", BUILD, "--prefix", prefix, env={"DESTDIR": str(root)}
-    )
+    install = (os.environ["VORKEL_CMAKE"], "--install", BUILD, "--prefix", prefix)
+    run(*install, env={"DESTDIR": str(root)})
     return pathlib.Path(str(root) + prefix)

@@ -91,7 +91,8 @@ def test_the_python_module(installed):
         "import vorkel; plan = vorkel.plan(['27 MHz'], ['148.5 MHz', 74.25]);"
         "print(vorkel.__version__, vorkel.__file__, plan.outputs[1].actual)"
     )
-    shown = run(os.environ["VORKEL_PYTHON"], "-c", code, env={"PYTHONPATH": str(folder), **preloaded()})
+    environment = {"PYTHONPATH": str(folder), **preloaded()}
+    shown = run(os.environ["VORKEL_PYTHON"], "-c", code, env=environment)
     assert shown == f"{VERSION} {folder}/vorkel/__init__.py 297/4\n"
 
 
@@ -115,10 +116,14 @@ def test_man_finds_the_pages(installed, section, name, sentence):
 
 def test_completion(installed):
     script = installed / "share/bash-completion/completions/vorkel"
-    code = 'source "$1"; COMP_WORDS=(vorkel pl); COMP_CWORD=1; _vorkel vorkel pl vorkel; echo ${COMPREPLY[@]}'
+    code = (
+        'source "$1"; COMP_WORDS=(vorkel pl); COMP_CWORD=1; _vorkel vorkel pl vorkel;'
+        "echo ${COMPREPLY[@]}"
+    )
     path = {"PATH": f"{installed}/bin:{os.environ['PATH']}"}
     assert run("bash", "-c", code, "bash", script, env=path) == "plan pll\n"
-    assert "_vorkel" in run("bash", "-c", 'source "$1"; complete -p vorkel', "bash", script, env=path)
+    registered = 'source "$1"; complete -p vorkel'
+    assert "_vorkel" in run("bash", "-c", registered, "bash", script, env=path)
 
 
 def test_documents_models_and_examples(installed):

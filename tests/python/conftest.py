@@ -16,7 +16,8 @@ def bundled_devices(monkeypatch):
 @pytest.fixture(scope="session")
 def video():
     """27 MHz x 44 is 1188 MHz: 8 x 148.5, 16 x 74.25 and 44 x 27 MHz."""
-    return vorkel.plan(inputs=["27 MHz"], outputs=["148.5 MHz", "74.25 MHz", "27 MHz"], device="vk40")
+    outputs = ["148.5 MHz", "74.25 MHz", "27 MHz"]
+    return vorkel.plan(inputs=["27 MHz"], outputs=outputs, device="vk40")
 
 
 @pytest.fixture(scope="session")

@@ -42,7 +42,14 @@ def test_settings_are_those_of_the_module(tmp_path):
 
 
 @pytest.mark.parametrize(
-    "words, status", [((), 2), (("27",), 2), (("27", "x"), 2), (("1kHz", "5GHz"), 1), (("27", "148.5", "33.7", "101.01"), 3)]
+    "words, status",
+    [
+        ((), 2),
+        (("27",), 2),
+        (("27", "x"), 2),
+        (("1kHz", "5GHz"), 1),
+        (("27", "148.5", "33.7", "101.01"), 3),
+    ],
 )
 def test_settings_of_a_bad_request(tmp_path, words, status):
     result = run(EXAMPLES / "python/clock_settings.py", *words, cwd=tmp_path)
@@ -92,7 +99,8 @@ def test_a_core_in_verilog_simulates(tmp_path):
     if not shutil.which("iverilog"):
         pytest.skip("there is no iverilog")
     top = core["targets"]["sim"]["toplevel"]
-    built = run_tool("iverilog", "-g2005", "-Wall", "-s", top, "-o", "sim", *files_of(core, "sim"), cwd=folder)
+    options = ("-g2005", "-Wall", "-s", top, "-o", "sim")
+    built = run_tool("iverilog", *options, *files_of(core, "sim"), cwd=folder)
     assert (built.returncode, built.stderr) == (0, "")
     shown = run_tool("vvp", "-n", "sim", cwd=folder)
     assert shown.returncode == 0 and "PASS" in shown.stdout, shown.stdout
@@ -144,7 +152,8 @@ def test_a_bad_request_leaves_no_file(tmp_path, parameters, status, said):
 
 
 @pytest.mark.parametrize(
-    "text", [None, "", "- 1", "a: [", "vlnv: x", "vlnv: 3\nparameters: {}", "parameters: {}", "\x00"]
+    "text",
+    [None, "", "- 1", "a: [", "vlnv: x", "vlnv: 3\nparameters: {}", "parameters: {}", "\x00"],
 )
 def test_a_file_that_is_no_request(tmp_path, text):
     request = tmp_path / "request.yml"

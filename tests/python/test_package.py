@@ -46,7 +46,8 @@ def test_the_stub_is_what_the_extension_has():
 
 
 def test_the_version_is_that_of_the_program(build_dir):
-    shown = subprocess.run([f"{build_dir}/vorkel", "version"], capture_output=True, text=True).stdout
+    command = [f"{build_dir}/vorkel", "version"]
+    shown = subprocess.run(command, capture_output=True, text=True).stdout
     assert shown == f"vorkel {vorkel.__version__}\n"
 
 
@@ -66,7 +67,8 @@ def test_types(tmp_path):
     user.write_text(
         "from fractions import Fraction\n"
         "import vorkel\n"
-        "plan = vorkel.plan(inputs=['27 MHz'], outputs=[148.5, vorkel.Output(27, phase=90), None])\n"
+        "outputs = [148.5, vorkel.Output(27, phase=90), None]\n"
+        "plan = vorkel.plan(inputs=['27 MHz'], outputs=outputs)\n"
         "actual: Fraction = plan.outputs[0].actual\n"
         "wrong: str = plan.outputs[0].actual\n"
     )
@@ -76,7 +78,7 @@ def test_types(tmp_path):
         text=True,
     )
     assert result.stdout.count("error:") == 1, result.stdout
-    assert "user.py:5" in result.stdout
+    assert "user.py:6" in result.stdout
 
 
 def test_it_can_be_loaded_again():

@@ -64,7 +64,11 @@ def test_floats_are_the_decimals_that_they_show():
 def test_phases_and_duty_cycles():
     plan = vorkel.plan(
         inputs=[100],
-        outputs=[vorkel.Output(100, phase="90deg", duty="25%"), {"frequency": 50, "phase": 0}, None],
+        outputs=[
+            vorkel.Output(100, phase="90deg", duty="25%"),
+            {"frequency": 50, "phase": 0},
+            None,
+        ],
         primitive="PLL",
     )
     first, second, third = plan.outputs

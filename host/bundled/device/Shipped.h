@@ -12,7 +12,8 @@ namespace Device {
 //   - in that folder itself;
 //   - in the build tree, in the package's folder, which is in that folder or beside it;
 //   - installed, in PREFIX/share/vorkel, where PREFIX is at most four folders above: as PREFIX/bin,
-//     PREFIX/lib/ARCHITECTURE, PREFIX/lib/tcltk/PACKAGE and PREFIX/lib/python3/dist-packages/MODULE.
+//     PREFIX/lib/ARCHITECTURE, PREFIX/lib/tcltk/PACKAGE and
+//     PREFIX/lib/python3/dist-packages/MODULE.
 // The first that is there; empty when none is.
 std::string Shipped(const std::string& folder, const std::string& name);
 
