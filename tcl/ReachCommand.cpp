@@ -89,27 +89,39 @@ std::size_t PlaceOf(Words words) {
   return 0;
 }
 
-// The words with an output at its place, whose frequency does not count. They live as long as this.
+// The words with an output at its place, whose frequency does not count, and with a value for a
+// -count that has none. They live as long as this.
 class WithOutput {
  public:
-  WithOutput(Words words, std::size_t place) : words_(words.begin(), words.end()) {
+  WithOutput(Words words, std::size_t place) {
+    for (std::size_t i = 0; i < words.size(); ++i) {
+      words_.push_back(words[i]);
+      const std::string word = Text(words[i]);
+      if (word != "-count" && word != "--count") continue;
+      if (i + 1 == words.size() || Text(words[i + 1]).starts_with("-")) Add("1");
+    }
     std::string outputs;
     for (std::size_t i = 0; i < place; ++i) outputs += "- ";
-    for (Tcl_Obj* const word : {Object("-out"), Object(outputs + "100")}) {
-      Tcl_IncrRefCount(word);
-      words_.push_back(word);
-    }
+    Add("-out");
+    Add(outputs + "100");
   }
   ~WithOutput() {
-    Tcl_DecrRefCount(words_.back());
-    Tcl_DecrRefCount(words_[words_.size() - 2]);
+    for (Tcl_Obj* const word : own_) Tcl_DecrRefCount(word);
   }
   WithOutput(const WithOutput&) = delete;
   WithOutput& operator=(const WithOutput&) = delete;
   Words words() const { return words_; }
 
  private:
+  void Add(const std::string& text) {
+    Tcl_Obj* const word = Object(text);
+    Tcl_IncrRefCount(word);
+    own_.push_back(word);
+    words_.push_back(word);
+  }
+
   std::vector<Tcl_Obj*> words_;
+  std::vector<Tcl_Obj*> own_;
 };
 
 }  // namespace
