@@ -67,8 +67,8 @@ def test_types(tmp_path):
     user.write_text(
         "from fractions import Fraction\n"
         "import vorkel\n"
-        "outputs = [148.5, vorkel.Output(27, phase=90), None]\n"
-        "plan = vorkel.plan(inputs=['27 MHz'], outputs=outputs)\n"
+        "plan = vorkel.plan(\n"
+        "    inputs=['27 MHz'], outputs=[148.5, vorkel.Output(27, phase=90), None])\n"
         "actual: Fraction = plan.outputs[0].actual\n"
         "wrong: str = plan.outputs[0].actual\n"
     )
