@@ -68,7 +68,7 @@ std::string Evaluate(Words words) {
   if (json != given.own.end()) {
     std::optional<int> number;
     if (given.own.contains("pick")) number = static_cast<int>(given.Count("pick", 1, 1));
-    plan = ReadPlan(Text(json->second), "", number, &mistakes);
+    plan = ReadPlan(Text(json->second), "-json", number, &mistakes);
   }
   const SettingsDraft settings = Over(OptionsOf(given, &mistakes), plan.settings);
   if (!mistakes.empty()) throw Failure::OfMistakes(mistakes);

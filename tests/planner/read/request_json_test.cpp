@@ -101,7 +101,8 @@ TEST_P(WrongRequest, IsTold) {
 }
 
 const char* const kEntries =
-    "device, primitive, inputs, outputs, input_jitter, bandwidth, tolerance, exact, feedback, "
+    "device, primitive, inputs, outputs, input_jitter, input_tolerance, bandwidth, tolerance, "
+    "exact, feedback, "
     "prefer_max_vco, int_div0, rank, engine, any_order, phase_tolerance, duty_tolerance, "
     "max_jitter";
 
