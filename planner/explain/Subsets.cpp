@@ -5,29 +5,45 @@ namespace planner::explain {
 
 std::optional<Set> Subsets::Next() const {
   Set found = 0;
-  if (!Decide(all_, 0, &found)) return std::nullopt;
+  if (!Decide({all_, 0}, &found)) return std::nullopt;
   return found;
 }
 
-bool Subsets::CanBe(Set undecided, Set chosen) const {
-  for (const Set rule : one_in_) {
-    if ((rule & (chosen | undecided)) == 0) return false;
-  }
-  for (const Set rule : one_out_) {
-    if ((rule & ~chosen) == 0) return false;
-  }
+// Decides what the rules leave no choice about. False when one of them cannot be kept any more.
+bool Subsets::Follow(Choice* choice) const {
+  const auto is_one = [](Set set) { return (set & (set - 1)) == 0; };
+  Set before = 0;
+  do {
+    before = choice->undecided;
+    for (const Set rule : one_in_) {
+      if ((rule & choice->in) != 0) continue;
+      const Set left = rule & choice->undecided;
+      if (left == 0) return false;
+      if (is_one(left)) choice->In(left);
+    }
+    const Set out = all_ & ~choice->in;
+    for (const Set rule : one_out_) {
+      if ((rule & out & ~choice->undecided) != 0) continue;
+      const Set left = rule & choice->undecided;
+      if (left == 0) return false;
+      if (is_one(left)) choice->Out(left);
+    }
+  } while (choice->undecided != before);
   return true;
 }
 
-bool Subsets::Decide(Set undecided, Set chosen, Set* found) const {
-  if (!CanBe(undecided, chosen)) return false;
-  if (undecided == 0) {
-    *found = chosen;
+bool Subsets::Decide(Choice choice, Set* found) const {
+  if (!Follow(&choice)) return false;
+  if (choice.undecided == 0) {
+    *found = choice.in;
     return true;
   }
-  const Set element = undecided & (~undecided + 1);
-  const Set rest = undecided & ~element;
-  return Decide(rest, chosen | element, found) || Decide(rest, chosen, found);
+  const Set element = choice.undecided & (~choice.undecided + 1);
+  Choice with = choice;
+  with.In(element);
+  if (Decide(with, found)) return true;
+  choice.Out(element);
+  return Decide(choice, found);
 }
 
 }  // namespace planner::explain

@@ -3,8 +3,8 @@
 // Whether demands go together is monotone: a subset of what goes together does, and a superset of
 // what does not go together does not. So a set that goes together settles all below it, and one
 // that does not all above it. Next() finds a set that neither settles. Its elements are decided
-// one by one, in or out, each as far as it can be in; a decision that leaves a rule without a way
-// to be kept is taken back.
+// one by one, in or out, each as far as it can be in; what a rule then leaves no choice about is
+// decided with it, and a decision that leaves a rule without a way to be kept is taken back.
 //
 // The map of M. Liffiton, A. Previti, A. Malik and J. Marques-Silva, "Fast, flexible MUS
 // enumeration", Constraints 21, 2016, with a search of its own, as there are few elements.
@@ -32,8 +32,17 @@ class Subsets {
   void SettleAbove(Set set) { one_out_.push_back(set); }
 
  private:
-  bool Decide(Set undecided, Set chosen, Set* found) const;
-  bool CanBe(Set undecided, Set chosen) const;
+  struct Choice {
+    Set undecided;
+    Set in;
+    void In(Set elements) {
+      undecided &= ~elements;
+      in |= elements;
+    }
+    void Out(Set elements) { undecided &= ~elements; }
+  };
+  bool Follow(Choice* choice) const;
+  bool Decide(Choice choice, Set* found) const;
 
   Set all_;
   std::vector<Set> one_in_;   // at least one element of each must be in

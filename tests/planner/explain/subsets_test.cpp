@@ -2,6 +2,12 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <optional>
+#include <vector>
+
+#include "tests/compare/Random.h"
+
 namespace planner::explain {
 namespace {
 
@@ -32,6 +38,47 @@ TEST(Subsets, TheWholeSetSettlesAll) {
   Subsets subsets(0b11);
   subsets.SettleBelow(0b11);
   EXPECT_EQ(subsets.Next(), std::nullopt);
+}
+
+TEST(Subsets, OfNothingOnlyTheEmptySet) {
+  Subsets subsets(0);
+  subsets.SettleBelow(0);
+  EXPECT_EQ(subsets.Next(), std::nullopt);
+}
+
+// Of two sets, the one that has the first element in which they differ.
+bool IsBefore(Set a, Set b) { return (a & (a ^ b) & (~(a ^ b) + 1)) != 0; }
+
+TEST(Subsets, NextIsTheFirstOfAllThatAreNotSettled) {
+  compare::Random random(17);
+  int settled = 0;
+  for (int i = 0; i < 3000; ++i) {
+    const Set all = ~Set{0} >> (64 - random.Int(1, 8));
+    Subsets subsets(all);
+    std::vector<Set> below;
+    std::vector<Set> above;
+    for (int n = random.Int(0, 12); n > 0; --n) {
+      const Set set = static_cast<Set>(random.Int(0, 255)) & all;
+      if (random.Int(0, 1) == 0) {
+        below.push_back(set);
+        subsets.SettleBelow(set);
+      } else {
+        above.push_back(set);
+        subsets.SettleAbove(set);
+      }
+    }
+    std::optional<Set> first;
+    for (Set set = 0; set <= all; ++set) {
+      const bool is_settled =
+          std::any_of(below.begin(), below.end(), [&](Set one) { return (set & ~one) == 0; }) ||
+          std::any_of(above.begin(), above.end(), [&](Set one) { return (one & ~set) == 0; });
+      if (!is_settled && (!first || IsBefore(set, *first))) first = set;
+    }
+    ASSERT_EQ(subsets.Next(), first) << i;
+    if (!first) ++settled;
+  }
+  EXPECT_GT(settled, 200);
+  EXPECT_LT(settled, 2800);
 }
 
 }  // namespace
