@@ -13,6 +13,7 @@
 #include "planner/reach/LoopPoints.h"
 #include "planner/search/Search.h"
 #include "tests/planner/search/drawn.h"
+#include "tests/planner/primitive_names.h"
 
 namespace planner::reach {
 namespace {

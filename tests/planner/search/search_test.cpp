@@ -14,6 +14,7 @@
 #include "hardware/Primitive.h"
 #include "plain_enumeration.h"
 #include "planner/answer/Evaluate.h"
+#include "tests/planner/primitive_names.h"
 
 namespace planner::search {
 namespace {
@@ -169,7 +170,9 @@ class LongSearch : public testing::TestWithParam<Primitive> {
     if (!IsLong()) GTEST_SKIP() << "only with VORKEL_TEST_LONG in the environment";
   }
 };
-TEST_P(LongSearch, AgreesOnBundledDevices) { CompareOnBundledDevices(GetParam(), RequestsOf(GetParam())); }
+TEST_P(LongSearch, AgreesOnBundledDevices) {
+  CompareOnBundledDevices(GetParam(), RequestsOf(GetParam()));
+}
 INSTANTIATE_TEST_SUITE_P(Primitives, LongSearch,
                          testing::Values(Primitive::kPll, Primitive::kTsyn, Primitive::kKruSp,
                                          Primitive::kKruClkgen));

@@ -4,16 +4,9 @@
 
 #include <gtest/gtest.h>
 
-#include <ostream>
-
 #include "../search/drawn.h"
 #include "planner/search/Search.h"
-
-namespace hardware {
-
-static void PrintTo(Primitive primitive, std::ostream* stream) { *stream << Name(primitive); }
-
-}  // namespace hardware
+#include "tests/planner/primitive_names.h"
 
 namespace planner::verify {
 

@@ -38,8 +38,10 @@ string ByHand() {
     "limits": {
       "vco": {"lowest": 800, "lowest_exact": "800", "highest": 800, "highest_exact": "800"},
       "pfd": {"lowest": 100, "lowest_exact": "100", "highest": 100, "highest_exact": "100"},
+      "vco_margin": 0, "vco_margin_exact": "0", "pfd_margin": 0, "pfd_margin_exact": "0",
       "largest_count": 64},
-    "search_vco": 800, "input_jitter": 0, "input_jitter_exact": "0", "phase_error": null,
+    "search_vco": 800, "input_jitter": 0, "input_jitter_exact": "0", "input_tolerance": 0,
+    "input_tolerance_exact": "0", "phase_error": null,
     "worst_ppm": 0, "worst_ppm_exact": "0", "max_jitter": null,
     "ranking": {"class": "met", "worst_error": 0, "worst_error_exact": "0", "max_jitter": null,
                 "margin": 0, "margin_exact": "0", "vco": 800, "vco_exact": "800"},
@@ -54,16 +56,16 @@ string ByHand() {
       "requested_duty": null, "requested_duty_exact": null, "duty": 50, "duty_exact": "50",
       "duty_error": null, "duty_error_exact": null, "jitter": null, "jitter_rms": null,
       "range": {"lowest": 10, "lowest_exact": "10", "highest": 400, "highest_exact": "400"},
-      "within": true}],
+      "margin": 0.5, "margin_exact": "1/2", "within": true}],
     "misses": [], "violations": [], "notes": ["jitter", "phase error"],
     "findings": [
       {"kind": "no_jitter", "primitive": "PLL", "quantity": "jitter", "output": null, "input": 0,
-       "value": 0, "value_exact": "0",
+       "corner": 0, "corner_exact": "0", "value": 0, "value_exact": "0",
        "range": {"lowest": 0, "lowest_exact": "0", "highest": 0, "highest_exact": "0"},
        "pin": null, "feedback_2x": false, "outputs": [], "numbers": [], "words": "",
        "text": "jitter"},
       {"kind": "no_phase_error", "primitive": "PLL", "quantity": "phase", "output": null,
-       "input": 0, "value": 0, "value_exact": "0",
+       "input": 0, "corner": 0, "corner_exact": "0", "value": 0, "value_exact": "0",
        "range": {"lowest": 0, "lowest_exact": "0", "highest": 0, "highest_exact": "0"},
        "pin": null, "feedback_2x": false, "outputs": [], "numbers": [], "words": "",
        "text": "phase error"}]
@@ -94,7 +96,7 @@ TEST(Verify, AWrongNumberHasItsPathAndPlace) {
   EXPECT_EQ(wrong[0].path, "answers[0].worst_ppm");
   EXPECT_EQ(wrong[0].found, "1e-9");
   EXPECT_EQ(wrong[0].expected, "0.0");
-  EXPECT_EQ(wrong[0].line, 21);
+  EXPECT_EQ(wrong[0].line, 23);
   EXPECT_EQ(wrong[0].column, 18);
 }
 
@@ -184,7 +186,7 @@ TEST(Verify, AnswersMustBeThere) {
                       "\"answers\": [], \"tradeoffs_cut\": []}";
   const auto wrong = Wrong(none);
   ASSERT_EQ(wrong.size(), 1u);
-  EXPECT_EQ(wrong[0].path, "answers");
+  EXPECT_EQ(wrong[0].path, "answers[0]");
 }
 
 TEST(Verify, HugeNumbersAreNamed) {
