@@ -72,6 +72,7 @@ class LoopWithin::Question {
       if (is_no_wider && !jitter_.IsAsked()) continue;
       tried = &pfd;
       bandwidth_ = bandwidth;
+      hopeless_ = HopelessUpTo();
       if (auto settings = AnswerWithin(pfd)) return settings;
     }
     return std::nullopt;
@@ -119,6 +120,7 @@ class LoopWithin::Question {
       const std::int64_t least_d = LeastD(span, step, grid.rows.back().d);
       for (const Row& row : grid.rows) {
         if (row.d < least_d) continue;
+        if (span.highest * (1 + kWider) <= hopeless_ * row.d) break;
         Settings settings;
         Outcome outcome = Outcome::kNot;
         ForEachM(row, grid.step, m_kind, span, [&](int m) {
@@ -194,6 +196,29 @@ class LoopWithin::Question {
     return true;
   }
 
+  bool IsSurelyTooLarge(double jitter) const {
+    return !jitter_.IsMet(jitter * (1 - 10 * answer::LoopJitter::kRounding));
+  }
+
+  // An M / D^2, M in eighths, with which and below which the jitter is surely too large: it falls
+  // when that rises. A large D stands for all, as its M are close together.
+  double HopelessUpTo() const {
+    if (!jitter_.IsAsked() || !within_.jitter_.FallsWithRatio()) return 0;
+    constexpr int kFineD = 256;
+    constexpr int kSquare = kFineD * kFineD;
+    int hopeless = 0;
+    int most = kRelaxedM * kEighths * kSquare;
+    while (hopeless < most) {
+      const int middle = hopeless + (most - hopeless + 1) / 2;
+      if (IsSurelyTooLarge(within_.jitter_.PeakToPeak(middle, kFineD, bandwidth_))) {
+        hopeless = middle;
+      } else {
+        most = middle - 1;
+      }
+    }
+    return static_cast<double>(hopeless) / kSquare;
+  }
+
   // What came of an M and a D. With a jitter that is surely too large, a smaller M has a larger one.
   enum class Outcome { kFound, kNot, kNorSmallerM };
 
@@ -201,8 +226,7 @@ class LoopWithin::Question {
     if (jitter_.IsAsked()) {
       const double jitter = within_.jitter_.PeakToPeak(m, d, bandwidth_);
       if (!jitter_.IsMet(jitter)) {
-        const bool is_sure = within_.jitter_.FallsWithRatio() &&
-                             !jitter_.IsMet(jitter * (1 - 10 * answer::LoopJitter::kRounding));
+        const bool is_sure = within_.jitter_.FallsWithRatio() && IsSurelyTooLarge(jitter);
         return is_sure ? Outcome::kNorSmallerM : Outcome::kNot;
       }
     }
@@ -273,6 +297,7 @@ class LoopWithin::Question {
   JitterDemand jitter_;
   bool asks_for_shape_ = false;
   Bandwidth bandwidth_ = Bandwidth::kOptimized;
+  double hopeless_ = 0;  // HopelessUpTo of that bandwidth
   bool moves_ = true;
   bool with_fractions_ = false;
 };
