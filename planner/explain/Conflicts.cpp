@@ -16,6 +16,10 @@ class Explorer {
       : all_(all), goes_(goes), most_(most) {}
 
   bool Goes(Set set) {
+    const auto has = [set](Set conflict) { return (conflict & ~set) == 0; };
+    const auto is_in = [set](Set whole) { return (set & ~whole) == 0; };
+    if (std::any_of(conflicts_.begin(), conflicts_.end(), has)) return false;
+    if (std::any_of(wholes_.begin(), wholes_.end(), is_in)) return true;
     ++questions_;
     return goes_(set);
   }
@@ -28,6 +32,7 @@ class Explorer {
       const Set element = left & (~left + 1);
       if (Goes(set | element)) set |= element;
     }
+    wholes_.push_back(set);
     return set;
   }
 
@@ -37,6 +42,7 @@ class Explorer {
       const Set element = left & (~left + 1);
       if (!Goes(set & ~element)) set &= ~element;
     }
+    conflicts_.push_back(set);
     return set;
   }
 
@@ -45,6 +51,10 @@ class Explorer {
   const std::function<bool(Set)>& goes_;
   std::int64_t most_;
   std::int64_t questions_ = 0;
+  // What is known without a question: what has one of these does not go together, and what is in
+  // one of those does.
+  std::vector<Set> conflicts_;
+  std::vector<Set> wholes_;
 };
 
 bool IsSmaller(Set a, Set b) {

@@ -6,6 +6,7 @@
 #include <cmath>
 #include <cstddef>
 #include <cstdint>
+#include <numeric>
 #include <utility>
 #include <vector>
 
@@ -193,7 +194,8 @@ class KruWithin::Question {
   }
 
   // Calls `take` with the M and D whose ratio is in a span, the smallest D and then the smallest M
-  // first, until it answers false.
+  // first, until it answers false. Of those with the same ratio the first stands for all: only the
+  // jitter tells them apart, and it is no smaller with the others.
   template <typename Take>
   void ForEachRatio(const Span& span, const Take& take) const {
     for (int d = 1; d <= last_d_; ++d) {
@@ -201,9 +203,17 @@ class KruWithin::Question {
       const int first = std::max(first_m_, static_cast<int>(low));
       const int last = static_cast<int>(std::min<double>(span.highest * d, last_m_));
       for (int m = first; m <= last; ++m) {
+        if (!IsFirstOfRatio(m, d)) continue;
         if (!take(m, d)) return;
       }
     }
+  }
+
+  bool IsFirstOfRatio(int m, int d) const {
+    const int common = std::gcd(m, d);
+    if (common == 1 || !task_.Model().RisesWithSettings()) return true;
+    const int lowest = m / common;
+    return common <= (first_m_ + lowest - 1) / lowest;
   }
 
   // --- KRU_SP -------------------------------------------------------------------------------------
