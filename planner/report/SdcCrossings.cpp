@@ -208,10 +208,14 @@ string SdcInterclockUncertainties(const Request& request, const Answer& answer) 
     text += Uncertainties(request, answer, clocks, i, false);
   }
   if (text.empty()) return "";
+  const string off =
+      " the edges of both can be off, each by half of its jitter, and those of an output also by "
+      "the phase error to the input.";
+  if (!IsLoop(answer.primitive)) return "\n" + SdcComment("Between two clocks" + off) + text;
   return "\n" +
-         SdcComment(
-             "Between two clocks the edges of both can be off, each by half of its jitter, "
-             "and those of an output also by the phase error to the input.") +
+         SdcComment("Between the input and an output" + off +
+                    " All outputs follow one VCO: between two of them it is the uncertainty of the "
+                    "capturing clock.") +
          text;
 }
 

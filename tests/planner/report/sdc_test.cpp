@@ -71,8 +71,10 @@ TEST(Sdc, AllOfALoop) {
             "set_clock_uncertainty 0.0644075 [get_clocks clk_out2]\n"
             "\n"
             // 128.815 / 2 + 77.037 ps.
-            "# Between two clocks the edges of both can be off, each by half of its jitter,\n"
-            "#   and those of an output also by the phase error to the input.\n"
+            "# Between the input and an output the edges of both can be off, each by half of\n"
+            "#   its jitter, and those of an output also by the phase error to the input. All\n"
+            "#   outputs follow one VCO: between two of them it is the uncertainty of the\n"
+            "#   capturing clock.\n"
             "set_clock_uncertainty 0.1414445 -from [get_clocks clk_in1] -to [get_clocks {clk_out0 "
             "clk_out1 clk_out2}]\n"
             "set_clock_uncertainty 0.1414445 -from [get_clocks {clk_out0 clk_out1 clk_out2}] -to "
