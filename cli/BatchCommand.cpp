@@ -22,7 +22,6 @@
 #include "cli/Words.h"
 #include "cli/Workers.h"
 #include "planner/batch/Answerer.h"
-#include "planner/read/MistakeText.h"
 #include "planner/read/Options.h"
 #include "planner/read/Shown.h"
 #include "planner/report/BatchText.h"
@@ -90,11 +89,7 @@ void ReadRequestOptions(const Given& given, Task* task) {
             [](const Option& a, const Option& b) { return a.name < b.name; });
   planner::read::Mistakes mistakes;
   task->answers.options = ReadOptions(options, &mistakes);
-  if (!mistakes.empty()) {
-    std::vector<std::string> reasons;
-    for (const planner::read::Mistake& mistake : mistakes) reasons.push_back(TextOf(mistake));
-    throw Failure::OfUsage(reasons);
-  }
+  if (!mistakes.empty()) Refuse(mistakes);
   task->options = fmt::format("{} {}\n", planner::report::kPlanVersion, task->form.all);
   for (const Option& option : options) {
     task->options += option.name + "=" + option.value + "\n";

@@ -194,6 +194,12 @@ Call ReadCall(std::string_view command, const std::vector<std::string>& words,
   return call;
 }
 
+void Refuse(const planner::read::Mistakes& mistakes) {
+  std::vector<std::string> reasons;
+  for (const planner::read::Mistake& mistake : mistakes) reasons.push_back(TextOf(mistake));
+  throw Failure::OfUsage(reasons);
+}
+
 std::optional<int> WholeNumber(const Given& given, std::string_view name, int lowest,
                                int highest) {
   const std::optional<std::string> text = given.Value(name);

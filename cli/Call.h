@@ -53,6 +53,9 @@ using MakeReading = std::function<std::optional<planner::read::Reading>(
 Call ReadCall(std::string_view command, const std::vector<std::string>& words,
               std::size_t most_operands, const MakeReading& make, const Setting& setting);
 
+// Throws what is wrong with the words of a command as Failure.
+[[noreturn]] void Refuse(const planner::read::Mistakes& mistakes);
+
 // The value of an option that is a whole number from `lowest` to `highest`, nothing when it was not
 // given. Throws Failure.
 std::optional<int> WholeNumber(const Given& given, std::string_view name, int lowest, int highest);

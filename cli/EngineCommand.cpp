@@ -3,20 +3,17 @@
 #include "cli/Call.h"
 #include "cli/Devices.h"
 #include "cli/Failure.h"
-#include "cli/Hdl.h"
+#include "cli/Formats.h"
 #include "cli/Options.h"
 #include "planner/engine/Ask.h"
-#include "planner/report/Json.h"
 #include "planner/report/PlanText.h"
 #include "planner/report/ReportText.h"
-#include "planner/report/Sdc.h"
 
 namespace cli {
 
 namespace {
 
 using planner::Primitive;
-using planner::report::Entry;
 
 Primitive PrimitiveOf(std::string_view command) {
   if (command == "tsyn") return Primitive::kTsyn;
@@ -29,26 +26,6 @@ std::string ExplainCall(const Call& call, Primitive primitive, const Setting& se
   std::vector<planner::read::Option> options = KeptFor("explain", call.pasted);
   options.push_back({"--primitive", std::string(Name(primitive))});
   return PastedCall("explain", options, setting);
-}
-
-std::string InFormat(const Call& call, const planner::Answer& answer, const Setting& setting) {
-  const std::vector<Entry> entries = {{&answer}};
-  switch (call.format) {
-    case Format::kText:
-      return planner::report::ReportText(call.request(), call.device, answer,
-                                         StyleOf(call, setting));
-    case Format::kJson:
-      return planner::report::Json(call.request(), call.device, entries);
-    case Format::kTcl:
-      return planner::report::Tcl(call.request(), call.device, entries);
-    case Format::kVerilog:
-    case Format::kVhdl:
-    case Format::kTestbench:
-      return HdlText(call, answer);
-    case Format::kSdc:
-      break;
-  }
-  return planner::report::Sdc(call.request(), call.device, answer, call.sdc);
 }
 
 }  // namespace
@@ -73,7 +50,12 @@ int RunEngine(std::string_view command, const std::vector<std::string>& words,
                   planner::report::UnsolvedText(answer, call.device, cause, style, calls) +
                       DoubtLines(call, style));
   }
-  Write(call, InFormat(call, answer, setting), setting);
+  Write(call,
+        call.format == Format::kText
+            ? planner::report::ReportText(call.request(), call.device, answer,
+                                          StyleOf(call, setting))
+            : InFormat(call, {{&answer}}, answer),
+        setting);
   return answer.within ? kDone : kOff;
 }
 

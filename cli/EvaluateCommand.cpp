@@ -1,7 +1,5 @@
 #include "cli/EvaluateCommand.h"
 
-#include <fmt/format.h>
-
 #include <cstddef>
 #include <optional>
 #include <utility>
@@ -9,14 +7,11 @@
 #include "cli/Call.h"
 #include "cli/Devices.h"
 #include "cli/Failure.h"
-#include "cli/Hdl.h"
+#include "cli/Formats.h"
 #include "cli/InputFile.h"
 #include "planner/answer/Evaluate.h"
 #include "planner/read/Settings.h"
-#include "planner/read/Shown.h"
-#include "planner/report/Json.h"
 #include "planner/report/ReportText.h"
-#include "planner/report/Sdc.h"
 #include "planner/report/Table.h"
 
 namespace cli {
@@ -29,19 +24,6 @@ using planner::read::Reading;
 
 constexpr std::size_t kLargest = 50'000'000;  // bytes of a plan
 constexpr int kMostPick = 1'000'000;
-
-std::string Contents(const std::string& name) {
-  if (name.empty()) throw Failure::OfUsage("the name of the plan is empty");
-  const std::string shown = planner::read::Shown(name);
-  std::string text;
-  try {
-    text = ReadFile(name, kLargest);
-  } catch (const FileError& error) {
-    throw Failure::OfUsage(fmt::format("{} cannot be read: {}", shown, error.what()));
-  }
-  if (text.size() > kLargest) throw Failure::OfUsage(shown + " is too large for a plan");
-  return text;
-}
 
 // The device of a draft; with a primitive that has been named it has that.
 planner::Device DeviceOf(const Draft& draft, std::optional<planner::Primitive> primitive,
@@ -63,7 +45,7 @@ std::optional<planner::read::Evaluation> EvaluationOf(const Given& given, const 
     if (name == "-" && given.Value("--request") == "-") {
       throw Failure::OfUsage("the plan and --request cannot both be standard input");
     }
-    file = ReadPlan(Contents(name), name, number, mistakes);
+    file = ReadPlan(ReadFileOf("plan", name, kLargest), name, number, mistakes);
   } else if (number) {
     throw Failure::OfUsage("--pick goes with the file of a plan");
   }
@@ -76,30 +58,12 @@ std::optional<planner::read::Evaluation> EvaluationOf(const Given& given, const 
   return FinishEvaluation(draft, settings, device, mistakes);
 }
 
-std::string InFormat(const Call& call, const planner::Answer& answer, const Setting& setting) {
-  const std::vector<planner::report::Entry> entries = {{&answer}};
-  switch (call.format) {
-    case Format::kText: {
-      const planner::report::Style style = StyleOf(call, setting);
-      std::string text =
-          planner::report::ReportText(call.request(), call.device, answer, style);
-      if (!answer.max_jitter) return text;
-      return text + "\n" +
-             planner::report::Prose(style, "jitter: ",
-                                    "peak to peak, at a bit error rate of 1e-12.");
-    }
-    case Format::kJson:
-      return planner::report::Json(call.request(), call.device, entries);
-    case Format::kTcl:
-      return planner::report::Tcl(call.request(), call.device, entries);
-    case Format::kVerilog:
-    case Format::kVhdl:
-    case Format::kTestbench:
-      return HdlText(call, answer);
-    case Format::kSdc:
-      break;
-  }
-  return planner::report::Sdc(call.request(), call.device, answer, call.sdc);
+std::string Text(const Call& call, const planner::Answer& answer, const Setting& setting) {
+  const planner::report::Style style = StyleOf(call, setting);
+  const std::string text = planner::report::ReportText(call.request(), call.device, answer, style);
+  if (!answer.max_jitter) return text;
+  return text + "\n" +
+         planner::report::Prose(style, "jitter: ", "peak to peak, at a bit error rate of 1e-12.");
 }
 
 }  // namespace
@@ -117,7 +81,10 @@ int RunEvaluate(std::string_view command, const std::vector<std::string>& words,
   const Call call = ReadCall(command, words, 1, make, setting);
   const planner::Answer answer =
       planner::answer::Evaluate(call.request(), call.device, settings, planner::Source{});
-  Write(call, InFormat(call, answer, setting), setting);
+  Write(call,
+        call.format == Format::kText ? Text(call, answer, setting)
+                                     : InFormat(call, {{&answer}}, answer),
+        setting);
   return answer.within ? kDone : kOff;
 }
 

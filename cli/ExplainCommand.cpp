@@ -5,7 +5,6 @@
 #include "cli/Call.h"
 #include "cli/Failure.h"
 #include "planner/explain/Explain.h"
-#include "planner/read/MistakeText.h"
 #include "planner/read/Units.h"
 #include "planner/report/ExplainText.h"
 
@@ -24,11 +23,7 @@ std::optional<std::vector<Rational>> OwnInputs(const Given& given) {
   planner::read::Mistakes mistakes;
   const auto values = planner::read::ReadValues(*list, planner::read::ValueKind::kFrequency, place,
                                                 false, &mistakes);
-  if (!values) {
-    std::vector<std::string> reasons;
-    for (const planner::read::Mistake& mistake : mistakes) reasons.push_back(TextOf(mistake));
-    throw Failure::OfUsage(reasons);
-  }
+  if (!values) Refuse(mistakes);
   std::vector<Rational> inputs;
   for (const auto& value : *values) inputs.push_back(*value);
   return inputs;

@@ -1,13 +1,16 @@
 #include "cli/InputFile.h"
 
 #include <fcntl.h>
+#include <fmt/format.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
 #include <algorithm>
 #include <cerrno>
 
+#include "cli/Failure.h"
 #include "cli/Output.h"
+#include "planner/read/Shown.h"
 
 namespace cli {
 
@@ -45,6 +48,23 @@ std::string ReadFile(const std::string& name, std::size_t most) {
     close(descriptor);
     throw;
   }
+}
+
+std::string ReadFileOf(std::string_view kind, const std::string& name, std::size_t most,
+                       std::string_view option) {
+  const std::string before = option.empty() ? "" : fmt::format("{}: ", option);
+  if (name.empty()) throw Failure::OfUsage(before + "the name of the file is empty");
+  const std::string shown = before + planner::read::Shown(name);
+  std::string text;
+  try {
+    text = ReadFile(name, most);
+  } catch (const FileError& error) {
+    throw Failure::OfUsage(fmt::format("{} cannot be read: {}", shown, error.what()));
+  }
+  if (text.size() > most) {
+    throw Failure::OfUsage(fmt::format("{} is too large for a {}", shown, kind));
+  }
+  return text;
 }
 
 }  // namespace cli

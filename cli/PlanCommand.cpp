@@ -4,12 +4,10 @@
 
 #include "cli/Call.h"
 #include "cli/Failure.h"
-#include "cli/Hdl.h"
+#include "cli/Formats.h"
 #include "cli/PickedPlan.h"
 #include "planner/plan/Plan.h"
-#include "planner/report/Json.h"
 #include "planner/report/PlanText.h"
-#include "planner/report/Sdc.h"
 
 namespace cli {
 
@@ -67,27 +65,6 @@ std::vector<planner::report::Entry> Entries(const Call& call, const Plan& plan, 
   return planner::report::PlanEntries(plan, number);
 }
 
-std::string InFormat(const Call& call, const Plan& plan, std::size_t number, std::size_t most,
-                     const Setting& setting) {
-  switch (call.format) {
-    case Format::kText:
-      return Text(call, plan, number, most, setting);
-    case Format::kJson:
-      return planner::report::Json(call.request(), call.device, Entries(call, plan, number, most),
-                                   plan.front_cut);
-    case Format::kTcl:
-      return planner::report::Tcl(call.request(), call.device, Entries(call, plan, number, most),
-                                  plan.front_cut);
-    case Format::kVerilog:
-    case Format::kVhdl:
-    case Format::kTestbench:
-      return HdlText(call, *plan.Pick(number));
-    case Format::kSdc:
-      break;
-  }
-  return planner::report::Sdc(call.request(), call.device, *plan.Pick(number), call.sdc);
-}
-
 }  // namespace
 
 int RunPlan(std::string_view command, const std::vector<std::string>& words,
@@ -96,7 +73,12 @@ int RunPlan(std::string_view command, const std::vector<std::string>& words,
   const auto most = static_cast<std::size_t>(
       WholeNumber(call.given, "--front", 0, kMostFront).value_or(kUsualFront));
   const Picked picked = PickedPlan(call, setting);
-  Write(call, InFormat(call, picked.plan, picked.number, most, setting), setting);
+  Write(call,
+        call.format == Format::kText
+            ? Text(call, picked.plan, picked.number, most, setting)
+            : InFormat(call, Entries(call, picked.plan, picked.number, most), picked.answer(),
+                       picked.plan.front_cut),
+        setting);
   return picked.answer().within ? kDone : kOff;
 }
 

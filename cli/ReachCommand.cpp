@@ -13,7 +13,7 @@
 #include "cli/Stream.h"
 #include "cli/Words.h"
 #include "planner/answer/Evaluate.h"
-#include "planner/read/MistakeText.h"
+#include "planner/read/Letters.h"
 #include "planner/read/Options.h"
 #include "planner/read/Shown.h"
 #include "planner/read/Units.h"
@@ -37,12 +37,6 @@ constexpr int kMostFound = 100'000;  // gaps, and nearest ones: these are kept
 constexpr int kUsualNear = 5;
 constexpr int kUsualInText = 40;
 
-[[noreturn]] void Refuse(const planner::read::Mistakes& mistakes) {
-  std::vector<std::string> reasons;
-  for (const planner::read::Mistake& mistake : mistakes) reasons.push_back(TextOf(mistake));
-  throw Failure::OfUsage(reasons);
-}
-
 std::optional<Rational> Frequency(const Given& given, const std::string& name) {
   const std::optional<std::string> text = given.Value(name);
   if (!text) return std::nullopt;
@@ -58,10 +52,11 @@ std::optional<Rational> Frequency(const Given& given, const std::string& name) {
 // The form of --format; nothing for Tcl.
 std::optional<ReachForm> ReadForm(const Given& given) {
   const std::string name = given.Value("--format").value_or("text");
-  if (name == "text") return ReachForm::kText;
-  if (name == "json") return ReachForm::kJson;
-  if (name == "csv") return ReachForm::kCsv;
-  if (name == "tcl") return std::nullopt;
+  const auto is = [&](std::string_view word) { return planner::read::IsSameWord(word, name); };
+  if (is("text")) return ReachForm::kText;
+  if (is("json")) return ReachForm::kJson;
+  if (is("csv")) return ReachForm::kCsv;
+  if (is("tcl")) return std::nullopt;
   throw Failure::OfUsage(fmt::format("--format: \"{}\" must be text, json, csv or tcl",
                                      planner::read::Shown(name)));
 }

@@ -2,16 +2,15 @@
 
 #include "cli/Call.h"
 #include "cli/Failure.h"
-#include "cli/Hdl.h"
+#include "cli/Formats.h"
 #include "cli/PickedPlan.h"
 #include "planner/report/Relations.h"
-#include "planner/report/Sdc.h"
 
 namespace cli {
 
 namespace {
 
-std::string InFormat(const Call& call, const planner::Answer& answer, const Setting& setting) {
+std::string Written(const Call& call, const planner::Answer& answer, const Setting& setting) {
   const planner::Request& request = call.request();
   const planner::relations::Rule& rule = call.sdc.rule;
   switch (call.format) {
@@ -22,12 +21,9 @@ std::string InFormat(const Call& call, const planner::Answer& answer, const Sett
       return planner::report::RelationsJson(request, call.device, answer, rule);
     case Format::kTcl:
       return planner::report::RelationsTcl(request, call.device, answer, rule);
-    case Format::kSdc:
-      return planner::report::Sdc(request, call.device, answer, call.sdc);
     default:
-      break;
+      return DesignText(call, answer);
   }
-  return HdlText(call, answer);
 }
 
 }  // namespace
@@ -36,7 +32,7 @@ int RunRelations(std::string_view command, const std::vector<std::string>& words
                  const Setting& setting) {
   const Call call = ReadCall(command, words, std::nullopt, setting);
   const Picked picked = PickedPlan(call, setting);
-  Write(call, InFormat(call, picked.answer(), setting), setting);
+  Write(call, Written(call, picked.answer(), setting), setting);
   return picked.answer().within ? kDone : kOff;
 }
 

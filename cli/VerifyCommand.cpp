@@ -19,19 +19,6 @@ namespace {
 // A plan has some KiB for each of its answers, which are some dozens, or a thousand trade-offs.
 constexpr std::size_t kLargest = 50'000'000;
 
-std::string Contents(const std::string& name) {
-  if (name.empty()) throw Failure::OfUsage("the name of the file is empty");
-  const std::string shown = planner::read::Shown(name);
-  std::string text;
-  try {
-    text = ReadFile(name, kLargest);
-  } catch (const FileError& error) {
-    throw Failure::OfUsage(fmt::format("{} cannot be read: {}", shown, error.what()));
-  }
-  if (text.size() > kLargest) throw Failure::OfUsage(shown + " is too large for a plan");
-  return text;
-}
-
 // The device that a plan is for; one without anything when the plan does not say.
 planner::Device DeviceOf(const std::string& text, const std::string& name,
                          const Setting& setting) {
@@ -56,7 +43,7 @@ int RunVerify(std::string_view command, const std::vector<std::string>& words,
     throw Failure::OfUsage("the plan is missing: verify FILE, such as verify plan.json");
   }
   const std::string& name = given.operands.front();
-  const std::string text = Contents(name);
+  const std::string text = ReadFileOf("plan", name, kLargest);
   const planner::Device device = DeviceOf(text, name, setting);
   const auto wrong =
       planner::verify::Verify(text, device, &planner::report::JsonSentences());

@@ -70,17 +70,16 @@ class LoopRun {
     const double second = request_.inputs.size() > 1 ? request_.inputs[1].ToDouble() : 0.0;
     object_->SetLowBandwidth(variant_.bandwidth == Bandwidth::kLow);
     const Port::StringBase frequencies = ListOf(Frequencies(request_));
+    const bool is_whole = IsWhole(request_, variant_);
     const std::lock_guard lock(LoopRuns());
     if (!closest_) {
       return object_->CalculateMinPowerOutFreqs(frequencies, first, second, Count(),
-                                                variant_.prefer_max_vco, IsWhole(request_, variant_),
-                                                Code(),
+                                                variant_.prefer_max_vco, is_whole, Code(),
                                                 trace_);
     }
     return object_->GetClosestSolution(frequencies, ListOf(Asked(&Output::phase)),
                                        ListOf(Asked(&Output::duty)), first, second, Count(),
-                                       variant_.prefer_max_vco, IsWhole(request_, variant_),
-                                                Code(), trace_);
+                                       variant_.prefer_max_vco, is_whole, Code(), trace_);
   }
 
   // 0 of the outputs that ask for none.

@@ -24,7 +24,19 @@ class Explorer {
     return goes_(set);
   }
   bool IsSpent() const { return questions_ >= most_; }
-  std::int64_t questions() const { return questions_; }
+
+  // What has been found, the smaller sets first.
+  Conflicts Found() const {
+    Conflicts found;
+    found.conflicts = conflicts_;
+    for (const Set whole : wholes_) {
+      if (whole != all_) found.corrections.push_back(all_ & ~whole);
+    }
+    std::sort(found.conflicts.begin(), found.conflicts.end(), IsSmaller);
+    std::sort(found.corrections.begin(), found.corrections.end(), IsSmaller);
+    found.questions = questions_;
+    return found;
+  }
 
   // The set with all that can be added to it one by one.
   Set Grown(Set set) {
@@ -47,6 +59,10 @@ class Explorer {
   }
 
  private:
+  static bool IsSmaller(Set a, Set b) {
+    return std::popcount(a) != std::popcount(b) ? std::popcount(a) < std::popcount(b) : a < b;
+  }
+
   Set all_;
   const std::function<bool(Set)>& goes_;
   std::int64_t most_;
@@ -57,36 +73,27 @@ class Explorer {
   std::vector<Set> wholes_;
 };
 
-bool IsSmaller(Set a, Set b) {
-  return std::popcount(a) != std::popcount(b) ? std::popcount(a) < std::popcount(b) : a < b;
-}
-
 }  // namespace
 
 Conflicts FindConflicts(std::size_t demands, const std::function<bool(Set)>& goes,
                         std::int64_t most_questions) {
-  Conflicts found;
   const Set all = demands == 0 ? 0 : ~Set{0} >> (64 - demands);
   Explorer explorer(all, goes, most_questions);
   Subsets subsets(all);
+  bool complete = true;
   while (const std::optional<Set> set = subsets.Next()) {
     if (explorer.IsSpent()) {
-      found.complete = false;
+      complete = false;
       break;
     }
     if (explorer.Goes(*set)) {
-      const Set whole = explorer.Grown(*set);
-      if (whole != all) found.corrections.push_back(all & ~whole);
-      subsets.SettleBelow(whole);
+      subsets.SettleBelow(explorer.Grown(*set));
     } else {
-      const Set conflict = explorer.Shrunk(*set);
-      found.conflicts.push_back(conflict);
-      subsets.SettleAbove(conflict);
+      subsets.SettleAbove(explorer.Shrunk(*set));
     }
   }
-  std::sort(found.conflicts.begin(), found.conflicts.end(), IsSmaller);
-  std::sort(found.corrections.begin(), found.corrections.end(), IsSmaller);
-  found.questions = explorer.questions();
+  Conflicts found = explorer.Found();
+  found.complete = complete;
   return found;
 }
 

@@ -313,6 +313,19 @@ Draft Over(const Draft& options, const Draft& file) {
   return all;
 }
 
+Draft WithoutChoices(Draft draft) {
+  draft.primitive.reset();
+  draft.bandwidth.reset();
+  draft.low_bandwidth.reset();
+  draft.feedback.reset();
+  draft.rank.reset();
+  draft.prefer_max_vco.reset();
+  draft.int_div0.reset();
+  draft.engine.reset();
+  draft.any_order.reset();
+  return draft;
+}
+
 std::optional<Reading> Finish(const Draft& draft, const Reader& reader, Mistakes* mistakes) {
   return Finisher(draft, reader, mistakes).Finish();
 }

@@ -60,6 +60,10 @@ struct Draft {
 // nothing to do with its phases, duty cycles and other demands of single outputs.
 Draft Over(const Draft& options, const Draft& file);
 
+// A draft without what says how a plan is to be chosen: that does not concern settings that are
+// there.
+Draft WithoutChoices(Draft draft);
+
 // A request, and what is said beside it.
 struct Reading {
   Request request;

@@ -235,13 +235,17 @@ class Finisher {
     return 0;
   }
 
+  // Whether the same is said twice, in counts and in numbers.
+  bool Contradicts(const Entry<Values>& counts, const Entry<Values>& numbers) {
+    if (!counts || !numbers) return false;
+    Mistake& mistake = Add(MistakeKind::kContradiction, numbers->place);
+    mistake.other = counts->place.entry;
+    mistake.text = counts->text;
+    return true;
+  }
+
   void Phases(LoopSettings* set) {
-    if (said_.phase_steps && said_.phases) {
-      Mistake& mistake = Add(MistakeKind::kContradiction, said_.phases->place);
-      mistake.other = said_.phase_steps->place.entry;
-      mistake.text = said_.phase_steps->text;
-      return;
-    }
+    if (Contradicts(said_.phase_steps, said_.phases)) return;
     const Entry<Values>& entry = said_.phases ? said_.phases : said_.phase_steps;
     if (!IsComplete(entry)) return;
     for (std::size_t i = 0; i < used_.size(); ++i) {
@@ -270,12 +274,7 @@ class Finisher {
   }
 
   void HighTimes(LoopSettings* set) {
-    if (said_.high_times && said_.duties) {
-      Mistake& mistake = Add(MistakeKind::kContradiction, said_.duties->place);
-      mistake.other = said_.high_times->place.entry;
-      mistake.text = said_.high_times->text;
-      return;
-    }
+    if (Contradicts(said_.high_times, said_.duties)) return;
     const Entry<Values>& entry = said_.duties ? said_.duties : said_.high_times;
     if (!IsComplete(entry)) return;
     for (std::size_t i = 0; i < used_.size(); ++i) {
@@ -424,7 +423,7 @@ class Finisher {
   // Frequencies that nobody asked for are those that come out. How settings are to be chosen is
   // nothing to settings that are there.
   std::optional<Evaluation> Compared() {
-    Draft draft = draft_;
+    Draft draft = WithoutChoices(draft_);
     Values frequencies(used_.size());
     std::vector<bool> unasked(used_.size());
     for (std::size_t i = 0; i < used_.size(); ++i) {
@@ -440,14 +439,6 @@ class Finisher {
     draft.outputs = {std::move(frequencies), place, text};
     draft.unasked = {std::move(unasked), place, ""};
     draft.primitive = {primitive_, draft.primitive ? draft.primitive->place : Place{}, ""};
-    draft.bandwidth.reset();
-    draft.low_bandwidth.reset();
-    draft.feedback.reset();
-    draft.rank.reset();
-    draft.prefer_max_vco.reset();
-    draft.int_div0.reset();
-    draft.engine.reset();
-    draft.any_order.reset();
     std::optional<Reading> reading =
         read::Finish(draft, {.primitive = primitive_, .evaluates = true}, &mistakes_);
     if (!reading) return std::nullopt;

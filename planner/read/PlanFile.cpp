@@ -29,8 +29,7 @@ class PlanReader {
       return {};
     }
     if (const Node* const request = root.Find("request")) {
-      plan_.request = ReadTree(*request, file_, Naming::kEntries, mistakes_);
-      DropChoices();
+      plan_.request = WithoutChoices(ReadTree(*request, file_, Naming::kEntries, mistakes_));
     }
     for (std::size_t i = 0; i < answers->items.size(); ++i) {
       if (!IsMeant(answers->items[i], number)) continue;
@@ -58,20 +57,6 @@ class PlanReader {
     mistake.kind = kind;
     mistake.place = std::move(place);
     return mistakes_->emplace_back(std::move(mistake));
-  }
-
-  // How the plan was to be chosen does not concern settings that are there.
-  void DropChoices() {
-    Draft& draft = plan_.request;
-    draft.primitive.reset();
-    draft.bandwidth.reset();
-    draft.low_bandwidth.reset();
-    draft.feedback.reset();
-    draft.rank.reset();
-    draft.prefer_max_vco.reset();
-    draft.int_div0.reset();
-    draft.engine.reset();
-    draft.any_order.reset();
   }
 
   static bool IsMeant(const Node& answer, std::optional<int> number) {
