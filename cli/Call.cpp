@@ -246,9 +246,9 @@ void Write(const Call& call, const std::string& text, const Setting& setting) {
   const std::string doubts = DoubtLines(call, StyleOf(call, setting));
   const bool is_text = call.format == Format::kText;
   if (call.file.empty()) {
-    WriteOut(is_text ? text + doubts : text);
+    WriteOut(is_text ? doubts + text : text);
   } else {
-    WriteFile(is_text ? text + doubts : text, call.file);
+    WriteFile(is_text ? doubts + text : text, call.file);
   }
   if (!is_text) WriteError(doubts);
 }

@@ -47,8 +47,8 @@ int RunEngine(std::string_view command, const std::vector<std::string>& words,
     calls.explain = ExplainCall(call, primitive, setting);
     const std::string cause = LimitsInTheWay(call.device, primitive, setting);
     throw Failure(kUnsolved,
-                  planner::report::UnsolvedText(answer, call.device, cause, style, calls) +
-                      DoubtLines(call, style));
+                  DoubtLines(call, style) +
+                      planner::report::UnsolvedText(answer, call.device, cause, style, calls));
   }
   Write(call,
         call.format == Format::kText

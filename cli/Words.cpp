@@ -96,10 +96,16 @@ class Reader {
     }
     if (!facts.is_list) return false;
     if (word.front() == ',') return true;
-    if (value.back() != ',') return false;
+    // Blanks for commas: the reader of the list tells what to write.
+    if (value.back() != ',') return IsValue(word, facts.kind);
     // The next entry: a number, or "-" for nothing, but no option.
     return word.front() != '-' || word.size() == 1 || word[1] == ',' || word[1] == '.' ||
            planner::read::IsDigit(word[1]);
+  }
+
+  static bool IsValue(std::string_view word, planner::read::ValueKind kind) {
+    planner::read::Mistakes mistakes;
+    return planner::read::ReadValue(word, kind, {}, &mistakes).has_value();
   }
 
   // Another command may have the option.

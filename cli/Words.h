@@ -6,7 +6,7 @@
 // one before it, pass over the empty value of `--in=`, and tell mistakes as sentences only.
 //
 // A value with a unit can come as several words, as a shell makes them of `27 MHz` and of
-// `148.5, 74.25, 27`.
+// `148.5, 74.25, 27`. So can a list without commas, `148.5 74.25`, which is then refused as one.
 //
 // Tested by words.test and wrong.test.
 #ifndef VORKEL_CLI_WORDS_H_

@@ -256,6 +256,31 @@ class Finisher {
     };
     look(draft_.inputs, true);
     look(draft_.outputs, false);
+    DoubtJitter();
+    DoubtDuties();
+  }
+
+  // A clock whose edges move by more than its period is none.
+  void DoubtJitter() {
+    constexpr int kPicoseconds = 1'000'000;  // in a period of 1 MHz
+    constexpr int kDecimals = 3;
+    if (!draft_.input_jitter) return;
+    const std::vector<Rational>& inputs = request().inputs;
+    const Rational shortest = kPicoseconds / *std::max_element(inputs.begin(), inputs.end());
+    const Rational& jitter = draft_.input_jitter->value;
+    if (jitter <= shortest) return;
+    reading_.doubts.push_back({DoubtKind::kJitterAbovePeriod, draft_.input_jitter->place,
+                               Written(jitter), shortest.Fixed(kDecimals)});
+  }
+
+  // Of several, a 0 leaves one out; alone it looks like a duty cycle.
+  void DoubtDuties() {
+    if (!draft_.duties) return;
+    const Values& duties = draft_.duties->value;
+    const bool are_none = std::all_of(duties.begin(), duties.end(), [](const auto& duty) {
+      return duty && *duty == 0;
+    });
+    if (are_none) reading_.doubts.push_back({DoubtKind::kNoDuty, draft_.duties->place, "", ""});
   }
 
   Request& request() { return reading_.request; }

@@ -44,7 +44,8 @@ struct Place {
 
 enum class MistakeKind {
   // One value. `text` is all of it.
-  kNotAValue,        // hint: the same with a decimal point, when it has a decimal comma
+  kNotAValue,        // hint: the same with a decimal point, when it has a decimal comma; other: the
+                     // entries of a list with commas, when it has blanks between them
   kNumberTooLarge,   // text: the number
   kNumberTooSmall,   // text: the number, which is not 0
   kTooManyDigits,    // text: the number
@@ -88,8 +89,8 @@ enum class MistakeKind {
 };
 
 // What a number must be.
-enum class NumberDemand { kNone, kAboveZero, kNotNegative, kAtMostOneMs, kPercentage, kTurn,
-                          kAtMostTenPercent };
+enum class NumberDemand { kNone, kAboveZero, kNotNegative, kAtMostOneMs, kPercentage, kPartOfPeriod,
+                          kTurn, kAtMostTenPercent };
 
 // How a JSON text is no JSON.
 enum class SyntaxFault {
@@ -140,7 +141,9 @@ class MistakeError : public std::runtime_error {
 
 // Something that may not be meant, beside a request that can be read.
 enum class DoubtKind {
-  kDecimalComma  // text: a list that looks like one number with a comma; hint: that number
+  kDecimalComma,      // text: a list that looks like one number with a comma; hint: that number
+  kJitterAbovePeriod,  // text: the jitter of the input; hint: the period that it is above; ps
+  kNoDuty             // all duty cycles are 0, which asks for none
 };
 
 struct Doubt {

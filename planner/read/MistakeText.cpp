@@ -64,6 +64,8 @@ std::string_view TextOf(NumberDemand demand) {
       return "at most 1 ms";
     case NumberDemand::kPercentage:
       return "between 0 and 100";
+    case NumberDemand::kPartOfPeriod:
+      return "above 0 and below 100";
     case NumberDemand::kAtMostTenPercent:
       return "at most 100000 ppm";
     case NumberDemand::kTurn:
@@ -174,6 +176,10 @@ std::string ValueText(const Mistake& mistake) {
   const std::string shown = Shown(mistake.text);
   switch (mistake.kind) {
     case MistakeKind::kNotAValue: {
+      if (!mistake.other.empty()) {
+        return fmt::format("\"{}\" is a list without commas; write {}", shown,
+                           Shown(mistake.other));
+      }
       const std::string point =
           mistake.hint.empty() ? "" : fmt::format("; with a decimal point it is {}",
                                                   Shown(mistake.hint));
@@ -328,7 +334,17 @@ std::string TextOf(const Mistake& mistake) {
 }
 
 std::string TextOf(const Doubt& doubt) {
-  return fmt::format("{} {} is a list of two; with a decimal point it is {}", TextOf(doubt.place),
+  const std::string place = TextOf(doubt.place);
+  switch (doubt.kind) {
+    case DoubtKind::kJitterAbovePeriod:
+      return fmt::format("{}: a jitter of {} ps is above the period of the input, {} ps", place,
+                         Shown(doubt.text), doubt.hint);
+    case DoubtKind::kNoDuty:
+      return fmt::format("{}: 0 asks for no duty cycle, as - does", place);
+    case DoubtKind::kDecimalComma:
+      break;
+  }
+  return fmt::format("{} {} is a list of two; with a decimal point it is {}", place,
                      Shown(doubt.text), doubt.hint);
 }
 

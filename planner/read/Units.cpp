@@ -88,7 +88,8 @@ NumberDemand DemandOn(const Rational& value, ValueKind kind) {
     case ValueKind::kPhase:
       return value.Absolute() <= 360 ? NumberDemand::kNone : NumberDemand::kTurn;
     case ValueKind::kDuty:
-      return value >= 0 && value <= 100 ? NumberDemand::kNone : NumberDemand::kPercentage;
+      // 0 asks for none, as of the engine.
+      return value >= 0 && value < 100 ? NumberDemand::kNone : NumberDemand::kPartOfPeriod;
     case ValueKind::kMaxJitter:
       if (value <= 0) return NumberDemand::kAboveZero;
       [[fallthrough]];
@@ -368,6 +369,29 @@ std::vector<std::string_view> EntriesOf(std::string_view text) {
   return entries;
 }
 
+// The values of a text with blanks between them, with commas instead: "148.5MHz,-,27" for
+// "148.5 MHz - 27"; empty when it is no such text. Where `optional`, "-" is an entry, too.
+std::string WithCommas(std::string_view text, ValueKind kind, const Place& place, bool optional) {
+  std::string list;
+  std::size_t count = 0;
+  for (;;) {
+    while (!text.empty() && IsBlank(text.front())) text.remove_prefix(1);
+    if (text.empty()) break;
+    const auto end = std::find_if(text.begin(), text.end(), IsBlank);
+    const std::string_view word = text.substr(0, static_cast<std::size_t>(end - text.begin()));
+    text.remove_prefix(word.size());
+    if (!list.empty() && IsDigit(list.back()) && IsUnit(word, kind)) {
+      list += word;
+      continue;
+    }
+    Mistakes ignored;
+    const bool is_value = ValueReader(word, kind, place, &ignored).Read().has_value();
+    if (!is_value && !(optional && word == "-")) return "";
+    list += (count++ > 0 ? "," : "") + std::string(word);
+  }
+  return count > 1 ? list : "";
+}
+
 Mistake ListMistake(MistakeKind kind, std::string_view text, ValueKind value_kind,
                     const Place& place) {
   Mistake mistake;
@@ -407,7 +431,13 @@ std::optional<Values> ReadValues(std::string_view text, ValueKind kind, const Pl
       continue;
     }
     const std::optional<Parsed> parsed = ValueReader(entry, kind, place, mistakes).Read();
-    if (!parsed) continue;
+    if (!parsed) {
+      Mistake& mistake = mistakes->back();
+      if (mistake.kind == MistakeKind::kNotAValue) {
+        mistake.other = WithCommas(entry, kind, place, optional);
+      }
+      continue;
+    }
     values.emplace_back(parsed->value);
     if (parsed->unit.empty()) bare = entry;
     if (!parsed->is_usual) {

@@ -180,6 +180,33 @@ TEST(DecimalCommas, AreTheReasonForAListThatIsTooLong) {
                           "--out 148,5 is 148.5"));
 }
 
+// --- Other doubts -------------------------------------------------------------------------------
+
+std::vector<std::string> DoubtsWith(std::vector<Option> options) {
+  std::vector<std::string> texts;
+  for (const Doubt& doubt : ReadGood(std::move(options)).doubts) texts.push_back(TextOf(doubt));
+  return texts;
+}
+
+// The period of 27 MHz is 37037.037 ps, that of 80 MHz 12500 ps.
+TEST(Doubts, AJitterOfTheInputIsAboveItsPeriod) {
+  EXPECT_THAT(DoubtsWith({{"--in", "27"}, {"--out", "100"}, {"--input-jitter", "40ns"}}),
+              ElementsAre("--input-jitter: a jitter of 40000 ps is above the period of the input, "
+                          "37037.037 ps"));
+  EXPECT_THAT(DoubtsWith({{"--in", "27,80"}, {"--out", "100"}, {"--input-jitter", "12500.5"}}),
+              ElementsAre("--input-jitter: a jitter of 12500.5 ps is above the period of the "
+                          "input, 12500.000 ps"));
+  EXPECT_THAT(DoubtsWith({{"--in", "80"}, {"--out", "100"}, {"--input-jitter", "12500"}}),
+              IsEmpty());
+}
+
+TEST(Doubts, ADutyCycleOfZeroAsksForNone) {
+  EXPECT_THAT(DoubtsWith({{"--in", "27"}, {"--out", "100"}, {"--duty", "0"}}),
+              ElementsAre("--duty: 0 asks for no duty cycle, as - does"));
+  EXPECT_THAT(DoubtsWith({{"--in", "27"}, {"--out", "100,50"}, {"--duty", "0,50"}}), IsEmpty());
+  EXPECT_THAT(DoubtsWith({{"--in", "27"}, {"--out", "100,50"}, {"--duty", "0,-"}}), IsEmpty());
+}
+
 // --- Writing ----------------------------------------------------------------------------------
 
 std::string Words(const std::vector<Option>& options) {
@@ -233,7 +260,7 @@ TEST(OptionsOfARequest, AreReadAsTheSame) {
       if (output.used) {
         output.frequency = Rational(1 + draw(99999), 64);
         output.phase = maybe(-360, 360);
-        output.duty = maybe(0, 100);
+        output.duty = maybe(0, 99);
         output.tolerance = maybe(0, 1000);
         output.phase_tolerance = maybe(0, 10);
         output.duty_tolerance = maybe(0, 10);

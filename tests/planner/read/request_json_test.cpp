@@ -172,7 +172,7 @@ TEST(RequestJson, TellsAllMistakesInTheOrderOfTheirPlaces) {
       TextsOf(mistakes),
       ElementsAre("FILE:1:11: exact must be true or false, not a number",
                   "FILE:2:13: input 0: 0 must be greater than 0",
-                  "FILE:3:39: output 0: duty: 101 must be between 0 and 100",
+                  "FILE:3:39: output 0: duty: 101 must be above 0 and below 100",
                   "FILE:3:53: output 0: phase: 400 must be between -360 and 360",
                   "FILE:4:4: output 1: unknown unit \"parsecs\" in \"5 parsecs\"; the units of a "
                   "frequency are Hz, kHz, MHz and GHz, or ps, ns, us and ms for a period",

@@ -141,7 +141,8 @@ INSTANTIATE_TEST_SUITE_P(
         Bad{"360.00000000000000001", ValueKind::kPhase,
             "360.00000000000000001 must be between -360 and 360"},
         Bad{"1e308/1e-308", ValueKind::kPhase, "1e308/1e-308 must be between -360 and 360"},
-        Bad{"101%", ValueKind::kDuty, "101% must be between 0 and 100"},
+        Bad{"101%", ValueKind::kDuty, "101% must be above 0 and below 100"},
+        Bad{"100", ValueKind::kDuty, "100 must be above 0 and below 100"},
         Bad{"-1", ValueKind::kTolerance, "-1 must be 0 or greater"},
         Bad{"1000000001", ValueKind::kTolerance,
             "1000000001 is out of range: a tolerance is from 0 to 1000000000 ppm"},
@@ -166,6 +167,20 @@ std::string List(const std::string& text, ValueKind kind, bool optional = false)
   for (const auto& value : *values) result += (result.empty() ? "" : ",") +
                                               (value ? Written(*value) : std::string("-"));
   return result;
+}
+
+TEST(Lists, WithBlanksForCommasAreShownWithThem) {
+  EXPECT_EQ(List("148.5 74.25", kF),
+            "it: \"148.5 74.25\" is a list without commas; write 148.5,74.25\n");
+  EXPECT_EQ(List("27,148.5 MHz  8ns", kF),
+            "it: \"148.5 MHz  8ns\" is a list without commas; write 148.5MHz,8ns\n");
+  EXPECT_EQ(List("- -45 90deg", ValueKind::kPhase, true),
+            "it: \"- -45 90deg\" is a list without commas; write -,-45,90deg\n");
+  // Not where something else is wrong, too.
+  EXPECT_EQ(List("148.5 x", kF), "it: unknown unit \"x\" in \"148.5 x\"; the units of a frequency "
+                                 "are Hz, kHz, MHz and GHz, or ps, ns, us and ms for a period\n");
+  EXPECT_EQ(List("148.5 -7", kF), "it: " + Not("148.5 -7") + "\n");
+  EXPECT_EQ(List("- 90", kF), "it: " + Not("- 90") + "\n");
 }
 
 TEST(Lists, HaveAUnitWithEachOrWithSomeWhenItChangesNothing) {
