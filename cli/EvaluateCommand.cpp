@@ -12,7 +12,6 @@
 #include "planner/answer/Evaluate.h"
 #include "planner/read/Settings.h"
 #include "planner/report/ReportText.h"
-#include "planner/report/Table.h"
 
 namespace cli {
 
@@ -58,14 +57,6 @@ std::optional<planner::read::Evaluation> EvaluationOf(const Given& given, const 
   return FinishEvaluation(draft, settings, device, mistakes);
 }
 
-std::string Text(const Call& call, const planner::Answer& answer, const Setting& setting) {
-  const planner::report::Style style = StyleOf(call, setting);
-  const std::string text = planner::report::ReportText(call.request(), call.device, answer, style);
-  if (!answer.max_jitter) return text;
-  return text + "\n" +
-         planner::report::Prose(style, "jitter: ", "peak to peak, at a bit error rate of 1e-12.");
-}
-
 }  // namespace
 
 int RunEvaluate(std::string_view command, const std::vector<std::string>& words,
@@ -82,8 +73,10 @@ int RunEvaluate(std::string_view command, const std::vector<std::string>& words,
   const planner::Answer answer =
       planner::answer::Evaluate(call.request(), call.device, settings, planner::Source{});
   Write(call,
-        call.format == Format::kText ? Text(call, answer, setting)
-                                     : InFormat(call, {{&answer}}, answer),
+        call.format == Format::kText
+            ? planner::report::EvaluationText(call.request(), call.device, answer,
+                                              StyleOf(call, setting))
+            : InFormat(call, {{&answer}}, answer),
         setting);
   return answer.within ? kDone : kOff;
 }

@@ -12,7 +12,7 @@
 #include "cli/Output.h"
 #include "cli/Stream.h"
 #include "cli/Words.h"
-#include "planner/answer/Evaluate.h"
+#include "planner/reach/Reach.h"
 #include "planner/read/Letters.h"
 #include "planner/read/Options.h"
 #include "planner/read/Shown.h"
@@ -112,24 +112,18 @@ planner::read::Reading ReadRequest(const Given& given, int output) {
   return std::move(*reading);
 }
 
-// Those that can be asked: a KRU has one input.
+// Those that can be asked.
 std::vector<Primitive> PrimitivesOf(const planner::Request& request,
                                     const planner::Device& device) {
-  std::vector<Primitive> primitives;
+  planner::reach::Askable askable = planner::reach::AskableOf(request, device);
+  if (!askable.primitives.empty()) return std::move(askable.primitives);
   std::string reasons;
-  for (const Primitive primitive : device.primitives) {
-    if (request.primitive && *request.primitive != primitive) continue;
-    const std::vector<planner::Finding> refusals = planner::answer::Refusals(request, primitive);
-    if (refusals.empty()) {
-      primitives.push_back(primitive);
-    } else {
-      for (const planner::Finding& refusal : refusals) {
-        reasons += fmt::format("vorkel: {}\n", planner::report::FindingText(refusal, device));
-      }
+  for (const planner::Answer& answer : askable.refused) {
+    for (const planner::Finding& refusal : answer.refusals) {
+      reasons += fmt::format("vorkel: {}\n", planner::report::FindingText(refusal, device));
     }
   }
-  if (primitives.empty()) throw Failure(kUnsolved, reasons);
-  return primitives;
+  throw Failure(kUnsolved, reasons);
 }
 
 }  // namespace

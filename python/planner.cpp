@@ -12,6 +12,7 @@
 #include <pybind11/pybind11.h>
 
 #include <cstddef>
+#include <exception>
 #include <memory>
 #include <nlohmann/json.hpp>
 #include <optional>
@@ -24,59 +25,29 @@
 #include "planner/device/Check.h"
 #include "planner/device/Files.h"
 #include "planner/explain/Explain.h"
-#include "planner/hdl/Hdl.h"
-#include "planner/hdl/Instance.h"
-#include "planner/hdl/Names.h"
 #include "planner/plan/Plan.h"
-#include "planner/read/RequestJson.h"
-#include "planner/read/Shown.h"
-#include "planner/relations/Rule.h"
 #include "planner/report/DevicesText.h"
 #include "planner/report/ErrorData.h"
 #include "planner/report/ExplainText.h"
 #include "planner/report/Json.h"
-#include "planner/report/PartText.h"
 #include "planner/report/PlanText.h"
-#include "planner/report/Relations.h"
-#include "planner/report/Sdc.h"
 #include "planner/report/VerifyText.h"
 #include "planner/verify/Verify.h"
+#include "python/Asked.h"
+#include "python/Evaluation.h"
+#include "python/Reachable.h"
+#include "python/Refused.h"
+#include "python/Writing.h"
 
 namespace {
 
 namespace py = pybind11;
 using nlohmann::ordered_json;
+using python::Asked;
+using python::Evaluation;
+using python::Reachable;
+using python::Refused;
 using std::string;
-
-constexpr const char* kUsualDevice = "vk40";
-
-string Text(const ordered_json& data) {
-  return data.dump(-1, ' ', false, ordered_json::error_handler_t::replace);
-}
-
-// Raises what a function of vorkel._errors makes of the data.
-[[noreturn]] void Raise(const char* function, const ordered_json& data) {
-  py::module_::import("vorkel._errors").attr(function)(py::str(Text(data)));
-  throw py::error_already_set();  // the function has raised
-}
-
-[[noreturn]] void RaiseMistakes(const planner::read::Mistakes& mistakes) {
-  ordered_json data = ordered_json::array();
-  for (const auto& mistake : mistakes) data.push_back(planner::report::MistakeData(mistake));
-  Raise("raise_request", data);
-}
-
-[[noreturn]] void RaisePart(const planner::device::PartError& error) {
-  Raise("raise_request", ordered_json::array({planner::report::PartErrorData(error)}));
-}
-
-[[noreturn]] void RaiseUnsolved(const planner::plan::Plan& plan, const planner::Device& device) {
-  ordered_json data = ordered_json::array();
-  for (const auto& answer : plan.refused) {
-    data.push_back(planner::report::RefusedData(answer, device));
-  }
-  Raise("raise_unsolved", data);
-}
 
 // Does something that knows no Python, while that goes on.
 template <typename Work>
@@ -85,55 +56,14 @@ auto Beside(const Work& work) {
   return work();
 }
 
-// A request and the device that it is for.
-struct Asked {
-  planner::read::Reading reading;
-  planner::Device device;
-  const planner::Request& request() const { return reading.request; }
-};
-
-ordered_json NoPrimitive(const planner::Device& device, const string& message) {
-  return ordered_json::array({{{"kind", "no_primitive"},
-                               {"entry", "device"},
-                               {"text", device.part},
-                               {"known", ordered_json::array()},
-                               {"message", message}}});
-}
-
-Asked Read(const string& json) {
-  planner::read::Mistakes mistakes;
-  const planner::read::Draft draft = planner::read::ReadJson(json, "", &mistakes);
-  if (!mistakes.empty()) RaiseMistakes(mistakes);
-  auto reading = planner::read::Finish(draft, {}, &mistakes);
-  if (!reading) RaiseMistakes(mistakes);
-  Asked asked;
-  asked.reading = std::move(*reading);
-  try {
-    const auto files = planner::device::HostFiles();
-    const auto& name = asked.reading.device;
-    asked.device = planner::device::Catalogue(*files).FindDevice(name ? name->value : kUsualDevice);
-  } catch (const planner::device::PartError& error) {
-    RaisePart(error);
-  }
-  const auto& primitive = asked.request().primitive;
-  if (asked.device.primitives.empty()) {
-    Raise("raise_request", NoPrimitive(asked.device, planner::report::LacksAllText(asked.device)));
-  }
-  if (primitive && !asked.device.Has(*primitive)) {
-    Raise("raise_request",
-          NoPrimitive(asked.device, planner::report::LacksText(asked.device, *primitive)));
-  }
-  return asked;
-}
-
 // What a plan is shown as.
 enum class Part { kPlan, kCompare, kBest };
 
 class Plan {
  public:
-  explicit Plan(const string& request) : asked_(Read(request)) {
+  explicit Plan(const string& request) : asked_(python::Read(request)) {
     plan_ = Beside([this] { return planner::plan::Make(asked_.request(), asked_.device); });
-    if (!plan_.IsSolved()) RaiseUnsolved(plan_, asked_.device);
+    if (!plan_.IsSolved()) python::RefuseUnsolved(plan_.refused, asked_.device);
   }
 
   std::size_t Count() const { return plan_.ranked.size(); }
@@ -157,45 +87,17 @@ class Plan {
     }
     return planner::report::PlanText(plan_, asked_.device, Checked(number), style, {});
   }
-  string Sdc(std::size_t number, bool plain, bool fifos, const string& rule) const {
-    planner::report::SdcOptions options;
-    options.plain = plain;
-    options.fifos = fifos;
-    options.rule = Rule(rule);
-    return planner::report::Sdc(asked_.request(), asked_.device, Candidate(number), options);
+  string Sdc(std::size_t number, bool plain, bool fifos, const string& gap) const {
+    return python::Sdc(asked_, Candidate(number), plain, fifos, gap);
   }
-  string Relations(std::size_t number, const string& rule) const {
-    return planner::report::RelationsJson(asked_.request(), asked_.device, Candidate(number),
-                                          Rule(rule));
+  string Relations(std::size_t number, const string& gap) const {
+    return python::Relations(asked_, Candidate(number), gap);
   }
   string Hdl(std::size_t number, bool is_vhdl, bool is_testbench, const string& name) const {
-    string wrong = planner::hdl::NameProblem(name);
-    if (!wrong.empty()) wrong = "\"" + planner::read::Shown(name) + "\" " + wrong;
-    if (wrong.empty()) wrong = planner::hdl::Refusal(asked_.request());
-    if (!wrong.empty()) {
-      Raise("raise_request", ordered_json::array({{{"kind", "not_writable"},
-                                                   {"entry", "name"},
-                                                   {"text", planner::read::Shown(name)},
-                                                   {"known", ordered_json::array()},
-                                                   {"message", wrong}}}));
-    }
-    const auto language =
-        is_vhdl ? planner::hdl::Language::kVhdl : planner::hdl::Language::kVerilog;
-    const auto& write = is_testbench ? planner::hdl::Testbench : planner::hdl::Module;
-    return write(language, name, asked_.request(), asked_.device, Candidate(number));
+    return python::Hdl(asked_, Candidate(number), is_vhdl, is_testbench, name);
   }
 
  private:
-  // From which gap on data can cross between clocks: "0.5ns", "20%"; empty: the usual.
-  static planner::relations::Rule Rule(const string& text) {
-    if (text.empty()) return {};
-    planner::read::Mistakes mistakes;
-    planner::read::Place place;
-    place.entry = "gap";
-    const auto rule = planner::relations::ReadRule(text, place, &mistakes);
-    if (!rule) RaiseMistakes(mistakes);
-    return *rule;
-  }
   std::size_t Checked(std::size_t number) const {
     if (plan_.Pick(number) == nullptr) throw py::index_error("there is no such candidate");
     return number;
@@ -223,7 +125,7 @@ class Plan {
 class Explanation {
  public:
   Explanation(const string& request, const std::optional<string>& oscillators)
-      : asked_(Read(request)), has_own_inputs_(oscillators) {
+      : asked_(python::Read(request)), has_own_inputs_(oscillators) {
     const std::vector<planner::Rational> inputs =
         oscillators ? Inputs(*oscillators) : planner::explain::StockOscillators();
     explanation_ =
@@ -249,7 +151,7 @@ class Explanation {
           text.get<string>(), planner::read::ValueKind::kFrequency, place, &mistakes);
       if (value) inputs.push_back(*value);
     }
-    if (!mistakes.empty()) RaiseMistakes(mistakes);
+    if (!mistakes.empty()) python::RefuseMistakes(mistakes);
     return inputs;
   }
 
@@ -265,12 +167,12 @@ string Devices(const std::optional<string>& name) {
     const auto selection = planner::device::Catalogue(*files).Select(*name);
     return planner::report::DeviceJson(planner::device::Describe(selection.file), selection.grades);
   } catch (const planner::device::PartError& error) {
-    RaisePart(error);
+    python::RefusePart(error);
   }
 }
 
 string Check(const py::bytes& text, const string& file, const string& device) {
-  return Text(planner::report::CheckData(planner::device::Check(string(text), file, device), file));
+  return python::Text(planner::report::CheckData(planner::device::Check(string(text), file, device), file));
 }
 
 string Verify(const string& plan, const string& file) {
@@ -280,14 +182,44 @@ string Verify(const string& plan, const string& file) {
     try {
       device = planner::device::Catalogue(*files).FindDevice(*part);
     } catch (const planner::device::PartError& error) {
-      RaisePart(error);
+      python::RefusePart(error);
     }
   }
   const auto wrong = Beside(
       [&] { return planner::verify::Verify(plan, device, &planner::report::JsonSentences()); });
   ordered_json data = ordered_json::array();
   for (const auto& one : wrong) data.push_back(planner::report::DiscrepancyData(one, file));
-  return Text(data);
+  return python::Text(data);
+}
+
+// A text, or none where that is None.
+std::optional<string> Given(const py::object& text) {
+  return text.is_none() ? std::nullopt : std::optional(text.cast<string>());
+}
+
+std::unique_ptr<Evaluation> Evaluated(const string& request, const py::list& settings,
+                                      const py::object& plan, const py::object& number) {
+  std::vector<Evaluation::Setting> all;
+  for (const py::handle& one : settings) {
+    const auto pair = one.cast<py::tuple>();
+    all.emplace_back(pair[0].cast<string>(), pair[1].cast<string>());
+  }
+  std::optional<int> place;
+  if (!number.is_none()) place = number.cast<int>();
+  return std::make_unique<Evaluation>(request, all, Given(plan), place);
+}
+
+// Raises in Python what is thrown here.
+void Raise(std::exception_ptr thrown) {
+  try {
+    if (thrown) std::rethrow_exception(thrown);
+  } catch (const Refused& refused) {
+    try {
+      py::module_::import("vorkel._errors").attr(refused.function.c_str())(refused.data);
+    } catch (py::error_already_set& raised) {
+      raised.restore();
+    }
+  }
 }
 
 }  // namespace
@@ -295,6 +227,8 @@ string Verify(const string& plan, const string& file) {
 PYBIND11_MODULE(_planner, module) {
   module.doc() = "The planner of vorkel. Use the package vorkel, which has types for all of it.";
   module.attr("version") = VORKEL_VERSION;
+
+  py::register_exception_translator(&Raise);
 
   py::enum_<Part>(module, "Part", "What a plan is shown as.")
       .value("PLAN", Part::kPlan)
@@ -314,20 +248,47 @@ PYBIND11_MODULE(_planner, module) {
 
   py::class_<Explanation>(module, "Explanation", "Why a request fails, and what would do.")
       .def(py::init([](const string& request, const py::object& oscillators) {
-             std::optional<string> inputs;
-             if (!oscillators.is_none()) inputs = oscillators.cast<string>();
-             return std::make_unique<Explanation>(request, inputs);
+             return std::make_unique<Explanation>(request, Given(oscillators));
            }),
            arg("request"), arg("oscillators"))
       .def("json", &Explanation::Json)
       .def("report", &Explanation::Report, arg("width"));
 
-  module.def(
-      "devices",
-      [](const py::object& name) {
-        return Devices(name.is_none() ? std::nullopt : std::optional(name.cast<string>()));
-      },
-      arg("name"));
+  py::class_<Evaluation>(module, "Evaluation", "What settings make that are there already.")
+      .def(py::init(&Evaluated), arg("request"), arg("settings"), arg("plan"), arg("number"))
+      .def("json", &Evaluation::Json)
+      .def("tcl", &Evaluation::Tcl)
+      .def("report", &Evaluation::Report, arg("width"))
+      .def("sdc",
+           [](const Evaluation& self, bool plain, bool fifos, const string& gap) {
+             return python::Sdc(self.asked(), self.answer(), plain, fifos, gap);
+           },
+           arg("plain"), arg("fifos"), arg("gap"))
+      .def("relations",
+           [](const Evaluation& self, const string& gap) {
+             return python::Relations(self.asked(), self.answer(), gap);
+           },
+           arg("gap"))
+      .def("hdl",
+           [](const Evaluation& self, bool is_vhdl, bool is_testbench, const string& name) {
+             return python::Hdl(self.asked(), self.answer(), is_vhdl, is_testbench, name);
+           },
+           arg("vhdl"), arg("testbench"), arg("name"));
+
+  // Each can take a while.
+  using Released = py::call_guard<py::gil_scoped_release>;
+  py::class_<Reachable>(module, "Reach", "Which frequencies an output can have.")
+      .def(py::init([](const string& request, int output, const py::object& lowest,
+                       const py::object& highest) {
+             return std::make_unique<Reachable>(request, output, Given(lowest), Given(highest));
+           }),
+           arg("request"), arg("output"), arg("lowest"), arg("highest"))
+      .def("all", &Reachable::All, arg("most"), Released())
+      .def("near", &Reachable::Near, arg("frequency"), arg("most"), Released())
+      .def("gaps", &Reachable::Gaps, arg("most"), Released())
+      .def("count", &Reachable::Count, Released());
+
+  module.def("devices", [](const py::object& name) { return Devices(Given(name)); }, arg("name"));
   module.def("shipped", &Device::Shipped, arg("folder"), arg("name"));
   module.def("check", &Check, arg("text"), arg("file"), arg("device"));
   module.def("verify", &Verify, arg("plan"), arg("file"));

@@ -2,7 +2,7 @@
 #include <algorithm>
 #include <optional>
 
-#include "planner/answer/Evaluate.h"
+#include "planner/reach/Reach.h"
 #include "planner/read/MistakeText.h"
 #include "planner/read/Units.h"
 #include "planner/report/FindingText.h"
@@ -132,21 +132,14 @@ std::string Reach(Words words) {
   const Given given =
       ReadGiven(all.words(), {"output", "from", "to", "near", "gaps", "count", "most"});
   const ReachQuestion question = QuestionOf(given, place);
-  std::vector<Primitive> primitives;
-  std::string reason;
-  for (const Primitive primitive : given.device.primitives) {
-    const auto& asked = given.request().primitive;
-    if (asked && *asked != primitive) continue;
-    const auto refusals = planner::answer::Refusals(given.request(), primitive);
-    if (refusals.empty()) {
-      primitives.push_back(primitive);
-    } else {
-      reason = planner::report::FindingText(refusals.front(), given.device);
-    }
+  const planner::reach::Askable askable =
+      planner::reach::AskableOf(given.request(), given.device);
+  if (askable.primitives.empty()) {
+    throw Failure::OfUsage("no_primitive", given.device.part,
+                           planner::report::RefusalText(askable.refused.back(), given.device));
   }
-  if (primitives.empty()) throw Failure::OfUsage("no_primitive", given.device.part, reason);
   std::string dict;
-  WriteReachTcl(given.request(), given.device, question, primitives, &dict);
+  WriteReachTcl(given.request(), given.device, question, askable.primitives, &dict);
   return dict;
 }
 

@@ -2,8 +2,10 @@
 #include "planner/reach/Reach.h"
 
 #include <algorithm>
+#include <utility>
 
 #include "planner/answer/Corners.h"
+#include "planner/answer/Evaluate.h"
 #include "planner/reach/KruPoints.h"
 #include "planner/reach/LoopPoints.h"
 
@@ -36,6 +38,22 @@ Request AloneAt(Request request, int output) {
 }
 
 }  // namespace
+
+Askable AskableOf(const Request& request, const Device& device) {
+  Askable askable;
+  for (const Primitive primitive : device.primitives) {
+    if (request.primitive && *request.primitive != primitive) continue;
+    Answer answer;
+    answer.primitive = primitive;
+    answer.refusals = answer::Refusals(request, primitive);
+    if (answer.refusals.empty()) {
+      askable.primitives.push_back(primitive);
+    } else {
+      askable.refused.push_back(std::move(answer));
+    }
+  }
+  return askable;
+}
 
 Reach::Reach(const Request& request, const Device& device, Primitive primitive, int output)
     : primitive_(primitive), input_(request.inputs.front()) {

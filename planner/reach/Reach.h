@@ -13,13 +13,23 @@
 
 #include <functional>
 #include <memory>
+#include <vector>
 
+#include "planner/Answer.h"
 #include "planner/Device.h"
 #include "planner/Request.h"
 #include "planner/Settings.h"
 #include "planner/reach/Point.h"
 
 namespace planner::reach {
+
+// The primitives of a device that can be asked, that of the request alone if it names one: those
+// that have as many inputs. For the others there are answers that say so.
+struct Askable {
+  std::vector<Primitive> primitives;
+  std::vector<Answer> refused;
+};
+Askable AskableOf(const Request& request, const Device& device);
 
 class Reach {
  public:

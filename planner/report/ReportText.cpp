@@ -234,4 +234,11 @@ string ReportText(const Request& request, const Device& device, const Answer& an
   return text + Notes(answer, device, style);
 }
 
+std::string EvaluationText(const Request& request, const Device& device, const Answer& answer,
+                           const Style& style) {
+  const std::string text = ReportText(request, device, answer, style);
+  if (!answer.max_jitter) return text;
+  return text + "\n" + Prose(style, "jitter: ", "peak to peak, at a bit error rate of 1e-12.");
+}
+
 }  // namespace planner::report

@@ -19,6 +19,10 @@ namespace planner::report {
 std::string ReportText(const Request& request, const Device& device, const Answer& answer,
                        const Style& style);
 
+// The same on settings that have been given, with what its jitter is.
+std::string EvaluationText(const Request& request, const Device& device, const Answer& answer,
+                           const Style& style);
+
 }  // namespace planner::report
 
 #endif  // VORKEL_PLANNER_REPORT_REPORTTEXT_H_

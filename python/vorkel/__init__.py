@@ -26,7 +26,7 @@ from ._answers import (
     Ranking,
     Refusal,
 )
-from ._calls import Plan, best, compare, explain, plan
+from ._calls import Plan, batch, best, compare, explain, plan, relations
 from ._devices import (
     Device,
     DeviceCheck,
@@ -42,6 +42,7 @@ from ._devices import (
     verify,
 )
 from ._errors import Mistake, RequestError, UnsolvedError, VorkelError
+from ._evaluation import Evaluation, evaluate
 from ._explanation import (
     Change,
     Conflict,
@@ -52,6 +53,7 @@ from ._explanation import (
 )
 from ._models import models
 from ._planner import version as __version__
+from ._reach import Reach, Reachable, ReachableCount, ReachableGap, reach
 from ._relations import Clock, Relation
 from ._request import Output, Value
 
@@ -69,6 +71,7 @@ __all__ = [
     "DevicePrimitive",
     "DeviceWarning",
     "Discrepancy",
+    "Evaluation",
     "Explanation",
     "Finding",
     "GradeCheck",
@@ -83,6 +86,10 @@ __all__ = [
     "PrimitiveExplanation",
     "Range",
     "Ranking",
+    "Reach",
+    "Reachable",
+    "ReachableCount",
+    "ReachableGap",
     "Refusal",
     "Relation",
     "RequestError",
@@ -90,12 +97,16 @@ __all__ = [
     "Value",
     "VorkelError",
     "__version__",
+    "batch",
     "best",
     "check",
     "compare",
     "devices",
+    "evaluate",
     "explain",
     "models",
     "plan",
+    "reach",
+    "relations",
     "verify",
 ]

@@ -3,21 +3,20 @@
 from __future__ import annotations
 
 import json
-from typing import Any, Iterable, Mapping, Optional, Tuple, Union
+from typing import Any, Iterable, Iterator, Mapping, Optional, Tuple, Union
 
 from . import _planner
-from ._answers import Answer, KruSettings, LoopSettings, OutputAnswer, Refusal
-from ._data import Data
-from ._errors import mistake
+from ._answers import Answer, Refusal
+from ._document import Document, is_vhdl, whole
+from ._errors import VorkelError, mistake
 from ._explanation import Explanation
 from ._relations import Relation, relations_of
 from ._request import AnyInputs, AnyOutput, Value, listed, request_json, written
 
 _USUAL_FRONT = 6
-_LARGEST = 1_000_000
 
 
-class Plan:
+class Plan(Document):
     """Answers to a request, the best first.
 
     `plan` makes one with a single answer, `compare` one with all candidates, and `best` one with
@@ -31,29 +30,12 @@ class Plan:
         self._part = part
         self._number = number
         self._most = most
-        self._data: Data = json.loads(self.to_json())
-        self._answers = tuple(Answer.of(one) for one in self._data["answers"] if one["solved"])
+        self._read()
         self._refused = tuple(
             Refusal.of(one["primitive"], one["reason"], one["refusals"])
             for one in self._data["answers"]
             if not one["solved"]
         )
-
-    def __repr__(self) -> str:
-        outputs = ", ".join(
-            f"{float(one.actual):.6g} MHz" if one.used else "-" for one in self.outputs
-        )
-        return f"<vorkel.Plan {self.device} {self.primitive}: {outputs}>"
-
-    @property
-    def device(self) -> str:
-        """The part name, with package and grade."""
-        return str(self._data["request"]["device"])
-
-    @property
-    def request(self) -> Mapping[str, Any]:
-        """What was asked for, as a request file has it; it can be given to `plan` again."""
-        return dict(self._data["request"])
 
     @property
     def answers(self) -> Tuple[Answer, ...]:
@@ -64,31 +46,6 @@ class Plan:
     def refused(self) -> Tuple[Refusal, ...]:
         """Of `compare`: the primitives that have no settings."""
         return self._refused
-
-    @property
-    def answer(self) -> Answer:
-        """The first answer."""
-        return self._answers[0]
-
-    @property
-    def primitive(self) -> str:
-        """That of the first answer."""
-        return self.answer.primitive
-
-    @property
-    def settings(self) -> Union[LoopSettings, KruSettings]:
-        """Those of the first answer."""
-        return self.answer.settings
-
-    @property
-    def outputs(self) -> Tuple[OutputAnswer, ...]:
-        """Those of the first answer."""
-        return self.answer.outputs
-
-    @property
-    def within(self) -> bool:
-        """Whether all of the first answer is as asked for, and in the device's range."""
-        return self.answer.within
 
     @property
     def candidates(self) -> int:
@@ -105,24 +62,19 @@ class Plan:
 
     def best(self, front: int = _USUAL_FRONT) -> Plan:
         """The best, that of each other primitive, at most `front` trade-offs, the engine's best."""
-        return Plan(self._made, _planner.Part.BEST, self._number, _count("front", front, 0))
+        return Plan(self._made, _planner.Part.BEST, self._number, whole("front", front, 0))
 
     def to_json(self) -> str:
-        """The document that `vorkel --format json` writes; `verify` takes it."""
+        """The document that `vorkel --format json` writes; `verify` and `evaluate` take it."""
         return self._made.json(self._part, self._number, self._most)
 
-    def to_dict(self) -> Data:
-        """The same as a dictionary."""
-        document: Data = json.loads(self.to_json())
-        return document
-
     def to_tcl(self) -> str:
-        """The same as a Tcl dict."""
+        """The document as a Tcl dict."""
         return self._made.tcl(self._part, self._number, self._most)
 
     def to_text(self, width: int = 80) -> str:
         """The report that `vorkel` shows, for so many columns."""
-        return self._made.report(self._part, self._number, self._most, _count("width", width, 40))
+        return self._made.report(self._part, self._number, self._most, whole("width", width, 40))
 
     def to_sdc(
         self,
@@ -159,30 +111,19 @@ class Plan:
         self, name: str = "clocks", number: Optional[int] = None, *, language: str = "verilog"
     ) -> str:
         """A testbench, in verilog or vhdl, that checks every edge of that module."""
-        if language not in ("verilog", "vhdl"):
-            sentence = f"language: {language!r} must be verilog or vhdl"
-            raise mistake("not_a_name", str(language), sentence, "language")
-        return self._made.hdl(self._chosen(number), language == "vhdl", True, name)
+        return self._made.hdl(self._chosen(number), is_vhdl(language), True, name)
 
     def _chosen(self, number: Optional[int]) -> int:
         return self._number if number is None else self._candidate(number)
 
     def _candidate(self, number: int) -> int:
-        if _count("number", number, 1) > self._made.count:
+        if whole("number", number, 1) > self._made.count:
             raise mistake(
                 "no_candidate",
                 str(number),
                 f"there are {self._made.count} candidates, and no number {number}",
             )
         return number
-
-
-def _count(name: str, value: int, lowest: int) -> int:
-    if isinstance(value, bool) or not isinstance(value, int) or not lowest <= value <= _LARGEST:
-        text = repr(value)
-        sentence = f"{name}: {text} must be a whole number from {lowest} to {_LARGEST}"
-        raise mistake("must_be", text, sentence, name)
-    return value
 
 
 def plan(
@@ -237,7 +178,7 @@ def plan(
     """
     names = dict(locals())
     del names["request"], names["pick"]
-    _count("pick", pick, 1)
+    whole("pick", pick, 1)
     made = _planner.Plan(request_json(request, names))
     first = Plan(made, _planner.Part.PLAN)
     return first if pick == 1 else first.pick(pick)
@@ -264,7 +205,7 @@ def best(
 ) -> Plan:
     """The best, that of each other primitive, at most `front` trade-offs, and what the engine has
     to say. Takes what `plan` takes."""
-    _count("front", front, 0)
+    whole("front", front, 0)
     return plan(inputs, outputs, request=request, **entries).best(front)
 
 
@@ -281,8 +222,47 @@ def explain(
     oscillators: input frequencies to try instead of stock ones. The rest is what `plan` takes, but
     `pick`.
     """
-    whole = {"inputs": inputs, "outputs": outputs, **entries}
+    entries.update(inputs=inputs, outputs=outputs)
     tried = None
     if oscillators is not None:
         tried = json.dumps([str(written(one, "oscillators")) for one in listed(oscillators)])
-    return Explanation(_planner.Explanation(request_json(request, whole), tried))
+    return Explanation(_planner.Explanation(request_json(request, entries), tried))
+
+
+def relations(
+    inputs: Optional[AnyInputs] = None,
+    outputs: Optional[Iterable[AnyOutput]] = None,
+    *,
+    request: Optional[Mapping[str, Any]] = None,
+    gap: Optional[str] = None,
+    **entries: Any,
+) -> Tuple[Relation, ...]:
+    """How data crosses from each clock of a plan to each other. Takes what `plan` takes, and the gap
+    of `Plan.relations`."""
+    return plan(inputs, outputs, request=request, **entries).relations(gap=gap)
+
+
+def batch(
+    requests: Iterable[Mapping[str, Any]], **entries: Any
+) -> Iterator[Union[Plan, VorkelError]]:
+    """The plan of each request, in their order, one after the other as they are taken.
+
+        >>> asked = [{"inputs": [27], "outputs": [148.5]}, {"inputs": [27]}]
+        >>> for answer in vorkel.batch(asked, device="vk40"):
+        ...     print(answer)
+        <vorkel.Plan vk40b484-2 TSYN: 148.5 MHz>
+        outputs: the outputs are missing
+
+    requests: dictionaries as request files have them; each can have an "id", as the lines that
+        `vorkel batch` reads.
+    entries: what stands in place of theirs, as the arguments of `plan`.
+
+    A request that cannot be read, or that nothing serves, has the exception in place of the plan.
+    """
+    for request in requests:
+        try:
+            if isinstance(request, Mapping):
+                request = {name: one for name, one in request.items() if name != "id"}
+            yield plan(request=request, **entries)
+        except VorkelError as error:
+            yield error

@@ -11,9 +11,9 @@ from typing import Any, Mapping, Optional, Tuple, Union
 
 from . import _planner
 from ._answers import Range
-from ._calls import Plan
 from ._data import Data, exact
 from ._errors import mistake
+from ._evaluation import AnyPlan, plan_json
 
 _LARGEST_DEVICE_FILE = 1_000_000  # bytes
 
@@ -226,18 +226,12 @@ class Discrepancy:
     message: str
 
 
-def verify(plan: Union[Plan, str, Mapping[str, Any]]) -> Tuple[Discrepancy, ...]:
+def verify(plan: AnyPlan) -> Tuple[Discrepancy, ...]:
     """Works every number of a plan out again, apart from the search; nothing when all are right.
 
-    plan: a plan, its JSON, or that as a dictionary. Raises RequestError when the device that it
+    plan: a plan or an evaluation, its JSON, or that as a dictionary. Raises RequestError when the device that it
     names is not there.
     """
-    if isinstance(plan, Plan):
-        text = plan.to_json()
-    elif isinstance(plan, str):
-        text = plan
-    else:
-        text = json.dumps(plan, indent=2)
     return tuple(
         Discrepancy(
             path=one["path"],
@@ -247,5 +241,5 @@ def verify(plan: Union[Plan, str, Mapping[str, Any]]) -> Tuple[Discrepancy, ...]
             column=one["column"],
             message=one["message"],
         )
-        for one in json.loads(_planner.verify(text, "plan"))
+        for one in json.loads(_planner.verify(plan_json(plan), "plan"))
     )

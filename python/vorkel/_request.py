@@ -53,6 +53,20 @@ def written(value: Any, entry: str) -> Any:
     raise mistake("wrong_type", kind, f"{entry}: no {kind} can be read", entry)
 
 
+def text_of(value: Any, entry: str) -> str:
+    """A value, or several with commas between, as the program's options have it."""
+    if isinstance(value, bool):
+        return "1" if value else "0"
+    if isinstance(value, float) and value - value == 0:
+        value = Decimal(repr(value))
+    data = "-" if value is None else written(value, entry)
+    if isinstance(data, Mapping):
+        raise mistake("wrong_type", "dict", f"{entry}: no dict can be read", entry)
+    if isinstance(data, list):
+        return ",".join(text_of(one, entry) for one in value)
+    return str(data)
+
+
 def output_data(output: Output) -> Any:
     return written({one.name: getattr(output, one.name) for one in fields(output)}, "outputs")
 
@@ -64,8 +78,18 @@ def listed(value: Any) -> List[Any]:
     return list(value)
 
 
-def request_json(request: Optional[Mapping[str, Any]], entries: Mapping[str, Any]) -> str:
+_NEEDED = {"inputs": "frequencies of the inputs", "outputs": "outputs"}
+
+
+def request_json(
+    request: Optional[Mapping[str, Any]],
+    entries: Mapping[str, Any],
+    needed: Iterable[str] = tuple(_NEEDED),
+) -> str:
     """The entries of a request and, in place of them, those that are not None."""
+    if request is not None and not isinstance(request, Mapping):
+        kind = type(request).__name__
+        raise mistake("wrong_type", kind, f"the request must be a dictionary, and is a {kind}")
     whole = dict(request or {})
     whole.update({name: value for name, value in entries.items() if value is not None})
     # What stands for all tolerances and what stands for one do not go together.
@@ -78,10 +102,10 @@ def request_json(request: Optional[Mapping[str, Any]], entries: Mapping[str, Any
             whole[name] = listed(whole[name])
         except (KeyError, TypeError):
             pass  # told below, or by `written`
-    for name, what in (("inputs", "frequencies of the inputs"), ("outputs", "outputs")):
+    for name in needed:
         if name not in whole or whole[name] is None or whole[name] == []:
-            raise mistake("missing", "", f"{name}: the {what} are missing", name)
-    if isinstance(whole["outputs"], list):
+            raise mistake("missing", "", f"{name}: the {_NEEDED[name]} are missing", name)
+    if isinstance(whole.get("outputs"), list):
         whole["outputs"] = ["-" if one is None else one for one in whole["outputs"]]
     data = {name: written(one, name) for name, one in whole.items() if one is not None}
     return json.dumps(data, ensure_ascii=False)

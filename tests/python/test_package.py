@@ -15,9 +15,13 @@ import vorkel
 from vorkel import _planner
 
 
-def test_the_example_of_the_package_works():
-    failed, tried = doctest.testmod(vorkel)
-    assert failed == 0 and tried > 0
+def test_the_examples_in_descriptions_work():
+    tried = {}
+    for name in ("vorkel", "vorkel._calls", "vorkel._evaluation", "vorkel._reach"):
+        module = importlib.import_module(name)
+        failed, tried[name] = doctest.testmod(module, extraglobs={"vorkel": vorkel})
+        assert failed == 0, name
+    assert all(tried.values())
 
 
 def test_all_that_is_public_is_there_and_described():
