@@ -64,6 +64,34 @@ def core_of(folder, name):
     return yaml.safe_load("\n".join(lines[1:]))
 
 
+# What the description of a core can have in each place, as far as it is used here.
+TOP = {"name", "description", "filesets", "generate", "generators", "targets"}
+ENTRIES = {
+    "filesets": {"files", "file_type", "depend"},
+    "targets": {"filesets", "default_tool", "generate", "toplevel"},
+    "generate": {"generator", "parameters"},
+    "generators": {"interpreter", "command", "description", "usage"},
+}
+FILE_TYPES = {"verilogSource", "vhdlSource", "SDC"}
+
+
+def check_form(core):
+    """A build tool takes a core with this form."""
+    assert set(core) <= TOP
+    assert re.fullmatch(r"[\w-]+:[\w-]+:[\w-]+:\d[\w.]*", core["name"])
+    for section, known in ENTRIES.items():
+        for name, entry in core.get(section, {}).items():
+            assert re.fullmatch(r"\w+", name) and set(entry) <= known, (section, name)
+    for fileset in core.get("filesets", {}).values():
+        assert fileset["file_type"] in FILE_TYPES
+        assert all(isinstance(path, str) and not path.startswith("/") for path in fileset["files"])
+        assert len(set(fileset["files"])) == len(fileset["files"])
+    for target in core.get("targets", {}).values():
+        assert set(target["filesets"]) <= set(core["filesets"])
+        assert set(target.get("generate", [])) <= set(core.get("generate", {}))
+    assert "default" in core.get("targets", {"default": None})
+
+
 def files_of(core, target):
     return [
         path
@@ -86,7 +114,10 @@ def test_a_core_in_verilog_simulates(tmp_path):
     result, folder = generated(tmp_path)
     assert (result.returncode, result.stdout, result.stderr) == (0, "", "")
     core = core_of(folder, "video_clocks")
+    check_form(core)
     assert core["name"] == "example:clocks:video:1.0"
+    assert core["targets"]["sim"]["default_tool"] == "icarus"
+    assert core["filesets"]["constraints"] == {"files": ["video_clocks.sdc"], "file_type": "SDC"}
     assert files_of(core, "default") == ["video_clocks.v", "video_clocks.sdc"]
     used = {path for target in core["targets"] for path in files_of(core, target)}
     there = {str(path.relative_to(folder)) for path in folder.rglob("*") if path.is_file()}
@@ -110,6 +141,8 @@ def test_a_core_in_vhdl_can_be_compiled_in_its_order(tmp_path):
     result, folder = generated(tmp_path, language="vhdl", name="pixel")
     assert result.returncode == 0, result.stderr
     core = core_of(folder, "pixel")
+    check_form(core)
+    assert core["targets"]["sim"]["default_tool"] == "ghdl"
     assert core["filesets"]["rtl"] == {"files": ["pixel.vhd"], "file_type": "vhdlSource"}
     if not shutil.which("ghdl"):
         pytest.skip("there is no ghdl")
@@ -127,6 +160,45 @@ def test_a_core_without_a_simulation(tmp_path):
     assert sorted(path.name for path in folder.iterdir()) == [
         "video_clocks.core", "video_clocks.sdc", "video_clocks.v",
     ]
+
+
+def test_a_design_with_the_generator(tmp_path):
+    """What a build tool does with the cores of the example."""
+    for name in ("vorkel_generator", "video"):
+        check_form(core_of(EXAMPLES / "core_generator", name))
+    tool = core_of(EXAMPLES / "core_generator", "vorkel_generator")
+    design = core_of(EXAMPLES / "core_generator", "video")
+    assert design["filesets"]["rtl"]["depend"] == [tool["name"].rpartition(":")[0]]
+    (asked,) = design["targets"]["default"]["generate"]
+    generate = design["generate"][asked]
+    generator = tool["generators"][generate["generator"]]
+    assert generator["interpreter"] == "python3"
+    request = tmp_path / "request.yml"
+    vlnv = design["name"].replace(":1.0", f"-{asked}:1.0")
+    request.write_text(
+        yaml.safe_dump(
+            {
+                "gapi": "1.0",
+                "files_root": str(EXAMPLES / "core_generator"),
+                "vlnv": vlnv,
+                "parameters": generate["parameters"],
+            }
+        )
+    )
+    folder = tmp_path / "core"
+    folder.mkdir()
+    result = run(EXAMPLES / "core_generator" / generator["command"], str(request), cwd=folder)
+    assert (result.returncode, result.stderr) == (0, "")
+    core = core_of(folder, "video_clocks")
+    check_form(core)
+    assert core["name"] == vlnv
+    if not shutil.which("verilator"):
+        pytest.skip("there is no verilator")
+    video = EXAMPLES / "core_generator" / design["filesets"]["rtl"]["files"][0]
+    top = design["targets"]["default"]["toplevel"]
+    options = ("--lint-only", "--timing", "-Wall", "-y", "models", "--top-module", top)
+    checked = run_tool("verilator", *options, video, "video_clocks.v", cwd=folder)
+    assert (checked.returncode, checked.stderr) == (0, "")
 
 
 @pytest.mark.parametrize(
