@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <cstddef>
 #include <cstdint>
+#include <functional>
 #include <string_view>
 #include <utility>
 #include <vector>
@@ -24,6 +25,10 @@ string Quoted(std::string_view word) { return "\"" + string(word) + "\""; }
 
 string From(int lowest, int highest) {
   return std::to_string(lowest) + " to " + std::to_string(highest);
+}
+
+string Entries(std::size_t count) {
+  return std::to_string(count) + (count == 1 ? " entry" : " entries");
 }
 
 // Reads entries of one object after the other; what is wrong with one is told, and makes the whole
@@ -57,24 +62,33 @@ class Reader {
     return node != nullptr ? node->text : string();
   }
 
-  // A whole number in a range; its lowest when it is none.
-  int Count(const Node& object, const string& path, const string& name, int lowest, int highest) {
+  // A whole number in a range, and of those only what `is_one`, or all without it; the lowest when
+  // it is none. `expected` is the range in words.
+  int Count(const Node& object, const string& path, const string& name, int lowest, int highest,
+            const std::function<bool(int)>& is_one = {}, string expected = "") {
     const Node* const node = Entry(object, path, name, NodeType::kNumber);
     if (node == nullptr) return lowest;
     const auto number = NumberOf(node->text);
     const auto whole = number ? number->Whole() : std::nullopt;
-    if (whole && lowest <= *whole && *whole <= highest) return static_cast<int>(*whole);
+    if (whole && lowest <= *whole && *whole <= highest &&
+        (!is_one || is_one(static_cast<int>(*whole)))) {
+      return static_cast<int>(*whole);
+    }
     Add(*node, number ? DiscrepancyKind::kNoSetting : DiscrepancyKind::kAbsurd, path + "." + name,
-        From(lowest, highest));
+        expected.empty() ? From(lowest, highest) : std::move(expected));
     return lowest;
   }
 
-  // Says that an entry, which is there, cannot be so.
-  void Refuse(const Node& object, const string& path, const string& name, string expected) {
+  // Says that an entry, which is there, cannot be so; `found` is what to call it.
+  void Refuse(const Node& object, const string& path, const string& name, string expected,
+              const string& found = "") {
     const Node* const node = object.Find(name);
     Add(node != nullptr ? *node : object, DiscrepancyKind::kNoSetting, path + "." + name,
         std::move(expected));
-    if (node == nullptr) discrepancies_->back().found.clear();
+    if (node == nullptr || !found.empty()) discrepancies_->back().found = found;
+  }
+  void RefuseType(const Node& node, const string& path, NodeType expected) {
+    Add(node, DiscrepancyKind::kWrongType, path, string(read::Name(expected)));
   }
 
  private:
@@ -168,12 +182,14 @@ class ClaimReader {
     const Node* const outputs = read_.Entry(node_, claim_.path, "outputs", NodeType::kArray);
     if (outputs == nullptr) return read_.Refuse(node_, claim_.path, "solved", "false");
     const std::size_t count = request_.outputs.size();
+    if (outputs->items.size() < count) {
+      return read_.Refuse(node_, claim_.path, "outputs", Entries(count),
+                          Entries(outputs->items.size()));
+    }
     for (std::size_t i = 0; i < count; ++i) {
       const string path = claim_.path + ".outputs[" + std::to_string(i) + "]";
-      if (i >= outputs->items.size() || outputs->items[i].type != NodeType::kObject) {
-        return read_.Refuse(node_, claim_.path, "outputs", std::to_string(count) + " objects");
-      }
       const Node& one = outputs->items[i];
+      if (one.type != NodeType::kObject) return read_.RefuseType(one, path, NodeType::kObject);
       outputs_.push_back({&one, path, read_.Flag(one, path, "used")});
     }
   }
@@ -262,12 +278,12 @@ class ClaimReader {
     const bool fractions =
         hardware::HasFractions(set.primitive, static_cast<int>(request_.outputs.size()),
                                request_.whole_divider_0);
-    set.m = read_.Count(*settings, path, "m_eighths", 1, 8 * hardware::kLargestM);
+    const auto is_m = [&](int eighths) {
+      return hardware::IsM(set.primitive, eighths, fractions);
+    };
+    set.m = read_.Count(*settings, path, "m_eighths", 8, 8 * hardware::kLargestM, is_m,
+                        fractions ? "8 or 40 to 512" : "8 times a whole M from 1 to 64");
     set.d = read_.Count(*settings, path, "d", 1, hardware::kLargestD);
-    if (read_.IsRight() && !hardware::IsM(set.primitive, set.m, fractions)) {
-      read_.Refuse(*settings, path, "m_eighths",
-                   fractions ? "8 or 40 to 512" : "8 times a whole M");
-    }
     for (std::size_t i = 0; i < outputs_.size(); ++i) {
       set.outputs.push_back(IsAsked(i) ? ReadLoopOutput(i, fractions) : LoopOutput{});
     }
@@ -279,13 +295,13 @@ class ClaimReader {
     const Node& node = *outputs_[i].node;
     const string& path = outputs_[i].path;
     LoopOutput set;
-    set.divider =
-        read_.Count(node, path, "divider_eighths", 1, 8 * hardware::kLargestDivider);
-    if (!hardware::IsDivider(set.divider, static_cast<int>(i), fractions,
-                             hardware::kLargestDivider)) {
-      read_.Refuse(node, path, "divider_eighths",
-                   i == 0 && fractions ? "8 or 16 to 1024" : "8 times a whole divider");
-    }
+    const auto is_divider = [&](int eighths) {
+      return hardware::IsDivider(eighths, static_cast<int>(i), fractions,
+                                 hardware::kLargestDivider);
+    };
+    set.divider = read_.Count(
+        node, path, "divider_eighths", 8, 8 * hardware::kLargestDivider, is_divider,
+        i == 0 && fractions ? "8 or 16 to 1024" : "8 times a whole divider from 1 to 128");
     // A turn either way; and less than a period high.
     set.phase = read_.Count(node, path, "phase_step", -set.divider, set.divider);
     set.high_time = read_.Count(node, path, "high_time", 0, std::max(1, set.divider / 4 - 1));

@@ -116,6 +116,39 @@ TEST(Verify, SettingsThatThereAreNot) {
   EXPECT_EQ(wrong[0].expected, "1 to 80");
 }
 
+// One message for one cause, and it says what is there.
+TEST(Verify, DividersAndOutputsThatThereCannotBe) {
+  for (const char* const eighths : {"0", "12", "2000"}) {
+    const auto wrong = Wrong(With(With(ByHand(), R"("divider": 4,)", R"("divider": 0,)"),
+                                  R"("divider_eighths": 32)",
+                                  string(R"("divider_eighths": )") + eighths));
+    ASSERT_EQ(wrong.size(), 1u) << eighths;
+    EXPECT_EQ(wrong[0].kind, DiscrepancyKind::kNoSetting);
+    EXPECT_EQ(wrong[0].path, "answers[0].outputs[0].divider_eighths");
+    EXPECT_EQ(wrong[0].found, eighths);
+    EXPECT_EQ(wrong[0].expected, "8 times a whole divider from 1 to 128");
+  }
+  const auto m = Wrong(With(ByHand(), R"("m_eighths": 64)", R"("m_eighths": 0)"));
+  ASSERT_EQ(m.size(), 1u);
+  const auto fraction = Wrong(With(ByHand(), R"("m": 8, "m_eighths": 64)",
+                                   R"("m": 7.5, "m_eighths": 60)"));
+  ASSERT_EQ(fraction.size(), 1u);
+  EXPECT_EQ(fraction[0].expected, "8 times a whole M from 1 to 64");
+  const string text = ByHand();
+  const std::size_t begin = text.find("\"outputs\": [{\n      \"index\"") + 12;
+  const std::size_t end = text.find("}],\n    \"misses\"") + 1;
+  const auto gone = Wrong(string(text).erase(begin, end - begin));
+  ASSERT_EQ(gone.size(), 1u);
+  EXPECT_EQ(gone[0].kind, DiscrepancyKind::kNoSetting);
+  EXPECT_EQ(gone[0].path, "answers[0].outputs");
+  EXPECT_EQ(gone[0].found, "0 entries");
+  EXPECT_EQ(gone[0].expected, "1 entry");
+  const auto word = Wrong(string(text).replace(begin, end - begin, "7"));
+  ASSERT_EQ(word.size(), 1u);
+  EXPECT_EQ(word[0].kind, DiscrepancyKind::kWrongType);
+  EXPECT_EQ(word[0].path, "answers[0].outputs[0]");
+}
+
 // The second bandwidth, right in all numbers, is not the first.
 TEST(Verify, ACandidateHasItsOwnNumber) {
   const string second = With(With(ByHand(), "OPTIMIZED", "LOW"), R"("tradeoff": true)",
