@@ -360,4 +360,43 @@ std::vector<Change> CommonTolerance(const Question& question) {
            question.request.tolerance, std::move(found->settings)}};
 }
 
+std::vector<Change> CommonJitter(const Question& question) {
+  std::vector<Demand> limited;
+  std::optional<Rational> lowest;
+  for (std::size_t i = 0; i < question.request.outputs.size(); ++i) {
+    const Output& output = question.request.outputs[i];
+    const std::optional<Rational> limit = question.request.MaxJitterOf(output);
+    if (!output.used || !limit) continue;
+    limited.push_back({Kind::kJitter, static_cast<int>(i)});
+    lowest = lowest ? std::min(*lowest, *limit) : *limit;
+  }
+  if (limited.size() < 2) return {};
+  const auto limit_of = [&](const Demand& demand) {
+    return *question.request.MaxJitterOf(
+        question.request.outputs[static_cast<std::size_t>(demand.output)]);
+  };
+  const auto find = [&](const Rational& jitter) {
+    Question changed = question;
+    for (const Demand& demand : limited) {
+      OutputOf(&changed, demand).max_jitter = std::max(jitter, limit_of(demand));
+    }
+    return changed.Ask();
+  };
+  // Of an output that keeps its own limit it takes nothing.
+  const auto needs = [&](const Settings& settings) {
+    Rational most = *lowest;
+    for (const Demand& demand : limited) {
+      const double jitter = JitterOf(question, demand, settings);
+      if (jitter >= answer::kUnknownJitter) continue;
+      const Rational exact = Rational::FromDouble(jitter);
+      if (exact > limit_of(demand)) most = std::max(most, exact);
+    }
+    return most;
+  };
+  std::optional<Allowance> found = FindSmallest(find, needs, 1000000000);
+  if (!found) return {};
+  return {{ChangeKind::kJitter, Demand{Kind::kJitter, -1}, found->value, *lowest,
+           std::move(found->settings)}};
+}
+
 }  // namespace planner::explain

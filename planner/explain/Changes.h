@@ -19,7 +19,7 @@ enum class ChangeKind {
   kFrequency,  // a frequency of `value` MHz
   kPhase,      // a phase of `value` degrees
   kDuty,       // a duty cycle of `value` percent
-  kJitter,     // a jitter of at most `value` ps
+  kJitter,     // a jitter of at most `value` ps: of the output, or of all that have a limit
   kLowest,     // of a range of the device: a minimum of `value` MHz
   kHighest,    // and a maximum
   kBandwidth,  // another bandwidth: that of the settings
@@ -41,6 +41,10 @@ std::vector<Change> ChangesOf(const Question& question, const Demand& demand);
 // The smallest tolerance for all frequencies, ppm, with which it goes; its settings make the
 // frequencies that the outputs would have together. Empty when no tolerance is enough.
 std::vector<Change> CommonTolerance(const Question& question);
+
+// The smallest jitter, ps, to which all limits of outputs that are below it can be moved so that it
+// goes; empty when no jitter is enough, and when less than two outputs have a limit.
+std::vector<Change> CommonJitter(const Question& question);
 
 }  // namespace planner::explain
 

@@ -79,6 +79,7 @@ OfPrimitive ExplainOne(const Request& request, const Device& device, Primitive p
     one.corrections.push_back(In(demands, correction));
   }
   one.together = CommonTolerance(question);
+  for (Change& change : CommonJitter(question)) one.together.push_back(std::move(change));
   one.swaps = Swaps(question);
   return one;
 }

@@ -41,7 +41,8 @@ struct OfPrimitive {
   bool is_met = false;            // the request goes as it stands; nothing is in the way
   std::vector<Conflict> conflicts;
   std::vector<std::vector<Demand>> corrections;
-  std::vector<Change> together;  // the smallest tolerance for all (CommonTolerance)
+  // The smallest tolerance for all (CommonTolerance), and the smallest jitter (CommonJitter).
+  std::vector<Change> together;
   std::vector<Swap> swaps;
   std::int64_t questions = 0;
   bool is_complete = true;  // false: the questions came to their end (Conflicts.h)

@@ -21,7 +21,7 @@ using explain::OfPrimitive;
 using nlohmann::ordered_json;
 
 // Counts up when an entry goes, is added, or changes its meaning or type.
-constexpr int kExplanationVersion = 1;
+constexpr int kExplanationVersion = 2;
 
 std::string_view KindName(DemandKind kind) {
   switch (kind) {
@@ -118,7 +118,10 @@ class Data {
     ordered_json data;
     data["kind"] = KindName(demand.kind);
     data["output"] = demand.output >= 0 ? ordered_json(demand.output) : ordered_json(nullptr);
-    if (demand.kind != DemandKind::kFrequency || demand.output >= 0) {
+    // Of all outputs together no words are told.
+    const bool is_of_output =
+        demand.kind == DemandKind::kFrequency || demand.kind == DemandKind::kJitter;
+    if (!is_of_output || demand.output >= 0) {
       data["text"] = DemandWords(demand, request_, device_, primitive);
     }
     return data;

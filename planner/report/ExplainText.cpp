@@ -129,19 +129,30 @@ string Texts::Changes(const std::vector<const Change*>& changes, Primitive primi
   return Join(words, "; ");
 }
 
+// What all outputs could have together, of a kind; null when it is not enough.
+const Change* CommonOf(const OfPrimitive& one, ChangeKind kind) {
+  for (const Change& change : one.together) {
+    if (change.kind == kind) return &change;
+  }
+  return nullptr;
+}
+
 // The primitive whose common tolerance is the smallest; null when none has one.
 const OfPrimitive* Texts::Nearest() const {
   const OfPrimitive* nearest = nullptr;
+  const Change* least = nullptr;
   for (const OfPrimitive& one : explanation_.primitives) {
-    if (one.together.empty()) continue;
-    if (!nearest || one.together.front().value < nearest->together.front().value) nearest = &one;
+    const Change* const tolerance = CommonOf(one, ChangeKind::kTolerance);
+    if (!tolerance || (least && least->value <= tolerance->value)) continue;
+    least = tolerance;
+    nearest = &one;
   }
   return nearest;
 }
 
 // The frequencies of all outputs together.
 string Texts::Together(const OfPrimitive& one) const {
-  const Change& change = one.together.front();
+  const Change& change = *CommonOf(one, ChangeKind::kTolerance);
   const Answer answer = answer::Evaluate(request_, device_, change.settings, Source{});
   std::vector<string> frequencies;
   for (const OutputAnswer& output : answer.outputs) {
@@ -156,15 +167,23 @@ Rational Texts::Distance(const Settings& settings) const {
   return answer::KeyOf(answer::Evaluate(request_, device_, settings, Source{})).worst_error;
 }
 
-// All outputs moved; or the one phase, duty cycle or jitter that is nearer.
+// All outputs moved, or all limits of their jitter; or the one phase, duty cycle or jitter that is
+// nearer.
 string Texts::NearestText() const {
   string text;
   std::optional<Rational> least;
   if (const OfPrimitive* const moved = Nearest()) {
     text = Together(*moved) + " (" + NameOf(*moved) + ")";
-    least = Distance(moved->together.front().settings);
+    least = Distance(CommonOf(*moved, ChangeKind::kTolerance)->settings);
   }
+  const auto hold = [&](const Change& change, const OfPrimitive& one) {
+    const Rational distance = Distance(change.settings);
+    if (least && *least <= distance) return;
+    least = distance;
+    text = ChangeWords(change, one.primitive) + " (" + NameOf(one) + ")";
+  };
   for (const OfPrimitive& one : explanation_.primitives) {
+    if (const Change* const jitter = CommonOf(one, ChangeKind::kJitter)) hold(*jitter, one);
     for (const Conflict& conflict : one.conflicts) {
       if (!conflict.lifts_all) continue;
       for (const Change& change : conflict.changes) {
@@ -172,10 +191,7 @@ string Texts::NearestText() const {
             change.kind != ChangeKind::kJitter) {
           continue;
         }
-        const Rational distance = Distance(change.settings);
-        if (least && *least <= distance) continue;
-        least = distance;
-        text = ChangeWords(change, one.primitive) + " (" + NameOf(one) + ")";
+        hold(change, one);
       }
     }
   }
@@ -228,6 +244,7 @@ string Texts::Corrections(const OfPrimitive& one) const {
 string Texts::Works(const OfPrimitive& one) const {
   std::vector<const Change*> lifting;
   std::vector<const Change*> others;
+  if (const Change* const jitter = CommonOf(one, ChangeKind::kJitter)) lifting.push_back(jitter);
   for (const Conflict& conflict : one.conflicts) {
     for (const Change& change : conflict.changes) {
       (conflict.lifts_all ? lifting : others).push_back(&change);
@@ -255,7 +272,8 @@ string Texts::Of(const OfPrimitive& one) const {
     text += Line("", std::to_string(one.conflicts.size() - told) + " more" + kDataHaveAll);
   }
   text += Works(one) + Corrections(one);
-  if (!one.together.empty() && one.together.front().value <= kLargestTolerance) {
+  const Change* const tolerance = CommonOf(one, ChangeKind::kTolerance);
+  if (tolerance && tolerance->value <= kLargestTolerance) {
     text += Line("all moved", Together(one));
   }
   for (const explain::Swap& swap : one.swaps) {

@@ -210,6 +210,9 @@ string ChangeWords(const Change& change, Primitive primitive) {
     case ChangeKind::kDuty:
       return Outputs({demand.output}) + " with a duty cycle of " + DutyWords(change.value);
     case ChangeKind::kJitter:
+      if (demand.output < 0) {
+        return "all jitter limits at " + RoundedUp(change.value, 3) + " ps";
+      }
       return Outputs({demand.output}) + " with a jitter of up to " + RoundedUp(change.value, 3) +
              " ps";
     case ChangeKind::kLowest:

@@ -75,7 +75,7 @@ class PrimitiveExplanation:
     corrections: Tuple[Tuple[Demand, ...], ...]
     """The smallest sets of demands without which the rest goes."""
     together: Tuple[Change, ...]
-    """The smallest tolerance for all."""
+    """The smallest tolerance for all, and the smallest jitter for all that have a limit."""
     swaps: Tuple[Tuple[int, int], ...]
     """Outputs that should change places."""
     complete: bool

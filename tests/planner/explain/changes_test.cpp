@@ -4,9 +4,11 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <cmath>
 #include <optional>
 #include <random>
 
+#include "tests/planner/answer/bundled_device.h"
 #include "tests/planner/explain/ExplainTest.h"
 
 namespace planner::explain {
@@ -165,6 +167,63 @@ TEST(Changes, TheCommonToleranceIsTheSmallest) {
     ASSERT_EQ(changes.size(), 1u);
     ASSERT_EQ(changes[0].value, *smallest) << turn;
   }
+}
+
+// Of three video clocks a PLL has 144.594 ps at least (plan_test.cpp works it out): the smallest
+// variance, 78.4271 ps^2, is that of 33 x 27 MHz with bandwidth HIGH.
+TEST(Changes, TheCommonJitterOfALoop) {
+  Question question = QuestionOf({27}, {Rational(297, 2), Rational(297, 4), 27});
+  question.device = answer_test::Bundled("vk40", "2");
+  question.request.max_jitter = 100;
+  const std::vector<Change> changes = CommonJitter(question);
+  ASSERT_EQ(changes.size(), 1u);
+  EXPECT_EQ(changes[0].kind, ChangeKind::kJitter);
+  EXPECT_EQ(changes[0].demand, (Demand{Kind::kJitter, -1}));
+  EXPECT_NEAR(changes[0].value.ToDouble(), 14.069 * std::sqrt(78.4271) + 20, 0.001);
+  EXPECT_EQ(changes[0].before, Rational(100));
+  // What is above the others may stay, and what has no limit needs none.
+  question.request.max_jitter.reset();
+  question.request.outputs[0].max_jitter = 130;
+  question.request.outputs[2].max_jitter = 1000;
+  const std::vector<Change> others = CommonJitter(question);
+  ASSERT_EQ(others.size(), 1u);
+  EXPECT_EQ(others[0].value, changes[0].value);
+  EXPECT_EQ(others[0].before, Rational(130));
+  question.request.outputs[2].max_jitter.reset();
+  EXPECT_THAT(CommonJitter(question), IsEmpty());  // the change of the one output says all
+}
+
+// With the limits there, the request goes; a little below, it does not.
+TEST(Changes, TheCommonJitterIsTheSmallest) {
+  std::mt19937 random(3);
+  Question question = QuestionOf({100}, {});
+  question.device = answer_test::Bundled("vk40", "2");
+  int found = 0;
+  for (int turn = 0; turn < 12; ++turn) {
+    question.primitive = hardware::kPrimitives[static_cast<std::size_t>(turn % 4)];
+    const Rational vco = 600;
+    question.request.outputs.assign(2, {});
+    question.request.outputs[0].frequency = 100;
+    question.request.outputs[1].frequency = vco / static_cast<int>(6 * (1 + random() % 3));
+    question.request.tolerance = 100000;
+    question.request.max_jitter = 1;
+    const std::vector<Change> changes = CommonJitter(question);
+    if (changes.empty()) continue;
+    ++found;
+    const auto goes_with = [&](const Rational& jitter) {
+      Question changed = question;
+      changed.request.max_jitter = jitter;
+      return changed.Ask().has_value();
+    };
+    EXPECT_TRUE(goes_with(changes[0].value)) << turn;
+    EXPECT_FALSE(goes_with(changes[0].value * Rational(999999, 1000000))) << turn;
+    Rational worst = 0;
+    for (const OutputAnswer& output : question.Judge(changes[0].settings).outputs) {
+      worst = std::max(worst, Rational::FromDouble(output.jitter.value()));
+    }
+    EXPECT_EQ(changes[0].value, worst) << turn;
+  }
+  EXPECT_GE(found, 6);
 }
 
 }  // namespace

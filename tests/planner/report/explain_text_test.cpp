@@ -154,6 +154,27 @@ TEST_F(ExplainTextTest, AllOutputsMovedTogetherAndTheNearestOfAll) {
   EXPECT_THAT(Text(), HasSubstr("\n  all moved   200, 66.666667 MHz, with a tolerance of 200 ppm"));
 }
 
+// The nearest is that of the smaller distance: 300 ps for 200 is 1.5 of a limit, and 5 percent
+// off is 500 tolerances.
+TEST_F(ExplainTextTest, AllLimitsOfTheJitterTogether) {
+  explanation_.request.max_jitter = 200;
+  Change jitter = To(ChangeKind::kJitter, {DemandKind::kJitter, -1}, Rational(3001234, 10000), 200);
+  LoopSettings settings;
+  settings.primitive = Primitive::kTsyn;
+  settings.m = 48;
+  settings.d = 1;
+  settings.outputs = {{24, 0, 3}, {72, 0, 9}};
+  jitter.settings = settings;
+  Tsyn().together = {jitter};
+  Tsyn().conflicts = {
+      Between({{DemandKind::kJitter, 0}}, {To(ChangeKind::kJitter, {DemandKind::kJitter, 0}, 290)},
+              false)};
+  const std::string text = Text();
+  EXPECT_THAT(text, HasSubstr("\nnearest: all jitter limits at 300.124 ps (TSYN)\n"));
+  EXPECT_THAT(text, HasSubstr("\n  works with  all jitter limits at 300.124 ps\n"));
+  EXPECT_THAT(text, Not(HasSubstr("all moved")));
+}
+
 TEST_F(ExplainTextTest, WithoutOutputsAndInAnotherOrder) {
   Tsyn().corrections = {{{DemandKind::kFrequency, 0}}, {{DemandKind::kFrequency, 1}},
                         {{DemandKind::kFrequency, 0}, {DemandKind::kVco}}};
@@ -190,6 +211,9 @@ TEST(ChangeWordsTest, ANumberThatHasToBeAllowedIsRoundedUp) {
   EXPECT_EQ(ChangeWords(To(ChangeKind::kJitter, output, Rational(1234561, 10000)),
                         Primitive::kPll),
             "output 2 with a jitter of up to 123.457 ps");
+  EXPECT_EQ(ChangeWords(To(ChangeKind::kJitter, {DemandKind::kJitter, -1}, Rational(1234561, 10000)),
+                        Primitive::kPll),
+            "all jitter limits at 123.457 ps");
 }
 
 TEST(ChangeWordsTest, BeyondTheRangesOfTheDevice) {
