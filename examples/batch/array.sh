@@ -17,6 +17,10 @@
 # VORKEL names the program.
 set -euo pipefail
 
+if (($# != 3)) || ! [[ $3 =~ ^[1-9][0-9]{0,5}$ ]]; then
+  printf '%s\n' "usage: array.sh REQUESTS FOLDER PARTS, in a task of a job array" >&2
+  exit 2
+fi
 requests=$1 folder=$2 parts=$3
 index=${SLURM_ARRAY_TASK_ID:-${PBS_ARRAY_INDEX:-${SGE_TASK_ID:?is set in a job array only}}}
 mkdir -p -- "$folder"

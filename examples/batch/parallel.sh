@@ -9,6 +9,10 @@
 # the program and the same folder. VORKEL names the program.
 set -euo pipefail
 
+if (($# < 2)) || ! [[ ${3:-16} =~ ^[1-9][0-9]{0,5}$ ]]; then
+  printf '%s\n' "usage: parallel.sh REQUESTS RESULT [PARTS [OPTION OF parallel...]]" >&2
+  exit 2
+fi
 requests=$1 result=$2 parts=${3:-16}
 shift $(($# < 3 ? $# : 3))
 export VORKEL=${VORKEL:-vorkel} REQUESTS=$requests FOLDER=$result.parts PARTS=$parts
