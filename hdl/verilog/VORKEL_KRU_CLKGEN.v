@@ -4,10 +4,13 @@
 // CLKFX has M / D of the frequency of the input, and CLKFXDV a quotient of that.
 //
 // The edge of the input with which the lock begins is where all pins but CLKFX180 rise.
-`ifdef SYNTHESIS
-(* blackbox *)
-`else
 `timescale 1fs/1fs
+`ifdef SYNTHESIS
+/* verilator lint_save */
+/* verilator lint_off UNUSEDPARAM */  // nothing is in the box
+/* verilator lint_off UNUSEDSIGNAL */
+/* verilator lint_off UNDRIVEN */
+(* blackbox *)
 `endif
 module VORKEL_KRU_CLKGEN #(
     parameter integer CLKIN_MHZ_NUM = 100,  // the planned clock, MHz
@@ -195,3 +198,6 @@ module VORKEL_KRU_CLKGEN #(
   end
 `endif
 endmodule
+`ifdef SYNTHESIS
+/* verilator lint_restore */
+`endif

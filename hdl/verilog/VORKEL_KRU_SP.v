@@ -10,10 +10,13 @@
 //
 // The edge of the input with which the lock begins is where CLK0, CLK2X, CLKDV and CLKFX rise, but
 // for PHASE_SHIFT.
-`ifdef SYNTHESIS
-(* blackbox *)
-`else
 `timescale 1fs/1fs
+`ifdef SYNTHESIS
+/* verilator lint_save */
+/* verilator lint_off UNUSEDPARAM */  // nothing is in the box
+/* verilator lint_off UNUSEDSIGNAL */
+/* verilator lint_off UNDRIVEN */
+(* blackbox *)
 `endif
 module VORKEL_KRU_SP #(
     parameter integer CLKIN_MHZ_NUM = 100,  // the planned clock, MHz
@@ -52,9 +55,10 @@ module VORKEL_KRU_SP #(
     parameter integer JITTER_SEED = 1
 ) (
     input wire CLKIN,
+    /* verilator lint_save */
     /* verilator lint_off UNUSEDSIGNAL */  // without feedback nothing looks at it
     input wire CLKFB,
-    /* verilator lint_on UNUSEDSIGNAL */
+    /* verilator lint_restore */
     input wire RST,
     output wire CLK0,
     output wire CLK90,
@@ -451,3 +455,6 @@ module VORKEL_KRU_SP #(
   endgenerate
 `endif
 endmodule
+`ifdef SYNTHESIS
+/* verilator lint_restore */
+`endif

@@ -1,9 +1,12 @@
 // The clock primitive TSYN: hdl.md describes its attributes, VORKEL_MODEL_LOOP what it does. To a
 // synthesis tool it is a black box.
-`ifdef SYNTHESIS
-(* blackbox *)
-`else
 `timescale 1fs/1fs
+`ifdef SYNTHESIS
+/* verilator lint_save */
+/* verilator lint_off UNUSEDPARAM */  // nothing is in the box
+/* verilator lint_off UNUSEDSIGNAL */
+/* verilator lint_off UNDRIVEN */
+(* blackbox *)
 `endif
 module VORKEL_TSYN #(
     parameter integer CLKIN1_MHZ_NUM = 100,  // the planned clocks, MHz
@@ -127,3 +130,6 @@ module VORKEL_TSYN #(
   );
 `endif
 endmodule
+`ifdef SYNTHESIS
+/* verilator lint_restore */
+`endif
