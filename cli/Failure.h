@@ -24,7 +24,7 @@ class Failure : public std::exception {
 
   // Sentences about what the user has said, a line each with the program's name before it. Where
   // the words were wrong, a line shows how the command is used.
-  static Failure OfUsage(std::vector<std::string> reasons, bool words_were_wrong = true) {
+  static Failure OfUsage(const std::vector<std::string>& reasons, bool words_were_wrong = true) {
     Failure failure(kWrong, "");
     for (const std::string& reason : reasons) failure.text_ += "vorkel: " + reason + "\n";
     failure.shows_usage_ = words_were_wrong;

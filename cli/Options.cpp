@@ -32,7 +32,7 @@ constexpr OptionRow kRows[] = {
      "frequencies to compare with, one for each output; - for one that is not asked for"},
     {"--out", "LIST", "krus", "frequencies of 1 to 6 outputs; - for one that is not used"},
     {"--phase", "LIST", "any evaluate", "phase of each output; - where any will do"},
-    {"--duty", "LIST", "loops evaluate", "duty cycle of each output; - or 0 where any will do"},
+    {"--duty", "LIST", "loops evaluate", "duty cycle of each output, above 0 and below 100; - or 0 where any will do"},
     {"--any-order", "", "planning batch",
      "outputs may change places, where not all places can make a frequency"},
     {"--output", "N", "reach", "the place of the output, 0 by default, up to 6"},

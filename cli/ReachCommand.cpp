@@ -43,7 +43,7 @@ std::optional<Rational> Frequency(const Given& given, const std::string& name) {
   planner::read::Mistakes mistakes;
   planner::read::Place place;
   place.entry = name;
-  const auto value = planner::read::ReadValue(*text, planner::read::ValueKind::kFrequency, place,
+  auto value = planner::read::ReadValue(*text, planner::read::ValueKind::kFrequency, place,
                                               &mistakes);
   if (!value) Refuse(mistakes);
   return value;

@@ -91,7 +91,7 @@ class PlanReader {
   std::optional<Said<Rational>> InParts(const Node& object, const std::string& path,
                                         std::string_view name, std::string_view in_parts,
                                         int parts) {
-    const auto number = Number(object, path, name);
+    auto number = Number(object, path, name);
     auto counted = Number(object, path, in_parts);
     if (!counted) return number;
     counted->value /= parts;

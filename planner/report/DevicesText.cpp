@@ -156,11 +156,11 @@ string SettingsNote(Primitive primitive) {
 
 string LowBandwidthNote(Primitive primitive) {
   if (primitive == Primitive::kPll) {
-    return "bandwidth LOW has a lower limit for the PFD: " +
+    return "with bandwidth LOW the maximum of the PFD is " +
            std::to_string(hardware::kPllLowBandwidthPfd) +
            " MHz for a PLL of any device, or CLKPFD_FREQ_MAX where that is less.";
   }
-  return "bandwidth LOW has a lower limit for the PFD: TSYN_CLKPFD_FREQ_MAX_LBW.";
+  return "with bandwidth LOW the maximum of the PFD is TSYN_CLKPFD_FREQ_MAX_LBW.";
 }
 
 constexpr std::string_view kCountNote =

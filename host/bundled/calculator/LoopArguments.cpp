@@ -127,7 +127,7 @@ double LoopArguments::Limit(Primitive primitive, std::string_view keyword) const
 }
 
 void LoopArguments::CheckPfd(double pfd, Bandwidth bandwidth) {
-  // Only the TSYN has a lower limit for a narrow loop.
+  // Only the TSYN has a limit of its own for a narrow loop.
   const auto highest = [&](Primitive primitive) {
     const bool low = primitive == Device::kTsyn && bandwidth == Bandwidth::kLow;
     return Limit(primitive, low ? "CLKPFD_FREQ_MAX_LBW" : "CLKPFD_FREQ_MAX");

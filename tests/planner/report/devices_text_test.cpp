@@ -71,7 +71,7 @@ TEST(DeviceText, AllLimitsOfADevice) {
             "note: M is 1 to 64, D 1 to 80 and each output divider 1 to 128, at most twice\n"
             "  O_MAX_HT_LT; all are whole. Output 1 can drive an I/O clock and goes up to\n"
             "  CLKOUT_FREQ_MAX_IOCLK, the others to CLKOUT_FREQ_MAX_GCLK.\n"
-            "note: bandwidth LOW has a lower limit for the PFD: 300 MHz for a PLL of any\n"
+            "note: with bandwidth LOW the maximum of the PFD is 300 MHz for a PLL of any\n"
             "  device, or CLKPFD_FREQ_MAX where that is less.\n"
             "note: O_MAX_HT_LT is the largest number of VCO cycles for which an output\n"
             "  divider can hold its output high or low. The further a divider is above it,\n"
