@@ -67,6 +67,52 @@ def test_with_cmake(installed, source):
     lines_of(build / "clocks", installed)
 
 
+def test_all_commands_are_in_it(installed, tmp_path):
+    """What the program makes of settings and of reach, from the library alone."""
+    (tmp_path / "more.cpp").write_text(
+        """
+#include <iostream>
+#include "planner/answer/Evaluate.h"
+#include "planner/device/Catalogue.h"
+#include "planner/device/Files.h"
+#include "planner/reach/Find.h"
+#include "planner/read/Settings.h"
+#include "planner/report/ReachText.h"
+#include "planner/report/ReportText.h"
+
+int main() {
+  const auto files = planner::device::HostFiles();
+  const planner::Device device = planner::device::Catalogue(*files).FindDevice("vk40");
+  const planner::read::Option options[] = {{"--in", "27"}, {"--m", "44"}, {"--d", "1"},
+                                           {"--divide", "8,16"}};
+  planner::read::Mistakes mistakes;
+  const auto draft = planner::read::ReadOptions({options, 1}, &mistakes);
+  const auto settings = planner::read::ReadSettingOptions(options, &mistakes);
+  const auto evaluation = FinishEvaluation(draft, settings, device, &mistakes);
+  if (!evaluation) return 1;
+  const planner::Request& request = evaluation->reading.request;
+  const auto answer = planner::answer::Evaluate(request, device, evaluation->settings, {});
+  std::cout << planner::report::EvaluationText(request, device, answer, {false, 80});
+  const planner::reach::Reach reach(request, device, planner::Primitive::kPll, 0);
+  for (const auto& point : planner::reach::Nearest(reach, {297, 2}, reach.range(), 2)) {
+    std::cout << reach.FrequencyOf(point).Fixed(6) << "\\n";
+  }
+  return planner::reach::AskableOf(request, device).primitives.empty();
+}
+"""
+    )
+    folder = installed / LIBRARY_DIR
+    program = tmp_path / "more"
+    run(
+        *(CXX, "-std=c++20", *FLAGS, "-I", installed / "include/vorkel", tmp_path / "more.cpp"),
+        *("-L", folder, "-lvorkel", "-o", program),
+    )
+    shown = run(program, env={"LD_LIBRARY_PATH": str(folder)})
+    words = "evaluate --in 27 --m 44 --d 1 --divide 8,16 --device vk40".split()
+    # 27 x 33 / 6, and 27 x 38 / 7.
+    assert shown == run(installed / "bin/vorkel", *words) + "148.500000\n146.571429\n"
+
+
 @pytest.mark.parametrize("version", ["2.0", "1.0", "1.2"])
 def test_cmake_takes_no_other_version(installed, tmp_path, version):
     (tmp_path / "CMakeLists.txt").write_text(
