@@ -127,8 +127,21 @@ class Reader {
     }
     std::vector<std::string> known;
     for (const OptionRow* row : OptionsOf(command_)) known.emplace_back(row->name);
-    throw Failure::OfUsage(fmt::format("unknown option {}{}", Shown(name),
-                                       planner::read::DidYouMean(name, known)));
+    std::string meant = planner::read::DidYouMean(name, known);
+    if (meant.empty()) meant = DidYouMeanItsBeginning(name, known);
+    throw Failure::OfUsage(fmt::format("unknown option {}{}", Shown(name), meant));
+  }
+
+  // "--in" for "--input" and "--out" for "--outputs".
+  static std::string DidYouMeanItsBeginning(const std::string& name,
+                                            const std::vector<std::string>& known) {
+    constexpr std::size_t kShortest = 4;
+    std::string longest;
+    for (const std::string& one : known) {
+      const bool begins = one.size() >= kShortest && name.compare(0, one.size(), one) == 0;
+      if (begins && one.size() > longest.size()) longest = one;
+    }
+    return longest.empty() ? "" : "; did you mean " + longest + "?";
   }
 
   std::string_view command_;
@@ -137,6 +150,16 @@ class Reader {
   CLI::App app_;
   Given given_;
 };
+
+// What to write for a word that is no option: a frequency without --in is the input's.
+std::string Meant(std::string_view command, const Given& given, const std::string& word) {
+  planner::read::Mistakes mistakes;
+  const bool is_frequency =
+      planner::read::ReadValue(word, planner::read::ValueKind::kFrequency, {}, &mistakes)
+          .has_value();
+  if (!is_frequency || given.Has("--in") || !Takes(command, "--in")) return "";
+  return fmt::format("; did you mean --in {}?", Shown(word));
+}
 
 }  // namespace
 
@@ -151,8 +174,9 @@ Given ReadWords(std::string_view command, const std::vector<std::string>& words,
                 std::size_t most_operands) {
   Given given = Reader(command, words).Read();
   if (given.operands.size() > most_operands) {
+    const std::string& word = given.operands[most_operands];
     throw Failure::OfUsage(
-        fmt::format("unexpected word \"{}\"", Shown(given.operands[most_operands])));
+        fmt::format("unexpected word \"{}\"{}", Shown(word), Meant(command, given, word)));
   }
   return given;
 }
