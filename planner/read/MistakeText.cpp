@@ -330,7 +330,7 @@ std::string TextOf(const Mistake& mistake) {
   if (mistake.kind == MistakeKind::kWrongType && !mistake.place.entry.empty()) {
     return fmt::format("{} {}", place, text);
   }
-  return fmt::format("{}: {}", place, text);
+  return place.empty() ? text : fmt::format("{}: {}", place, text);
 }
 
 std::string TextOf(const Doubt& doubt) {

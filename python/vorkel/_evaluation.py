@@ -141,6 +141,9 @@ def evaluate(
     ]
     for name in (*_SETTINGS, "plan", "pick", "request"):
         del said[name]
+    if divide_by_2 is not None and not isinstance(divide_by_2, bool):
+        sentence = f"divide_by_2: {divide_by_2!r} must be True or False"
+        raise mistake("not_a_switch", repr(divide_by_2), sentence, "divide_by_2")
     if pick is not None:
         whole("pick", pick, 1)
         if plan is None:

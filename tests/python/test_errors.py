@@ -80,6 +80,11 @@ def test_an_unknown_argument_is_a_type_error():
             call(27, [148.5], colour="red")
 
 
+def test_a_sentence_without_a_place_begins_with_what_is_wrong():
+    with pytest.raises(vorkel.RequestError, match='^unknown entry "colour"; the entries are '):
+        vorkel.plan(request={"inputs": [27], "outputs": [27], "colour": 1})
+
+
 def test_what_python_itself_knows():
     assert issubclass(vorkel.RequestError, ValueError)
     assert issubclass(vorkel.RequestError, vorkel.VorkelError)

@@ -140,6 +140,7 @@ def test_relations_of_settings():
         (dict(m=44, d=1, divide=[8], set_phase=[3]), "no_setting", "set_phase", "5.625"),
         (dict(m=44, d=1, divide=[8], phase_steps=[1, 2]), "count_differs", "phase_steps", "1 output"),
         (dict(pins=["CLK0"]), "no_setting", "pins", "it needs the feedback, feedback=True"),
+        (dict(pins="CLKFX", m=2, d=1, divide_by_2="no"), "not_a_switch", "divide_by_2", "'no'"),
         (dict(m=44, d=1, divide=[8], pick=1), "contradiction", "pick", "plan"),
         (dict(plan="{", m=44), "syntax", "", "plan:1:2"),
         (dict(plan={}), "not_a_plan", "", "no plan with settings"),
