@@ -5,12 +5,14 @@
 #include <cstddef>
 #include <functional>
 #include <optional>
+#include <utility>
 #include <vector>
 
 #include "planner/report/FindingText.h"
 #include "planner/report/Numbers.h"
 #include "planner/report/SettingsText.h"
 #include "planner/report/Table.h"
+#include "planner/report/Words.h"
 
 namespace planner::report {
 
@@ -211,10 +213,29 @@ string Report::Shapes() const {
   });
 }
 
+// Of which outputs the edges can be off by more than a period, so that they are no clock; or
+// nothing.
+string JitterRemark(const Answer& answer) {
+  constexpr double kPicoseconds = 1e6;  // in a period of 1 MHz
+  std::vector<int> outputs;
+  for (std::size_t i = 0; i < answer.outputs.size(); ++i) {
+    const OutputAnswer& output = answer.outputs[i];
+    if (!output.used || !output.jitter) continue;
+    if (*output.jitter * output.frequency.ToDouble() > kPicoseconds) {
+      outputs.push_back(static_cast<int>(i));
+    }
+  }
+  if (outputs.empty()) return "";
+  return Outputs(outputs) + ": the jitter is above the period of the clock";
+}
+
 // A blank line and a paragraph for each note, or nothing.
 string Notes(const Answer& answer, const Device& device, const Style& style) {
+  std::vector<string> remarks = RemarkTexts(answer, device);
+  string jitter = JitterRemark(answer);
+  if (!jitter.empty()) remarks.push_back(std::move(jitter));
   string text;
-  for (const string& remark : RemarkTexts(answer, device)) {
+  for (const string& remark : remarks) {
     string prose = Prose(style, "note: ", remark);
     prose.pop_back();
     text += (text.empty() ? "\n" : "") + Paint(style, Role::kNote, prose) + "\n";

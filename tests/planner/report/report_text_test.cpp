@@ -156,6 +156,22 @@ KruSettings Shifted() {
 }
 
 // 32 of 255 steps are 45.176 degrees.
+// Periods of 200, 100 and 50 MHz: 5000, 10000 and 20000 ps.
+TEST(ReportText, AJitterAboveThePeriodIsTold) {
+  const Request request = MadeRequest({100}, {200, 100, 50});
+  const auto text_with = [&](double jitter) {
+    return Text(request, MadeLoop(request, Primitive::kPll, Bandwidth::kOptimized, 80, 1,
+                                  {40, 80, 160}, jitter));
+  };
+  EXPECT_EQ(text_with(5000).find("above the period"), std::string::npos);
+  EXPECT_NE(text_with(5001).find("\nnote: output 0: the jitter is above the period of the clock\n"),
+            std::string::npos);
+  EXPECT_NE(
+      text_with(10001)
+          .find("\nnote: outputs 0 and 1: the jitter is above the period of the clock\n"),
+      std::string::npos);
+}
+
 TEST(ReportText, AKruWithAPhaseShift) {
   Request request = MadeRequest({100}, {100, 100});
   request.outputs[0].phase = 45;
