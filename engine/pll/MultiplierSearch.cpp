@@ -25,43 +25,83 @@ static_assert(kTsynGapEnd == hardware::kSmallestTsynM);
 static_assert(kDBelow == hardware::kLargestD + 0.5);
 static_assert(kFractionalStep * hardware::kEighths == 1.0);
 
-}  // namespace
+// Whether M gives the candidate a whole D and a PFD frequency in its range; takes both then.
+bool TakeM(VcoCandidate& candidate, double m, double pfdMin, double pfdMax, const Run& run) {
+  const double realD = run.inFreq * m / candidate.vco;
+  if (!(realD > kDAbove && realD < kDBelow)) return false;
+  const double pfd = run.inFreq / realD;
+  if (!(pfd >= pfdMin && pfd <= pfdMax)) return false;
+  const int d = RoundToInt(realD);
+  const double remainder = std::fabs(d - realD);
+  if (!(remainder < kLargestRemainder)) return false;
 
-bool SearchMAndD(VcoCandidate& candidate, double pfdMin, double pfdMax, bool integerStep,
-                 const Run& run) {
-  const double inFreq = run.inFreq;
-  const Trace& trace = run.trace;
-  const bool hasGap = run.prim == kTsyn;
-  TRACE(trace, "DLL - RK --> _prim = %d \n", VorkelImp::_prim);
+  candidate.m = m;
+  candidate.d = static_cast<std::uint32_t>(d);
+  if (remainder == 0.0) {
+    TRACE(run.trace, "DLL-- For VCO = %f: M = %f, D = (float) %f, (int) %d\n", candidate.vco, m,
+          realD, d);
+  } else {
+    TRACE(run.trace, "DLL-- For VCO = %f: M = %f, D = (float) %f, (int) %d; remainder = %f\n",
+          candidate.vco, m, realD, d, remainder);
+  }
+  return true;
+}
+
+bool IsInGap(double m, const Run& run) {
+  return run.prim == kTsyn && m >= kTsynGapBegin && m < kTsynGapEnd;
+}
+
+// The smallest M by going through all.
+bool WalkM(VcoCandidate& candidate, double pfdMin, double pfdMax, double step, const Run& run) {
   double m = 1.0;
   for (int trial = 0; trial < kTrials; ++trial) {
     if (trial == 1) m = 2.0;
-    if (trial > 1) m += integerStep ? kIntegerStep : kFractionalStep;
-    if (hasGap && m >= kTsynGapBegin && m < kTsynGapEnd) {
+    if (trial > 1) m += step;
+    if (IsInGap(m, run)) {
       m = kTsynGapEnd;
     } else if (m > kLargestM) {
       return false;
     }
-    const double realD = inFreq * m / candidate.vco;
-    if (!(realD > kDAbove && realD < kDBelow)) continue;
-    const double pfd = inFreq / realD;
-    if (!(pfd >= pfdMin && pfd <= pfdMax)) continue;
-    const int d = RoundToInt(realD);
-    const double remainder = std::fabs(d - realD);
-    if (!(remainder < kLargestRemainder)) continue;
-
-    candidate.m = m;
-    candidate.d = static_cast<std::uint32_t>(d);
-    if (remainder == 0.0) {
-      TRACE(trace, "DLL-- For VCO = %f: M = %f, D = (float) %f, (int) %d\n", candidate.vco, m,
-            realD, d);
-    } else {
-      TRACE(trace, "DLL-- For VCO = %f: M = %f, D = (float) %f, (int) %d; remainder = %f\n",
-            candidate.vco, m, realD, d, remainder);
-    }
-    return true;
+    if (TakeM(candidate, m, pfdMin, pfdMax, run)) return true;
   }
   return false;
+}
+
+// Frequencies, MHz, between which the quotients of two are far from the ends of what a double
+// can be.
+constexpr double kSmallestUsual = 1e-100;
+constexpr double kLargestUsual = 1e100;
+
+bool IsUsual(double frequency) {
+  return frequency >= kSmallestUsual && frequency <= kLargestUsual;
+}
+
+// The same by going through D, of which there are mostly fewer. With D an M can be no other than
+// the one nearest to D x VCO / input: that, being at most 64, is off by at most 64 x 0.0005, a
+// quarter of the smallest step, roundings included. And a larger D has no smaller M.
+bool WalkD(VcoCandidate& candidate, double pfdMin, double pfdMax, double step, const Run& run) {
+  if (!(pfdMin <= pfdMax && pfdMax > 0.0)) return false;
+  const double ratio = candidate.vco / run.inFreq;
+  // With room for the remainder and for roundings.
+  const double first = std::floor(std::fmax(run.inFreq / pfdMax - 1.0, 1.0));
+  const double last = pfdMin > 0.0 ? run.inFreq / pfdMin + 1.0 : kDBelow;
+  for (double d = first; d < kDBelow && d <= last; d += 1.0) {
+    const double m = std::floor(d * ratio / step + 0.5) * step;
+    if (m > kLargestM) return false;
+    const bool exists = m == 1.0 || (m >= 2.0 && !IsInGap(m, run));
+    if (exists && TakeM(candidate, m, pfdMin, pfdMax, run)) return true;
+  }
+  return false;
+}
+
+}  // namespace
+
+bool SearchMAndD(VcoCandidate& candidate, double pfdMin, double pfdMax, bool integerStep,
+                 const Run& run) {
+  TRACE(run.trace, "DLL - RK --> _prim = %d \n", VorkelImp::_prim);
+  const double step = integerStep ? kIntegerStep : kFractionalStep;
+  const bool isUsual = IsUsual(run.inFreq) && IsUsual(candidate.vco);
+  return (isUsual ? WalkD : WalkM)(candidate, pfdMin, pfdMax, step, run);
 }
 
 bool CalculateMAndD(VorkelImp& imp, bool integerStep, const Run& run) {

@@ -25,6 +25,7 @@ void NarrowAll(PinLimits* limits, const Rational& tolerance) {
 Rational CornerFactor(const Rational& ppm) { return 1 + ppm / 1'000'000; }
 
 Range Narrowed(const Range& range, const Rational& tolerance) {
+  if (tolerance == Rational(0)) return range;
   return {range.lowest / CornerFactor(-tolerance), range.highest / CornerFactor(tolerance)};
 }
 

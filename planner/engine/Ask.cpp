@@ -52,19 +52,47 @@ class LoopRuns {
   std::vector<std::pair<Variant, Outcome>> runs_;
 };
 
-// The first answer that is as asked for, of all phases that stand for those of the request, or
-// else the best.
-Answer AskKru(const Request& request, const Device& device, Primitive primitive,
-              const Variant& variant, const Source& source, bool trace) {
-  std::optional<Answer> best;
-  for (const auto& phases : KruPhases(request, primitive, variant.feedback)) {
-    Answer answer = AnswerOf(request, device, primitive, source,
-                             RunKru(request, device, primitive, variant, phases, trace));
-    if (answer.within) return answer;
-    if (!best || answer::Before(request, answer, *best)) best = std::move(answer);
+// The runs for the variants of a KRU. Many end in the same settings, which are judged once.
+class KruRuns {
+ public:
+  KruRuns(const Request& request, const Device& device, Primitive primitive, bool trace)
+      : request_(request), device_(device), primitive_(primitive), trace_(trace) {}
+
+  // The first answer that is as asked for, of all phases that stand for those of the request, or
+  // else the best.
+  Answer Of(const Variant& variant, const Source& source) {
+    std::optional<Answer> best;
+    for (const auto& phases : KruPhases(request_, primitive_, variant.feedback)) {
+      Answer answer =
+          Judged(source, RunKru(request_, device_, primitive_, variant, phases, trace_));
+      if (answer.within) return answer;
+      if (!best || answer::Before(request_, answer, *best)) best = std::move(answer);
+    }
+    return *best;
   }
-  return *best;
-}
+
+ private:
+  Answer Judged(const Source& source, const Outcome& outcome) {
+    const auto* const found = std::get_if<Found>(&outcome);
+    if (found == nullptr) return AnswerOf(request_, device_, primitive_, source, outcome);
+    const auto same = std::find_if(
+        judged_.begin(), judged_.end(),
+        [found](const Answer& other) { return other.settings == found->settings; });
+    if (same == judged_.end()) {
+      judged_.push_back(AnswerOf(request_, device_, primitive_, source, outcome));
+      return judged_.back();
+    }
+    Answer answer = *same;
+    answer.source = source;
+    return answer;
+  }
+
+  const Request& request_;
+  const Device& device_;
+  const Primitive primitive_;
+  const bool trace_;
+  std::vector<Answer> judged_;
+};
 
 // Whether two answers have the same settings, but for a feedback that makes no difference.
 bool IsSame(const Answer& a, const Answer& b) {
@@ -82,17 +110,26 @@ void RequirePrimitive(const Device& device, Primitive primitive) {
   throw std::invalid_argument("The device does not have the primitive.");
 }
 
-// The answers of all variants, solved or not, in their order.
+// The answers of all variants, solved or not, in their order. Of variants of a loop that end in the
+// same settings there is the first: with the same settings none ranks before another.
 std::vector<Answer> AllAnswers(const Request& request, const Device& device,
                                Primitive primitive) {
   std::vector<Answer> answers;
-  LoopRuns runs(request, device, primitive);
+  LoopRuns loop_runs(request, device, primitive);
+  KruRuns kru_runs(request, device, primitive, false);
   for (const Variant& variant : Variants(request, primitive)) {
     const Source source = {.engine = true, .variant = variant.name};
-    answers.push_back(
-        hardware::IsLoop(primitive)
-            ? AnswerOf(request, device, primitive, source, runs.Of(variant))
-            : AskKru(request, device, primitive, variant, source, false));
+    if (!hardware::IsLoop(primitive)) {
+      answers.push_back(kru_runs.Of(variant, source));
+      continue;
+    }
+    const Outcome outcome = loop_runs.Of(variant);
+    const auto* const found = std::get_if<Found>(&outcome);
+    const bool is_known =
+        found != nullptr && std::any_of(answers.begin(), answers.end(), [&](const Answer& other) {
+          return other.solved && other.settings == found->settings;
+        });
+    if (!is_known) answers.push_back(AnswerOf(request, device, primitive, source, outcome));
   }
   return answers;
 }
@@ -106,7 +143,7 @@ Answer AskOne(const Request& request, const Device& device, Primitive primitive,
   std::vector<Finding> refusals = answer::Refusals(request, primitive);
   if (!refusals.empty()) return answer::Unsolved(primitive, source, std::move(refusals));
   if (!hardware::IsLoop(primitive)) {
-    return AskKru(request, device, primitive, variant, source, trace);
+    return KruRuns(request, device, primitive, trace).Of(variant, source);
   }
   return AnswerOf(request, device, primitive, source,
                   RunLoop(request, device, primitive, variant, trace));

@@ -1,5 +1,7 @@
 #include "planner/engine/Object.h"
 
+#include <cmath>
+#include <cstdint>
 #include <cstdio>
 #include <string>
 
@@ -16,13 +18,26 @@ std::unique_ptr<Ip::VorkelImp> MakeObject(const Device& device) {
   return object;
 }
 
+namespace {
+
+std::string TextOf(double number) {
+  // Most are whole, and those are quickly written.
+  constexpr double kLargestWhole = 1e15;
+  if (std::fabs(number) < kLargestWhole && number == std::floor(number) && !std::signbit(number)) {
+    return std::to_string(static_cast<std::int64_t>(number));
+  }
+  char text[40];
+  std::snprintf(text, sizeof text, "%.17g", number);
+  return text;
+}
+
+}  // namespace
+
 Port::StringBase ListOf(const std::vector<double>& numbers) {
   std::string list;
   for (const double number : numbers) {
-    char text[40];
-    std::snprintf(text, sizeof text, "%.17g", number);
     if (!list.empty()) list += ' ';
-    list += text;
+    list += TextOf(number);
   }
   return Port::StringBase(std::string_view(list));
 }

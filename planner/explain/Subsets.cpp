@@ -1,6 +1,8 @@
 // Tested by subsets_test.cpp.
 #include "planner/explain/Subsets.h"
 
+#include <bit>
+
 namespace planner::explain {
 
 std::optional<Set> Subsets::Next() const {
@@ -32,13 +34,24 @@ bool Subsets::Follow(Choice* choice) const {
   return true;
 }
 
+// An element to decide about. What makes a decision fail is that a set has none of its elements in:
+// those with the fewest left come first. When all have one, no decision can fail any more.
+Set Subsets::ElementOf(const Choice& choice) const {
+  Set least = choice.undecided;
+  for (const Set rule : one_in_) {
+    const Set left = rule & choice.undecided;
+    if ((rule & choice.in) == 0 && std::popcount(left) < std::popcount(least)) least = left;
+  }
+  return least & (~least + 1);
+}
+
 bool Subsets::Decide(Choice choice, Set* found) const {
   if (!Follow(&choice)) return false;
   if (choice.undecided == 0) {
     *found = choice.in;
     return true;
   }
-  const Set element = choice.undecided & (~choice.undecided + 1);
+  const Set element = ElementOf(choice);
   Choice with = choice;
   with.In(element);
   if (Decide(with, found)) return true;

@@ -42,6 +42,7 @@ class Subsets {
     void Out(Set elements) { undecided &= ~elements; }
   };
   bool Follow(Choice* choice) const;
+  Set ElementOf(const Choice& choice) const;
   bool Decide(Choice choice, Set* found) const;
 
   Set all_;

@@ -72,6 +72,9 @@ std::size_t BestOf(const std::vector<Attempt>& attempts, Answers Attempt::*sourc
 }  // namespace
 
 Answer AnswerOf(const Attempt& attempt, const Settings& settings, const Device& device) {
+  for (const Answer& answer : attempt.search) {
+    if (answer.settings == settings) return answer;
+  }
   Answer answer = answer::Evaluate(attempt.placed, device, settings, {.search = true});
   answer::NoteMoved(attempt.order, &answer);
   return answer;

@@ -109,9 +109,9 @@ class LoopWithin::Question {
     with_fractions_ = with_fractions;
     Spans spans = {{grid.lowest, grid.highest}};
     Spans left;
-    for (const Asked& output : within_.outputs_) {
+    for (std::size_t place = 0; place < within_.outputs_.size(); ++place) {
       left.clear();
-      if (!MeetOutput(output, spans, &left)) return std::nullopt;
+      MeetOutput(place, spans, &left);
       if (left.empty()) return std::nullopt;
       std::swap(spans, left);
     }
@@ -151,8 +151,29 @@ class LoopWithin::Question {
            divider >= hardware::kSmallestFractionalDivider * kEighths;
   }
 
-  // Leaves of spans what one output leaves. False when no divider has the phase and the duty cycle.
-  bool MeetOutput(const Asked& output, const Spans& spans, Spans* left) const {
+  // Leaves of spans what output `place` of those used leaves.
+  void MeetOutput(std::size_t place, const Spans& spans, Spans* left) const {
+    const Asked& output = within_.outputs_[place];
+    const Relaxed::OfOutput& own = relaxed_.outputs[output.index];
+    const SpanCase one = {.output = place,
+                          .frequency = own.frequency,
+                          .phase = own.phase,
+                          .duty = own.duty,
+                          .range = own.range,
+                          .dividers = relaxed_.dividers,
+                          .second_input = relaxed_.second_input,
+                          .moves = moves_,
+                          .in_eighths = StepOf(output) == 1};
+    const SpanStore::Kept kept = within_.spans_.Of(one, [&] {
+      Spans all;
+      MeetOutput(output, {{0, HUGE_VAL}}, &all);
+      return all;
+    });
+    if (kept) return Common(spans, *kept, left);
+    MeetOutput(output, spans, left);
+  }
+
+  void MeetOutput(const Asked& output, const Spans& spans, Spans* left) const {
     const Relaxed::OfOutput& own = relaxed_.outputs[output.index];
     const RatioRange& range = relaxed_.second_input ? output.first_range : output.range;
     SpanOutput ends = {.lowest = 0,
@@ -172,16 +193,13 @@ class LoopWithin::Question {
     const auto is_allowed = [&](int divider) {
       return IsDivider(divider) && IsShapeMet(output, divider);
     };
-    if (ends.highest < HUGE_VAL) {
-      Meet(spans, ends, is_allowed, left);
-      return true;
-    }
+    if (ends.highest < HUGE_VAL) return Meet(spans, ends, is_allowed, left);
     // Any frequency, with any divider that has the shape.
-    *left = spans;
     for (int divider = ends.first; divider <= ends.last; divider += ends.step) {
-      if (is_allowed(divider)) return true;
+      if (!is_allowed(divider)) continue;
+      *left = spans;
+      return;
     }
-    return false;
   }
 
   bool IsShapeMet(const Asked& output, int divider) const {

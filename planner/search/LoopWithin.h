@@ -19,6 +19,7 @@
 #include "planner/search/LoopGrid.h"
 #include "planner/search/OutputShape.h"
 #include "planner/search/RatioRange.h"
+#include "planner/search/SpanStore.h"
 #include "planner/search/VcoSpans.h"
 #include "planner/search/Within.h"
 
@@ -52,6 +53,7 @@ class LoopWithin {
   Inputs first_input_;
   std::vector<Asked> outputs_;
   answer::LoopJitter jitter_;
+  mutable SpanStore spans_;
 };
 
 }  // namespace planner::search

@@ -66,6 +66,18 @@ void Meet(const Spans& spans, const SpanOutput& output, const IsAllowed& is_allo
   }
 }
 
+// What two lists of spans have in common, into `common`, which is empty.
+inline void Common(const Spans& spans, const Spans& others, Spans* common) {
+  auto other = others.begin();
+  for (const Span& span : spans) {
+    other = std::lower_bound(other, others.end(), span.lowest,
+                             [](const Span& one, double lowest) { return one.highest < lowest; });
+    for (auto next = other; next != others.end() && next->lowest <= span.highest; ++next) {
+      AddSpan(std::max(span.lowest, next->lowest), std::min(span.highest, next->highest), common);
+    }
+  }
+}
+
 }  // namespace planner::search
 
 #endif  // VORKEL_PLANNER_SEARCH_VCOSPANS_H_

@@ -3,9 +3,12 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <cmath>
+#include <cstdint>
 #include <string>
 
 #include "engine/pll/Stages.h"
+#include "tests/compare/Random.h"
 #include "tests/engine/EngineTest.h"
 
 namespace {
@@ -330,6 +333,55 @@ TEST_F(MultiplierSearchTest, ASearchThatFailsLeavesTheCandidate) {
 }
 
 // --- The table ---------------------------------------------------------------------------------
+
+// The rule in plain words, M after M.
+bool PlainSearch(VcoCandidate& candidate, double inFreq, double pfdMin, double pfdMax, double step,
+                 bool hasGap) {
+  for (double m = 1.0; m <= 64.0; m = m == 1.0 ? 2.0 : m + step) {
+    if (hasGap && m >= 2.0 && m < 5.0) continue;
+    const double realD = inFreq * m / candidate.vco;
+    if (!(realD > 0.5 && realD < 80.5)) continue;
+    const double pfd = inFreq / realD;
+    const double d = std::floor(realD + 0.5);
+    if (!(pfd >= pfdMin && pfd <= pfdMax && std::fabs(d - realD) < 0.0005)) continue;
+    candidate.m = m;
+    candidate.d = static_cast<std::uint32_t>(d);
+    return true;
+  }
+  return false;
+}
+
+// Candidates at an M and a D, and where these just are or just are not near enough; limits at the
+// PFD frequency and beside it, none, and such that nothing passes.
+TEST_F(MultiplierSearchTest, IsThePlainSearchOfDrawnCandidates) {
+  compare::Random random(3);
+  const auto beside = [&](double value) {
+    return random.OneIn(3) ? Above(value) : random.OneIn(2) ? Below(value) : value;
+  };
+  int found = 0;
+  for (int i = 0; i < 20000; ++i) {
+    SetPrim(random.OneIn(2) ? kPll : kTsyn);
+    const double step = random.OneIn(2) ? 1.0 : 0.125;
+    const double inFreq = random.OneIn(40) ? random.Pick<double>({0, -100, 1e-320, 1e300, kNan})
+                                           : random.Real(5, random.OneIn(3) ? 1000 : 50);
+    const double m = random.Int(1, static_cast<int>(70 / step)) * step;
+    const int d = random.OneIn(3) ? random.Int(1, 82) : random.Int(1, 4);
+    const double realD = random.OneIn(2) ? d : beside(d + (random.OneIn(2) ? 0.0005 : -0.0005));
+    const double vco = beside(inFreq * m / realD);
+    const double pfd = inFreq / realD;
+    const double pfdMin = random.Pick<double>({0, -1, 10, beside(pfd), pfd / 2, kNan});
+    const double pfdMax = random.Pick<double>({kInfinity, 500, beside(pfd), pfd * 3, 0});
+    VcoCandidate plain{};
+    plain.vco = vco;
+    const bool expected = PlainSearch(plain, inFreq, pfdMin, pfdMax, step, prim_ == kTsyn);
+    ASSERT_EQ(Search(vco, inFreq, pfdMin, pfdMax, step == 1.0), expected)
+        << inFreq << " " << vco << " " << pfdMin << " " << pfdMax << " " << step;
+    ASSERT_EQ(candidate_.m, plain.m);
+    ASSERT_EQ(candidate_.d, plain.d);
+    found += expected ? 1 : 0;
+  }
+  EXPECT_GT(found, 4000);
+}
 
 class CalculateMAndDTest : public testing::Test {
  protected:
