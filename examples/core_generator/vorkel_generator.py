@@ -69,10 +69,12 @@ def core_file(core, name, language, simulation):
     targets = {"default": {"filesets": ["rtl", "constraints"]}}
     if simulation:
         models = [f"models/{path.name}" for path in vorkel.models(language)]
-        filesets["simulation"] = {"files": [*models, f"{name}_tb{ending}"], "file_type": kind}
+        filesets["models"] = {"files": models, "file_type": kind}
+        filesets["testbench"] = {"files": [f"{name}_tb{ending}"], "file_type": kind}
         targets["sim"] = {
             "default_tool": "icarus" if language == "verilog" else "ghdl",
-            "filesets": ["rtl", "simulation"],
+            # The order in which tools for VHDL compile them.
+            "filesets": ["models", "rtl", "testbench"],
             "toplevel": f"{name}_tb",
         }
     body = {

@@ -165,6 +165,22 @@ TEST(LoopPoints, WindowsJoin) {
 
 // The bundled device: a VCO of 600 to 1440 MHz from 10 MHz, below which the PFD may not be, takes a D
 // of 1 and an M from 60 up to the largest, 64.
+TEST(Reach, AsksThePrimitivesWithAsManyInputs) {
+  const Device device = drawn::Bundled("vk40", "2");
+  Request request = RequestOf(27);
+  EXPECT_EQ(AskableOf(request, device).primitives, device.primitives);
+  EXPECT_TRUE(AskableOf(request, device).refused.empty());
+  request.inputs.push_back(54);
+  const Askable loops = AskableOf(request, device);
+  EXPECT_EQ(loops.primitives, (std::vector{Primitive::kPll, Primitive::kTsyn}));
+  ASSERT_EQ(loops.refused.size(), 2u);
+  EXPECT_EQ(loops.refused[1].primitive, Primitive::kKruClkgen);
+  EXPECT_EQ(loops.refused[1].refusals.at(0).kind, FindingKind::kTooManyInputs);
+  request.primitive = Primitive::kKruSp;
+  EXPECT_TRUE(AskableOf(request, device).primitives.empty());
+  EXPECT_EQ(AskableOf(request, device).refused.size(), 1u);
+}
+
 TEST(Reach, BundledDeviceByHand) {
   const Device device = drawn::Bundled("vk40", "2");
   Request request = RequestOf(10);
