@@ -265,7 +265,7 @@ class Batch {
   }
 
   void Put(const Done& done) {
-    constexpr std::size_t kMostUnwritten = std::size_t{256} * 1024;
+    constexpr std::size_t kMostUnwritten = 256 * 1024;
     counts_.Add(done.line, done.status, done.primitive);
     out_ += done.text;
     if (out_.size() >= kMostUnwritten) Flush();

@@ -44,6 +44,7 @@ std::string OwnFolder() {
   std::error_code error;
   fs::path own = fs::read_symlink("/proc/self/exe", error);
   if (error) {
+    // The system tells the address as a number. NOLINTNEXTLINE(performance-no-int-to-ptr)
     const auto* const started = reinterpret_cast<const char*>(getauxval(AT_EXECFN));
     own = started != nullptr ? fs::canonical(started, error) : fs::path();
   }

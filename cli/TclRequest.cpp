@@ -15,7 +15,7 @@
 #include "cli/Output.h"
 #include "host/bundled/device/Shipped.h"
 
-extern char** environ;  // POSIX declares it nowhere
+extern char** environ;  // NOLINT: POSIX declares it nowhere
 
 namespace cli {
 

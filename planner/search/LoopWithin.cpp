@@ -295,7 +295,7 @@ class LoopWithin::Question {
       to = std::min(to, ratio / range.Lowest());
     }
     const int step = StepOf(output);
-    const double end = largest_ / step + 1;
+    const double end = largest_ / step + 1;  // NOLINT: rounded down, and one more
     const int first = std::max(static_cast<int>(std::min(from / step, end)) * step, kEighths);
     const int last = std::min((static_cast<int>(to / step) + 1) * step, largest_);
     for (int divider = first; divider <= last; divider += step) {

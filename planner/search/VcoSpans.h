@@ -51,7 +51,7 @@ struct SpanOutput {
 template <typename IsAllowed>
 void Meet(const Spans& spans, const SpanOutput& output, const IsAllowed& is_allowed, Spans* left) {
   const double step = output.step;
-  const double end = output.last / output.step + 1;
+  const double end = output.last / output.step + 1;  // NOLINT: rounded down, and one more
   for (const Span& span : spans) {
     // The dividers that reach into the span, one further out.
     const double from = span.lowest / output.highest / step - 1;
