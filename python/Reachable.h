@@ -16,8 +16,8 @@ namespace python {
 // Each answer is a document of doc/reach.md.
 class Reachable {
  public:
-  // Of the output at a place, from 0; `lowest` and `highest` are values with or without a unit, both
-  // included. Throws Refused.
+  // Of the output at a place, from 0; `lowest` and `highest` are values with or without a unit,
+  // both included. Throws Refused.
   Reachable(const std::string& request, int output, const std::optional<std::string>& lowest,
             const std::optional<std::string>& highest);
 

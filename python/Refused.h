@@ -32,7 +32,8 @@ std::string Text(const nlohmann::ordered_json& data);
                               const std::string& text, const std::string& message);
 [[noreturn]] void RefusePart(const planner::device::PartError& error);
 // Answers that are not solved.
-[[noreturn]] void RefuseUnsolved(const std::vector<planner::Answer>& refused, const planner::Device& device);
+[[noreturn]] void RefuseUnsolved(const std::vector<planner::Answer>& refused,
+                                 const planner::Device& device);
 
 }  // namespace python
 

@@ -237,8 +237,8 @@ def relations(
     gap: Optional[str] = None,
     **entries: Any,
 ) -> Tuple[Relation, ...]:
-    """How data crosses from each clock of a plan to each other. Takes what `plan` takes, and the gap
-    of `Plan.relations`."""
+    """How data crosses from each clock of a plan to each other. Takes what `plan` takes, and the
+    gap of `Plan.relations`."""
     return plan(inputs, outputs, request=request, **entries).relations(gap=gap)
 
 

@@ -229,8 +229,8 @@ class Discrepancy:
 def verify(plan: AnyPlan) -> Tuple[Discrepancy, ...]:
     """Works every number of a plan out again, apart from the search; nothing when all are right.
 
-    plan: a plan or an evaluation, its JSON, or that as a dictionary. Raises RequestError when the device that it
-    names is not there.
+    plan: a plan or an evaluation, its JSON, or that as a dictionary. Raises RequestError when the
+    device that it names is not there.
     """
     return tuple(
         Discrepancy(

@@ -19,13 +19,16 @@ def program(build_dir, *words):
 
 def test_what_settings_make():
     # 27 x 44 is 1188 MHz: 8 x 148.5, 16 x 74.25. A VCO of 600 to 1440 MHz leaves 252 of 1440.
-    made = vorkel.evaluate(27, m=44, d=1, divide=[8, None, 16], set_phase=[90, None, 0], device="vk40")
+    made = vorkel.evaluate(
+        27, m=44, d=1, divide=[8, None, 16], set_phase=[90, None, 0], device="vk40"
+    )
     assert (made.primitive, made.device[:4], made.within) == ("TSYN", "vk40", True)
     assert [one.used for one in made.outputs] == [True, False, True]
     assert made.outputs[0].actual == Fraction(297, 2)
     assert (made.outputs[0].phase, made.outputs[0].phase_step) == (90, 16)
     assert made.outputs[2].period == Fraction(4000, 297)
-    assert (made.settings.vco, made.settings.pfd, made.settings.bandwidth) == (1188, 27, "OPTIMIZED")
+    assert (made.settings.vco, made.settings.pfd) == (1188, 27)
+    assert made.settings.bandwidth == "OPTIMIZED"
     assert made.answer.limits.vco_margin == Fraction(252, 1440)
     assert repr(made) == "<vorkel.Evaluation vk40b484-2 TSYN: 148.5 MHz, -, 74.25 MHz>"
 
@@ -50,14 +53,20 @@ def test_numbers_are_taken_exactly(m):
 
 def test_a_kru():
     made = vorkel.evaluate(
-        100, pins=["CLKDV", None, "CLK90"], divide=2.5, feedback=True, divide_by_2=True, phase_shift=3
+        100,
+        pins=["CLKDV", None, "CLK90"],
+        divide=2.5,
+        feedback=True,
+        divide_by_2=True,
+        phase_shift=3,
     )
     assert made.primitive == "KRU_SP"
     assert [one.pin for one in made.outputs] == ["CLKDV", None, "CLK90"]
     # 50 MHz behind the half.
     assert [one.actual for one in made.outputs if one.used] == [20, 50]
     settings = made.settings
-    assert (settings.divide, settings.phase_shift, settings.clkin_divide_by_2) == (Fraction(5, 2), 3, True)
+    assert (settings.divide, settings.phase_shift) == (Fraction(5, 2), 3)
+    assert settings.clkin_divide_by_2
 
 
 CALLS = [
@@ -138,7 +147,7 @@ def test_relations_of_settings():
         (dict(m="x", d=1, divide=[8]), "not_a_value", "m", "m: "),
         (dict(m={}, d=1, divide=[8]), "wrong_type", "m", "dict"),
         (dict(m=44, d=1, divide=[8], set_phase=[3]), "no_setting", "set_phase", "5.625"),
-        (dict(m=44, d=1, divide=[8], phase_steps=[1, 2]), "count_differs", "phase_steps", "1 output"),
+        (dict(m=44, d=1, divide=[8], phase_steps=[1, 2]), "count_differs", "phase_steps", "2 in"),
         (dict(pins=["CLK0"]), "no_setting", "pins", "it needs the feedback, feedback=True"),
         (dict(pins="CLKFX", m=2, d=1, divide_by_2="no"), "not_a_switch", "divide_by_2", "'no'"),
         (dict(m=44, d=1, divide=[8], pick=1), "contradiction", "pick", "plan"),

@@ -152,13 +152,12 @@ def test_a_core_in_vhdl_can_be_compiled_in_its_order(tmp_path):
         text = (folder / path).read_text()
         used = re.findall(r"\bwork\.(\w+)|^ *component (\w+)", text, re.IGNORECASE | re.MULTILINE)
         assert {(unit or component).lower() for unit, component in used} - {"all"} <= names, path
-        names.update(
-            unit.lower()
-            for unit in re.findall(r"^(?:entity|package) (\w+) is", text, re.IGNORECASE | re.MULTILINE)
-        )
+        units = re.findall(r"^(?:entity|package) (\w+) is", text, re.IGNORECASE | re.MULTILINE)
+        names.update(unit.lower() for unit in units)
         built = run_tool("ghdl", "-a", "--std=08", path, cwd=folder)
         assert (built.returncode, built.stderr) == (0, ""), path
-    shown = run_tool("ghdl", "--elab-run", "--std=08", core["targets"]["sim"]["toplevel"], cwd=folder)
+    top = core["targets"]["sim"]["toplevel"]
+    shown = run_tool("ghdl", "--elab-run", "--std=08", top, cwd=folder)
     assert shown.returncode == 0 and "PASS" in shown.stdout, shown.stdout
 
 

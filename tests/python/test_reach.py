@@ -32,8 +32,9 @@ def plain_frequencies(lowest, highest):
 
 
 def test_all_between_two_bounds():
-    reach = vorkel.reach(27, primitive="PLL", lowest="20 MHz", highest=Fraction(61, 2), device="vk40")
-    plain = plain_frequencies(20, Fraction(61, 2))
+    highest = Fraction(61, 2)
+    reach = vorkel.reach(27, primitive="PLL", lowest="20 MHz", highest=highest, device="vk40")
+    plain = plain_frequencies(20, highest)
     assert [one.frequency for one in reach.all()["PLL"]] == plain
     assert len(plain) > 100
     counted = reach.count()["PLL"]
