@@ -106,7 +106,9 @@ Task ReadTask(std::string_view command, const std::vector<std::string>& words) {
     throw Failure::OfUsage("-o: the name of the file is empty");
   }
   task.jobs = WholeNumber(given, "--jobs", 0, kMostJobs).value_or(1);
-  if (task.jobs == 0) task.jobs = std::max(1, static_cast<int>(std::thread::hardware_concurrency()));
+  if (task.jobs == 0) {
+    task.jobs = std::max(1, static_cast<int>(std::thread::hardware_concurrency()));
+  }
   if (const auto shard = given.Value("--shard")) task.shard = ReadShard(*shard);
   task.resume = given.Has("--resume");
   task.quiet = given.Has("--quiet");
@@ -293,7 +295,8 @@ class Batch {
 
   std::string ProgressText() const {
     const std::int64_t all = counts_.All();
-    std::string text = fmt::format("{} requests, {} not within", all, all - counts_.Of(Status::kWithin));
+    std::string text =
+        fmt::format("{} requests, {} not within", all, all - counts_.Of(Status::kWithin));
     if (const auto percent = input_.Percent()) text += fmt::format(", {} % of the input", *percent);
     return text;
   }

@@ -70,7 +70,8 @@ Format ReadFormat(std::string_view command, const Given& given, Complaints* comp
     known.push_back(word);
     if (!planner::read::IsSameWord(word, *name)) continue;
     if (command == "compare" && IsHdl(format) && !given.Has("--pick")) {
-      complaints->Add(fmt::format("--format {} is about one candidate: say which with --pick N", word));
+      complaints->Add(
+          fmt::format("--format {} is about one candidate: say which with --pick N", word));
     }
     return format;
   }

@@ -69,8 +69,8 @@ std::string PastedCall(std::string_view command, const Call& call, const Setting
 std::string PastedCall(std::string_view command, const std::vector<planner::read::Option>& options,
                        const Setting& setting);
 
-// Writes what a call has to say, in its format. What may not have been meant is told first, before a
-// text, and else on standard error.
+// Writes what a call has to say, in its format. What may not have been meant is told first, before
+// a text, and else on standard error.
 void Write(const Call& call, const std::string& text, const Setting& setting);
 // That itself, lines for the beginning of a text; mostly nothing.
 std::string DoubtLines(const Call& call, const planner::report::Style& style);

@@ -59,8 +59,8 @@ constexpr Command kCommands[] = {
      "exit status is that of the worst: 4 when the program failed, 2 with a line that is wrong, 1 "
      "with one that is unsolved, 3 with one that is off, else 0.",
      false, RunBatch},
-    {"evaluate", "[FILE] [OPTION...]",
-     "say what settings of your own make", "--in 27 --m 44 --d 1 --divide 8,16,44",
+    {"evaluate", "[FILE] [OPTION...]", "say what settings of your own make",
+     "--in 27 --m 44 --d 1 --divide 8,16,44",
      "FILE is a plan as --format json writes it, perhaps edited: its settings and its request count, "
      "its figures do not; - is standard input. Options replace what it says. Without --out there is "
      "nothing to compare the frequencies with. Settings that the primitive cannot have are refused; "

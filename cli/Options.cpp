@@ -32,7 +32,8 @@ constexpr OptionRow kRows[] = {
      "frequencies to compare with, one for each output; - for one that is not asked for"},
     {"--out", "LIST", "krus", "frequencies of 1 to 6 outputs; - for one that is not used"},
     {"--phase", "LIST", "any evaluate", "phase of each output; - where any will do"},
-    {"--duty", "LIST", "loops evaluate", "duty cycle of each output, above 0 and below 100; - or 0 where any will do"},
+    {"--duty", "LIST", "loops evaluate",
+     "duty cycle of each output, above 0 and below 100; - or 0 where any will do"},
     {"--any-order", "", "planning batch",
      "outputs may change places, where not all places can make a frequency"},
     {"--output", "N", "reach", "the place of the output, 0 by default, up to 6"},
@@ -86,7 +87,8 @@ constexpr OptionRow kRows[] = {
      "how far a duty cycle may be off, 0.5 by default"},
     {"--max-jitter", "PS", "any batch evaluate",
      "the most jitter that an output may have, peak to peak"},
-    {"--pick", "N", "plan compare best relations", "the candidate to take, by its number in compare"},
+    {"--pick", "N", "plan compare best relations",
+     "the candidate to take, by its number in compare"},
     {"--front", "N", "best", "trade-offs to show, the best settings as the first; 6 by default"},
     {"--oscillators", "LIST", "explain", "input frequencies to try instead of stock oscillators"},
     {"--m", "M", "evaluate", "M; of a TSYN in steps of 1/8, as 41.625"},
@@ -98,12 +100,15 @@ constexpr OptionRow kRows[] = {
     {"--set-phase", "LIST", "evaluate", "the same in degrees, each of them on a step"},
     {"--high-times", "LIST", "evaluate",
      "how long each output is high, in halves of a VCO period; - for 50 %"},
-    {"--set-duty", "LIST", "evaluate", "the same in percent, each of them a whole number of halves"},
+    {"--set-duty", "LIST", "evaluate",
+     "the same in percent, each of them a whole number of halves"},
     {"--pins", "LIST", "evaluate", "pin of each output of a KRU, - for one that is not used"},
     {"--divide-by-2", "", "evaluate", "of a KRU_SP: CLKIN_DIVIDE_BY_2"},
     {"--phase-shift", "N", "evaluate", "of a KRU_SP: PHASE_SHIFT, 0 to 255"},
-    {"--pick", "N", "evaluate", "the answer of the plan to take, by its number; the first by default"},
-    {"--request", "FILE", "any evaluate", "take from a file what no option says; - is standard input"},
+    {"--pick", "N", "evaluate",
+     "the answer of the plan to take, by its number; the first by default"},
+    {"--request", "FILE", "any evaluate",
+     "take from a file what no option says; - is standard input"},
     {"--format", "NAME", "written",
      "text (default), json, tcl, sdc, sdc-plain, verilog, vhdl or testbench"},
     {"--format", "NAME", "compare",
@@ -163,8 +168,9 @@ constexpr Reason kReasons[] = {
 };
 
 // The options that do not ask for anything: they belong to one call.
-constexpr std::string_view kOfOneCall[] = {"--format", "--name",      "--language",  "-o",   "--trace",
-                                           "--pick",   "--sdc-plain", "--sdc-fifos", "--gap"};
+constexpr std::string_view kOfOneCall[] = {"--format",    "--name",      "--language",
+                                           "-o",          "--trace",     "--pick",
+                                           "--sdc-plain", "--sdc-fifos", "--gap"};
 
 // Whether a list of words has one.
 bool Has(std::string_view list, std::string_view word) {

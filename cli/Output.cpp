@@ -82,7 +82,8 @@ void WriteThrough(const std::string& text, const std::string& path) {
   if (file.Close() != 0) Throw(errno, false);
 }
 
-// A file beside another one, with a name of its own, that is gone unless it takes the other's place.
+// A file beside another one, with a name of its own, that is gone unless it takes the other's
+// place.
 class Draft {
  public:
   explicit Draft(const std::string& path) : path_(path) {

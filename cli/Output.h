@@ -14,8 +14,9 @@ namespace cli {
 // signal. To be called first.
 void PrepareStreams();
 
-// Writes a text to standard output, behind what others have written to its C stream. That its reader has gone away is no failure; that it takes
-// nothing else, such as on a full disk, is thrown as Failure.
+// Writes a text to standard output, behind what others have written to its C stream. That its
+// reader has gone away is no failure; that it takes nothing else, such as on a full disk, is thrown
+// as Failure.
 void WriteOut(const std::string& text);
 
 // Writes a text to standard error, where nobody may be listening.
@@ -33,8 +34,8 @@ void WriteFile(const std::string& text, const std::string& name);
 int WriteAll(int descriptor, std::string_view text);
 // The path of the file of -o behind links, also where there is no such file yet. Throws Failure.
 std::string TargetOf(const std::string& name);
-// Throws the Failure that a file of -o cannot be written. The name may be to blame, or what happened
-// later, such as a full disk.
+// Throws the Failure that a file of -o cannot be written. The name may be to blame, or what
+// happened later, such as a full disk.
 [[noreturn]] void RefuseFile(const std::string& name, const std::string& reason,
                              bool name_is_wrong);
 // Throws the Failure that standard output takes nothing, for the error of a system call.

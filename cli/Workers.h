@@ -56,8 +56,8 @@ class Workers {
   bool IsIdle() const { return order_.empty(); }
 
   // Waits until something can be taken back, or until there is something to read from a file
-  // descriptor; answers whether that is so. -1 is for none. Returns at once when nothing is in hand.
-  // Throws std::system_error when there can be no more processes.
+  // descriptor; answers whether that is so. -1 is for none. Returns at once when nothing is in
+  // hand. Throws std::system_error when there can be no more processes.
   bool Wait(int descriptor);
   // The next one, when it is done.
   std::optional<Done> Take();

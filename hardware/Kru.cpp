@@ -11,7 +11,7 @@ const PinFacts& FactsOf(Pin pin) {
 }
 
 Rational PinRatio(Pin pin, const KruRatios& ratios) {
-  const Rational line = ratios.divide_by_2 ? Rational(1, 2) : Rational(1);
+  Rational line = ratios.divide_by_2 ? Rational(1, 2) : Rational(1);
   switch (FactsOf(pin).source) {
     case PinSource::kLine:
       return line;

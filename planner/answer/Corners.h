@@ -1,11 +1,11 @@
 // The corners of a request: the ends of what its inputs can be over temperature and age.
 //
 // Every frequency behind an input goes with it. So a limit is kept with all that the input can be
-// when it is kept at the two ends, f x (1 - t) and f x (1 + t) for a tolerance of t: lowest <= f x (1 - t)
-// and f x (1 + t) <= highest. That is to say of the nominal frequency that it is in a narrower
-// range, from lowest / (1 - t) to highest / (1 + t), and all of this is exact. The distance to an
-// end of the narrower range, as a fraction of that end, is the one to the true limit in the corner
-// that is nearest to it.
+// when it is kept at the two ends, f x (1 - t) and f x (1 + t) for a tolerance of t: lowest <= f x
+// (1 - t) and f x (1 + t) <= highest. That is to say of the nominal frequency that it is in a
+// narrower range, from lowest / (1 - t) to highest / (1 + t), and all of this is exact. The
+// distance to an end of the narrower range, as a fraction of that end, is the one to the true limit
+// in the corner that is nearest to it.
 //
 // Tested by corners_test.cpp.
 #ifndef VORKEL_PLANNER_ANSWER_CORNERS_H_

@@ -113,7 +113,8 @@ class KruPoints::Maker {
   KruSettings settings_;
 };
 
-// As answers to one output are ranked: the least jitter, and then as answer::CompareSettings has it.
+// As answers to one output are ranked: the least jitter, and then as answer::CompareSettings has
+// it.
 KruPoints::KruPoints(const Request& request, const Device& device, Primitive primitive)
     : primitive_(primitive), outputs_(request.outputs.size()) {
   Maker(request, device, primitive, this).Make();

@@ -1,5 +1,5 @@
-// The frequencies of an output of a KRU_SP or a KRU_CLKGEN: of all its pins with all that can be set.
-// They are some hundred thousand at most, and kept.
+// The frequencies of an output of a KRU_SP or a KRU_CLKGEN: of all its pins with all that can be
+// set. They are some hundred thousand at most, and kept.
 //
 // Tested by reach_test.cpp.
 #ifndef VORKEL_PLANNER_REACH_KRUPOINTS_H_

@@ -21,9 +21,9 @@ struct Point {
   bool operator==(const Point&) const = default;
 };
 
-// A quotient of two whole numbers above 0 and below 2^20, rounded. Two such quotients that differ do
-// so by more than a 2^40th of them, and a division is rounded correctly: so doubles are equal, and in
-// order, just where the quotients are.
+// A quotient of two whole numbers above 0 and below 2^20, rounded. Two such quotients that differ
+// do so by more than a 2^40th of them, and a division is rounded correctly: so doubles are equal,
+// and in order, just where the quotients are.
 inline double RatioOf(std::int64_t multiply, std::int64_t divide) {
   return static_cast<double>(multiply) / static_cast<double>(divide);
 }

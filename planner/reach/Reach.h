@@ -1,11 +1,12 @@
 // Which frequencies an output of a primitive can have from an input.
 //
 // All that settings make which keep the device's limits with each input, when no other output is
-// used: every frequency once, exactly, and with the settings that plan ranks first for it - the least
-// jitter, then the lowest VCO. Frequencies are those of the first input.
+// used: every frequency once, exactly, and with the settings that plan ranks first for it - the
+// least jitter, then the lowest VCO. Frequencies are those of the first input.
 //
-// An output has a place: with output 1 of a PLL it can run faster, output 0 of a TSYN has dividers in
-// eighths, and from place 5 on a TSYN has no fractions at all; output 0 of a KRU_CLKGEN is on CLKFX.
+// An output has a place: with output 1 of a PLL it can run faster, output 0 of a TSYN has dividers
+// in eighths, and from place 5 on a TSYN has no fractions at all; output 0 of a KRU_CLKGEN is on
+// CLKFX.
 //
 // Tested by reach_test.cpp.
 #ifndef VORKEL_PLANNER_REACH_REACH_H_

@@ -11,7 +11,8 @@ namespace planner::read {
 namespace {
 
 bool HasEnding(std::string_view name, std::string_view ending) {
-  return name.size() > ending.size() && IsSameWord(name.substr(name.size() - ending.size()), ending);
+  return name.size() > ending.size() &&
+         IsSameWord(name.substr(name.size() - ending.size()), ending);
 }
 
 // The text from its first line on that is neither empty nor a comment.

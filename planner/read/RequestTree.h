@@ -1,5 +1,5 @@
-// Requests from the values of a file, JSON or TOML (see RequestJson.h for the entries), or from what
-// a script has said.
+// Requests from the values of a file, JSON or TOML (see RequestJson.h for the entries), or from
+// what a script has said.
 //
 // Tested by request_json_test.cpp, request_toml_test.cpp and request_tcl_test.cpp.
 #ifndef VORKEL_PLANNER_READ_REQUESTTREE_H_

@@ -21,7 +21,8 @@
 
 namespace planner::read {
 
-// The options of settings, beside --primitive, --bandwidth and --feedback, which requests have, too.
+// The options of settings, beside --primitive, --bandwidth and --feedback, which requests have,
+// too.
 std::span<const OptionFacts> SettingOptions();
 const OptionFacts* FindSettingOption(std::string_view name);
 

@@ -21,7 +21,9 @@ bool IsControl(char32_t letter) {
 
 void AppendHex(std::uint32_t value, int digits, std::string* text) {
   constexpr std::string_view kDigits = "0123456789abcdef";
-  for (int shift = 4 * (digits - 1); shift >= 0; shift -= 4) *text += kDigits[(value >> shift) & 15];
+  for (int shift = 4 * (digits - 1); shift >= 0; shift -= 4) {
+    *text += kDigits[(value >> shift) & 15];
+  }
 }
 
 std::string Escaped(std::string_view text, std::size_t most) {

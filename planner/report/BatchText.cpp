@@ -116,7 +116,9 @@ string MessageOf(const Outcome& outcome, const BatchForm& form) {
   return message;
 }
 
-string Cell(const std::optional<Rational>& value) { return value ? CsvNumber(value->ToDouble()) : ""; }
+string Cell(const std::optional<Rational>& value) {
+  return value ? CsvNumber(value->ToDouble()) : "";
+}
 string Cell(const std::optional<double>& value) { return value ? CsvNumber(*value) : ""; }
 
 // The cells up to the number of the candidate.

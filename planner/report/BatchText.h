@@ -1,5 +1,5 @@
-// What becomes of the lines of a batch: as lines of JSON, as rows for a spreadsheet, and in numbers.
-// doc/batch.md describes them.
+// What becomes of the lines of a batch: as lines of JSON, as rows for a spreadsheet, and in
+// numbers. doc/batch.md describes them.
 //
 // Tested by batch.test.
 #ifndef VORKEL_PLANNER_REPORT_BATCHTEXT_H_

@@ -42,8 +42,8 @@ enum class ReachForm { kText, kJson, kCsv };
 // Where the pieces go; false: no more are wanted.
 using Sink = std::function<bool(const std::string&)>;
 
-// Writes all that is asked for, of one primitive after the other. Answers how many frequencies, gaps
-// or nearest ones there were, shown or not; of a count the count.
+// Writes all that is asked for, of one primitive after the other. Answers how many frequencies,
+// gaps or nearest ones there were, shown or not; of a count the count.
 std::int64_t WriteReach(const Request& request, const Device& device,
                         const ReachQuestion& question, const std::vector<Primitive>& primitives,
                         ReachForm form, const Sink& sink);

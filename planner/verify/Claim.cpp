@@ -144,7 +144,8 @@ class ClaimReader {
     claim_.is_engine = source == "engine" || source == "both";
     claim_.variant = read_.Word(node_, claim_.path, "variant");
     claim_.is_tradeoff = read_.Flag(node_, claim_.path, "tradeoff");
-    if (const Node* const number = node_.Find("number"); number && number->type != NodeType::kNull) {
+    if (const Node* const number = node_.Find("number");
+        number && number->type != NodeType::kNull) {
       claim_.number = static_cast<std::size_t>(
           read_.Count(node_, claim_.path, "number", 1, 1'000'000));
     }

@@ -12,9 +12,9 @@
 
 namespace planner::verify {
 
-// `compare` has all candidates, the best first, and then what is not solved. `best` has one that was
-// picked, the best, the best of each other primitive, trade-offs and the first of the engine's. The
-// answers have to follow each other in one of these ways.
+// `compare` has all candidates, the best first, and then what is not solved. `best` has one that
+// was picked, the best, the best of each other primitive, trade-offs and the first of the engine's.
+// The answers have to follow each other in one of these ways.
 void HoldSequence(const Standing& standing, const std::vector<Claim>& claims,
                   Discrepancies* discrepancies);
 

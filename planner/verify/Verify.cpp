@@ -118,7 +118,9 @@ class Work {
     for (std::size_t i = 0; i < answers->items.size(); ++i) {
       DoAnswer(answers->items[i], "answers[" + std::to_string(i) + "]", &claims);
     }
-    if (claims.size() == answers->items.size() && !IsGiven()) HoldSequence(kept_->standing, claims, &found_);
+    if (claims.size() == answers->items.size() && !IsGiven()) {
+      HoldSequence(kept_->standing, claims, &found_);
+    }
   }
 
   // --- One answer -------------------------------------------------------------------------
@@ -209,7 +211,8 @@ class Work {
       entries["solved"] = true;
       return entries;
     }
-    entries.update(EntriesOf(kept_->request, device_, answer, OwnPlaces(kept_->request), sentences_));
+    entries.update(
+        EntriesOf(kept_->request, device_, answer, OwnPlaces(kept_->request), sentences_));
     return entries;
   }
 
@@ -217,8 +220,8 @@ class Work {
   void HoldPlace(const Claim& claim, Discrepancies* wrong) const {
     if (!claim.number || kept_->standing.PlaceOf(claim.settings, claim.order)) return;
     Candidate candidate = CandidateOf(claim);
-    candidate.ranked.figures = FiguresOf(Recompute(kept_->request, device_, claim.settings, claim.order,
-                                                   candidate.origin));
+    candidate.ranked.figures = FiguresOf(
+        Recompute(kept_->request, device_, claim.settings, claim.order, candidate.origin));
     if (*claim.number > kept_->standing.candidates.size()) return;
     const Candidate& right = kept_->standing.candidates[*claim.number - 1];
     if (!IsBefore(kept_->request, right.ranked, candidate.ranked)) return;

@@ -6,8 +6,9 @@
 // figures of jitter are the calculator's (answer/Jitter.h), and what the engine answers is asked of
 // the engine again.
 //
-// The settings of an answer are what is judged, so all other numbers are held against them. But where
-// one other entry would make it an answer that the request has, in every number, that one is wrong.
+// The settings of an answer are what is judged, so all other numbers are held against them. But
+// where one other entry would make it an answer that the request has, in every number, that one is
+// wrong.
 //
 // Tested by verify_test.cpp and mutation_test.cpp.
 #ifndef VORKEL_PLANNER_VERIFY_VERIFY_H_
