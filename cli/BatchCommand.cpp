@@ -66,9 +66,9 @@ Shard ReadShard(const std::string& text) {
     }
   }
   if (numbers[0] >= 1 && numbers[0] <= numbers[1]) return {numbers[0], numbers[1]};
-  throw Failure::OfUsage(fmt::format(
-      "--shard: \"{}\" must be I/N, part I of N parts, such as 1/8 to 8/8",
-      planner::read::Shown(text)));
+  throw Failure::OfUsage(
+      fmt::format("--shard: \"{}\" must be I/N, part I of N parts, such as 1/8 to 8/8",
+                  planner::read::Shown(text)));
 }
 
 // The options of the batch itself; all others are of the requests.
@@ -194,8 +194,10 @@ class Batch {
         lines_(kLongestLine, planner::batch::Digest(task_.options)),
         progress_(!task_.quiet && isatty(STDERR_FILENO) != 0 &&
                   !(WritesOut() && isatty(STDOUT_FILENO) != 0)) {
-    if (task_.resume) earlier_ = std::make_unique<BatchEarlier>(task_.output);
-    else Open();
+    if (task_.resume)
+      earlier_ = std::make_unique<BatchEarlier>(task_.output);
+    else
+      Open();
     if (task_.jobs > 1) {
       workers_ = std::make_unique<Workers>(
           task_.jobs, [this](const Line& line) { return Answer(line); },

@@ -37,8 +37,8 @@ BatchEarlier::~BatchEarlier() {
 }
 
 void BatchEarlier::Refuse(const std::string& reason) const {
-  throw Failure::OfUsage(
-      fmt::format("--resume: {}: {}", planner::read::ShownWhole(path_), reason), false);
+  throw Failure::OfUsage(fmt::format("--resume: {}: {}", planner::read::ShownWhole(path_), reason),
+                         false);
 }
 
 bool BatchEarlier::HasNext() {
@@ -63,9 +63,10 @@ Head BatchEarlier::Take(const Line& line) {
   const std::optional<Head> head = planner::batch::ReadHead(answer.text);
   if (!head) Refuse(fmt::format("line {} is no answer of a batch", answer.number));
   if (head->line != line.number || head->digest != line.digest) {
-    Refuse(fmt::format("line {} answers line {} of another input, or was made with other options; "
-                       "here line {} comes next",
-                       answer.number, head->line, line.number));
+    Refuse(
+        fmt::format("line {} answers line {} of another input, or was made with other options; "
+                    "here line {} comes next",
+                    answer.number, head->line, line.number));
   }
   size_ += static_cast<long long>(answer.size) + 1;
   return *head;

@@ -48,9 +48,8 @@ struct Complaints {
 
 // The words that a command takes as --format, in the order of its help.
 std::vector<std::pair<std::string, Format>> FormatsOf(std::string_view command) {
-  std::vector<std::pair<std::string, Format>> formats = {{"text", Format::kText},
-                                                         {"json", Format::kJson},
-                                                         {"tcl", Format::kTcl}};
+  std::vector<std::pair<std::string, Format>> formats = {
+      {"text", Format::kText}, {"json", Format::kJson}, {"tcl", Format::kTcl}};
   if (command == "explain") return formats;
   if (command != "compare") {
     formats.emplace_back("sdc", Format::kSdc);
@@ -201,8 +200,7 @@ void Refuse(const planner::read::Mistakes& mistakes) {
   throw Failure::OfUsage(reasons);
 }
 
-std::optional<int> WholeNumber(const Given& given, std::string_view name, int lowest,
-                               int highest) {
+std::optional<int> WholeNumber(const Given& given, std::string_view name, int lowest, int highest) {
   const std::optional<std::string> text = given.Value(name);
   if (!text) return std::nullopt;
   constexpr std::size_t kMostDigits = 9;

@@ -86,8 +86,7 @@ int RunCheck(std::string_view command, const std::vector<std::string>& words,
     WriteError(planner::report::MistakesText(checked, shown, {false, setting.err_width}));
     return kWrong;
   }
-  WriteOut(planner::report::CheckText(checked, shown,
-                                      {setting.out_has_colour, setting.out_width}));
+  WriteOut(planner::report::CheckText(checked, shown, {setting.out_has_colour, setting.out_width}));
   return kDone;
 }
 

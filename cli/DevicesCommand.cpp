@@ -35,8 +35,8 @@ bool IsJson(const Given& given) {
   const std::string format = given.Value("--format").value_or("text");
   const bool is_json = planner::read::IsSameWord(format, "json");
   if (!is_json && !planner::read::IsSameWord(format, "text")) {
-    throw Failure::OfUsage(fmt::format("--format: \"{}\" must be text or json",
-                                       planner::read::Shown(format)));
+    throw Failure::OfUsage(
+        fmt::format("--format: \"{}\" must be text or json", planner::read::Shown(format)));
   }
   return is_json;
 }

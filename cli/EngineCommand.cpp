@@ -51,10 +51,9 @@ int RunEngine(std::string_view command, const std::vector<std::string>& words,
                       planner::report::UnsolvedText(answer, call.device, cause, style, calls));
   }
   Write(call,
-        call.format == Format::kText
-            ? planner::report::ReportText(call.request(), call.device, answer,
-                                          StyleOf(call, setting))
-            : InFormat(call, {{&answer}}, answer),
+        call.format == Format::kText ? planner::report::ReportText(call.request(), call.device,
+                                                                   answer, StyleOf(call, setting))
+                                     : InFormat(call, {{&answer}}, answer),
         setting);
   return answer.within ? kDone : kOff;
 }

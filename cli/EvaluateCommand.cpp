@@ -35,8 +35,7 @@ planner::Device DeviceOf(const Draft& draft, std::optional<planner::Primitive> p
 
 // The settings and the request of a call.
 std::optional<planner::read::Evaluation> EvaluationOf(const Given& given, const Draft& options,
-                                                      const Setting& setting,
-                                                      Mistakes* mistakes) {
+                                                      const Setting& setting, Mistakes* mistakes) {
   planner::read::PlanFile file;
   const std::optional<int> number = WholeNumber(given, "--pick", 1, kMostPick);
   if (!given.operands.empty()) {

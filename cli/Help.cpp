@@ -94,13 +94,14 @@ std::string WholeHelp(const Setting& setting) {
   }
   std::string text = fmt::format("usage: {} COMMAND [OPTION...]\n\n", setting.program);
   text += planner::report::Paragraph(
-      style, "Plans clocks: finds the settings of a device's clock primitives, VCO, M, D, dividers "
-             "and pins, with their errors and their jitter.");
+      style,
+      "Plans clocks: finds the settings of a device's clock primitives, VCO, M, D, dividers "
+      "and pins, with their errors and their jitter.");
   text += "\n" + Section("Commands", commands, style);
   text += "\n" + Section("Options of plan", Described(OptionsOf("plan")), style);
   text += "\n" + Section("Options of other commands", OtherOptions(), style);
-  text += fmt::format("\n{} help COMMAND lists exactly those that a command takes.\n",
-                      setting.program);
+  text +=
+      fmt::format("\n{} help COMMAND lists exactly those that a command takes.\n", setting.program);
   text += Values("plan", style);
   text += "\n" + Section("Exit status", ExitStatuses(), style);
   text += "\nExamples:\n";

@@ -248,9 +248,8 @@ std::optional<ValueFacts> ValueOf(std::string_view option) {
 std::vector<planner::read::Option> KeptFor(std::string_view command,
                                            std::vector<planner::read::Option> options) {
   std::erase_if(options, [&](const planner::read::Option& option) {
-    return !Takes(command, option.name) ||
-           std::find(std::begin(kOfOneCall), std::end(kOfOneCall), option.name) !=
-               std::end(kOfOneCall);
+    return !Takes(command, option.name) || std::find(std::begin(kOfOneCall), std::end(kOfOneCall),
+                                                     option.name) != std::end(kOfOneCall);
   });
   return options;
 }

@@ -21,8 +21,8 @@ constexpr int kMostPick = 1'000'000;
 // Why there is nothing at all, with what of the device's limits is to blame.
 std::string UnsolvedText(const Call& call, const Plan& plan, const Setting& setting) {
   const Style style{false, setting.err_width};
-  std::string text = DoubtLines(call, style) +
-                     planner::report::UnsolvedText(plan, call.device, style, {});
+  std::string text =
+      DoubtLines(call, style) + planner::report::UnsolvedText(plan, call.device, style, {});
   for (const planner::Answer& answer : plan.refused) {
     const std::string cause = LimitsInTheWay(call.device, answer.primitive, setting);
     if (cause.empty()) continue;

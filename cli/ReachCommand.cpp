@@ -43,8 +43,8 @@ std::optional<Rational> Frequency(const Given& given, const std::string& name) {
   planner::read::Mistakes mistakes;
   planner::read::Place place;
   place.entry = name;
-  auto value = planner::read::ReadValue(*text, planner::read::ValueKind::kFrequency, place,
-                                              &mistakes);
+  auto value =
+      planner::read::ReadValue(*text, planner::read::ValueKind::kFrequency, place, &mistakes);
   if (!value) Refuse(mistakes);
   return value;
 }
@@ -57,8 +57,8 @@ std::optional<ReachForm> ReadForm(const Given& given) {
   if (is("json")) return ReachForm::kJson;
   if (is("csv")) return ReachForm::kCsv;
   if (is("tcl")) return std::nullopt;
-  throw Failure::OfUsage(fmt::format("--format: \"{}\" must be text, json, csv or tcl",
-                                     planner::read::Shown(name)));
+  throw Failure::OfUsage(
+      fmt::format("--format: \"{}\" must be text, json, csv or tcl", planner::read::Shown(name)));
 }
 
 ReachQuestion ReadQuestion(const Given& given, const std::optional<ReachForm>& form) {
@@ -74,8 +74,8 @@ ReachQuestion ReadQuestion(const Given& given, const std::optional<ReachForm>& f
     if (given.Has(name)) kinds.emplace_back(name);
   }
   if (kinds.size() > 1) {
-    throw Failure::OfUsage(fmt::format("{} and {} are two questions; ask one after the other",
-                                       kinds[0], kinds[1]));
+    throw Failure::OfUsage(
+        fmt::format("{} and {} are two questions; ask one after the other", kinds[0], kinds[1]));
   }
   if (given.Has("--most") && (given.Has("--gaps") || given.Has("--count"))) {
     throw Failure::OfUsage(fmt::format("--most has no use beside {}", kinds[0]));
@@ -153,8 +153,8 @@ int RunReach(std::string_view command, const std::vector<std::string>& words,
   }
   if (found == 0 && question.kind != ReachQuestion::Kind::kCount) {
     throw Failure(kUnsolved, planner::report::Prose(
-                                 {false, setting.err_width}, "vorkel: ",
-                                 NothingInReachText(question, device, primitives)));
+                                 {false, setting.err_width},
+                                 "vorkel: ", NothingInReachText(question, device, primitives)));
   }
   stream.Finish();
   return kDone;

@@ -41,8 +41,9 @@ int Dispatch(const std::vector<std::string>& words, const Setting& setting) {
     throw Failure::OfUsage(UnknownCommand(name));
   }
   const bool wants_help =
-      std::any_of(arguments.begin(), arguments.end(),
-                  [](const std::string& word) { return IsAmong(word, {"--help", "-h"}); });
+      std::any_of(arguments.begin(), arguments.end(), [](const std::string& word) {
+        return IsAmong(word, {"--help", "-h"});
+      });
   if (wants_help) return RunHelp("help", {name}, setting);
   return command->run(name, arguments, setting);
 }
@@ -62,10 +63,11 @@ int RunWords(const std::vector<std::string>& words, const Setting& setting) {
     return failure.status();
   } catch (const std::exception& error) {
     if (is_debugged) throw;
-    WriteError(fmt::format("vorkel: {} has failed: {}; with VORKEL_DEBUG=1 it stops there, for a "
-                           "debugger\n",
-                           words.empty() ? "help" : planner::read::Shown(words[0]),
-                           planner::read::ShownWhole(error.what())));
+    WriteError(
+        fmt::format("vorkel: {} has failed: {}; with VORKEL_DEBUG=1 it stops there, for a "
+                    "debugger\n",
+                    words.empty() ? "help" : planner::read::Shown(words[0]),
+                    planner::read::ShownWhole(error.what())));
     return kFailed;
   }
 }

@@ -52,9 +52,8 @@ Stream::Stream(const std::string& name, Draft draft, const std::optional<Left>& 
 void Stream::OpenDraft(Draft draft, const std::optional<Left>& left) {
   constexpr mode_t kMode = 0666;  // without what the user masks
   is_kept_ = draft == Draft::kKept;
-  const std::string path = is_kept_
-                               ? PathOfLeft(target_)
-                               : FolderOf(target_) + ".vorkel." + std::to_string(getpid());
+  const std::string path =
+      is_kept_ ? PathOfLeft(target_) : FolderOf(target_) + ".vorkel." + std::to_string(getpid());
   if (left && left->path != path && rename(left->path.c_str(), path.c_str()) != 0) {
     RefuseFile(name_, SystemReason(errno), true);
   }

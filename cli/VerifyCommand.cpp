@@ -20,8 +20,7 @@ namespace {
 constexpr std::size_t kLargest = 50'000'000;
 
 // The device that a plan is for; one without anything when the plan does not say.
-planner::Device DeviceOf(const std::string& text, const std::string& name,
-                         const Setting& setting) {
+planner::Device DeviceOf(const std::string& text, const std::string& name, const Setting& setting) {
   const std::optional<std::string> part = planner::verify::PartOf(text);
   if (!part) return {};
   const auto files = DeviceFiles(setting);
@@ -45,8 +44,7 @@ int RunVerify(std::string_view command, const std::vector<std::string>& words,
   const std::string& name = given.operands.front();
   const std::string text = ReadFileOf("plan", name, kLargest);
   const planner::Device device = DeviceOf(text, name, setting);
-  const auto wrong =
-      planner::verify::Verify(text, device, &planner::report::JsonSentences());
+  const auto wrong = planner::verify::Verify(text, device, &planner::report::JsonSentences());
   if (!wrong.empty()) {
     WriteError(planner::report::VerifyText(wrong, name, {false, setting.err_width}));
     return kWrong;

@@ -25,8 +25,7 @@ class Reader {
     app_.set_help_flag();
     for (const OptionRow* row : OptionsOf(command)) {
       const std::string name(row->name);
-      CLI::Option* option =
-          row->placeholder.empty() ? app_.add_flag(name) : app_.add_option(name);
+      CLI::Option* option = row->placeholder.empty() ? app_.add_flag(name) : app_.add_option(name);
       option->type_name(std::string(row->placeholder));
     }
   }
@@ -35,8 +34,7 @@ class Reader {
     while (next_ < words_.size()) {
       const std::string& word = words_[next_++];
       if (word == "--") {
-        given_.operands.insert(given_.operands.end(), words_.begin() + Offset(next_),
-                               words_.end());
+        given_.operands.insert(given_.operands.end(), words_.begin() + Offset(next_), words_.end());
         break;
       }
       if (word.size() < 2 || word.front() != '-') {
@@ -122,8 +120,7 @@ class Reader {
         is_letter_and_more ? app_.get_option_no_throw(name.substr(0, 2)) : nullptr;
     if (option) {
       throw Failure::OfUsage(fmt::format("unknown option {}; a value stands apart: {} {}",
-                                         Shown(name), name.substr(0, 2),
-                                         option->get_type_name()));
+                                         Shown(name), name.substr(0, 2), option->get_type_name()));
     }
     std::vector<std::string> known;
     for (const OptionRow* row : OptionsOf(command_)) known.emplace_back(row->name);

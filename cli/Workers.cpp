@@ -164,8 +164,8 @@ bool Workers::CanTake(const Worker& worker) const {
   if (worker.held.empty()) return true;
   if (next.is_suspect || worker.held.front().is_suspect) return false;
   // Towards the end, and of few lines that take long, each gets its share.
-  const std::size_t share = std::clamp(waiting_.size() / (2 * workers_.size()), std::size_t{1},
-                                       kMostLines);
+  const std::size_t share =
+      std::clamp(waiting_.size() / (2 * workers_.size()), std::size_t{1}, kMostLines);
   return worker.held.size() < share && worker.bytes < kMostBytes;
 }
 
@@ -174,8 +174,7 @@ void Workers::GiveNext(Worker* worker) {
   waiting_.pop_front();
   waiting_bytes_ -= held.line.text.size();
   worker->bytes += held.line.text.size();
-  Append(LineHead{held.line.number, held.line.digest, held.line.text.size(),
-                  held.line.is_too_long},
+  Append(LineHead{held.line.number, held.line.digest, held.line.text.size(), held.line.is_too_long},
          held.line.text, &worker->out);
   worker->held.push_back(std::move(held));
 }

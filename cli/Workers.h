@@ -70,10 +70,10 @@ class Workers {
   struct Worker {
     pid_t process = -1;
     int socket = -1;
-    std::string out;          // what it is still to be sent
-    std::string in;           // what it has sent
-    std::deque<Held> held;    // what it has in hand
-    std::size_t bytes = 0;    // of these lines
+    std::string out;        // what it is still to be sent
+    std::string in;         // what it has sent
+    std::deque<Held> held;  // what it has in hand
+    std::size_t bytes = 0;  // of these lines
   };
 
   void Start(Worker* worker);
@@ -89,9 +89,9 @@ class Workers {
   Work work_;
   Work died_;
   std::vector<Worker> workers_;
-  std::deque<Held> waiting_;         // for a process
+  std::deque<Held> waiting_;  // for a process
   std::size_t waiting_bytes_ = 0;
-  std::deque<std::int64_t> order_;   // all that is in hand
+  std::deque<std::int64_t> order_;  // all that is in hand
   std::unordered_map<std::int64_t, Done> done_;
   std::size_t done_bytes_ = 0;
 };

@@ -138,8 +138,8 @@ Rational operator+(const Rational& a, const Rational& b) {
     const std::int64_t a_rest = Divided(a.denominator_, common);
     const std::int64_t b_rest = Divided(b.denominator_, common);
     // Two products below 2^126 each.
-    Wide numerator = static_cast<Wide>(a.numerator_) * b_rest +
-                     static_cast<Wide>(b.numerator_) * a_rest;
+    Wide numerator =
+        static_cast<Wide>(a.numerator_) * b_rest + static_cast<Wide>(b.numerator_) * a_rest;
     std::int64_t shared = 1;
     if (common != 1) {
       shared = CommonOf(static_cast<std::int64_t>(numerator % common), common);
@@ -172,8 +172,7 @@ Rational operator*(const Rational& a, const Rational& b) {
   }
   const Rational::Large x = a.Widened();
   const Rational::Large y = b.Widened();
-  return Rational(
-      Rational::Large{x.numerator * y.numerator, x.denominator * y.denominator});
+  return Rational(Rational::Large{x.numerator * y.numerator, x.denominator * y.denominator});
 }
 
 Rational operator/(const Rational& a, const Rational& b) {

@@ -24,7 +24,17 @@ namespace hardware {
 
 // The codes are those of the search; 0 is no pin.
 enum class Pin {
-  kNone, kClk0, kClk90, kClk180, kClk270, kClkdv, kClk2x, kClk2x180, kClkfx, kClkfx180, kClkfxdv
+  kNone,
+  kClk0,
+  kClk90,
+  kClk180,
+  kClk270,
+  kClkdv,
+  kClk2x,
+  kClk2x180,
+  kClkfx,
+  kClkfx180,
+  kClkfxdv
 };
 
 // Where the clock of a pin comes from.
@@ -34,10 +44,10 @@ struct PinFacts {
   Pin pin;
   std::string_view name;
   PinSource source;
-  int phase;                  // degrees
-  std::string_view limits;    // the pin whose limits it has
-  bool is_sp;                 // a KRU_SP has it
-  bool is_clkgen;             // a KRU_CLKGEN has it
+  int phase;                // degrees
+  std::string_view limits;  // the pin whose limits it has
+  bool is_sp;               // a KRU_SP has it
+  bool is_clkgen;           // a KRU_CLKGEN has it
   bool needs_feedback;
 };
 

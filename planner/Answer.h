@@ -15,18 +15,18 @@ namespace planner {
 // cycles in percent, jitter in ps peak to peak at a bit error rate of 1e-12.
 struct OutputAnswer {
   bool used = true;
-  Rational ratio;             // to the input
-  Rational frequency;         // with the first input
+  Rational ratio;      // to the input
+  Rational frequency;  // with the first input
   std::optional<Rational> frequency_second;
-  Rational error_ppm;         // (frequency - requested) / requested * 1e6
-  Rational phase;             // as the step says it: negative for a negative request
+  Rational error_ppm;                   // (frequency - requested) / requested * 1e6
+  Rational phase;                       // as the step says it: negative for a negative request
   std::optional<Rational> phase_error;  // above -180 and up to 180, when one was asked for
   Rational duty;
-  std::optional<Rational> duty_error;   // percent points
-  std::optional<double> jitter;         // with that of the input
-  std::optional<double> jitter_rms;     // of the random part alone
-  std::optional<double> searched;       // MHz: what the engine counted with
-  Rational margin = 0;                  // to the limits of its range: see Answer
+  std::optional<Rational> duty_error;  // percent points
+  std::optional<double> jitter;        // with that of the input
+  std::optional<double> jitter_rms;    // of the random part alone
+  std::optional<double> searched;      // MHz: what the engine counted with
+  Rational margin = 0;                 // to the limits of its range: see Answer
   // What is not as asked for (kOffTarget), and what is outside of the device's limits.
   std::vector<Finding> misses;
   std::vector<Finding> violations;
@@ -35,8 +35,8 @@ struct OutputAnswer {
 
 // Where settings come from. Those of the user's own come from neither of both.
 struct Source {
-  bool engine = false;      // the design flow's own search answers them
-  bool search = false;      // the search over all settings has found them
+  bool engine = false;       // the design flow's own search answers them
+  bool search = false;       // the search over all settings has found them
   std::string variant = {};  // of the engine: "smallest VCO", "largest VCO", ...; empty else
 };
 

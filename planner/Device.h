@@ -20,8 +20,8 @@ namespace planner {
 // The limits of a PLL or a TSYN, MHz.
 struct LoopLimits {
   Range vco;
-  Range pfd;            // with bandwidth OPTIMIZED or HIGH
-  Range pfd_low;        // with bandwidth LOW: never above pfd
+  Range pfd;      // with bandwidth OPTIMIZED or HIGH
+  Range pfd_low;  // with bandwidth LOW: never above pfd
   Range output;
   Range output_1;       // of output 1; a PLL's can drive an I/O clock, which runs faster
   int max_count = 0;    // O_MAX_HT_LT, VCO periods; a fraction of the file is cut off
@@ -49,10 +49,10 @@ struct PinLimits {
 class SpeedData;
 
 struct Device {
-  std::string name;     // "vk40"
-  std::string package;  // "b484"; empty when there is none
-  std::string grade;    // "2"
-  std::string part;     // "vk40b484-2"
+  std::string name;                   // "vk40"
+  std::string package;                // "b484"; empty when there is none
+  std::string grade;                  // "2"
+  std::string part;                   // "vk40b484-2"
   std::vector<Primitive> primitives;  // those whose limits are all there, in the usual order
 
   std::optional<LoopLimits> pll;

@@ -16,29 +16,29 @@ enum class Quantity { kNone, kVco, kPfd, kFrequency, kPhase, kDuty, kJitter, kDi
 
 enum class FindingKind {
   // Limits of the device that settings break.
-  kOutsideLimit,       // quantity, value and range, MHz; input, and output of a frequency
-  kDividerTooLarge,    // output; value: the divider; range.highest: the largest high or low time
+  kOutsideLimit,     // quantity, value and range, MHz; input, and output of a frequency
+  kDividerTooLarge,  // output; value: the divider; range.highest: the largest high or low time
   // Demands that settings do not meet.
-  kOffTarget,          // quantity, output; value: the error; range.highest: what is allowed
+  kOffTarget,  // quantity, output; value: the error; range.highest: what is allowed
   // What a user should know beside that.
-  kSearchedVco,        // with two inputs: the engine counted with a VCO of `value` MHz
+  kSearchedVco,          // with two inputs: the engine counted with a VCO of `value` MHz
   kSearchedFrequencies,  // the engine counted with other frequencies (numbers, MHz)
-  kNothingMoves,       // beside a fraction, all phases are 0 and all duty cycles 50 %
-  kPreferMaxVcoUnused,  // the engine counts it only with a phase or a duty cycle
-  kWholeDividerUnused,  // a PLL has no fractions
-  kOutput0Phase,       // a KRU_CLKGEN has output 0 on CLKFX whatever its phase
-  kBandwidthUnused,    // a KRU has no bandwidth
-  kInputJitterPasses,  // a KRU passes the jitter of the input on: value, ps
-  kNoJitter,           // no jitter of `outputs`, or of all when empty: text says why, or
-                       // nothing when the device has no coefficients
-  kNoPhaseError,       // no phase error: likewise
-  kMoved,              // any_order: outputs[i] tells which output of the request stands at
-                       // place i; the whole answer goes by places (answer/Moved.h)
+  kNothingMoves,         // beside a fraction, all phases are 0 and all duty cycles 50 %
+  kPreferMaxVcoUnused,   // the engine counts it only with a phase or a duty cycle
+  kWholeDividerUnused,   // a PLL has no fractions
+  kOutput0Phase,         // a KRU_CLKGEN has output 0 on CLKFX whatever its phase
+  kBandwidthUnused,      // a KRU has no bandwidth
+  kInputJitterPasses,    // a KRU passes the jitter of the input on: value, ps
+  kNoJitter,             // no jitter of `outputs`, or of all when empty: text says why, or
+                         // nothing when the device has no coefficients
+  kNoPhaseError,         // no phase error: likewise
+  kMoved,                // any_order: outputs[i] tells which output of the request stands at
+                         // place i; the whole answer goes by places (answer/Moved.h)
   // Why a primitive has no settings.
-  kTooManyInputs,      // value of them, range.highest allowed
+  kTooManyInputs,  // value of them, range.highest allowed
   kTooManyOutputs,
-  kUnsolved,           // the engine's own sentence: text
-  kNoSettings,         // no settings keep the device's limits
+  kUnsolved,    // the engine's own sentence: text
+  kNoSettings,  // no settings keep the device's limits
 };
 
 struct Finding {

@@ -50,10 +50,10 @@ struct Request {
   // demands are made of what the frequencies as they stand here make.
   Rational input_tolerance = 0;
 
-  Rational tolerance = 100;                     // ppm
-  Rational phase_tolerance = Rational(1, 2);   // degrees
-  Rational duty_tolerance = Rational(1, 2);    // percent points
-  std::optional<Rational> max_jitter;           // ps, peak to peak
+  Rational tolerance = 100;                   // ppm
+  Rational phase_tolerance = Rational(1, 2);  // degrees
+  Rational duty_tolerance = Rational(1, 2);   // percent points
+  std::optional<Rational> max_jitter;         // ps, peak to peak
 
   std::optional<Bandwidth> bandwidth;  // the only one to look at
   std::optional<Primitive> primitive;  // likewise

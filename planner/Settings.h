@@ -41,8 +41,8 @@ struct KruSettings {
   bool divide_by_2 = false;  // KRU_SP: CLKIN_DIVIDE_BY_2
   int m = 0;                 // 0 when no output is on CLKFX, CLKFX180 or CLKFXDV
   int d = 0;
-  int divide_halves = 0;     // of CLKDV or CLKFXDV; 0 when no output is on it
-  int phase_shift = 0;       // KRU_SP: PHASE_SHIFT
+  int divide_halves = 0;            // of CLKDV or CLKFXDV; 0 when no output is on it
+  int phase_shift = 0;              // KRU_SP: PHASE_SHIFT
   std::vector<hardware::Pin> pins;  // of each output of the request; kNone of an unused one
 
   hardware::KruRatios Ratios() const { return {divide_by_2, m, d, divide_halves}; }

@@ -33,9 +33,9 @@ Reachable::Reachable(const std::string& request, int output,
                      const std::optional<std::string>& highest) {
   if (output < 0 || output > kMostOutput) {
     const std::string text = std::to_string(output);
-    RefuseEntry("must_be", "output", text,
-                "output: " + text + " must be a whole number from 0 to " +
-                    std::to_string(kMostOutput));
+    RefuseEntry(
+        "must_be", "output", text,
+        "output: " + text + " must be a whole number from 0 to " + std::to_string(kMostOutput));
   }
   question_.output = output;
   if (lowest) question_.from = Frequency(*lowest, "lowest");

@@ -172,7 +172,8 @@ string Devices(const std::optional<string>& name) {
 }
 
 string Check(const py::bytes& text, const string& file, const string& device) {
-  return python::Text(planner::report::CheckData(planner::device::Check(string(text), file, device), file));
+  return python::Text(
+      planner::report::CheckData(planner::device::Check(string(text), file, device), file));
 }
 
 string Verify(const string& plan, const string& file) {
@@ -259,21 +260,24 @@ PYBIND11_MODULE(_planner, module) {
       .def("json", &Evaluation::Json)
       .def("tcl", &Evaluation::Tcl)
       .def("report", &Evaluation::Report, arg("width"))
-      .def("sdc",
-           [](const Evaluation& self, bool plain, bool fifos, const string& gap) {
-             return python::Sdc(self.asked(), self.answer(), plain, fifos, gap);
-           },
-           arg("plain"), arg("fifos"), arg("gap"))
-      .def("relations",
-           [](const Evaluation& self, const string& gap) {
-             return python::Relations(self.asked(), self.answer(), gap);
-           },
-           arg("gap"))
-      .def("hdl",
-           [](const Evaluation& self, bool is_vhdl, bool is_testbench, const string& name) {
-             return python::Hdl(self.asked(), self.answer(), is_vhdl, is_testbench, name);
-           },
-           arg("vhdl"), arg("testbench"), arg("name"));
+      .def(
+          "sdc",
+          [](const Evaluation& self, bool plain, bool fifos, const string& gap) {
+            return python::Sdc(self.asked(), self.answer(), plain, fifos, gap);
+          },
+          arg("plain"), arg("fifos"), arg("gap"))
+      .def(
+          "relations",
+          [](const Evaluation& self, const string& gap) {
+            return python::Relations(self.asked(), self.answer(), gap);
+          },
+          arg("gap"))
+      .def(
+          "hdl",
+          [](const Evaluation& self, bool is_vhdl, bool is_testbench, const string& name) {
+            return python::Hdl(self.asked(), self.answer(), is_vhdl, is_testbench, name);
+          },
+          arg("vhdl"), arg("testbench"), arg("name"));
 
   // Each can take a while.
   using Released = py::call_guard<py::gil_scoped_release>;
@@ -288,7 +292,8 @@ PYBIND11_MODULE(_planner, module) {
       .def("gaps", &Reachable::Gaps, arg("most"), Released())
       .def("count", &Reachable::Count, Released());
 
-  module.def("devices", [](const py::object& name) { return Devices(Given(name)); }, arg("name"));
+  module.def(
+      "devices", [](const py::object& name) { return Devices(Given(name)); }, arg("name"));
   module.def("shipped", &Device::Shipped, arg("folder"), arg("name"));
   module.def("check", &Check, arg("text"), arg("file"), arg("device"));
   module.def("verify", &Verify, arg("plan"), arg("file"));

@@ -19,10 +19,10 @@ struct Entry {
 };
 
 constexpr Entry kEntries[] = {
-    {"::vorkel::plan", Plan},       {"::vorkel::compare", Compare}, {"::vorkel::best", Best},
-    {"::vorkel::explain", Explain}, {"::vorkel::evaluate", Evaluate},
-    {"::vorkel::devices", Devices}, {"::vorkel::check", Check},
-    {"::vorkel::reach", Reach},
+    {"::vorkel::plan", Plan},           {"::vorkel::compare", Compare},
+    {"::vorkel::best", Best},           {"::vorkel::explain", Explain},
+    {"::vorkel::evaluate", Evaluate},   {"::vorkel::devices", Devices},
+    {"::vorkel::check", Check},         {"::vorkel::reach", Reach},
     {"::vorkel::relations", Relations},
 };
 

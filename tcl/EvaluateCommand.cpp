@@ -1,9 +1,8 @@
 // Tested by evaluate.test.
-#include "planner/answer/Evaluate.h"
-
 #include <optional>
 #include <vector>
 
+#include "planner/answer/Evaluate.h"
 #include "planner/read/Settings.h"
 #include "planner/report/Json.h"
 #include "tcl/Commands.h"
@@ -73,8 +72,7 @@ std::string Evaluate(Words words) {
   const SettingsDraft settings = Over(OptionsOf(given, &mistakes), plan.settings);
   if (!mistakes.empty()) throw Failure::OfMistakes(mistakes);
   const planner::read::Draft draft = Over(given.draft, plan.request);
-  const planner::Primitive primitive =
-      PrimitiveOf(draft, settings, DeviceOf(draft, std::nullopt));
+  const planner::Primitive primitive = PrimitiveOf(draft, settings, DeviceOf(draft, std::nullopt));
   const planner::Device device = DeviceOf(draft, primitive);
   const auto evaluation = FinishEvaluation(draft, settings, device, &mistakes);
   if (!evaluation) throw Failure::OfMistakes(mistakes);

@@ -1,9 +1,8 @@
 // Tested by explain.test.
-#include "planner/explain/Explain.h"
-
 #include <optional>
 #include <vector>
 
+#include "planner/explain/Explain.h"
 #include "planner/read/Units.h"
 #include "planner/report/ExplainText.h"
 #include "tcl/Commands.h"
@@ -21,9 +20,8 @@ std::vector<planner::Rational> Oscillators(const Given& given) {
   planner::read::Place place;
   place.entry = "-oscillators";
   planner::read::Mistakes mistakes;
-  const auto values =
-      planner::read::ReadValues(WithCommas(own->second), planner::read::ValueKind::kFrequency,
-                                place, false, &mistakes);
+  const auto values = planner::read::ReadValues(
+      WithCommas(own->second), planner::read::ValueKind::kFrequency, place, false, &mistakes);
   if (!values) throw Failure::OfMistakes(mistakes);
   std::vector<planner::Rational> inputs;
   for (const auto& value : *values) inputs.push_back(*value);

@@ -69,8 +69,8 @@ std::string Relations(Words words) {
   const Given given = ReadGiven(words, {"pick", "gap"});
   const planner::relations::Rule rule = RuleOf(given);
   const planner::plan::Plan plan = PlanOf(given);
-  return planner::report::RelationsTcl(given.request(), given.device,
-                                       *plan.Pick(Pick(given, plan)), rule);
+  return planner::report::RelationsTcl(given.request(), given.device, *plan.Pick(Pick(given, plan)),
+                                       rule);
 }
 
 }  // namespace tcl

@@ -132,8 +132,7 @@ std::string Reach(Words words) {
   const Given given =
       ReadGiven(all.words(), {"output", "from", "to", "near", "gaps", "count", "most"});
   const ReachQuestion question = QuestionOf(given, place);
-  const planner::reach::Askable askable =
-      planner::reach::AskableOf(given.request(), given.device);
+  const planner::reach::Askable askable = planner::reach::AskableOf(given.request(), given.device);
   if (askable.primitives.empty()) {
     throw Failure::OfUsage("no_primitive", given.device.part,
                            planner::report::RefusalText(askable.refused.back(), given.device));

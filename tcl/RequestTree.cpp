@@ -19,8 +19,8 @@ using planner::read::Node;
 using planner::read::NodeType;
 using std::string;
 
-constexpr std::array<std::string_view, 6> kSwitches = {
-    "exact", "feedback", "prefer_max_vco", "int_div0", "engine", "any_order"};
+constexpr std::array<std::string_view, 6> kSwitches = {"exact",    "feedback", "prefer_max_vco",
+                                                       "int_div0", "engine",   "any_order"};
 
 Node TextNode(string text) {
   Node node;
@@ -87,8 +87,8 @@ Node OutputsOf(Tcl_Obj* object) {
   node.type = NodeType::kArray;
   const auto items = List(object);
   const bool has_dicts = items && std::any_of(items->begin(), items->end(), [](Tcl_Obj* item) {
-    return OutputOf(item).type == NodeType::kObject;
-  });
+                           return OutputOf(item).type == NodeType::kObject;
+                         });
   if (has_dicts) {
     for (Tcl_Obj* const item : *items) node.items.push_back(OutputOf(item));
   } else {

@@ -56,8 +56,8 @@ Refusal LoopPhaseErrorRefusal(const Device& device, const Request& request,
   });
 }
 
-Refusal KruJitterRefusal(const Device& device, const Request& request,
-                         const KruSettings& settings, hardware::Pin pin) {
+Refusal KruJitterRefusal(const Device& device, const Request& request, const KruSettings& settings,
+                         hardware::Pin pin) {
   return Refused(device, ::Device::CoefficientGroup::kKru, [&](const ::Device::Grade& grade) {
     const Calculator::KruSettings model =
         CalculatorSettings(settings, request.inputs.front().ToDouble());

@@ -25,8 +25,8 @@ Refusal LoopJitterRefusal(const Device& device, const Request& request,
                           const LoopSettings& settings, int divider_eighths);
 Refusal LoopPhaseErrorRefusal(const Device& device, const Request& request,
                               const LoopSettings& settings);
-Refusal KruJitterRefusal(const Device& device, const Request& request,
-                         const KruSettings& settings, hardware::Pin pin);
+Refusal KruJitterRefusal(const Device& device, const Request& request, const KruSettings& settings,
+                         hardware::Pin pin);
 Refusal KruPhaseErrorRefusal(const Device& device);
 
 }  // namespace planner::answer

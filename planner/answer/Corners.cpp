@@ -8,8 +8,8 @@ namespace {
 void Narrow(Range* range, const Rational& tolerance) { *range = Narrowed(*range, tolerance); }
 
 void NarrowAll(LoopLimits* limits, const Rational& tolerance) {
-  for (Range* range : {&limits->vco, &limits->pfd, &limits->pfd_low, &limits->output,
-                       &limits->output_1}) {
+  for (Range* range :
+       {&limits->vco, &limits->pfd, &limits->pfd_low, &limits->output, &limits->output_1}) {
     Narrow(range, tolerance);
   }
 }

@@ -36,8 +36,7 @@ Errors ErrorsOf(const Output& output, const Rational& frequency, const Rational&
 Rational WorstError(const Request& request, const Output& output, const Errors& errors) {
   Rational worst = errors.ppm.Absolute() / FrequencyUnit(request.ToleranceOf(output));
   if (errors.phase) {
-    worst = std::max(worst,
-                     errors.phase->Absolute() / PhaseUnit(request.PhaseToleranceOf(output)));
+    worst = std::max(worst, errors.phase->Absolute() / PhaseUnit(request.PhaseToleranceOf(output)));
   }
   if (errors.duty) {
     worst = std::max(worst, errors.duty->Absolute() / DutyUnit(request.DutyToleranceOf(output)));

@@ -133,8 +133,7 @@ std::vector<Finding> Refusals(const Request& request, Primitive primitive) {
   const auto judge = [&](FindingKind kind, std::size_t count, int most) {
     const auto number = static_cast<std::int64_t>(count);
     if (number <= most) return;
-    refusals.push_back(
-        {.kind = kind, .primitive = primitive, .value = number, .range = {1, most}});
+    refusals.push_back({.kind = kind, .primitive = primitive, .value = number, .range = {1, most}});
   };
   judge(FindingKind::kTooManyInputs, request.inputs.size(), hardware::MostInputs(primitive));
   // A loop has an output for each place; the pins of a KRU go to those that are used.

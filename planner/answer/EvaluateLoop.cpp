@@ -111,9 +111,8 @@ class LoopJudge {
   // In the device's ranges the calculator has nothing to refuse but the input.
   void AddJitter(int index, OutputAnswer* output) {
     if (!is_in_range_ || !jitter_.IsKnown()) {
-      const Refusal refusal =
-          LoopJitterRefusal(device_, request_, settings_,
-                            settings_.outputs[static_cast<std::size_t>(index)].divider);
+      const Refusal refusal = LoopJitterRefusal(
+          device_, request_, settings_, settings_.outputs[static_cast<std::size_t>(index)].divider);
       if (refusal) {
         missing_.AddJitter(index, *refusal);
         return;

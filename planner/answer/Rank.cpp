@@ -154,9 +154,9 @@ Comparison CompareSettings(const Settings& a, const Settings& b) {
 RankKey KeyOf(const Answer& answer) {
   if (!answer.solved) return {.rank_class = Class::kUnsolved};
   const bool is_broken = !answer.violations.empty();
-  return {.rank_class = is_broken        ? Class::kBroken
+  return {.rank_class = is_broken       ? Class::kBroken
                         : answer.within ? Class::kMet
-                                         : Class::kMissed,
+                                        : Class::kMissed,
           .worst_error = answer.worst_error,
           .jitter = answer.max_jitter.value_or(kUnknownJitter),
           .margin = answer.margin,
@@ -179,9 +179,8 @@ Criterion Decided(const Request& request, const Answer& a, const Answer& b) {
 }
 
 void Rank(const Request& request, std::vector<Answer>* answers) {
-  std::stable_sort(answers->begin(), answers->end(), [&](const Answer& a, const Answer& b) {
-    return Before(request, a, b);
-  });
+  std::stable_sort(answers->begin(), answers->end(),
+                   [&](const Answer& a, const Answer& b) { return Before(request, a, b); });
 }
 
 bool SameSettings(const Answer& a, const Answer& b) { return a.settings == b.settings; }

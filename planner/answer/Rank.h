@@ -25,19 +25,19 @@
 namespace planner::answer {
 
 enum class Class {
-  kMet,       // all demands met, all limits kept
-  kMissed,    // all limits kept, some demand missed
-  kBroken,    // a limit of the device broken
+  kMet,     // all demands met, all limits kept
+  kMissed,  // all limits kept, some demand missed
+  kBroken,  // a limit of the device broken
   kUnsolved,
 };
 
 // What settings are compared by.
 struct RankKey {
   Class rank_class = Class::kMet;
-  Rational worst_error = 0;         // of all demands, in their units (Demands.h)
-  double jitter = kUnknownJitter;   // the largest of an output, ps; unknown when one is
-  Rational margin = 0;              // to the device's limits (Margin.h)
-  Rational vco = 0;                 // MHz; 0 of a KRU
+  Rational worst_error = 0;        // of all demands, in their units (Demands.h)
+  double jitter = kUnknownJitter;  // the largest of an output, ps; unknown when one is
+  Rational margin = 0;             // to the device's limits (Margin.h)
+  Rational vco = 0;                // MHz; 0 of a KRU
 };
 
 // What of a request says how to compare.

@@ -81,9 +81,9 @@ void Answerer::Make(const Line& line, Outcome* outcome) {
   PlaceInBatch(line.number, &outcome->mistakes);
   if (!reading || !outcome->mistakes.empty() || !FindDevice(*reading, outcome)) return;
   outcome->plan = plan::Make(reading->request, *outcome->device);
-  outcome->status = !outcome->plan->IsSolved()              ? Status::kUnsolved
+  outcome->status = !outcome->plan->IsSolved()             ? Status::kUnsolved
                     : outcome->plan->ranked.front().within ? Status::kWithin
-                                                            : Status::kOff;
+                                                           : Status::kOff;
 }
 
 // The device must have what the request asks for.

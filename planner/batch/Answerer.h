@@ -17,9 +17,9 @@
 namespace planner::batch {
 
 struct Task {
-  std::string file;         // how mistakes name the batch
-  read::Draft options;      // replaces what the lines say
-  std::string device;       // of lines that name none
+  std::string file;     // how mistakes name the batch
+  read::Draft options;  // replaces what the lines say
+  std::string device;   // of lines that name none
 };
 
 class Answerer {

@@ -25,9 +25,7 @@ class Digest {
   void Add(std::string_view text) {
     for (const char letter : text) Add(letter);
   }
-  void Add(char letter) {
-    value_ = (value_ ^ static_cast<unsigned char>(letter)) * 0x100000001b3;
-  }
+  void Add(char letter) { value_ = (value_ ^ static_cast<unsigned char>(letter)) * 0x100000001b3; }
   std::uint64_t Value() const { return value_; }
   // 16 digits, 0 to 9 and a to f.
   static std::string Text(std::uint64_t value);
@@ -37,12 +35,12 @@ class Digest {
 };
 
 struct Line {
-  std::int64_t number = 0;    // from 1
-  std::uint64_t digest = 0;   // of all its bytes but the newline, behind those of `Lines`
-  std::string text;           // without the newline; only its beginning when it is too long
+  std::int64_t number = 0;   // from 1
+  std::uint64_t digest = 0;  // of all its bytes but the newline, behind those of `Lines`
+  std::string text;          // without the newline; only its beginning when it is too long
   bool is_too_long = false;
-  std::size_t size = 0;       // in bytes, without the newline
-  bool IsBlank() const;       // nothing but blanks
+  std::size_t size = 0;  // in bytes, without the newline
+  bool IsBlank() const;  // nothing but blanks
 };
 
 class Lines {

@@ -32,9 +32,8 @@ std::vector<Mistake> Together(const std::vector<::Device::Mistake>& mistakes) {
   const auto first = [](const Mistake& mistake) {
     return mistake.places.empty() ? Mistake::Place{0, 0} : mistake.places.front();
   };
-  std::stable_sort(
-      together.begin(), together.end(),
-      [&first](const Mistake& a, const Mistake& b) { return first(a) < first(b); });
+  std::stable_sort(together.begin(), together.end(),
+                   [&first](const Mistake& a, const Mistake& b) { return first(a) < first(b); });
   return together;
 }
 

@@ -56,14 +56,14 @@ struct Doubt {
   std::vector<std::string> grades;  // those that it is true of
   std::string keyword;
   hardware::Rational value;
-  std::string text;                 // the decimal of the file
-  std::string other;                // empty when there is none
+  std::string text;   // the decimal of the file
+  std::string other;  // empty when there is none
   hardware::Rational other_value;
   std::string other_text;
   hardware::Rational bound;
-  std::vector<unsigned> lines;      // of the keyword, one for each grade
-  std::vector<Primitive> touched;   // the primitives that it concerns
-  std::vector<Primitive> lost;      // those of them that can do nothing with such limits
+  std::vector<unsigned> lines;     // of the keyword, one for each grade
+  std::vector<Primitive> touched;  // the primitives that it concerns
+  std::vector<Primitive> lost;     // those of them that can do nothing with such limits
 };
 
 std::vector<Doubt> Doubts(const Description& description);
@@ -73,9 +73,9 @@ std::vector<Doubt> Doubts(const GradeDescription& grade);
 // How much of a primitive a grade has.
 struct Coverage {
   Primitive primitive;
-  int there = 0;   // keywords
+  int there = 0;  // keywords
   int needed = 0;
-  int own = 0;     // of those that are there, those that no other primitive needs
+  int own = 0;  // of those that are there, those that no other primitive needs
   bool IsComplete() const { return there == needed; }
   // Whether something is missing, beside limits that are of no other use.
   bool IsBegun() const { return there != needed && own != 0; }

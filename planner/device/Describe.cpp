@@ -41,8 +41,7 @@ GradeDescription DescribeGrade(const ::Device::Grade& grade) {
     const auto figure = ExactFigure(grade, i);
     if (!figure) continue;
     const ::Device::FigureSource& source = grade.figure_sources[i];
-    description.limits.push_back({keywords[i].name, *figure, source.decimal,
-                                  source.position.line});
+    description.limits.push_back({keywords[i].name, *figure, source.decimal, source.position.line});
   }
   for (const Primitive primitive : hardware::kPrimitives) {
     if (grade.Has(HostPrimitive(primitive))) description.primitives.push_back(primitive);

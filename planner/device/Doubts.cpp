@@ -29,8 +29,8 @@ constexpr Pair kPairs[] = {
      Primitive::kPll},
     {"CLKOUT_FREQ_MIN_GCLK", "CLKOUT_FREQ_MAX_GCLK", DoubtKind::kNothingBetween, RangeOf::kOutput,
      Primitive::kPll},
-    {"CLKOUT_FREQ_MIN_GCLK", "CLKOUT_FREQ_MAX_IOCLK", DoubtKind::kNothingBetween,
-     RangeOf::kOutput1, std::nullopt},
+    {"CLKOUT_FREQ_MIN_GCLK", "CLKOUT_FREQ_MAX_IOCLK", DoubtKind::kNothingBetween, RangeOf::kOutput1,
+     std::nullopt},
     {"TSYN_VCOCLK_FREQ_MIN", "TSYN_VCOCLK_FREQ_MAX", DoubtKind::kNothingBetween, RangeOf::kVco,
      Primitive::kTsyn},
     {"TSYN_VCOCLK_FREQ_MIN", "TSYN_VCOCLK_FREQ_TARGET", DoubtKind::kTargetOutside, RangeOf::kNone,
@@ -122,8 +122,8 @@ class Finder {
     const Limit* const high = grade_.Find(pair.high);
     if (low == nullptr || high == nullptr || low->value <= high->value) return;
     // Of the two ends of the VCO, the recommended one is what is looked at.
-    const bool target_is_high = pair.kind == DoubtKind::kTargetOutside &&
-                                pair.high == "TSYN_VCOCLK_FREQ_TARGET";
+    const bool target_is_high =
+        pair.kind == DoubtKind::kTargetOutside && pair.high == "TSYN_VCOCLK_FREQ_TARGET";
     Doubt& doubt = target_is_high ? Add(pair.kind, pair.range, *high, low)
                                   : Add(pair.kind, pair.range, *low, high);
     if (pair.lost && Has(*pair.lost)) doubt.lost = {*pair.lost};
@@ -184,8 +184,7 @@ class Finder {
     }
   }
 
-  void CompareVcoAndOutputs(const LoopKeywords& loop, const Limit& vco_min,
-                            const Limit& vco_max) {
+  void CompareVcoAndOutputs(const LoopKeywords& loop, const Limit& vco_min, const Limit& vco_max) {
     const Limit& output_min = *grade_.Find(loop.output_min);
     const Limit& output_max = *grade_.Find(loop.output_max);
     if (output_min.value > output_max.value) return;

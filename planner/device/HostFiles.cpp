@@ -13,8 +13,7 @@ namespace {
 
 class FilesOfTheHost final : public Files {
  public:
-  explicit FilesOfTheHost(::Device::DeviceCatalogue catalogue)
-      : catalogue_(std::move(catalogue)) {}
+  explicit FilesOfTheHost(::Device::DeviceCatalogue catalogue) : catalogue_(std::move(catalogue)) {}
 
   std::vector<std::string> Names() const override { return catalogue_.Names(); }
 

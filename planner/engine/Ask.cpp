@@ -15,10 +15,9 @@ namespace {
 Answer AnswerOf(const Request& request, const Device& device, Primitive primitive,
                 const Source& source, const Outcome& outcome) {
   if (const auto* const refused = std::get_if<Refused>(&outcome)) {
-    return answer::Unsolved(primitive, source,
-                            {{.kind = FindingKind::kUnsolved,
-                              .primitive = primitive,
-                              .text = refused->sentence}});
+    return answer::Unsolved(
+        primitive, source,
+        {{.kind = FindingKind::kUnsolved, .primitive = primitive, .text = refused->sentence}});
   }
   const Found& found = std::get<Found>(outcome);
   return answer::Evaluate(request, device, found.settings, source, found.searched);
@@ -75,9 +74,9 @@ class KruRuns {
   Answer Judged(const Source& source, const Outcome& outcome) {
     const auto* const found = std::get_if<Found>(&outcome);
     if (found == nullptr) return AnswerOf(request_, device_, primitive_, source, outcome);
-    const auto same = std::find_if(
-        judged_.begin(), judged_.end(),
-        [found](const Answer& other) { return other.settings == found->settings; });
+    const auto same = std::find_if(judged_.begin(), judged_.end(), [found](const Answer& other) {
+      return other.settings == found->settings;
+    });
     if (same == judged_.end()) {
       judged_.push_back(AnswerOf(request_, device_, primitive_, source, outcome));
       return judged_.back();
@@ -112,8 +111,7 @@ void RequirePrimitive(const Device& device, Primitive primitive) {
 
 // The answers of all variants, solved or not, in their order. Of variants of a loop that end in the
 // same settings there is the first: with the same settings none ranks before another.
-std::vector<Answer> AllAnswers(const Request& request, const Device& device,
-                               Primitive primitive) {
+std::vector<Answer> AllAnswers(const Request& request, const Device& device, Primitive primitive) {
   std::vector<Answer> answers;
   LoopRuns loop_runs(request, device, primitive);
   KruRuns kru_runs(request, device, primitive, false);

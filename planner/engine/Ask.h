@@ -27,7 +27,7 @@ struct Variant {
   bool closest = false;         // choose by phases and duty cycles, even if there are none
   bool prefer_max_vco = false;  // of several, the one with the largest VCO
   bool whole_divider_0 = false;
-  bool feedback = false;        // of a KRU_SP
+  bool feedback = false;  // of a KRU_SP
   bool operator==(const Variant&) const = default;
 };
 

@@ -61,7 +61,8 @@ class PhaseLists {
     const int last = has_shift_ ? LastStep() : 0;
     std::optional<Rational> least;
     Phases best = phases;
-    if (std::all_of(phases.begin(), phases.end(), [](const auto& one) { return !one; })) return best;
+    if (std::all_of(phases.begin(), phases.end(), [](const auto& one) { return !one; }))
+      return best;
     for (int step = first; step <= last; ++step) {
       const Rational offset(360 * step, hardware::kShiftSteps);
       const std::optional<Rational> worst = WorstError(phases, offset);
@@ -108,8 +109,7 @@ class PhaseLists {
 
   // What the engine is to be asked for, of which it makes this offset.
   Phases Made(const Phases& phases, const Rational& offset) const {
-    const Rational rest =
-        (std::min(offset, quarter_ - kBelow) * kFractions).Floor() / kFractions;
+    const Rational rest = (std::min(offset, quarter_ - kBelow) * kFractions).Floor() / kFractions;
     Phases made = phases;
     for (auto& phase : made) {
       if (phase) phase = TurnedToFull(PinOf(*phase, offset)) + rest;

@@ -18,9 +18,8 @@ using hardware::PinSource;
 
 bool IsUsed(const std::vector<Pin>& pins, std::initializer_list<PinSource> sources) {
   return std::any_of(pins.begin(), pins.end(), [&sources](Pin pin) {
-    return pin != Pin::kNone &&
-           std::find(sources.begin(), sources.end(), hardware::FactsOf(pin).source) !=
-               sources.end();
+    return pin != Pin::kNone && std::find(sources.begin(), sources.end(),
+                                          hardware::FactsOf(pin).source) != sources.end();
   });
 }
 
@@ -60,11 +59,10 @@ Outcome RunKru(const Request& request, const Device& device, Primitive primitive
   for (const std::size_t index : UsedOutputs(request)) used_phases.push_back(phases[index]);
   const int count = static_cast<int>(frequencies.size());
   const double input = request.inputs[0].ToDouble();
-  const int code =
-      is_clkgen ? object->KruClkgenCalculateActuals(ListOf(frequencies), ListOf(used_phases),
-                                                    input, count, trace)
-                : object->KruCalculateActuals(ListOf(frequencies), ListOf(used_phases), input,
-                                              count, variant.feedback, trace);
+  const int code = is_clkgen ? object->KruClkgenCalculateActuals(
+                                   ListOf(frequencies), ListOf(used_phases), input, count, trace)
+                             : object->KruCalculateActuals(ListOf(frequencies), ListOf(used_phases),
+                                                           input, count, variant.feedback, trace);
   if (code == Ip::Kru::kNoSpeedData) {
     throw std::logic_error("The engine cannot read the limits of a primitive that is there.");
   }

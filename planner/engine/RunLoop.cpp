@@ -35,8 +35,8 @@ bool IsWhole(const Request& request, const Variant& variant) {
 
 class LoopRun {
  public:
-  LoopRun(const Request& request, const Device& device, Primitive primitive,
-          const Variant& variant, bool trace)
+  LoopRun(const Request& request, const Device& device, Primitive primitive, const Variant& variant,
+          bool trace)
       : request_(request),
         device_(device),
         primitive_(primitive),
@@ -74,8 +74,7 @@ class LoopRun {
     const std::lock_guard lock(LoopRuns());
     if (!closest_) {
       return object_->CalculateMinPowerOutFreqs(frequencies, first, second, Count(),
-                                                variant_.prefer_max_vco, is_whole, Code(),
-                                                trace_);
+                                                variant_.prefer_max_vco, is_whole, Code(), trace_);
     }
     return object_->GetClosestSolution(frequencies, ListOf(Asked(&Output::phase)),
                                        ListOf(Asked(&Output::duty)), first, second, Count(),
@@ -156,9 +155,9 @@ Variant Effective(const Request& request, const Device& device, Primitive primit
   Variant same = variant;
   same.name.clear();
   same.feedback = false;
-  // The engine knows bandwidth LOW and no other, and of LOW only the highest PFD frequency. It takes
-  // a D that is a whole number but for less than a thousandth, so that no PFD frequency is above the
-  // input by more than that; where this is below both limits they are the same to it.
+  // The engine knows bandwidth LOW and no other, and of LOW only the highest PFD frequency. It
+  // takes a D that is a whole number but for less than a thousandth, so that no PFD frequency is
+  // above the input by more than that; where this is below both limits they are the same to it.
   const Range& low = device.Loop(primitive).PfdOf(Bandwidth::kLow);
   const Rational most = request.inputs.front() * Rational(1001, 1000);
   if (same.bandwidth == Bandwidth::kHigh || most < low.highest) {

@@ -112,8 +112,8 @@ void AddMoves(const Question& question, const Demand& demand, ChangeKind kind,
   for (const Side side : kSides) {
     std::optional<Allowance> found = Nearest(question, window_of(question, demand, side));
     if (!found) continue;
-    changes->push_back({kind, demand, Moved(value, found->value, side), value,
-                        std::move(found->settings)});
+    changes->push_back(
+        {kind, demand, Moved(value, found->value, side), value, std::move(found->settings)});
   }
 }
 
@@ -131,12 +131,12 @@ void AddTolerance(const Question& question, const Demand& demand, std::vector<Ch
   std::optional<Allowance> found = FindSmallest(find, needs, 1000000);
   if (!found) return;
   const Rational before = question.request.ToleranceOf(OutputOf(&original, demand));
-  changes->push_back({ChangeKind::kTolerance, demand, found->value, before,
-                      std::move(found->settings)});
+  changes->push_back(
+      {ChangeKind::kTolerance, demand, found->value, before, std::move(found->settings)});
 }
 
-// The jitter of an output, ps. An answer has none of settings beyond the ranges of VCO and PFD, which
-// count here where these ranges are left out.
+// The jitter of an output, ps. An answer has none of settings beyond the ranges of VCO and PFD,
+// which count here where these ranges are left out.
 double JitterOf(const Question& question, const Demand& demand, const Settings& settings) {
   if (const auto* const loop = std::get_if<LoopSettings>(&settings)) {
     return answer::LoopJitter(question.device, question.request)
@@ -159,8 +159,8 @@ void AddJitter(const Question& question, const Demand& demand, std::vector<Chang
   };
   std::optional<Allowance> found = FindSmallest(find, needs, 1000000000);
   if (!found) return;
-  changes->push_back({ChangeKind::kJitter, demand, found->value, before,
-                      std::move(found->settings)});
+  changes->push_back(
+      {ChangeKind::kJitter, demand, found->value, before, std::move(found->settings)});
 }
 
 // The values of settings that a range of the device is for.
@@ -255,9 +255,8 @@ void AddRange(const Question& question, const Demand& demand, const ValuesOf& va
       return most;
     };
     const Rational& end = side == Side::kBelow ? range.lowest : range.highest;
-    std::optional<Allowance> found = FindSmallest(find, needs, side == Side::kBelow
-                                                                   ? end * Rational(999, 1000)
-                                                                   : end * 3);
+    std::optional<Allowance> found =
+        FindSmallest(find, needs, side == Side::kBelow ? end * Rational(999, 1000) : end * 3);
     if (!found) continue;
     changes->push_back({side == Side::kBelow ? ChangeKind::kLowest : ChangeKind::kHighest, demand,
                         Moved(end, found->value, side), end, std::move(found->settings)});
@@ -272,20 +271,23 @@ void AddLimit(const Question& question, const Demand& demand, std::vector<Change
   };
   switch (demand.kind) {
     case Kind::kVco:
-      AddRange(question, demand, vcos,
-               [](Question* changed) -> Range& { return changed->Limits().vco; }, changes);
+      AddRange(
+          question, demand, vcos, [](Question* changed) -> Range& { return changed->Limits().vco; },
+          changes);
       break;
     case Kind::kPfd:
-      AddRange(question, demand, pfds,
-               [](Question* changed) -> Range& { return changed->Limits().pfd; }, changes);
+      AddRange(
+          question, demand, pfds, [](Question* changed) -> Range& { return changed->Limits().pfd; },
+          changes);
       break;
     default:
-      AddRange(question, demand, frequencies,
-               [&](Question* changed) -> Range& {
-                 LoopLimits& limits = changed->Limits();
-                 return demand.output == 1 ? limits.output_1 : limits.output;
-               },
-               changes);
+      AddRange(
+          question, demand, frequencies,
+          [&](Question* changed) -> Range& {
+            LoopLimits& limits = changed->Limits();
+            return demand.output == 1 ? limits.output_1 : limits.output;
+          },
+          changes);
       break;
   }
 }

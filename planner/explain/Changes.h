@@ -14,15 +14,15 @@
 namespace planner::explain {
 
 enum class ChangeKind {
-  kWithout,    // the demand goes
-  kTolerance,  // a tolerance of `value` ppm: of the output, or of all when it is -1
-  kFrequency,  // a frequency of `value` MHz
-  kPhase,      // a phase of `value` degrees
-  kDuty,       // a duty cycle of `value` percent
-  kJitter,     // a jitter of at most `value` ps: of the output, or of all that have a limit
-  kLowest,     // of a range of the device: a minimum of `value` MHz
-  kHighest,    // and a maximum
-  kBandwidth,  // another bandwidth: that of the settings
+  kWithout,         // the demand goes
+  kTolerance,       // a tolerance of `value` ppm: of the output, or of all when it is -1
+  kFrequency,       // a frequency of `value` MHz
+  kPhase,           // a phase of `value` degrees
+  kDuty,            // a duty cycle of `value` percent
+  kJitter,          // a jitter of at most `value` ps: of the output, or of all that have a limit
+  kLowest,          // of a range of the device: a minimum of `value` MHz
+  kHighest,         // and a maximum
+  kBandwidth,       // another bandwidth: that of the settings
   kInputTolerance,  // an input that is off by `value` ppm at most
 };
 

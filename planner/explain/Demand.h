@@ -31,7 +31,7 @@ enum class DemandKind {
   // Of the request:
   kBandwidth,
   kFeedback,
-  kSecondInput,  // all of it with the second input, too
+  kSecondInput,     // all of it with the second input, too
   kInputTolerance,  // all limits with what the inputs can be beside their frequencies, too
 };
 

@@ -62,9 +62,8 @@ OfPrimitive ExplainOne(const Request& request, const Device& device, Primitive p
   one.is_met = within.Exists();
   if (one.is_met) return one;
   const std::vector<Demand> demands = DemandsOf(request, primitive);
-  const Conflicts found = FindConflicts(demands.size(), [&](Set set) {
-    return within.Exists(OnlyWith(demands, set));
-  });
+  const Conflicts found =
+      FindConflicts(demands.size(), [&](Set set) { return within.Exists(OnlyWith(demands, set)); });
   one.questions = found.questions;
   one.is_complete = found.complete;
   const Question question{request, device, primitive, {}};

@@ -13,8 +13,6 @@ Answer Question::Judge(const Settings& settings) const {
   return answer::Evaluate(request, device, settings, Source{});
 }
 
-LoopLimits& Question::Limits() {
-  return primitive == Primitive::kPll ? *device.pll : *device.tsyn;
-}
+LoopLimits& Question::Limits() { return primitive == Primitive::kPll ? *device.pll : *device.tsyn; }
 
 }  // namespace planner::explain

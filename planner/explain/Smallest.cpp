@@ -12,9 +12,7 @@ namespace {
 constexpr int kMostTurns = 100;
 
 // Below a value by less than can be told.
-Rational JustBelow(const Rational& value) {
-  return value - value / (std::int64_t{1} << 50);
-}
+Rational JustBelow(const Rational& value) { return value - value / (std::int64_t{1} << 50); }
 
 // A number between two others with few digits.
 Rational Between(const Rational& low, const Rational& high) {

@@ -132,8 +132,7 @@ Plan Make(const Request& request, const Device& device, const Options& options) 
     if (shown.empty()) {
       AddRefused(of, &plan);
     } else if (used.engine && !of.IsEngineSolved()) {
-      plan.engine_refused.push_back(
-          answer::Unsolved(primitive, {.engine = true}, of.refusals));
+      plan.engine_refused.push_back(answer::Unsolved(primitive, {.engine = true}, of.refusals));
     }
     for (Answer& answer : shown) plan.ranked.push_back(std::move(answer));
     const bool is_cut = std::any_of(of.attempts.begin(), of.attempts.end(),

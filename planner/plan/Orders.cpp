@@ -32,9 +32,8 @@ std::vector<int> OwnPlaces(const Request& request, const Device& device, Primiti
       places.push_back(0);
       break;
   }
-  std::erase_if(places, [&](int place) {
-    return static_cast<std::size_t>(place) >= request.outputs.size();
-  });
+  std::erase_if(
+      places, [&](int place) { return static_cast<std::size_t>(place) >= request.outputs.size(); });
   return places;
 }
 

@@ -68,11 +68,10 @@ std::vector<Gap> LargestGaps(const Reach& reach, const Range& frequencies, std::
       const Gap gap = {*last, point};
       // What is narrower for certain: doubles are off by less than this.
       const double above = Approximate(point);
-      const bool is_narrower =
-          best.IsFull() && most > 0 &&
-          above - Approximate(*last) + 1e-15 * above <
-              Approximate(best.Last().above) - Approximate(best.Last().below) -
-                  1e-15 * Approximate(best.Last().above);
+      const bool is_narrower = best.IsFull() && most > 0 &&
+                               above - Approximate(*last) + 1e-15 * above <
+                                   Approximate(best.Last().above) - Approximate(best.Last().below) -
+                                       1e-15 * Approximate(best.Last().above);
       if (!is_narrower) best.Add(gap);
     }
     last = point;

@@ -91,8 +91,7 @@ class KruPoints::Maker {
     }
   }
 
-  void Add(Made made, std::int64_t multiply, std::int64_t divide,
-           const search::RatioRange& range) {
+  void Add(Made made, std::int64_t multiply, std::int64_t divide, const search::RatioRange& range) {
     if (!range.Contains(multiply, divide)) return;
     const std::int64_t common = std::gcd(multiply, divide);
     made.multiply = multiply / common;

@@ -43,8 +43,8 @@ LoopPoints::LoopPoints(const Request& request, const Device& device, Primitive p
                        std::size_t window)
     : primitive_(primitive), outputs_(request.outputs.size()), window_(window) {
   const LoopLimits& limits = device.Loop(primitive);
-  const bool fractions = hardware::HasFractions(primitive, static_cast<int>(outputs_),
-                                                request.whole_divider_0);
+  const bool fractions =
+      hardware::HasFractions(primitive, static_cast<int>(outputs_), request.whole_divider_0);
   // Only output 0 has dividers in eighths.
   step_ = fractions && outputs_ == 1 ? 1 : kEighths;
   for (const Bandwidth bandwidth : hardware::kBandwidths) {

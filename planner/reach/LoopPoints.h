@@ -66,8 +66,8 @@ class LoopPoints final : public Points {
   Primitive primitive_;
   std::size_t outputs_;
   std::size_t window_;
-  int step_ = 8;            // of dividers, in eighths
-  std::vector<Vco> vcos_;   // those that are preferred come first
+  int step_ = 8;           // of dividers, in eighths
+  std::vector<Vco> vcos_;  // those that are preferred come first
 };
 
 }  // namespace planner::reach

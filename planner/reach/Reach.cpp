@@ -70,8 +70,7 @@ Reach::Reach(const Request& request, const Device& device, Primitive primitive, 
   }
 }
 
-void Reach::ForEach(const Range& frequencies,
-                    const std::function<bool(const Point&)>& take) const {
+void Reach::ForEach(const Range& frequencies, const std::function<bool(const Point&)>& take) const {
   points_->ForEach({frequencies.lowest / input_, frequencies.highest / input_}, take);
 }
 

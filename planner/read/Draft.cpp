@@ -42,9 +42,9 @@ std::string DecimalComma(std::string_view text, bool is_input) {
   if (!is_bare(whole, 3) || !is_bare(decimals, 6)) return "";
   const long first = std::stol(std::string(whole));
   const long second = std::stol(std::string(decimals));
-  const bool is_far = is_input ? first > 4 * second || second > 4 * first
-                               : first > 20 * second ||
-                                     (decimals.size() == 3 && second > 4 * first);
+  const bool is_far = is_input
+                          ? first > 4 * second || second > 4 * first
+                          : first > 20 * second || (decimals.size() == 3 && second > 4 * first);
   if (!is_far && decimals.front() != '0') return "";
   return std::string(whole) + "." + std::string(decimals);
 }
@@ -277,9 +277,8 @@ class Finisher {
   void DoubtDuties() {
     if (!draft_.duties) return;
     const Values& duties = draft_.duties->value;
-    const bool are_none = std::all_of(duties.begin(), duties.end(), [](const auto& duty) {
-      return duty && *duty == 0;
-    });
+    const bool are_none = std::all_of(duties.begin(), duties.end(),
+                                      [](const auto& duty) { return duty && *duty == 0; });
     if (are_none) reading_.doubts.push_back({DoubtKind::kNoDuty, draft_.duties->place, "", ""});
   }
 

@@ -34,7 +34,7 @@ struct Draft {
   Entry<std::string> device;
   Entry<std::optional<Primitive>> primitive;  // nothing: auto
   Entry<std::vector<Rational>> inputs;
-  Entry<Values> outputs;  // frequencies; nothing: the output is not used
+  Entry<Values> outputs;             // frequencies; nothing: the output is not used
   Entry<std::vector<bool>> unasked;  // whose frequencies are only what settings make
   Entry<Values> phases;
   Entry<Values> duties;
@@ -69,7 +69,7 @@ struct Reading {
   Request request;
   Entry<std::string> device;  // the name, or its beginning; nothing: the default
   std::vector<Doubt> doubts;
-  Draft draft;                // what it is made of
+  Draft draft;  // what it is made of
 };
 
 // For whom a request is read.

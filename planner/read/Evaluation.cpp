@@ -168,15 +168,15 @@ class Finisher {
   int Bounded(const Entry<Rational>& entry, int lowest, int highest, std::string_view option,
               std::string_view what) {
     if (!entry) {
-      Missing(option, "of the settings, such as " + std::string(option) + " " +
-                          std::to_string(lowest));
+      Missing(option,
+              "of the settings, such as " + std::string(option) + " " + std::to_string(lowest));
       return lowest;
     }
     const auto whole = Whole(entry->value);
     if (whole && *whole >= lowest && *whole <= highest) return *whole;
-    Refuse(entry->place, Written(entry->value), Of(what),
-           "it is a whole number from " + std::to_string(lowest) + " to " +
-               std::to_string(highest));
+    Refuse(
+        entry->place, Written(entry->value), Of(what),
+        "it is a whole number from " + std::to_string(lowest) + " to " + std::to_string(highest));
     return lowest;
   }
 
@@ -223,13 +223,11 @@ class Finisher {
     const Rational& value = *said_.dividers->value[i];
     const auto eighths = Whole(value * kEighths);
     const int output = static_cast<int>(i);
-    if (eighths &&
-        hardware::IsDivider(*eighths, output, fractions_, hardware::kLargestDivider)) {
+    if (eighths && hardware::IsDivider(*eighths, output, fractions_, hardware::kLargestDivider)) {
       return *eighths;
     }
     const std::string most = std::to_string(hardware::kLargestDivider);
-    Refuse(said_.dividers->place, Written(value),
-           Of("divider of output " + std::to_string(i)),
+    Refuse(said_.dividers->place, Written(value), Of("divider of output " + std::to_string(i)),
            fractions_ && i == 0 ? "it is 1, or 2 to " + most + " in steps of 1/8"
                                 : "it is a whole number from 1 to " + most);
     return 0;
@@ -261,8 +259,8 @@ class Finisher {
       } else if (said_.phases && !step) {
         const int below = *Whole(steps.Floor());
         Refuse(entry->place, Written(*value), what,
-               "the nearest steps are " + Written(hardware::PhaseOfStep(below, divider)) +
-                   " and " + Written(hardware::PhaseOfStep(below + 1, divider)) + " degrees");
+               "the nearest steps are " + Written(hardware::PhaseOfStep(below, divider)) + " and " +
+                   Written(hardware::PhaseOfStep(below + 1, divider)) + " degrees");
       } else if (!step || *step > divider || *step < -divider) {
         Refuse(entry->place, Written(*value), what,
                "it is a whole number of eighths of a VCO period, at most a turn, " +
@@ -310,8 +308,7 @@ class Finisher {
                         std::to_string(times.shortest) + " to " + std::to_string(times.longest) +
                         " halves of a VCO period");
     }
-    const int below =
-        std::clamp(*Whole(halves.Floor()), times.shortest, times.longest);
+    const int below = std::clamp(*Whole(halves.Floor()), times.shortest, times.longest);
     const int above = std::clamp(below + 1, times.shortest, times.longest);
     const std::string first = Written(hardware::DutyOfHighTime(below, divider));
     const std::string second = Written(hardware::DutyOfHighTime(above, divider));
@@ -336,8 +333,8 @@ class Finisher {
     if (!mistakes_.empty()) return;
     KruSettings set;
     set.primitive = primitive_;
-    set.feedback = (said_.feedback && said_.feedback->value) ||
-                   (draft_.feedback && draft_.feedback->value);
+    set.feedback =
+        (said_.feedback && said_.feedback->value) || (draft_.feedback && draft_.feedback->value);
     set.divide_by_2 = said_.divide_by_2 && said_.divide_by_2->value;
     for (std::size_t i = 0; i < used_.size(); ++i) {
       set.pins.push_back(used_[i] ? PinOf(i, set.feedback) : Pin::kNone);
@@ -360,14 +357,14 @@ class Finisher {
     if (any([](PinSource source) {
           return source == PinSource::kDivider || source == PinSource::kDividedSynthesiser;
         })) {
-      set.divide_halves = is_sp ? DivideOf("CLKDV", hardware::kClkdvHalves,
-                                           "2 to 8 in steps of 0.5, or 9 to 17 as a whole number")
-                                : DivideOf("CLKFXDV", hardware::kClkfxdvHalves,
-                                           "2, 4, 8, 16 or 32");
+      set.divide_halves = is_sp
+                              ? DivideOf("CLKDV", hardware::kClkdvHalves,
+                                         "2 to 8 in steps of 0.5, or 9 to 17 as a whole number")
+                              : DivideOf("CLKFXDV", hardware::kClkfxdvHalves, "2, 4, 8, 16 or 32");
     }
     if (said_.phase_shift) {
-      set.phase_shift = Bounded(said_.phase_shift, 0, hardware::kShiftSteps, "--phase-shift",
-                                "PHASE_SHIFT");
+      set.phase_shift =
+          Bounded(said_.phase_shift, 0, hardware::kShiftSteps, "--phase-shift", "PHASE_SHIFT");
     }
     settings_ = std::move(set);
   }
@@ -388,8 +385,7 @@ class Finisher {
       if (facts.name == name) return facts.pin;
       names += (names.empty() ? "" : ", ") + std::string(facts.name);
     }
-    Refuse(said_.pins->place, name, Of("pin of output " + std::to_string(i)),
-           "it is " + names);
+    Refuse(said_.pins->place, name, Of("pin of output " + std::to_string(i)), "it is " + names);
     return Pin::kNone;
   }
 
@@ -428,8 +424,8 @@ class Finisher {
     std::vector<bool> unasked(used_.size());
     for (std::size_t i = 0; i < used_.size(); ++i) {
       if (!used_[i]) continue;
-      const bool was_asked = draft.outputs && draft.outputs->value[i] &&
-                             !(draft.unasked && draft.unasked->value[i]);
+      const bool was_asked =
+          draft.outputs && draft.outputs->value[i] && !(draft.unasked && draft.unasked->value[i]);
       unasked[i] = !was_asked;
       frequencies[i] = was_asked ? draft.outputs->value[i]
                                  : std::optional(draft.inputs->value.front() * RatioOf(i));

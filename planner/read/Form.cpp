@@ -30,9 +30,8 @@ std::string_view Beginning(std::string_view text) {
 
 bool IsNameAndEquals(std::string_view text) {
   std::size_t place = 0;
-  while (place < text.size() &&
-         (IsDigit(text[place]) || text[place] == '_' || text[place] == '-' ||
-          (Lower(text[place]) >= 'a' && Lower(text[place]) <= 'z'))) {
+  while (place < text.size() && (IsDigit(text[place]) || text[place] == '_' || text[place] == '-' ||
+                                 (Lower(text[place]) >= 'a' && Lower(text[place]) <= 'z'))) {
     ++place;
   }
   if (place == 0) return false;

@@ -297,8 +297,7 @@ std::size_t FirstInvalid(std::string_view text) {
 
 }  // namespace
 
-std::optional<Node> ReadJsonTree(std::string_view text, std::string_view file,
-                                 Mistakes* mistakes) {
+std::optional<Node> ReadJsonTree(std::string_view text, std::string_view file, Mistakes* mistakes) {
   if (text.substr(0, kEncodingMark.size()) == kEncodingMark) {
     text.remove_prefix(kEncodingMark.size());
   }

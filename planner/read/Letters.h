@@ -49,9 +49,7 @@ inline std::size_t LetterCount(std::string_view text) {
   return count;
 }
 
-inline bool IsBlank(char letter) {
-  return letter == ' ' || (letter >= '\t' && letter <= '\r');
-}
+inline bool IsBlank(char letter) { return letter == ' ' || (letter >= '\t' && letter <= '\r'); }
 
 // The text without blanks at its ends.
 inline std::string_view Trimmed(std::string_view text) {

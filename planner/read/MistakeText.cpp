@@ -142,9 +142,9 @@ std::string MissingText(const Mistake& mistake) {
     missing = fmt::format("{} has no {}, and {}", ShownWhole(mistake.place.file),
                           is_input ? "inputs" : "outputs", missing);
   }
-  return fmt::format("{}: the {}", missing,
-                     is_input ? "input frequency, such as --in 100"
-                              : "output frequencies, such as --out 200,50");
+  return fmt::format(
+      "{}: the {}", missing,
+      is_input ? "input frequency, such as --in 100" : "output frequencies, such as --out 200,50");
 }
 
 // A sentence that its place does not begin: nothing for all others.
@@ -181,8 +181,9 @@ std::string ValueText(const Mistake& mistake) {
                            Shown(mistake.other));
       }
       const std::string point =
-          mistake.hint.empty() ? "" : fmt::format("; with a decimal point it is {}",
-                                                  Shown(mistake.hint));
+          mistake.hint.empty()
+              ? ""
+              : fmt::format("; with a decimal point it is {}", Shown(mistake.hint));
       return fmt::format("\"{}\" is not {}, such as {}{}", shown, kind.article, kind.examples,
                          point);
     }
@@ -229,18 +230,15 @@ std::string ListText(const Mistake& mistake) {
           shown, Shown(mistake.other), usual, mistake.hint);
     }
     case MistakeKind::kTooMany:
-      return fmt::format("at most {} {}{}, not {}", mistake.most,
-                         mistake.most == 1 ? "frequency" : "frequencies",
-                         mistake.primitive
-                             ? fmt::format(" of a {}", hardware::Name(*mistake.primitive))
-                             : "",
-                         mistake.count);
+      return fmt::format(
+          "at most {} {}{}, not {}", mistake.most, mistake.most == 1 ? "frequency" : "frequencies",
+          mistake.primitive ? fmt::format(" of a {}", hardware::Name(*mistake.primitive)) : "",
+          mistake.count);
     case MistakeKind::kCountDiffers:
       return fmt::format("{} in the list, but there {}{}", mistake.count, Outputs(mistake.most),
-                         mistake.hint.empty()
-                             ? ""
-                             : fmt::format("; with a decimal point {} is {}", mistake.other,
-                                           mistake.hint));
+                         mistake.hint.empty() ? ""
+                                              : fmt::format("; with a decimal point {} is {}",
+                                                            mistake.other, mistake.hint));
     case MistakeKind::kNothingUsed:
       return "no output is used";
     case MistakeKind::kNotAName:
@@ -285,8 +283,7 @@ std::string FileText(const Mistake& mistake) {
                          DidYouMean(mistake.text, mistake.known));
     }
     case MistakeKind::kSyntax:
-      return fmt::format("no valid {}: {}",
-                         mistake.fault == SyntaxFault::kOther ? "TOML" : "JSON",
+      return fmt::format("no valid {}: {}", mistake.fault == SyntaxFault::kOther ? "TOML" : "JSON",
                          SyntaxText(mistake));
     case MistakeKind::kWrongType: {
       std::vector<std::string> wanted;

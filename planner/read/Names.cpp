@@ -13,8 +13,7 @@ namespace {
 
 constexpr std::array kRanks = {Rank::kJitter, Rank::kError, Rank::kMargin, Rank::kVco};
 // As messages have always listed them.
-constexpr std::array kListedBandwidths = {Bandwidth::kLow, Bandwidth::kHigh,
-                                          Bandwidth::kOptimized};
+constexpr std::array kListedBandwidths = {Bandwidth::kLow, Bandwidth::kHigh, Bandwidth::kOptimized};
 
 Mistake NotAName(std::string_view name, const Place& place, std::vector<std::string> known) {
   Mistake mistake;

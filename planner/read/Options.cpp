@@ -79,9 +79,12 @@ class OptionReader {
       return;
     }
     const std::pair<std::string_view, Entry<bool> Draft::*> switches[] = {
-        {"--any-order", &Draft::any_order},   {"--engine", &Draft::engine},
-        {"--low-bandwidth", &Draft::low_bandwidth}, {"--prefer-max-vco", &Draft::prefer_max_vco},
-        {"--int-div0", &Draft::int_div0},     {"--feedback", &Draft::feedback},
+        {"--any-order", &Draft::any_order},
+        {"--engine", &Draft::engine},
+        {"--low-bandwidth", &Draft::low_bandwidth},
+        {"--prefer-max-vco", &Draft::prefer_max_vco},
+        {"--int-div0", &Draft::int_div0},
+        {"--feedback", &Draft::feedback},
         {"--exact", &Draft::exact}};
     for (const auto& [switch_name, member] : switches) {
       if (switch_name == name) draft_.*member = {is_set, place_, value_};
@@ -311,8 +314,7 @@ Draft DraftOf(const Request& request) {
             &draft.phase_tolerance);
   SayDemand(request, &Output::duty_tolerance, request.duty_tolerance, usual.duty_tolerance,
             &draft.duty_tolerance);
-  SayDemand(request, &Output::max_jitter, request.max_jitter, usual.max_jitter,
-            &draft.max_jitter);
+  SayDemand(request, &Output::max_jitter, request.max_jitter, usual.max_jitter, &draft.max_jitter);
   return draft;
 }
 

@@ -17,8 +17,8 @@ namespace planner::read {
 
 // The options of a request.
 struct OptionFacts {
-  std::string_view name;         // "--in"
-  std::string_view placeholder;  // of its value: "F[,F2]"; empty: a switch
+  std::string_view name;          // "--in"
+  std::string_view placeholder;   // of its value: "F[,F2]"; empty: a switch
   std::optional<ValueKind> kind;  // of values
   bool is_list = false;
 };

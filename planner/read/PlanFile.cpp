@@ -67,7 +67,7 @@ class PlanReader {
 
   // An entry that is there and is not null, of a type.
   const Node* EntryOf(const Node& object, const std::string& path, std::string_view name,
-                    NodeType type) {
+                      NodeType type) {
     const Node* const node = object.Find(name);
     if (node == nullptr || node->type == NodeType::kNull) return nullptr;
     if (node->type == type) return node;
@@ -131,14 +131,13 @@ class PlanReader {
   void ReadKru(const Node& set, const std::string& path, const Node& outputs) {
     SettingsDraft& settings = plan_.settings;
     const bool is_sp = settings.primitive->value == Primitive::kKruSp;
-    if (const auto divide = InParts(set, path, is_sp ? "clkdv" : "clkfxdv", "divide_halves",
-                                    kHalves)) {
+    if (const auto divide =
+            InParts(set, path, is_sp ? "clkdv" : "clkfxdv", "divide_halves", kHalves)) {
       settings.dividers = {Values{divide->value}, divide->place, ""};
     }
     settings.phase_shift = Number(set, path, "phase_shift");
-    for (const auto& [name, entry] :
-         {std::pair{"feedback", &settings.feedback},
-          {"clkin_divide_by_2", &settings.divide_by_2}}) {
+    for (const auto& [name, entry] : {std::pair{"feedback", &settings.feedback},
+                                      {"clkin_divide_by_2", &settings.divide_by_2}}) {
       const Node* const node = EntryOf(set, path, name, NodeType::kBoolean);
       if (node != nullptr) *entry = {node->truth, At(*node, path + "." + name), ""};
     }
@@ -158,8 +157,8 @@ class PlanReader {
       const auto add = [&](Values* values, const std::optional<Said<Rational>>& said) {
         values->push_back(used && said ? std::optional(said->value) : std::nullopt);
       };
-      add(&dividers, used ? InParts(output, own, "divider", "divider_eighths", kEighths)
-                          : std::nullopt);
+      add(&dividers,
+          used ? InParts(output, own, "divider", "divider_eighths", kEighths) : std::nullopt);
       add(&steps, used ? Number(output, own, "phase_step") : std::nullopt);
       add(&high_times, used ? Number(output, own, "high_time") : std::nullopt);
     });
@@ -174,9 +173,9 @@ class PlanReader {
     for (std::size_t i = 0; i < outputs.items.size(); ++i) {
       const Node& output = outputs.items[i];
       const std::string path = path_ + ".outputs[" + std::to_string(i) + "]";
-      const Node* const used =
-          output.type == NodeType::kObject ? EntryOf(output, path, "used", NodeType::kBoolean)
-                                           : nullptr;
+      const Node* const used = output.type == NodeType::kObject
+                                   ? EntryOf(output, path, "used", NodeType::kBoolean)
+                                   : nullptr;
       act(output, path, output.type == NodeType::kObject && (used == nullptr || used->truth));
     }
   }

@@ -15,8 +15,8 @@ namespace {
 
 const Node& Need(const Node& object, std::string_view name, NodeType type) {
   const Node* node = object.Find(name);
-  if (!node || node->type != type) throw std::invalid_argument("an answer without " +
-                                                               std::string(name));
+  if (!node || node->type != type)
+    throw std::invalid_argument("an answer without " + std::string(name));
   return *node;
 }
 

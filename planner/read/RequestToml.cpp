@@ -83,8 +83,8 @@ class Builder {
     const std::string_view rest = line.substr(begin);
     std::string number(rest.substr(0, rest.find_first_of(" \t\r,]}#")));
     std::erase(number, '_');
-    const bool has_base = number.size() > 2 && number[0] == '0' && Lower(number[1]) >= 'a' &&
-                          Lower(number[1]) != 'e';
+    const bool has_base =
+        number.size() > 2 && number[0] == '0' && Lower(number[1]) >= 'a' && Lower(number[1]) != 'e';
     return has_base ? parsed : number;
   }
 

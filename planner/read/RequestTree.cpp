@@ -22,9 +22,12 @@ struct Switch {
   Entry<bool> Draft::*entry;
 };
 constexpr Switch kSwitches[] = {
-    {"exact", &Draft::exact},       {"feedback", &Draft::feedback},
-    {"prefer_max_vco", &Draft::prefer_max_vco}, {"int_div0", &Draft::int_div0},
-    {"engine", &Draft::engine},     {"any_order", &Draft::any_order},
+    {"exact", &Draft::exact},
+    {"feedback", &Draft::feedback},
+    {"prefer_max_vco", &Draft::prefer_max_vco},
+    {"int_div0", &Draft::int_div0},
+    {"engine", &Draft::engine},
+    {"any_order", &Draft::any_order},
 };
 struct DemandEntry {
   std::string_view name;
@@ -40,17 +43,14 @@ constexpr DemandEntry kDemands[] = {
 
 const std::vector<std::string>& KnownEntries() {
   static const std::vector<std::string> kNames = {
-      "device",    "primitive", "inputs",         "outputs",        "input_jitter",
-      "input_tolerance",
-      "bandwidth", "tolerance", "exact",          "feedback",       "prefer_max_vco",
-      "int_div0",  "rank",      "engine",         "any_order",      "phase_tolerance",
-      "duty_tolerance", "max_jitter"};
+      "device",    "primitive", "inputs",    "outputs",         "input_jitter",   "input_tolerance",
+      "bandwidth", "tolerance", "exact",     "feedback",        "prefer_max_vco", "int_div0",
+      "rank",      "engine",    "any_order", "phase_tolerance", "duty_tolerance", "max_jitter"};
   return kNames;
 }
 const std::vector<std::string>& KnownOutputEntries() {
   static const std::vector<std::string> kNames = {
-      "frequency", "phase", "duty", "tolerance", "phase_tolerance", "duty_tolerance",
-      "max_jitter"};
+      "frequency", "phase", "duty", "tolerance", "phase_tolerance", "duty_tolerance", "max_jitter"};
   return kNames;
 }
 
@@ -183,8 +183,8 @@ class TreeReader {
     std::vector<Rational> inputs;
     for (std::size_t i = 0; i < node.items.size(); ++i) {
       const Node& item = node.items[i];
-      const auto value = Value(item, ValueKind::kFrequency,
-                               At(item.position, "inputs", static_cast<int>(i)));
+      const auto value =
+          Value(item, ValueKind::kFrequency, At(item.position, "inputs", static_cast<int>(i)));
       if (value) inputs.push_back(*value);
     }
     // A value that is wrong is told already.

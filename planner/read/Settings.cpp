@@ -30,9 +30,8 @@ std::vector<std::string> PinNames(std::string_view text) {
   for (std::size_t begin = 0; begin <= text.size();) {
     const std::size_t comma = std::min(text.find(',', begin), text.size());
     std::string name(Trimmed(text.substr(begin, comma - begin)));
-    for (char& letter : name) letter = letter >= 'a' && letter <= 'z'
-                                           ? static_cast<char>(letter - ('a' - 'A'))
-                                           : letter;
+    for (char& letter : name)
+      letter = letter >= 'a' && letter <= 'z' ? static_cast<char>(letter - ('a' - 'A')) : letter;
     names.push_back(std::move(name));
     begin = comma + 1;
   }
@@ -62,8 +61,10 @@ SettingsDraft ReadSettingOptions(std::span<const Option> options, Mistakes* mist
       {"--d", &SettingsDraft::d},
       {"--phase-shift", &SettingsDraft::phase_shift}};
   const std::pair<std::string_view, Entry<Values> SettingsDraft::*> lists[] = {
-      {"--divide", &SettingsDraft::dividers},       {"--phase-steps", &SettingsDraft::phase_steps},
-      {"--set-phase", &SettingsDraft::phases},      {"--high-times", &SettingsDraft::high_times},
+      {"--divide", &SettingsDraft::dividers},
+      {"--phase-steps", &SettingsDraft::phase_steps},
+      {"--set-phase", &SettingsDraft::phases},
+      {"--high-times", &SettingsDraft::high_times},
       {"--set-duty", &SettingsDraft::duties}};
   for (const Option& option : options) {
     const OptionFacts* const facts = FindSettingOption(option.name);

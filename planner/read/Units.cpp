@@ -24,8 +24,14 @@ struct Unit {
   bool is_period = false;
 };
 
-constexpr std::array<Unit, 8> kFrequencyUnits = {{{"hz", -6}, {"khz", -3}, {"mhz", 0}, {"ghz", 3},
-    {"ps", 6, true}, {"ns", 3, true}, {"us", 0, true}, {"ms", -3, true}}};
+constexpr std::array<Unit, 8> kFrequencyUnits = {{{"hz", -6},
+                                                  {"khz", -3},
+                                                  {"mhz", 0},
+                                                  {"ghz", 3},
+                                                  {"ps", 6, true},
+                                                  {"ns", 3, true},
+                                                  {"us", 0, true},
+                                                  {"ms", -3, true}}};
 // A degree sign is two bytes in UTF-8, and one in the encodings before it.
 constexpr std::array<Unit, 5> kPhaseUnits = {
     {{"deg", 0}, {"degree", 0}, {"degrees", 0}, {"\xc2\xb0", 0}, {"\xb0", 0}}};
@@ -80,7 +86,7 @@ std::string_view MeantFor(std::string_view unit) {
 // What a number of a kind must be, and is not.
 NumberDemand DemandOn(const Rational& value, ValueKind kind) {
   static const Rational kMillisecond = 1'000'000'000;  // ps: beyond any clock
-  static const Rational kGapMillisecond = 1'000'000;  // ns
+  static const Rational kGapMillisecond = 1'000'000;   // ns
   static const Rational kTenPercent = 100'000;         // ppm: beyond any oscillator
   switch (kind) {
     case ValueKind::kFrequency:

@@ -8,9 +8,9 @@
 
 #include "planner/batch/Resumed.h"
 #include "planner/report/Csv.h"
+#include "planner/report/ErrorData.h"
 #include "planner/report/FindingText.h"
 #include "planner/report/Json.h"
-#include "planner/report/ErrorData.h"
 #include "planner/report/Numbers.h"
 #include "planner/report/PartText.h"
 #include "planner/report/SettingsText.h"
@@ -32,8 +32,7 @@ string Dumped(const ordered_json& data) {
 // A text as its user has written it; a number, too.
 string IdJson(const Outcome& outcome) {
   if (!outcome.id) return "null";
-  return outcome.id->type == read::NodeType::kNumber ? outcome.id->text
-                                                     : Dumped(outcome.id->text);
+  return outcome.id->type == read::NodeType::kNumber ? outcome.id->text : Dumped(outcome.id->text);
 }
 
 ordered_json Trouble(const char* kind, const string& message) {
@@ -99,10 +98,9 @@ string JsonLineOf(const Outcome& outcome, const BatchForm& form) {
 // --- For spreadsheets -------------------------------------------------------------------
 
 constexpr const char* kColumns[] = {
-    "line",      "id",        "status",      "number",    "device",    "primitive", "bandwidth",
-    "m",         "d",         "vco",         "output",    "divider",   "pin",       "requested",
-    "actual",    "error_ppm", "phase",       "phase_error", "duty",    "duty_error", "jitter",
-    "within",    "message"};
+    "line",  "id",          "status", "number",     "device", "primitive", "bandwidth", "m",
+    "d",     "vco",         "output", "divider",    "pin",    "requested", "actual",    "error_ppm",
+    "phase", "phase_error", "duty",   "duty_error", "jitter", "within",    "message"};
 
 // All that is wrong, in one cell.
 string MessageOf(const Outcome& outcome, const BatchForm& form) {

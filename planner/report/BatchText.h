@@ -15,8 +15,8 @@ namespace planner::report {
 
 struct BatchForm {
   bool csv = false;
-  bool all = false;           // all candidates, not only the best
-  std::size_t longest = 0;    // the bytes that a line can have at most, for who has more
+  bool all = false;         // all candidates, not only the best
+  std::size_t longest = 0;  // the bytes that a line can have at most, for who has more
 };
 
 // An outcome as one line of JSON, or as a row for each output; with the ends of the lines.

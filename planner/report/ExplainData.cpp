@@ -185,8 +185,9 @@ class Data {
 }  // namespace
 
 std::string ExplainJson(const Explanation& explanation, const Device& device) {
-  return Data(explanation, device).All().dump(2, ' ', false,
-                                              ordered_json::error_handler_t::replace) +
+  return Data(explanation, device)
+             .All()
+             .dump(2, ' ', false, ordered_json::error_handler_t::replace) +
          "\n";
 }
 

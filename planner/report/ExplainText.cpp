@@ -208,8 +208,8 @@ string Texts::Verdict() const {
     if (!calls_.best.empty()) text += "hint: the settings: " + calls_.best + "\n";
     return text;
   }
-  string text = Paragraph(style_, "Not possible as it stands with any primitive of " +
-                                      device_.part + ".");
+  string text =
+      Paragraph(style_, "Not possible as it stands with any primitive of " + device_.part + ".");
   const string nearest = NearestText();
   return nearest.empty() ? text : text + Prose(style_, "nearest: ", nearest);
 }
@@ -228,9 +228,8 @@ string Texts::Corrections(const OfPrimitive& one) const {
   std::vector<string> words;
   for (const std::vector<Demand>& correction : one.corrections) {
     const bool are_outputs =
-        std::all_of(correction.begin(), correction.end(), [](const Demand& demand) {
-          return demand.kind == DemandKind::kFrequency;
-        });
+        std::all_of(correction.begin(), correction.end(),
+                    [](const Demand& demand) { return demand.kind == DemandKind::kFrequency; });
     if (!are_outputs || correction.size() > 2) continue;
     std::vector<int> outputs;
     for (const Demand& demand : correction) outputs.push_back(demand.output);

@@ -13,8 +13,8 @@
 namespace planner::report {
 
 // "output 0 at 333 MHz", "the VCO from 600 to 1440 MHz", "M up to 64".
-std::string DemandWords(const explain::Demand& demand, const Request& request,
-                        const Device& device, Primitive primitive);
+std::string DemandWords(const explain::Demand& demand, const Request& request, const Device& device,
+                        Primitive primitive);
 
 // A change as what would be asked for: "output 1 at 112.5 degrees", "a VCO of 1450 MHz, 10 above
 // the range", "output 0 with a tolerance of 84 ppm". A number that has to be allowed is rounded up,

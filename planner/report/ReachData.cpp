@@ -19,9 +19,7 @@ using reach::Reach;
 using std::string;
 using Kind = ReachQuestion::Kind;
 
-Rational Ppm(const Rational& difference, const Rational& of) {
-  return difference / of * 1'000'000;
-}
+Rational Ppm(const Rational& difference, const Rational& of) { return difference / of * 1'000'000; }
 
 Rational Width(const Reach& reach, const reach::Gap& gap) {
   return reach.FrequencyOf(gap.above) - reach.FrequencyOf(gap.below);
@@ -174,20 +172,19 @@ std::vector<string> PointCells(const Reach& reach, const Request& request, const
   }
   const Settings settings = reach.SettingsOf(point);
   if (const auto* const loop = std::get_if<LoopSettings>(&settings)) {
-    cells.insert(cells.end(), {CsvNumber(VcoOf(request, *loop).ToDouble()),
-                               string(Name(loop->bandwidth)), Eighths(loop->m),
-                               std::to_string(loop->d), Eighths(loop->outputs.back().divider), "",
-                               "", "", ""});
+    cells.insert(cells.end(),
+                 {CsvNumber(VcoOf(request, *loop).ToDouble()), string(Name(loop->bandwidth)),
+                  Eighths(loop->m), std::to_string(loop->d), Eighths(loop->outputs.back().divider),
+                  "", "", "", ""});
   } else {
     const auto& kru = std::get<KruSettings>(settings);
     const bool is_sp = kru.primitive == Primitive::kKruSp;
     const auto count = [](int number) { return number == 0 ? "" : std::to_string(number); };
     const auto truth = [&](bool is_so) { return !is_sp ? "" : is_so ? "true" : "false"; };
-    cells.insert(cells.end(),
-                 {"", "", count(kru.m), count(kru.d), "",
-                  string(hardware::FactsOf(kru.pins.back()).name), truth(kru.feedback),
-                  truth(kru.divide_by_2),
-                  kru.divide_halves == 0 ? "" : CsvNumber(kru.divide_halves / 2.0)});
+    cells.insert(cells.end(), {"", "", count(kru.m), count(kru.d), "",
+                               string(hardware::FactsOf(kru.pins.back()).name), truth(kru.feedback),
+                               truth(kru.divide_by_2),
+                               kru.divide_halves == 0 ? "" : CsvNumber(kru.divide_halves / 2.0)});
   }
   const double jitter = reach.JitterOf(point);
   cells.push_back(std::isfinite(jitter) ? CsvNumber(jitter) : "");
@@ -197,9 +194,13 @@ std::vector<string> PointCells(const Reach& reach, const Request& request, const
 std::vector<string> GapCells(const Reach& reach, const reach::Gap& gap) {
   const Rational below = reach.FrequencyOf(gap.below);
   const Rational above = reach.FrequencyOf(gap.above);
-  return {string(Name(reach.primitive())),        CsvNumber(below.ToDouble()),
-          CsvNumber(above.ToDouble()),            CsvNumber((above - below).ToDouble()),
-          CsvNumber(Ppm(above - below, below).ToDouble()), Quotient(below), Quotient(above)};
+  return {string(Name(reach.primitive())),
+          CsvNumber(below.ToDouble()),
+          CsvNumber(above.ToDouble()),
+          CsvNumber((above - below).ToDouble()),
+          CsvNumber(Ppm(above - below, below).ToDouble()),
+          Quotient(below),
+          Quotient(above)};
 }
 
 std::vector<string> CountCells(const Reach& reach, const reach::Counted& counted) {

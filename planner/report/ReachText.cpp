@@ -147,8 +147,8 @@ class TextWriter final : public Writer {
     if (question_.kind == Kind::kNear) text += ", nearest to " + Decimal(question_.near) + " MHz";
     Put(text + "\n");
     if (question_.kind == Kind::kCount) {
-      Put("\n" + Row({{"primitive", -11}, {"frequencies", 12}, {"lowest MHz", 15},
-                      {"highest MHz", 15}}));
+      Put("\n" +
+          Row({{"primitive", -11}, {"frequencies", 12}, {"lowest MHz", 15}, {"highest MHz", 15}}));
     }
   }
   void BeginPrimitive(const Reach& reach) override {
@@ -313,9 +313,9 @@ Range ReachQuestion::Within(const reach::Reach& reach) const {
   return {from.value_or(Rational(0)), to ? *to : reach.range().highest};
 }
 
-std::int64_t WriteReach(const Request& request, const Device& device,
-                        const ReachQuestion& question, const std::vector<Primitive>& primitives,
-                        ReachForm form, const Sink& sink) {
+std::int64_t WriteReach(const Request& request, const Device& device, const ReachQuestion& question,
+                        const std::vector<Primitive>& primitives, ReachForm form,
+                        const Sink& sink) {
   const auto writer = WriterOf(request, device, question, form, sink);
   std::int64_t all = 0;
   writer->Begin();

@@ -30,8 +30,8 @@ struct ReachQuestion {
   int output = 0;
   std::optional<Rational> from;  // MHz
   std::optional<Rational> to;
-  Rational near = 0;             // kNear, MHz
-  std::int64_t most = 0;         // of a list, gaps or nearest ones; 0: all of a list
+  Rational near = 0;      // kNear, MHz
+  std::int64_t most = 0;  // of a list, gaps or nearest ones; 0: all of a list
 
   // The range of it all, as far as a primitive goes.
   Range Within(const reach::Reach& reach) const;
@@ -44,9 +44,8 @@ using Sink = std::function<bool(const std::string&)>;
 
 // Writes all that is asked for, of one primitive after the other. Answers how many frequencies,
 // gaps or nearest ones there were, shown or not; of a count the count.
-std::int64_t WriteReach(const Request& request, const Device& device,
-                        const ReachQuestion& question, const std::vector<Primitive>& primitives,
-                        ReachForm form, const Sink& sink);
+std::int64_t WriteReach(const Request& request, const Device& device, const ReachQuestion& question,
+                        const std::vector<Primitive>& primitives, ReachForm form, const Sink& sink);
 
 // The same as a Tcl dict.
 std::int64_t WriteReachTcl(const Request& request, const Device& device,

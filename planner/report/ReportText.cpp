@@ -92,8 +92,8 @@ string Report::Outputs() const {
   for (const Output& output : request_.outputs) {
     has_asked = has_asked || (output.used && output.asked);
   }
-  std::vector<Column> columns = {
-      IsLoop(answer_.primitive) ? Column{Align::kRight, "divider"} : Column{Align::kLeft, "pin"}};
+  std::vector<Column> columns = {IsLoop(answer_.primitive) ? Column{Align::kRight, "divider"}
+                                                           : Column{Align::kLeft, "pin"}};
   if (has_asked) columns.push_back({Align::kRight, "requested MHz"});
   columns.push_back({Align::kRight, "actual MHz"});
   if (has_asked) columns.push_back({Align::kRight, "error ppm"});
@@ -138,10 +138,10 @@ string Report::Limits(const Device& device) const {
   std::vector<Row> rows;
   const auto add = [&](const string& name, const Range& range, const Rational& value,
                        const Rational& margin, bool is_off) {
-    rows.push_back({{name, Short(range.lowest, kFrequencyDecimals),
-                     Short(value, kFrequencyDecimals), Short(range.highest, kFrequencyDecimals),
-                     Fixed(margin * 100, 2), is_off ? kOff : ""},
-                    is_off ? Role::kOff : Role::kNone});
+    rows.push_back(
+        {{name, Short(range.lowest, kFrequencyDecimals), Short(value, kFrequencyDecimals),
+          Short(range.highest, kFrequencyDecimals), Fixed(margin * 100, 2), is_off ? kOff : ""},
+         is_off ? Role::kOff : Role::kNone});
   };
   const auto is_off = [&](Quantity quantity) {
     return std::any_of(answer_.violations.begin(), answer_.violations.end(),

@@ -23,8 +23,8 @@ inline constexpr std::uint32_t kNoTurn = 0b0001;
 // Those of an output on a source; that of a KRU_CLKGEN with output 0 is always CLKFX.
 inline std::uint32_t QuartersOn(PinSource source, bool is_sp, int output) {
   if (source == PinSource::kLine) return kAllQuarters;
-  const bool has_half =
-      source == PinSource::kDoubler || (source == PinSource::kSynthesiser && (is_sp || output != 0));
+  const bool has_half = source == PinSource::kDoubler ||
+                        (source == PinSource::kSynthesiser && (is_sp || output != 0));
   return has_half ? kHalfTurns : kNoTurn;
 }
 // Those of an output, among those of all.

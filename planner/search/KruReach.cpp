@@ -130,8 +130,7 @@ bool KruReach::IsNearOn(PinSource source, std::size_t place, const KruBase& base
   if (all_met_ && !output.Frequency().IsMet(ratio.a, ratio.b)) return false;
   if (!IsBelow(task_.FrequencyError(place, ratio), bound)) return false;
   if (!IsDutyNearOn(source, place, base.divide_halves, bound)) return false;
-  if (all_met_ &&
-      !phases_.CanMeet(place, QuartersOn(source, task_.IsSp(), output.Index()))) {
+  if (all_met_ && !phases_.CanMeet(place, QuartersOn(source, task_.IsSp(), output.Index()))) {
     return false;
   }
   return !output.Jitter().IsAsked() || IsJitterNearOn(source, place, base, bound);
@@ -242,8 +241,8 @@ KruReach::Step KruReach::StepWith(int m, const std::optional<KruError>& bound,
       continue;
     }
     if (!has_line) break;
-    step.on_divide[k] = NearOn(PinSource::kDivider, base, bound,
-                               wider != nullptr ? wider->on_divide[k] : all_);
+    step.on_divide[k] =
+        NearOn(PinSource::kDivider, base, bound, wider != nullptr ? wider->on_divide[k] : all_);
     on_any |= step.on_divide[k];
     const Outputs served = step.on_line | step.on_divide[k];
     const auto end = known.begin() + static_cast<std::ptrdiff_t>(count);

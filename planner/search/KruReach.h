@@ -1,9 +1,9 @@
 // The M and D of a KRU with which all outputs can be near enough.
 //
 // Each output must have a source that comes near enough to its frequency: those of the delay line
-// are what they are, those of the synthesiser leave a span of M / D. Where each output has one, with
-// the same divide, is a span of M / D, too. How near is near enough falls while M rises: what has
-// been found with a smaller M and D has less jitter.
+// are what they are, those of the synthesiser leave a span of M / D. Where each output has one,
+// with the same divide, is a span of M / D, too. How near is near enough falls while M rises: what
+// has been found with a smaller M and D has less jitter.
 //
 // Tested by search_test.cpp.
 #ifndef VORKEL_PLANNER_SEARCH_KRUREACH_H_
@@ -58,8 +58,8 @@ class KruReach {
   // Begins with a delay line, and no bounds: all errors are near enough.
   void Start(const KruBase& line);
 
-  // From an M on, only what is below an error is near enough; the D of what is asked for from now on
-  // are not below those of what has the error.
+  // From an M on, only what is below an error is near enough; the D of what is asked for from now
+  // on are not below those of what has the error.
   void Bind(int m, const KruError& error);
 
   // Counts what Bind has changed.
@@ -120,13 +120,13 @@ class KruReach {
   struct Step {
     int m;
     std::optional<KruError> bound;
-    Outputs line = 0;     // those that the delay line serves near enough,
+    Outputs line = 0;  // those that the delay line serves near enough,
     Outputs doubler = 0;
-    Outputs on_line = 0;  // either of them,
+    Outputs on_line = 0;                            // either of them,
     std::array<Outputs, kMostDivides> on_divide{};  // and a divide of CLKDV
-    int first_d = 0;         // none below has an M
-    Spans spans;             // of M / D
-    Outputs on_jitter = 0;   // those that need the synthesiser and ask for a jitter
+    int first_d = 0;                                // none below has an M
+    Spans spans;                                    // of M / D
+    Outputs on_jitter = 0;  // those that need the synthesiser and ask for a jitter
   };
   // The spans of a few outputs that two sources have each.
   class FewSpans {

@@ -53,8 +53,8 @@ class Walk {
   std::int64_t Pairs() const { return pairs_; }
 
  private:
-  // Where the jitter of a ratio is known, it is so with all M and D that make it. With output 0 of a
-  // KRU_CLKGEN unused CLKFX can be out of range.
+  // Where the jitter of a ratio is known, it is so with all M and D that make it. With output 0 of
+  // a KRU_CLKGEN unused CLKFX can be out of range.
   bool IsJitterAllKnown() const {
     const bool on_clkfx = task_.IsSp() || task_.Outputs().front().Index() == 0;
     return !task_.Model().IsKnown() || (on_clkfx && task_.IsJitterAllKnown());
@@ -109,7 +109,8 @@ class Walk {
     });
   }
 
-  // Whether CLKFX leaves settings a chance to have the largest margin, where an output must be on it.
+  // Whether CLKFX leaves settings a chance to have the largest margin, where an output must be on
+  // it.
   bool CanBeWidest(const KruBase& pair) const {
     return task_.IsSp() || task_.Outputs().front().Index() != 0 ||
            !solver_.IsTooNarrow(solver_.WidthOf(PinSource::kSynthesiser, pair, 0), 0);
@@ -120,7 +121,8 @@ class Walk {
     Bind(base);
   }
 
-  // Whether settings can have a larger margin than the best so far, or the same with no more jitter.
+  // Whether settings can have a larger margin than the best so far, or the same with no more
+  // jitter.
   bool CanBeWidest(const KruBase& base, const KruReach::Served& served) const {
     constexpr std::size_t kSources = 4;
     const double jitter = task_.JitterOf(base, Pin::kClkfx, false);

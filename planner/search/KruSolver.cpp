@@ -29,8 +29,8 @@ std::strong_ordering CompareSettings(const KruEntry& a, const KruEntry& b) {
   const std::strong_ordering order = CompareBases(a.base, b.base);
   if (order != kEqual) return order;
   // libc++ 14 has only a weak order of arrays.
-  if (a.pins != b.pins) return a.pins < b.pins ? std::strong_ordering::less
-                                               : std::strong_ordering::greater;
+  if (a.pins != b.pins)
+    return a.pins < b.pins ? std::strong_ordering::less : std::strong_ordering::greater;
   return a.shift <=> b.shift;
 }
 
@@ -131,8 +131,7 @@ void KruSolver::AddPin(const KruBase& base, const KruPin& pin, std::size_t place
   choice.jitter = jitter;
   choice.error = task_.FrequencyError(place, ratio);
   if (output.AsksForDuty()) {
-    choice.error =
-        task_.LargerOf(choice.error, task_.DutyError(place, source, base.divide_halves));
+    choice.error = task_.LargerOf(choice.error, task_.DutyError(place, source, base.divide_halves));
   }
   if (output.Jitter().IsAsked()) {
     choice.error = task_.LargerOf(choice.error, task_.JitterError(place, jitter));
@@ -158,8 +157,7 @@ bool KruSolver::IsAllowed(std::size_t place, const Choice& choice, double most_j
                           int shift) const {
   if (choice.jitter > most_jitter) return false;
   const PhaseTable* const phases = task_.Outputs()[place].Phases();
-  return !all_met_ || phases == nullptr ||
-         phases->Met(Index(choice.pin->quarter))[Index(shift)];
+  return !all_met_ || phases == nullptr || phases->Met(Index(choice.pin->quarter))[Index(shift)];
 }
 
 KruError KruSolver::ErrorOf(std::size_t place, const Choice& choice, int shift) const {
@@ -298,8 +296,7 @@ void KruSolver::LeaveNearest(double most_jitter, const KruError& error, int shif
 KruSolver::Width KruSolver::WidthOf(PinSource source, const KruBase& base,
                                     std::size_t place) const {
   Width widest{{-HUGE_VAL, 0}, RatioOf(source, base), nullptr};
-  const double quotient =
-      static_cast<double>(widest.ratio.a) / static_cast<double>(widest.ratio.b);
+  const double quotient = static_cast<double>(widest.ratio.a) / static_cast<double>(widest.ratio.b);
   const auto look = [&](const RatioRange& range) {
     const Near margin = range.Margin(quotient);
     if (margin.value <= widest.margin.value) return;

@@ -132,7 +132,7 @@ class KruSolver {
   search::TradeOffs<KruEntry> front_;
   std::optional<KruEntry> widest_;  // the best by its margin
   std::int64_t solved_ = 0;
-  std::optional<KruBase> line_;   // of which the tables are
+  std::optional<KruBase> line_;  // of which the tables are
   std::vector<Table> tables_;
   const Table* table_ = nullptr;  // the one that is solved
   std::array<Left, kMostKruOutputs> left_;

@@ -67,9 +67,8 @@ bool KruOutput::IsDutyMet(PinSource source, int divide_halves) const {
 }
 
 Rational KruOutput::ExactDutyError(PinSource source, int divide_halves) const {
-  const Rational percent = source == PinSource::kDivider
-                               ? hardware::PinDuty(Pin::kClkdv, divide_halves)
-                               : Rational(50);
+  const Rational percent =
+      source == PinSource::kDivider ? hardware::PinDuty(Pin::kClkdv, divide_halves) : Rational(50);
   return (percent - *asked_->duty).Absolute() /
          answer::DutyUnit(request_->DutyToleranceOf(*asked_));
 }
@@ -162,8 +161,7 @@ Rational KruTask::Exact(const KruError& error) const {
       return output.Frequency().Ppm(error.a, error.b) /
              answer::FrequencyUnit(request_.ToleranceOf(asked));
     case KruError::Demand::kPhase: {
-      const Rational made =
-          Rational(90 * error.a) + Rational(360 * error.b, hardware::kShiftSteps);
+      const Rational made = Rational(90 * error.a) + Rational(360 * error.b, hardware::kShiftSteps);
       return hardware::TurnedToHalf(made - *asked.phase).Absolute() /
              answer::PhaseUnit(request_.PhaseToleranceOf(asked));
     }
@@ -189,9 +187,8 @@ std::strong_ordering KruTask::Compare(const KruError& a, const KruError& b) cons
   const bool are_zero = a.near.value + a.near.slack + b.near.value + b.near.slack == 0;
   if (are_zero || IsSame(a, b)) return std::strong_ordering::equal;
   if (a.demand == KruError::Demand::kFrequency && b.demand == KruError::Demand::kFrequency) {
-    const auto order =
-        FrequencyDemand::Compare(outputs_[a.output].Frequency(), a.a, a.b,
-                                 outputs_[b.output].Frequency(), b.a, b.b);
+    const auto order = FrequencyDemand::Compare(outputs_[a.output].Frequency(), a.a, a.b,
+                                                outputs_[b.output].Frequency(), b.a, b.b);
     if (order) return *order;
   }
   return Exact(a) <=> Exact(b);

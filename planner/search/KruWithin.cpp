@@ -51,8 +51,7 @@ class KruWithin::Question {
     for (std::size_t i = 0; i < task.Outputs().size(); ++i) {
       all_ |= Of(i);
       const Relaxed::OfOutput& own = OwnOf(i);
-      asks_for_jitter_ =
-          asks_for_jitter_ || (!own.jitter && task.Outputs()[i].Jitter().IsAsked());
+      asks_for_jitter_ = asks_for_jitter_ || (!own.jitter && task.Outputs()[i].Jitter().IsAsked());
       asks_for_phase_ = asks_for_phase_ || PhasesOf(i) != nullptr;
     }
     if (relaxed.dividers) {
@@ -216,7 +215,8 @@ class KruWithin::Question {
     return common <= (first_m_ + lowest - 1) / lowest;
   }
 
-  // --- KRU_SP -------------------------------------------------------------------------------------
+  // --- KRU_SP
+  // -------------------------------------------------------------------------------------
 
   // Only the jitter tells a PHASE_SHIFT of 0 from others.
   std::optional<Settings> AnswerSp(const KruBase& line) {
@@ -319,7 +319,8 @@ class KruWithin::Question {
     });
   }
 
-  // --- KRU_CLKGEN ---------------------------------------------------------------------------------
+  // --- KRU_CLKGEN
+  // ---------------------------------------------------------------------------------
 
   std::optional<Settings> AnswerClkgen() {
     shifts_[0] = true;
@@ -388,7 +389,8 @@ class KruWithin::Question {
     return false;
   }
 
-  // --- Pins ----------------------------------------------------------------------------------------
+  // --- Pins
+  // ----------------------------------------------------------------------------------------
 
   // The first PHASE_SHIFT with which each output has a pin, and the first such pins.
   std::optional<Settings> WithPins(const KruBase& base) const {
@@ -438,7 +440,7 @@ class KruWithin::Question {
   bool asks_for_phase_ = false;
   std::vector<int> divides_;
   bool doubled_ = false;
-  Shifts shifts_;  // those that are tried
+  Shifts shifts_;         // those that are tried
   bool shifted_ = false;  // they are above 0
 };
 

@@ -2,8 +2,8 @@
 //
 // What counts of an M and a D is which outputs the synthesiser can then serve; and likewise of a
 // divide. There are few such sets: the demands of the outputs leave spans of M / D, and where the
-// same spans overlap one quotient is as good as another, the one with the smallest D. So the sets of
-// M and D are tried with those of the divides, and with all PHASE_SHIFTs at once.
+// same spans overlap one quotient is as good as another, the one with the smallest D. So the sets
+// of M and D are tried with those of the divides, and with all PHASE_SHIFTs at once.
 //
 // Tested by within_test.cpp.
 #ifndef VORKEL_PLANNER_SEARCH_KRUWITHIN_H_

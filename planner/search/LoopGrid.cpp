@@ -79,8 +79,8 @@ LoopGrid LoopGridOf(const Inputs& inputs, const MSet& m, int largest_d,
   if (pfd) {
     // input / D <= highest: D >= input / highest.
     if (pfd->highest <= 0) return grid;
-    first_d = std::max(first_d, static_cast<int>(Factor(inputs.highest / pfd->highest)
-                                                     .Ceiling(1, largest_d + 1)));
+    first_d = std::max(
+        first_d, static_cast<int>(Factor(inputs.highest / pfd->highest).Ceiling(1, largest_d + 1)));
     if (pfd->lowest > 0) {
       last_d = static_cast<int>(Factor(inputs.lowest / pfd->lowest).Floor(1, largest_d));
     }

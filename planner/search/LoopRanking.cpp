@@ -76,10 +76,10 @@ bool LoopRanking::Choose(Kind kind, int m, int d, bool all_met, LoopPoint* point
     point->error = LargerOf(point->error, choice.error);
     point->is_met = point->is_met && choice.is_met;
     if (by_margin_) {
-      const LoopMargin margin = {choice.margin,
-                                 outputs_[i].Index() == 1 ? LoopMargin::Of::kOutput1
-                                                          : LoopMargin::Of::kOutput,
-                                 m, std::int64_t{d} * choice.divider};
+      const LoopMargin margin = {
+          choice.margin,
+          outputs_[i].Index() == 1 ? LoopMargin::Of::kOutput1 : LoopMargin::Of::kOutput, m,
+          std::int64_t{d} * choice.divider};
       // No bandwidth counts here.
       if (IsBelow(margin, point->margin, Bandwidth::kOptimized)) point->margin = margin;
     }
@@ -99,9 +99,9 @@ LoopEntry LoopRanking::EntryOf(const LoopPoint& point, Bandwidth bandwidth) cons
                                          .jitter = entry.jitter});
   }
   if (by_margin_) {
-    entry.margin = {MarginOf(lowest_input_ / point.d, highest_input_ / point.d,
-                             limits_.PfdOf(bandwidth)),
-                    LoopMargin::Of::kPfd, 1, point.d};
+    entry.margin = {
+        MarginOf(lowest_input_ / point.d, highest_input_ / point.d, limits_.PfdOf(bandwidth)),
+        LoopMargin::Of::kPfd, 1, point.d};
     if (IsBelow(point.margin, entry.margin, bandwidth)) entry.margin = point.margin;
   }
   return entry;
@@ -112,9 +112,8 @@ std::strong_ordering LoopRanking::Compare(const LoopError& a, const LoopError& b
   if (IsSurelyBelow(b.near, a.near)) return std::strong_ordering::greater;
   if (a.near.value + a.near.slack + b.near.value + b.near.slack == 0) return kEqual;
   if (a.demand == LoopError::Demand::kFrequency && b.demand == LoopError::Demand::kFrequency) {
-    const auto order =
-        FrequencyDemand::Compare(outputs_[a.place].Frequency(), a.a, a.b,
-                                 outputs_[b.place].Frequency(), b.a, b.b);
+    const auto order = FrequencyDemand::Compare(outputs_[a.place].Frequency(), a.a, a.b,
+                                                outputs_[b.place].Frequency(), b.a, b.b);
     if (order) return *order;
   }
   const bool is_same = a.demand == b.demand && a.place == b.place && a.a == b.a && a.b == b.b &&
@@ -145,7 +144,9 @@ std::strong_ordering LoopRanking::CompareVcos(const LoopEntry& a, const LoopEntr
 bool LoopRanking::IsBefore(const LoopEntry& a, const LoopEntry& b, bool are_met) const {
   std::strong_ordering order = kEqual;
   const auto by_error = [&] { return order = Compare(a.error, b.error), order != kEqual; };
-  const auto by_jitter = [&] { return order = CompareJitters(a.jitter, b.jitter), order != kEqual; };
+  const auto by_jitter = [&] {
+    return order = CompareJitters(a.jitter, b.jitter), order != kEqual;
+  };
   const auto by_margin = [&] { return order = CompareMargins(a, b), order != kEqual; };
   const auto by_vco = [&] { return order = CompareVcos(a, b), order != kEqual; };
   bool is_decided = false;

@@ -36,10 +36,10 @@ struct LoopPoint {
   int m = 0;  // in eighths
   int d = 0;
   Kind kind = Kind::kMoving;
-  double ratio = 0;  // m / d, rounded: two are equal only when the quotients are
-  LoopError error;   // the worst of all outputs, but for the jitter
-  bool is_met = false;  // all demands but for the jitter
-  LoopMargin margin;    // of VCO and outputs, where the request ranks by it
+  double ratio = 0;                 // m / d, rounded: two are equal only when the quotients are
+  LoopError error;                  // the worst of all outputs, but for the jitter
+  bool is_met = false;              // all demands but for the jitter
+  LoopMargin margin;                // of VCO and outputs, where the request ranks by it
   std::array<short, 7> dividers{};  // in eighths, of the used outputs in their order
 };
 

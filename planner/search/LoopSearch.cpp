@@ -129,12 +129,13 @@ class LoopSearch {
           .first = output.UpTo(kind, 1),
           .last = output.DownTo(kind, output.Largest()),
           .step = output.StepOf(kind)};
-      Meet(spans, span,
-           [&](int divider) {
-             return divider > 0 && output.DownTo(kind, divider) == divider &&
-                    output.ShapeOf(kind, divider).is_met;
-           },
-           &left);
+      Meet(
+          spans, span,
+          [&](int divider) {
+            return divider > 0 && output.DownTo(kind, divider) == divider &&
+                   output.ShapeOf(kind, divider).is_met;
+          },
+          &left);
       std::swap(spans, left);
     }
     return spans;
@@ -199,7 +200,8 @@ class LoopSearch {
       if (jitter_.IsKnown() ? order >= 0 : order > 0) return;
     }
     bounds->Add(key, point.error, compare);
-    for (Best* best : bests) Take(ranking_.EntryOf(point, best->bandwidth), false, with_front, best);
+    for (Best* best : bests)
+      Take(ranking_.EntryOf(point, best->bandwidth), false, with_front, best);
   }
 
   // By which factor the M / D^2 of one must be larger than that of another so that its jitter is

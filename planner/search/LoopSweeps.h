@@ -47,8 +47,7 @@ bool ForEachM(const Row& row, int step, MKind kind, const Span& span, const Take
     if (kind == MKind::kFraction && m % kOne == 0) continue;
     if (!take(m)) return false;
   }
-  if (row.one && kind != MKind::kFraction && low <= kOne &&
-      span.highest * row.d >= kOne) {
+  if (row.one && kind != MKind::kFraction && low <= kOne && span.highest * row.d >= kOne) {
     return take(kOne);
   }
   return true;

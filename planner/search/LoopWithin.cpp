@@ -29,11 +29,10 @@ LoopWithin::LoopWithin(const Request& request, const Device& device, Primitive p
     const Output& asked = request_.outputs[i];
     if (!asked.used) continue;
     const Range& range = limits_.OutputOf(static_cast<int>(i));
-    outputs_.push_back({i, FrequencyDemand(request_, asked), RatioRange(inputs_, range),
-                        RatioRange(first_input_, range),
-                        OutputShape(request_, asked, limits_.max_count),
-                        OutputShape(request_, asked, kRelaxedDivider),
-                        request_.MaxJitterOf(asked)});
+    outputs_.push_back(
+        {i, FrequencyDemand(request_, asked), RatioRange(inputs_, range),
+         RatioRange(first_input_, range), OutputShape(request_, asked, limits_.max_count),
+         OutputShape(request_, asked, kRelaxedDivider), request_.MaxJitterOf(asked)});
   }
   // Those with the fewest dividers come first.
   std::sort(outputs_.begin(), outputs_.end(), [](const Asked& a, const Asked& b) {
@@ -55,8 +54,8 @@ class LoopWithin::Question {
     for (const Asked& output : within_.outputs_) {
       const Relaxed::OfOutput& own = relaxed_.outputs[output.index];
       if (!own.jitter && output.max_jitter) jitter_.Add(*output.max_jitter);
-      const bool has_shape = (output.shape.AsksForPhase() && !own.phase) ||
-                             (output.shape.AsksForDuty() && !own.duty);
+      const bool has_shape =
+          (output.shape.AsksForPhase() && !own.phase) || (output.shape.AsksForDuty() && !own.duty);
       asks_for_shape_ = asks_for_shape_ || has_shape;
     }
   }
@@ -86,13 +85,13 @@ class LoopWithin::Question {
   std::optional<Settings> AnswerWithin(const Range& pfd) {
     MSet m = MSetOf(within_.primitive_, fractions_);
     if (relaxed_.m) m = {kEighths, kRelaxedM * kEighths, fractions_ ? 1 : kEighths, false};
-    const LoopGrid grid = LoopGridOf(
-        inputs_, m, relaxed_.d ? kRelaxedD : hardware::kLargestD,
-        relaxed_.vco ? std::nullopt : std::optional(within_.limits_.vco),
-        relaxed_.pfd ? std::nullopt : std::optional(pfd));
+    const LoopGrid grid =
+        LoopGridOf(inputs_, m, relaxed_.d ? kRelaxedD : hardware::kLargestD,
+                   relaxed_.vco ? std::nullopt : std::optional(within_.limits_.vco),
+                   relaxed_.pfd ? std::nullopt : std::optional(pfd));
     if (grid.rows.empty() || grid.lowest > grid.highest) return std::nullopt;
-    // Beside a fraction nothing moves, unless that does not count. Without a demand on phase or duty
-    // cycle whole numbers are but some of the eighths.
+    // Beside a fraction nothing moves, unless that does not count. Without a demand on phase or
+    // duty cycle whole numbers are but some of the eighths.
     if (!fractions_) return AnswerWith(grid, MKind::kWhole, true, false);
     if (relaxed_.nothing_moves || !asks_for_shape_) {
       return AnswerWith(grid, MKind::kAll, true, true);
@@ -237,7 +236,8 @@ class LoopWithin::Question {
     return static_cast<double>(hopeless) / kSquare;
   }
 
-  // What came of an M and a D. With a jitter that is surely too large, a smaller M has a larger one.
+  // What came of an M and a D. With a jitter that is surely too large, a smaller M has a larger
+  // one.
   enum class Outcome { kFound, kNot, kNorSmallerM };
 
   Outcome Try(int m, int d, Settings* settings) const {

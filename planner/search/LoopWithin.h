@@ -1,7 +1,7 @@
 // Whether a PLL or a TSYN has settings that meet some demands and keep some limits.
 //
-// The demands leave short spans of the ratio M / D (VcoSpans.h). Many of them have no quotient of an
-// M and a D at all, which is quickly known (Fractions.h); what is in the others is tried.
+// The demands leave short spans of the ratio M / D (VcoSpans.h). Many of them have no quotient of
+// an M and a D at all, which is quickly known (Fractions.h); what is in the others is tried.
 //
 // Tested by within_test.cpp.
 #ifndef VORKEL_PLANNER_SEARCH_LOOPWITHIN_H_

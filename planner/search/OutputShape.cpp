@@ -80,12 +80,11 @@ ShapeError OutputShape::Duty(int divider) const {
   if (!duty_.is_asked) return {};
   const int halves = HighTime(divider);
   if (duty_.per == 0) {
-    return Judge(duty_,
-                 (Rational(std::int64_t{kPercentPerHalf} * halves, divider) - duty_.exact)
-                     .Absolute());
+    return Judge(
+        duty_,
+        (Rational(std::int64_t{kPercentPerHalf} * halves, divider) - duty_.exact).Absolute());
   }
-  const Wide difference =
-      Wide{kPercentPerHalf} * halves * duty_.per - Wide{duty_.asked} * divider;
+  const Wide difference = Wide{kPercentPerHalf} * halves * duty_.per - Wide{duty_.asked} * divider;
   const Wide rest = difference < 0 ? -difference : difference;
   const Wide whole = Wide{duty_.per} * divider;
   return {Rounded(static_cast<double>(rest) / static_cast<double>(whole) * duty_.per_unit),

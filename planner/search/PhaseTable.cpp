@@ -37,8 +37,7 @@ PhaseTable::PhaseTable(const Request& request, const Output& asked, std::size_t 
 void PhaseTable::Fill(const Request& request, const Output& asked, std::size_t shifts) {
   const auto phase = *asked.phase->InWords();
   const auto tolerance = *request.PhaseToleranceOf(asked).InWords();
-  const double per_unit =
-      (1 / answer::PhaseUnit(request.PhaseToleranceOf(asked))).ToDouble();
+  const double per_unit = (1 / answer::PhaseUnit(request.PhaseToleranceOf(asked))).ToDouble();
   const std::int64_t degree = hardware::kShiftSteps * phase.denominator;
   const std::int64_t turn = kTurn * degree;
   const std::int64_t step = kTurn * phase.denominator;
@@ -64,9 +63,9 @@ void PhaseTable::FillSlowly(const Request& request, const Output& asked, std::si
   const Rational unit = answer::PhaseUnit(tolerance);
   for (std::size_t quarter = 0; quarter < kQuarters; ++quarter) {
     for (std::size_t shift = 0; shift < shifts; ++shift) {
-      const Rational made = Rational(static_cast<int>(quarter) * kQuarter) +
-                            Rational(static_cast<std::int64_t>(shift) * kTurn,
-                                     hardware::kShiftSteps);
+      const Rational made =
+          Rational(static_cast<int>(quarter) * kQuarter) +
+          Rational(static_cast<std::int64_t>(shift) * kTurn, hardware::kShiftSteps);
       const Rational error = hardware::TurnedToHalf(made - *asked.phase).Absolute();
       errors_[quarter][shift] = (error / unit).ToDouble();
       met_[quarter][shift] = error <= tolerance;

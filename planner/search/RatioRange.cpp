@@ -8,10 +8,7 @@
 namespace planner::search {
 
 RatioRange::RatioRange(const Inputs& inputs, const Range& range)
-    : inputs_(inputs),
-      range_(range),
-      has_lowest_(range.lowest > 0),
-      is_empty_(range.highest <= 0) {
+    : inputs_(inputs), range_(range), has_lowest_(range.lowest > 0), is_empty_(range.highest <= 0) {
   if (has_lowest_) lowest_ = Factor(inputs.lowest / range.lowest);
   if (!is_empty_) highest_ = Factor(inputs.highest / range.highest);
 }

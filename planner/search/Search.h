@@ -44,9 +44,9 @@ struct Candidate {
   std::optional<double> max_jitter;  // ps, peak to peak; nothing when unknown
 };
 
-// What there was to look at. A pair is an M and a D that keep VCO and PFD in range, with a bandwidth;
-// of a KRU an M and a D of the synthesiser, or neither, with CLKIN_DIVIDE_BY_2 or not and with
-// feedback or not.
+// What there was to look at. A pair is an M and a D that keep VCO and PFD in range, with a
+// bandwidth; of a KRU an M and a D of the synthesiser, or neither, with CLKIN_DIVIDE_BY_2 or not
+// and with feedback or not.
 struct Counts {
   std::int64_t pairs = 0;
   // How often dividers or pins were chosen; of the others a bound tells that they can neither be

@@ -20,10 +20,10 @@ struct SpanCase {
   bool phase;
   bool duty;
   bool range;
-  bool dividers;       // are beyond the hardware's
-  bool second_input;   // does not count
-  bool moves;          // phase and duty cycle
-  bool in_eighths;     // are the dividers
+  bool dividers;      // are beyond the hardware's
+  bool second_input;  // does not count
+  bool moves;         // phase and duty cycle
+  bool in_eighths;    // are the dividers
 };
 
 // May be asked from several threads at once.

@@ -18,14 +18,14 @@ namespace planner::search {
 template <typename Entry>
 class TradeOffs {
  public:
-  // `compare_errors(a, b)` is the order of two errors; `is_before(a, b)` tells which of two that are
-  // equal in both is kept.
+  // `compare_errors(a, b)` is the order of two errors; `is_before(a, b)` tells which of two that
+  // are equal in both is kept.
   template <typename CompareErrors, typename IsBefore>
   void Take(const Entry& entry, const CompareErrors& compare_errors, const IsBefore& is_before) {
     // The first that has no more jitter has, of those, the smallest error.
-    auto place = std::lower_bound(
-        entries_.begin(), entries_.end(), entry.jitter,
-        [](const Entry& one, double jitter) { return one.jitter > jitter; });
+    auto place =
+        std::lower_bound(entries_.begin(), entries_.end(), entry.jitter,
+                         [](const Entry& one, double jitter) { return one.jitter > jitter; });
     if (place != entries_.end()) {
       const std::strong_ordering order = compare_errors(*place, entry);
       if (order < 0) return;

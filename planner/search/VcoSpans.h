@@ -4,8 +4,8 @@
 // VCO for each divider. What is left for several outputs is where their spans meet: a handful of
 // short spans, among which to look for M and D, in place of all M and D of the grid.
 //
-// Spans are rounded outwards: all ratios that meet the demands are in them, and of those close to an
-// end some that do not.
+// Spans are rounded outwards: all ratios that meet the demands are in them, and of those close to
+// an end some that do not.
 //
 // Tested by vco_spans_test.cpp.
 #ifndef VORKEL_PLANNER_SEARCH_VCOSPANS_H_

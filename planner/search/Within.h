@@ -3,8 +3,8 @@
 //
 // This is asked thousands of times for one request, when an explanation looks for the smallest sets
 // of demands and limits that do not go together. So a question that has a "yes" ends with the first
-// settings that are found, and a "no" comes from intervals: the demands of an output leave, for each
-// of its dividers, an interval of the VCO; where those of all outputs meet, M / D has to be.
+// settings that are found, and a "no" comes from intervals: the demands of an output leave, for
+// each of its dividers, an interval of the VCO; where those of all outputs meet, M / D has to be.
 //
 // Tested by within_test.cpp.
 #ifndef VORKEL_PLANNER_SEARCH_WITHIN_H_

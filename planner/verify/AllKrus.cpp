@@ -110,8 +110,8 @@ class Krus {
     set_.pins.assign(request.outputs.size(), Pin::kNone);
     for (const Output& output : request.outputs) {
       has_phase_ = has_phase_ || (output.used && output.phase);
-      rough_.push_back({output.frequency.ToDouble(),
-                        output.tolerance.value_or(request.tolerance).ToDouble()});
+      rough_.push_back(
+          {output.frequency.ToDouble(), output.tolerance.value_or(request.tolerance).ToDouble()});
     }
   }
 
@@ -495,7 +495,7 @@ class Krus {
     double frequency;
     double tolerance;
   };
-  std::vector<RoughDemand> rough_;  // by output
+  std::vector<RoughDemand> rough_;    // by output
   std::vector<RoughPin> rough_pins_;  // of what is tried, output by output
   // By output, pin and PHASE_SHIFT.
   std::array<std::array<std::vector<Bound::Figures>, hardware::kPins.size() + 1>, 7> rough_phases_;

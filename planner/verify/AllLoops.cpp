@@ -80,8 +80,8 @@ class Loops {
   }
 
   void TryDividers(int m, int d) {
-    const bool is_any = IsPfdInside(d, Bandwidth::kOptimized) ||
-                        IsPfdInside(d, Bandwidth::kLow) || IsPfdInside(d, Bandwidth::kHigh);
+    const bool is_any = IsPfdInside(d, Bandwidth::kOptimized) || IsPfdInside(d, Bandwidth::kLow) ||
+                        IsPfdInside(d, Bandwidth::kHigh);
     if (!is_any) return;
     if (!fractions_) return Try(m, d, Kind::kWhole);
     if (m % 8 != 0 || !request_.AsksForShape()) return Try(m, d, Kind::kStill);
@@ -218,8 +218,7 @@ class Loops {
       choice->set.phase = static_cast<int>(*(steps + Rational(1, 2)).Floor().Whole());
     }
     const Rational allowed = asked.phase_tolerance.value_or(request_.phase_tolerance);
-    choice->degrees =
-        Turned(verify::PhaseOf(choice->set.phase, divider) - *asked.phase).Absolute();
+    choice->degrees = Turned(verify::PhaseOf(choice->set.phase, divider) - *asked.phase).Absolute();
     choice->is_met = choice->is_met && choice->degrees <= allowed;
     choice->error = std::max(choice->error, DegreesInUnits(choice->degrees, allowed));
   }

@@ -36,8 +36,7 @@ bool BestSettings::IsBehind(std::size_t kind, int rank_class, double error, doub
   if (!best_[kind] || !tradeoffs_.IsBehind(rank_class, error, jitter, kRounding)) return false;
   const Figures& best = best_[kind]->figures;
   if (best.rank_class != rank_class) return best.rank_class < rank_class;
-  const bool has_larger_error =
-      best.worst_error.ToDouble() < error - kRounding * (1 + error);
+  const bool has_larger_error = best.worst_error.ToDouble() < error - kRounding * (1 + error);
   if (rank_class > 0 || request_.rank == Rank::kError) return has_larger_error;
   if (request_.rank == Rank::kMargin) {
     return best.margin.ToDouble() > margin + kRounding * (1 + margin);
@@ -56,8 +55,7 @@ bool BestSettings::IsBehind(std::size_t kind, const Ranked& bound) const {
   return std::any_of(front.begin(), front.end(), [&](const Ranked& one) {
     const Figures& own = one.figures;
     if (own.jitter > figures.jitter || figures.worst_error < own.worst_error) return false;
-    const bool is_same =
-        own.jitter == figures.jitter && own.worst_error == figures.worst_error;
+    const bool is_same = own.jitter == figures.jitter && own.worst_error == figures.worst_error;
     return !is_same || IsAhead(request_, one, bound);
   });
 }

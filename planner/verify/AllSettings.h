@@ -33,8 +33,7 @@ class BestSettings {
 
   // Whether nothing with at least such an error and jitter and at most such a margin could be any
   // of these. Never true for what could be.
-  bool IsBehind(std::size_t kind, int rank_class, double error, double jitter,
-                double margin) const;
+  bool IsBehind(std::size_t kind, int rank_class, double error, double jitter, double margin) const;
   // The same exactly, for settings of a KRU whose pins and PHASE_SHIFT are not chosen: `bound` has
   // the best figures that these could have.
   bool IsBehind(std::size_t kind, const Ranked& bound) const;
@@ -50,8 +49,7 @@ BestSettings BestOf(const Request& request, const Device& device, Primitive prim
 
 void TryLoops(const Request& request, const Device& device, Primitive primitive,
               BestSettings* best);
-void TryKrus(const Request& request, const Device& device, Primitive primitive,
-             BestSettings* best);
+void TryKrus(const Request& request, const Device& device, Primitive primitive, BestSettings* best);
 
 }  // namespace planner::verify
 

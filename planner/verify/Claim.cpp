@@ -146,8 +146,8 @@ class ClaimReader {
     claim_.is_tradeoff = read_.Flag(node_, claim_.path, "tradeoff");
     if (const Node* const number = node_.Find("number");
         number && number->type != NodeType::kNull) {
-      claim_.number = static_cast<std::size_t>(
-          read_.Count(node_, claim_.path, "number", 1, 1'000'000));
+      claim_.number =
+          static_cast<std::size_t>(read_.Count(node_, claim_.path, "number", 1, 1'000'000));
     }
     if (!read_.IsRight()) return false;
     const auto primitive = Named<Primitive>(hardware::kPrimitives, name);
@@ -159,9 +159,8 @@ class ClaimReader {
     claim_.primitive = *primitive;
     const std::size_t outputs = request_.outputs.size();
     const std::size_t inputs = request_.inputs.size();
-    if (claim_.solved &&
-        (outputs > static_cast<std::size_t>(hardware::MostOutputs(*primitive)) ||
-         inputs > static_cast<std::size_t>(hardware::MostInputs(*primitive)))) {
+    if (claim_.solved && (outputs > static_cast<std::size_t>(hardware::MostOutputs(*primitive)) ||
+                          inputs > static_cast<std::size_t>(hardware::MostInputs(*primitive)))) {
       read_.Refuse(node_, claim_.path, "solved", "false");
       return false;
     }
@@ -276,12 +275,9 @@ class ClaimReader {
     const Node* const settings = read_.Entry(node_, claim_.path, "settings", NodeType::kObject);
     if (settings == nullptr) return;
     const string path = claim_.path + ".settings";
-    const bool fractions =
-        hardware::HasFractions(set.primitive, static_cast<int>(request_.outputs.size()),
-                               request_.whole_divider_0);
-    const auto is_m = [&](int eighths) {
-      return hardware::IsM(set.primitive, eighths, fractions);
-    };
+    const bool fractions = hardware::HasFractions(
+        set.primitive, static_cast<int>(request_.outputs.size()), request_.whole_divider_0);
+    const auto is_m = [&](int eighths) { return hardware::IsM(set.primitive, eighths, fractions); };
     set.m = read_.Count(*settings, path, "m_eighths", 8, 8 * hardware::kLargestM, is_m,
                         fractions ? "8 or 40 to 512" : "8 times a whole M from 1 to 64");
     set.d = read_.Count(*settings, path, "d", 1, hardware::kLargestD);

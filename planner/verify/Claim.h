@@ -32,9 +32,8 @@ struct Claim {
 
 // Nothing when there are no settings that can be judged: something is missing or of a wrong type,
 // the device has no such primitive, or cannot be set so. All of that is among the discrepancies.
-std::optional<Claim> ReadClaim(const Request& request, const Device& device,
-                               const read::Node& node, const std::string& path,
-                               Discrepancies* discrepancies);
+std::optional<Claim> ReadClaim(const Request& request, const Device& device, const read::Node& node,
+                               const std::string& path, Discrepancies* discrepancies);
 
 }  // namespace planner::verify
 

@@ -23,8 +23,7 @@ ordered_json Marker(int kind) {
 
 bool IsMarker(const ordered_json& value, int kind) {
   return value.is_binary() &&
-         value.get_binary().subtype() ==
-             static_cast<ordered_json::binary_t::subtype_type>(kind);
+         value.get_binary().subtype() == static_cast<ordered_json::binary_t::subtype_type>(kind);
 }
 
 void Put(ordered_json* object, const string& name, const std::optional<Rational>& value) {
@@ -38,8 +37,7 @@ ordered_json Number(const std::optional<double>& value) {
 
 // A count of parts, as whole as it is.
 ordered_json Parts(int count, int of) {
-  return count % of == 0 ? ordered_json(count / of)
-                         : ordered_json(static_cast<double>(count) / of);
+  return count % of == 0 ? ordered_json(count / of) : ordered_json(static_cast<double>(count) / of);
 }
 
 ordered_json Ends(const Range& range) {
@@ -75,11 +73,7 @@ class Entries {
  public:
   Entries(const Request& request, const Device& device, const Answer& answer,
           const PlaceOrder& order, const Sentences* sentences)
-      : request_(request),
-        device_(device),
-        answer_(answer),
-        order_(order),
-        sentences_(sentences) {}
+      : request_(request), device_(device), answer_(answer), order_(order), sentences_(sentences) {}
 
   ordered_json All() {
     ordered_json all;

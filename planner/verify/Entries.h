@@ -31,9 +31,8 @@ std::string WordOf(FindingKind kind);
 std::string WordOf(const Source& source);
 
 // All entries of an answer but `number` and `tradeoff`. `sentences` may be null.
-nlohmann::ordered_json EntriesOf(const Request& request, const Device& device,
-                                 const Answer& answer, const PlaceOrder& order,
-                                 const Sentences* sentences);
+nlohmann::ordered_json EntriesOf(const Request& request, const Device& device, const Answer& answer,
+                                 const PlaceOrder& order, const Sentences* sentences);
 
 // The units of a document.
 nlohmann::ordered_json Units();

@@ -40,8 +40,7 @@ std::vector<Rational> CornersOf(const std::vector<Rational>& inputs, const Ratio
 
 Rational MarginIn(const Range& range, const Rational& frequency) {
   const Rational none = 0;
-  const Rational below =
-      range.highest == none ? -frequency : 1 - frequency / range.highest;
+  const Rational below = range.highest == none ? -frequency : 1 - frequency / range.highest;
   if (range.lowest == none) return below;
   const Rational above = frequency / range.lowest - 1;
   return above < below ? above : below;
@@ -63,9 +62,7 @@ Rational PsInUnits(const Rational& jitter, const Rational& allowed) {
   return InUnits(jitter, allowed, 1);
 }
 
-Rational VcoOf(const Rational& input, int m, int d) {
-  return input * m / (hardware::kEighths * d);
-}
+Rational VcoOf(const Rational& input, int m, int d) { return input * m / (hardware::kEighths * d); }
 
 Rational PfdOf(const Rational& input, int d) { return input / d; }
 
@@ -114,9 +111,7 @@ Rational DutyOf(Pin pin, int divide_halves) {
   return Rational(100) * whole / (2 * whole + 1);
 }
 
-bool HasM(Pin pin) {
-  return pin == Pin::kClkfx || pin == Pin::kClkfx180 || pin == Pin::kClkfxdv;
-}
+bool HasM(Pin pin) { return pin == Pin::kClkfx || pin == Pin::kClkfx180 || pin == Pin::kClkfxdv; }
 
 bool HasDivide(Pin pin) { return pin == Pin::kClkdv || pin == Pin::kClkfxdv; }
 

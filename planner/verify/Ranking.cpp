@@ -87,9 +87,8 @@ void Tradeoffs::Add(const Ranked& one) {
     if (place->figures.jitter < own.jitter) return;
     if (place->figures.jitter == own.jitter && !IsBefore(request_, one, *place)) return;
   }
-  const auto end = std::find_if(place, all_.end(), [&](const Ranked& other) {
-    return other.figures.jitter < own.jitter;
-  });
+  const auto end = std::find_if(
+      place, all_.end(), [&](const Ranked& other) { return other.figures.jitter < own.jitter; });
   place = all_.erase(place, end);
   all_.insert(place, one);
 }

@@ -189,8 +189,7 @@ std::optional<Request> ReadRequest(const Node& document, const Device& device,
                                    Discrepancies* discrepancies) {
   const Node* const node = document.Find(kRequest);
   if (node == nullptr) {
-    discrepancies->push_back(
-        At(document, DiscrepancyKind::kMissing, string(kRequest), "object"));
+    discrepancies->push_back(At(document, DiscrepancyKind::kMissing, string(kRequest), "object"));
     discrepancies->back().found.clear();
     return std::nullopt;
   }
@@ -209,8 +208,8 @@ std::optional<Request> ReadRequest(const Node& document, const Device& device,
   }
   Request request = std::move(reading->request);
   if (!request.primitive || device.Has(*request.primitive)) return request;
-  discrepancies->push_back(At(*node->Find("primitive"), DiscrepancyKind::kNoSetting,
-                              "request.primitive", ""));
+  discrepancies->push_back(
+      At(*node->Find("primitive"), DiscrepancyKind::kNoSetting, "request.primitive", ""));
   return std::nullopt;
 }
 

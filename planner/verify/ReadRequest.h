@@ -19,8 +19,7 @@ std::optional<Request> ReadRequest(const read::Node& document, const Device& dev
 
 // Names numbers of the request to which all answers of the document are for another one: inputs,
 // their jitter, frequencies, phases and duty cycles.
-void HoldRequest(const Request& request, const read::Node& document,
-                 Discrepancies* discrepancies);
+void HoldRequest(const Request& request, const read::Node& document, Discrepancies* discrepancies);
 
 }  // namespace planner::verify
 

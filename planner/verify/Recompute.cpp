@@ -138,10 +138,9 @@ class Work {
     output->ratio = FrequencyOf(VcoOf(1, loop_->m, loop_->d), set.divider);
     const bool is_still = loop_->m % 8 != 0 || loop_->outputs[0].divider % 8 != 0;
     output->phase = is_still ? Rational(0) : verify::PhaseOf(set.phase, set.divider);
-    output->duty = is_still || set.high_time == 0 ? Rational(50)
-                                                  : verify::DutyOf(set.high_time, set.divider);
-    KeepOutput(i, i == 1 ? limits.output_1 : limits.output, Outside(Quantity::kFrequency),
-               output);
+    output->duty =
+        is_still || set.high_time == 0 ? Rational(50) : verify::DutyOf(set.high_time, set.divider);
+    KeepOutput(i, i == 1 ? limits.output_1 : limits.output, Outside(Quantity::kFrequency), output);
     if (set.divider > 8 * hardware::LargestDivider(limits.max_count)) {
       Finding finding{.kind = FindingKind::kDividerTooLarge};
       finding.primitive = answer_.primitive;

@@ -38,8 +38,7 @@ void Add(const Candidate& candidate, Candidates* all) {
 // A primitive, with the outputs in all orders that there are.
 class OfPrimitive {
  public:
-  OfPrimitive(const Request& request, const Device& device, Primitive primitive,
-              Standing* standing)
+  OfPrimitive(const Request& request, const Device& device, Primitive primitive, Standing* standing)
       : request_(request), device_(device), primitive_(primitive), standing_(*standing) {}
 
   void Do() {
@@ -89,15 +88,15 @@ class OfPrimitive {
       candidate.origin.outputs.push_back(output.searched);
     }
     candidate.ranked.settings = answer.settings;
-    candidate.ranked.figures = FiguresOf(
-        Recompute(request_, device_, answer.settings, order, candidate.origin));
+    candidate.ranked.figures =
+        FiguresOf(Recompute(request_, device_, answer.settings, order, candidate.origin));
     return candidate;
   }
 
   void Ask(std::vector<Finding>* refusals) {
-    const std::vector<PlaceOrder> orders =
-        request_.any_order ? plan::OrdersOf(request_, device_, primitive_)
-                           : std::vector<PlaceOrder>{OwnPlaces(request_)};
+    const std::vector<PlaceOrder> orders = request_.any_order
+                                               ? plan::OrdersOf(request_, device_, primitive_)
+                                               : std::vector<PlaceOrder>{OwnPlaces(request_)};
     for (const PlaceOrder& order : orders) {
       orders_.push_back({order, {}, {}});
       const Request placed = InOrder(request_, order);
@@ -151,8 +150,7 @@ class OfPrimitive {
     const Figures* leader = nullptr;
     for (std::size_t i = 0; i < orders_.size(); ++i) {
       for (const Candidate& one : orders_[i].*source) {
-        if (leader != nullptr &&
-            CompareFigures(request_, one.ranked.figures, *leader) >= 0) {
+        if (leader != nullptr && CompareFigures(request_, one.ranked.figures, *leader) >= 0) {
           continue;
         }
         leader = &one.ranked.figures;

@@ -59,8 +59,7 @@ class Work {
     if (request) {
       string text = TextOf(*document_.Find("request")) + (IsGiven() ? " given" : "");
       if (!kept_ || kept_->text != text) {
-        kept_ = {std::move(text), *request,
-                 IsGiven() ? Standing{} : StandingOf(*request, device_)};
+        kept_ = {std::move(text), *request, IsGiven() ? Standing{} : StandingOf(*request, device_)};
       }
       DoAnswers();
       DoHead();
@@ -101,10 +100,9 @@ class Work {
     const Node* const answers = document_.Find("answers");
     const Node& there = answers != nullptr ? *answers : document_;
     if (answers == nullptr || answers->type != NodeType::kArray) {
-      found_.push_back(At(there,
-                          answers == nullptr ? DiscrepancyKind::kMissing
-                                             : DiscrepancyKind::kWrongType,
-                          "answers", "array"));
+      found_.push_back(
+          At(there, answers == nullptr ? DiscrepancyKind::kMissing : DiscrepancyKind::kWrongType,
+             "answers", "array"));
       if (answers == nullptr) found_.back().found.clear();
       return;
     }
@@ -175,8 +173,7 @@ class Work {
     if (claim.number || !claim.is_engine || !claim.variant.empty()) return false;
     return std::any_of(kept_->standing.as_requested.begin(), kept_->standing.as_requested.end(),
                        [&](const Candidate& one) {
-                         return one.ranked.settings == claim.settings &&
-                                one.order == claim.order;
+                         return one.ranked.settings == claim.settings && one.order == claim.order;
                        });
   }
 
