@@ -5,11 +5,15 @@
 // nothing: text that is no number reads as 0, and only "true" is a set flag. A method reads its
 // words from the first to the last, each converted before the next is looked at: so it holds them
 // in locals, since C++ leaves open in which order the arguments of a call are evaluated.
+//
+// The method runs in the C locale as long as the call lives: words and results are the same in
+// every host.
 #ifndef VORKEL_BINDING_CALL_H_
 #define VORKEL_BINDING_CALL_H_
 
 #include "binding/TclCalls.h"
 #include "binding/VorkelPtrHandle.h"
+#include "engine/CLocale.h"
 
 namespace Ip {
 
@@ -50,6 +54,7 @@ class Call {
   int objc_;
   Words objv_;
   Tcl_Interp* interp_;
+  CLocale cLocale_;
 };
 
 }  // namespace Ip

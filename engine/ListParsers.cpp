@@ -5,6 +5,7 @@
 #include <cstddef>
 #include <cstdlib>
 
+#include "engine/CLocale.h"
 #include "engine/Ip_VorkelImp.h"
 
 namespace Ip {
@@ -15,6 +16,7 @@ namespace {
 // same; that is meant so, and a later call may read them.
 bool ParseList(int count, const Port::StringBase& text, RequestList& list) {
   if (text.IsEmpty() || count < 1 || count > MAX_OUTPUTS) return false;
+  const CLocale cLocale;
   std::size_t position = 0;
   for (int slot = 0; slot < count; ++slot) {
     std::size_t begin = 0;

@@ -3,6 +3,8 @@
 #include <cstdarg>
 #include <cstdio>
 
+#include "engine/CLocale.h"
+
 namespace Ip {
 
 Trace::~Trace() {
@@ -10,6 +12,7 @@ Trace::~Trace() {
 }
 
 void Trace::Print(const char* format, ...) const {
+  const CLocale cLocale;
   std::va_list arguments;
   va_start(arguments, format);
   std::vprintf(format, arguments);

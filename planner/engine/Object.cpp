@@ -5,6 +5,7 @@
 #include <cstdio>
 #include <string>
 
+#include "engine/CLocale.h"
 #include "planner/device/SpeedData.h"
 
 namespace planner::engine {
@@ -26,6 +27,7 @@ std::string TextOf(double number) {
   if (std::fabs(number) < kLargestWhole && number == std::floor(number) && !std::signbit(number)) {
     return std::to_string(static_cast<std::int64_t>(number));
   }
+  const Ip::CLocale in_c_locale;
   char text[40];
   std::snprintf(text, sizeof text, "%.17g", number);
   return text;

@@ -12,6 +12,7 @@
 #include "tests/compare/Random.h"
 #include "tests/host/device_folder.h"
 #include "tests/planner/engine/devices.h"
+#include "tests/support/CommaLocale.h"
 
 namespace {
 
@@ -310,6 +311,17 @@ TEST_F(RunTest, AnswersAsAnyObjectOfTheEngine) {
   EXPECT_EQ(settings.d, other.GetChosenD());
   EXPECT_EQ(settings.outputs[0].divider / 8.0, other.GetChosenDiv0());
   EXPECT_EQ(settings.outputs[1].divider / 8, other.GetChosenDivN(1));
+}
+
+// The engine takes lists of numbers as text. Here no fraction gets lost on the way: from 33.125 MHz,
+// 298.125 is that times 9 and 99.375 times 3, and the first VCO from 600 MHz on is 894.375.
+TEST_F(RunTest, AHostWithADecimalCommaHasTheSameAnswers) {
+  const Request request = Ask({Rational(265, 8)}, {Out(Rational(2385, 8)), Out(Rational(795, 8))});
+  const CommaLocale locale;
+  if (!CommaLocale::IsSet()) GTEST_SKIP() << "localedef can make no locale with a comma";
+  const Variant whole = {.whole_divider_0 = true};
+  EXPECT_EQ(LoopFound(Primitive::kTsyn, request, whole),
+            Loop(Primitive::kTsyn, 27 * 8, 1, {{3 * 8, 0, 0}, {9 * 8, 0, 0}}));
 }
 
 // The engine has one variable for the primitive of the run, which a PLL and a TSYN at a time would
