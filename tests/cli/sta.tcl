@@ -92,9 +92,8 @@ proc ::sta::run {plans} {
   set here [pwd]
   cd $::cli::scratch
   try {
-    # A library that is loaded for the sanitizers is not for this program. Both it and its script
-    # write to the file of its warnings.
-    exec env -u LD_PRELOAD $program -exit -no_splash [file join $folder report.tcl] \
+    # Both the program and its script write to the file of its warnings.
+    exec $program -exit -no_splash [file join $folder report.tcl] \
       >said 2>>warnings </dev/null
     set said [string trim [::cli::contents said]]
     if {$said ne ""} {

@@ -4,6 +4,8 @@ package require tcltest 2.5
 namespace import -force ::tcltest::test
 # What a terminal gets can only be seen with this program.
 ::tcltest::testConstraint script [expr {[auto_execok script] ne ""}]
+# Sanitizers need much memory, and keep what is freed.
+::tcltest::testConstraint ownMemory [expr {![info exists ::env(VORKEL_PRELOAD)]}]
 
 namespace eval ::cli {
   variable folder [file dirname [file normalize [info script]]]
@@ -17,6 +19,13 @@ namespace eval ::cli {
   # A folder of the test file's own, gone when it ends.
   variable scratch [exec mktemp -d]
   variable counter 0
+  # The words that start an interpreter which can load the package. With sanitizers it has their
+  # libraries loaded; nothing else that a test starts needs them, and other programs fail with them.
+  variable interpreter [list [info nameofexecutable]]
+  if {[info exists ::env(VORKEL_PRELOAD)]} {
+    set interpreter [list env LD_PRELOAD=$::env(VORKEL_PRELOAD) {*}$interpreter]
+    unset -nocomplain ::env(LD_PRELOAD)
+  }
   # The names of the values above the tables of a report.
   variable labels [join {
     device input VCO PFD M D bandwidth {input jitter} {input tolerance} {phase error}

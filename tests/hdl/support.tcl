@@ -17,13 +17,12 @@ namespace eval ::hdl {
   }
 }
 
-# Runs a tool in the scratch folder; a dict as that of ::cli::execute. A library that is loaded for
-# the sanitizers is not for it.
+# Runs a tool in the scratch folder; a dict as that of ::cli::execute.
 proc ::hdl::tool {args} {
   set here [pwd]
   cd $::cli::scratch
   try {
-    return [::cli::execute env -u LD_PRELOAD {*}$args]
+    return [::cli::execute {*}$args]
   } finally {
     cd $here
   }
