@@ -2,11 +2,17 @@
 
 #include <dlfcn.h>
 
+#include <atomic>
+#include <mutex>
+
 namespace Tcl {
 
 namespace {
 
-const TclStubs* table = nullptr;
+constinit std::atomic<const TclStubs*> table = nullptr;
+constinit std::mutex binding;
+
+const TclStubs* Table() { return table.load(std::memory_order_acquire); }
 
 const TclStubs* ExportedTable() {
   const void* symbol = dlsym(RTLD_DEFAULT, "tclStubsPtr");
@@ -16,27 +22,28 @@ const TclStubs* ExportedTable() {
 }  // namespace
 
 bool Bind(Tcl_Interp* interp) {
-  if (table != nullptr) return true;
-  table = ExportedTable();
-  if (table == nullptr && Tcl_InitStubs(interp, "8.4", 0) != nullptr) table = tclStubsPtr;
-  return table != nullptr;
+  if (Table() != nullptr) return true;
+  const std::lock_guard lock(binding);
+  if (Table() == nullptr) table = ExportedTable();
+  if (Table() == nullptr && Tcl_InitStubs(interp, "8.4", 0) != nullptr) table = tclStubsPtr;
+  return Table() != nullptr;
 }
 
 void CreateObjCommand(Tcl_Interp* interp, const char* name, Tcl_ObjCmdProc* procedure) {
-  table->tcl_CreateObjCommand(interp, name, procedure, nullptr, nullptr);
+  Table()->tcl_CreateObjCommand(interp, name, procedure, nullptr, nullptr);
 }
 
-int Eval(Tcl_Interp* interp, const char* script) { return table->tcl_Eval(interp, script); }
+int Eval(Tcl_Interp* interp, const char* script) { return Table()->tcl_Eval(interp, script); }
 
 void PkgProvide(Tcl_Interp* interp, const char* name, const char* version) {
-  table->tcl_PkgProvide(interp, name, version);
+  Table()->tcl_PkgProvide(interp, name, version);
 }
 
-const char* GetString(Tcl_Obj* object) { return table->tcl_GetString(object); }
+const char* GetString(Tcl_Obj* object) { return Table()->tcl_GetString(object); }
 
 void SetResult(Tcl_Interp* interp, const char* text) {
   // Volatile: Tcl copies the text and writes nothing to it.
-  table->tcl_SetResult(interp, const_cast<char*>(text), TCL_VOLATILE);
+  Table()->tcl_SetResult(interp, const_cast<char*>(text), TCL_VOLATILE);
 }
 
 }  // namespace Tcl

@@ -11,7 +11,7 @@ namespace Tcl {
 
 // Finds the stubs table: the exported one when the process has a non-null one, else that of
 // `interp`. False, with Tcl's own message as the interpreter's result, when there is neither. A
-// table once found serves the whole process.
+// table once found serves the whole process. Can be called from several threads at once.
 bool Bind(Tcl_Interp* interp);
 
 // The functions; Bind has succeeded.

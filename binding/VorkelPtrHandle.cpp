@@ -1,5 +1,6 @@
 #include "binding/VorkelPtrHandle.h"
 
+#include <atomic>
 #include <new>
 #include <string>
 #include <string_view>
@@ -37,11 +38,8 @@ Script::Handle* VorkelPtrHandle::CreateHandle(Tcl_Interp* interp) const {
 }
 
 Script::PtrHandleBase* VorkelPtrHandle::GetPtrHandleBase() const {
-  static VorkelPtrHandle* prototype = nullptr;
-  if (prototype == nullptr) {
-    prototype = Script::NewPrototype<VorkelPtrHandle>(GetTclInterp());
-  }
-  return prototype;
+  static constinit std::atomic<VorkelPtrHandle*> prototype = nullptr;
+  return Script::PrototypeIn(&prototype, GetTclInterp());
 }
 
 }  // namespace Ip

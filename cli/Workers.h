@@ -1,10 +1,9 @@
 // Processes that work on the lines of a batch, for one that hands them out and takes the answers
 // back in order.
 //
-// The engine has a variable for the whole process (planner/engine/RunLoop.cpp), so that threads
-// would wait for each other; processes share nothing. And a process that dies - of a fault, or
-// because the system has no memory left - is replaced, and what it had in hand is done again, line
-// by line. Only a line with which alone a process dies once more has failed.
+// Processes share nothing, and one that dies - of a fault, or because the system has no memory left -
+// is replaced, and what it had in hand is done again, line by line. Only a line with which alone a
+// process dies once more has failed.
 //
 // What is in hand is bounded, in lines and in bytes, however slow a line is.
 //

@@ -6,7 +6,7 @@
 
 namespace Ip {
 
-std::int32_t VorkelImp::_prim = -1;
+constinit thread_local std::int32_t VorkelImp::_prim = -1;
 
 VorkelImp::VorkelImp(Tcl_Interp* owner) : interp(owner) {}
 

@@ -8,7 +8,8 @@
 // the engine use the operations.
 //
 // The engine reports failure by result codes and false returns and throws nothing of its own.
-// All calls come from the interpreter's thread.
+// The calls of an object come from one thread at a time; those of several objects can come from
+// several.
 #ifndef VORKEL_ENGINE_IP_VORKELIMP_H_
 #define VORKEL_ENGINE_IP_VORKELIMP_H_
 
@@ -181,9 +182,10 @@ class VorkelImp {
   KruState kru;
 
   // The primitive of the current PLL/TSYN run: 1 PLL, 0 TSYN, -1 before the first. One value
-  // for the whole process, not for each object; every solver pass sets it, and the trace prints
-  // it. Decisions are made by the run's own (Pll::Run).
-  static std::int32_t _prim;
+  // for all objects, not for each; every solver pass sets it, and the trace prints it. Decisions
+  // are made by the run's own (Pll::Run). Each thread has its own, so that runs of several do not
+  // meet.
+  static constinit thread_local std::int32_t _prim;
 };
 
 }  // namespace Ip

@@ -4,6 +4,7 @@
 #ifndef VORKEL_HOST_SCRIPT_PTRHANDLE_H_
 #define VORKEL_HOST_SCRIPT_PTRHANDLE_H_
 
+#include <atomic>
 #include <memory>
 #include <new>
 
@@ -51,12 +52,17 @@ class PtrHandleBase : public Handle {
   bool invisible_ = false;
 };
 
-// A prototype handle of class H; null when there is no memory.
+// The prototype handle of class H, which stays in `place`: the one that is there, or a new one.
+// Null when there is no memory. Can be asked for from several threads at once.
 template <typename H>
-H* NewPrototype(Tcl_Interp* interp) {
-  H* const prototype = new (std::nothrow) H(interp);
-  if (prototype != nullptr) prototype->StayInvisible();
-  return prototype;
+H* PrototypeIn(std::atomic<H*>* place, Tcl_Interp* interp) {
+  H* prototype = place->load();
+  if (prototype != nullptr) return prototype;
+  std::unique_ptr<H> made(new (std::nothrow) H(interp));
+  if (made == nullptr) return nullptr;
+  made->StayInvisible();
+  // Another thread may have been first; then that is the one.
+  return place->compare_exchange_strong(prototype, made.get()) ? made.release() : prototype;
 }
 
 // The typed level: handles that stand for objects of class T.
@@ -72,9 +78,8 @@ class PtrHandle : public PtrHandleBase {
   }
 
   PtrHandleBase* GetPtrHandleBase() const override {
-    static PtrHandle<T>* prototype = nullptr;
-    if (prototype == nullptr) prototype = NewPrototype<PtrHandle<T>>(GetTclInterp());
-    return prototype;
+    static constinit std::atomic<PtrHandle<T>*> prototype = nullptr;
+    return PrototypeIn(&prototype, GetTclInterp());
   }
 };
 

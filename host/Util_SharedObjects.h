@@ -5,6 +5,8 @@
 #define VORKEL_HOST_UTIL_SHAREDOBJECTS_H_
 
 #include <map>
+#include <memory>
+#include <mutex>
 #include <string>
 #include <typeinfo>
 
@@ -15,6 +17,8 @@ namespace Util {
 // The map from `const Key*` to a shared `Value` and its use count. There is one such map for
 // each pair of types in the process; Instance finds it in the registry under a name made of
 // the two type names. Entries are never removed, and the values are never deleted here.
+//
+// Several threads can use a map at once: the key of a request is that of the thread that makes it.
 template <typename Key, typename Value>
 class SharedObjects {
  public:
@@ -28,22 +32,26 @@ class SharedObjects {
     const Port::StringBase name(std::string(typeid(const Key*).name()) + typeid(Value).name());
     auto* objects = static_cast<SharedObjects*>(SharedResourceMgr::find(name));
     if (objects == nullptr) {
-      objects = new SharedObjects;
-      SharedResourceMgr::insert(name, objects);
+      std::unique_ptr<SharedObjects> made(new SharedObjects);
+      SharedResourceMgr::insert(name, made.get());
+      // Another thread may have been first.
+      objects = static_cast<SharedObjects*>(SharedResourceMgr::find(name));
+      if (objects == made.get()) made.release();
     }
-    objects->key_ = key;
+    key_ = key;
     return *objects;
   }
 
   // The entry of the request's key, or null. Does not count.
   Entry* Find() {
-    const auto found = entries_.find(key_);
-    return found == entries_.end() ? nullptr : &found->second;
+    const std::lock_guard lock(mutex_);
+    return FindLocked();
   }
 
   // Counts one more user of the request's object and returns it; null when there is none.
   Value* Get() {
-    Entry* entry = Find();
+    const std::lock_guard lock(mutex_);
+    Entry* entry = FindLocked();
     if (entry == nullptr) return nullptr;
     ++entry->useCount;
     return entry->object;
@@ -52,7 +60,8 @@ class SharedObjects {
   // Stores `object` under the request's key, with a use count of 1. The key must be free:
   // IllegalMethodCalledException otherwise, and nothing is stored.
   Value* Create(Value* object) {
-    if (Find() != nullptr) {
+    const std::lock_guard lock(mutex_);
+    if (FindLocked() != nullptr) {
       throw IllegalMethodCalledException(
           "DesignEntry", "Shared Object already exists. Use Get() instead of Create().\n");
     }
@@ -63,7 +72,16 @@ class SharedObjects {
  private:
   SharedObjects() = default;
 
-  const Key* key_ = nullptr;
+  // The mutex is held.
+  Entry* FindLocked() {
+    const auto found = entries_.find(key_);
+    return found == entries_.end() ? nullptr : &found->second;
+  }
+
+  // Of the map that this thread has asked for last, which is the one that it uses now.
+  static inline constinit thread_local const Key* key_ = nullptr;
+
+  std::mutex mutex_;
   std::map<const Key*, Entry> entries_;
 };
 

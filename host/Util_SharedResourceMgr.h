@@ -8,8 +8,8 @@ namespace Util {
 
 namespace Details {
 
-// Names are unique in the process; a resource stays registered until the process ends.
-// Unlocked: all callers are on the interpreter's thread.
+// Names are unique in the process; a resource stays registered until the process ends. Can be
+// asked from several threads at once.
 class SharedResourceMgr {
  public:
   // The resource of that name, or null when there is none.

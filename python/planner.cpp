@@ -6,7 +6,7 @@
 // which get it as data.
 //
 // Python's other threads run while something is planned, and can plan themselves: plans share
-// nothing, and runs of the engine take turns (planner/engine/Ask.h).
+// nothing.
 //
 // Tested by tests/python.
 #include <pybind11/pybind11.h>

@@ -3,10 +3,8 @@
 // The search knows no more than lists of frequencies, phases and duty cycles and a few switches.
 // A request leaves some of these open; each way to fill them in is a variant of the search.
 //
-// The engine runs on objects of this folder's, made for each run and freed after it. One variable
-// of it, the primitive of the current PLL or TSYN run, is shared by the whole process: runs of
-// several threads take turns here. A thread that runs the engine by other means, such as the
-// script package, must not do so at the same time.
+// The engine runs on objects of this folder's, made for each run and freed after it. Runs of several
+// threads share nothing that changes.
 //
 // Tested by ask_test.cpp.
 #ifndef VORKEL_PLANNER_ENGINE_ASK_H_

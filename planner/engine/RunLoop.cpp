@@ -2,7 +2,6 @@
 //
 // Tested by run_test.cpp.
 #include <cmath>
-#include <mutex>
 #include <stdexcept>
 
 #include "engine/ResultTexts.h"
@@ -12,12 +11,6 @@
 
 namespace planner::engine {
 namespace {
-
-// The engine has the primitive of a PLL or TSYN run in a variable of the process.
-std::mutex& LoopRuns() {
-  static std::mutex runs;
-  return runs;
-}
 
 // Half an eighth is far more than the engine's doubles are off.
 int Eighths(double value) { return static_cast<int>(std::lround(value * hardware::kEighths)); }
@@ -71,7 +64,6 @@ class LoopRun {
     object_->SetLowBandwidth(variant_.bandwidth == Bandwidth::kLow);
     const Port::StringBase frequencies = ListOf(Frequencies(request_));
     const bool is_whole = IsWhole(request_, variant_);
-    const std::lock_guard lock(LoopRuns());
     if (!closest_) {
       return object_->CalculateMinPowerOutFreqs(frequencies, first, second, Count(),
                                                 variant_.prefer_max_vco, is_whole, Code(), trace_);

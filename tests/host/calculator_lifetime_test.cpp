@@ -1,7 +1,11 @@
 // Whose a calculator is, and for how long.
 #include <gtest/gtest.h>
 
+#include <atomic>
+#include <cstddef>
 #include <memory>
+#include <thread>
+#include <vector>
 
 #include "host/Dly_SpeedController.h"
 #include "host/PM_PIC.h"
@@ -50,6 +54,27 @@ TEST(GetCMBCalculator, AnswersAlikeForTheSameController) {
   ASSERT_NE(calculator, nullptr);
   EXPECT_EQ(CalculatorOf(controller), calculator.get());
   EXPECT_EQ(CalculatorOf(controller), calculator.get());
+}
+
+TEST(GetCMBCalculator, AnswersSeveralThreadsAlike) {
+  for (int round = 0; round < 100; ++round) {
+    const auto controller = Controller("vk40");
+    std::vector<Tw_BmCMBCalculator*> calculators(3, nullptr);
+    std::atomic<std::size_t> waiting = calculators.size();
+    std::vector<std::thread> threads;
+    for (Tw_BmCMBCalculator*& calculator : calculators) {
+      threads.emplace_back([&calculator, &controller, &waiting] {
+        --waiting;
+        while (waiting > 0) std::this_thread::yield();
+        calculator = CalculatorOf(controller);
+      });
+    }
+    for (std::thread& thread : threads) thread.join();
+    const std::unique_ptr<Tw_BmCMBCalculator> owned(calculators[0]);
+    ASSERT_NE(owned, nullptr);
+    ASSERT_EQ(calculators[1], calculators[0]);
+    ASSERT_EQ(calculators[2], calculators[0]);
+  }
 }
 
 TEST(GetCMBCalculator, AnswersDifferentlyForDifferentControllers) {

@@ -2,6 +2,7 @@
 #ifndef VORKEL_TESTS_HOST_CALCULATOR_SUPPORT_H_
 #define VORKEL_TESTS_HOST_CALCULATOR_SUPPORT_H_
 
+#include <atomic>
 #include <limits>
 #include <memory>
 #include <string>
@@ -64,7 +65,7 @@ struct Answer {
 class Asked {
  public:
   explicit Asked(Device::Grade grade, std::string name = "dev-1")
-      : place_(std::make_shared<Tw_BmCMBCalculator*>(nullptr)),
+      : place_(std::make_shared<std::atomic<Tw_BmCMBCalculator*>>(nullptr)),
         calculator_(std::make_unique<Calculator::DeviceCalculator>(std::move(grade),
                                                                    std::move(name), place_)) {}
 
@@ -131,7 +132,7 @@ class Asked {
     return {figure, error.CStr()};
   }
 
-  std::shared_ptr<Tw_BmCMBCalculator*> place_;
+  std::shared_ptr<std::atomic<Tw_BmCMBCalculator*>> place_;
   std::unique_ptr<Calculator::DeviceCalculator> calculator_;
 };
 

@@ -1,6 +1,10 @@
 #include <gtest/gtest.h>
 
+#include <atomic>
+#include <cstddef>
 #include <string>
+#include <thread>
+#include <vector>
 
 #include "host/Util_SharedObjects.h"
 
@@ -70,6 +74,38 @@ TEST(SharedObjects, RefuseASecondObjectForAKey) {
   }
   EXPECT_EQ(Objects::Instance(&key).Find()->object, &first);
   EXPECT_EQ(Objects::Instance(&key).Find()->useCount, 1);
+}
+
+// Each thread has keys of its own, and meets the others in the map, which they make together.
+TEST(SharedObjects, AreForSeveralThreads) {
+  struct ThreadsValue {
+    int number;
+  };
+  using ThreadsObjects = Util::SharedObjects<Key, ThreadsValue>;
+  constexpr int kKeys = 2000;
+  std::vector<int> wrong(3, 0);
+  std::vector<std::thread> threads;
+  std::atomic<std::size_t> waiting = wrong.size();
+  for (std::size_t t = 0; t < wrong.size(); ++t) {
+    threads.emplace_back([&waiting, &wrong, t] {
+      Key* const keys = new Key[kKeys];  // for good, see above
+      std::vector<ThreadsValue> values(kKeys);
+      --waiting;
+      while (waiting > 0) std::this_thread::yield();
+      for (std::size_t i = 0; i < kKeys; ++i) {
+        auto& objects = ThreadsObjects::Instance(&keys[i]);
+        if (objects.Get() != nullptr) ++wrong[t];
+        if (objects.Create(&values[i]) != &values[i]) ++wrong[t];
+        if (objects.Get() != &values[i]) ++wrong[t];
+      }
+      for (std::size_t i = 0; i < kKeys; ++i) {
+        const auto* const entry = ThreadsObjects::Instance(&keys[i]).Find();
+        if (entry == nullptr || entry->object != &values[i] || entry->useCount != 2) ++wrong[t];
+      }
+    });
+  }
+  for (std::thread& thread : threads) thread.join();
+  EXPECT_EQ(wrong, (std::vector<int>{0, 0, 0}));
 }
 
 TEST(Exception, IsCaughtAsEveryBase) {

@@ -2,6 +2,7 @@
 //
 // Tested by calculator_lifetime_test.cpp.
 #include <memory>
+#include <mutex>
 
 #include "host/Dly_SpeedController.h"
 #include "host/Tw_BmCMBCalculator.h"
@@ -18,7 +19,10 @@ bool Tw_BmCMBCalculator::Unused(Port::StringBase* error) {
 Tw_BmCMBCalculator* Tw_BmPhysicalBlockModeler::GetCMBCalculator(Dly_SpeedController* controller) {
   if (controller == nullptr) return nullptr;
   const Dly_SpeedController::Data& data = controller->data();
-  if (*data.calculator != nullptr) return *data.calculator;
+  // Of several threads that ask for the same controller one makes it.
+  static constinit std::mutex making;
+  const std::lock_guard lock(making);
+  if (Tw_BmCMBCalculator* const made = *data.calculator) return made;
   const Device::Grade& grade = data.speed_data;
   if (!grade.Has(Device::CoefficientGroup::kLoop) && !grade.Has(Device::CoefficientGroup::kKru)) {
     return nullptr;

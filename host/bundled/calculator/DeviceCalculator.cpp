@@ -30,7 +30,7 @@ bool Answer(Port::StringBase* error, Operation operation) {
 }  // namespace
 
 DeviceCalculator::DeviceCalculator(Device::Grade grade, std::string device_name,
-                                   std::shared_ptr<Tw_BmCMBCalculator*> place)
+                                   std::shared_ptr<std::atomic<Tw_BmCMBCalculator*>> place)
     : grade_(std::move(grade)), device_name_(std::move(device_name)), place_(std::move(place)) {
   *place_ = this;
 }

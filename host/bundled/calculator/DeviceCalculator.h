@@ -6,6 +6,7 @@
 #ifndef VORKEL_HOST_BUNDLED_CALCULATOR_DEVICECALCULATOR_H_
 #define VORKEL_HOST_BUNDLED_CALCULATOR_DEVICECALCULATOR_H_
 
+#include <atomic>
 #include <memory>
 #include <string>
 
@@ -19,7 +20,7 @@ class DeviceCalculator final : public Tw_BmCMBCalculator {
   // `place` is the controller's note of its living calculator: it names this one until this one
   // is destroyed. `device_name` is for error sentences.
   DeviceCalculator(Device::Grade grade, std::string device_name,
-                   std::shared_ptr<Tw_BmCMBCalculator*> place);
+                   std::shared_ptr<std::atomic<Tw_BmCMBCalculator*>> place);
   ~DeviceCalculator() override;
 
   bool VcoFrequency(double a1, double a2, double a3, double a4, Port::StringBase* error,
@@ -45,7 +46,7 @@ class DeviceCalculator final : public Tw_BmCMBCalculator {
 
   Device::Grade grade_;
   std::string device_name_;
-  std::shared_ptr<Tw_BmCMBCalculator*> place_;
+  std::shared_ptr<std::atomic<Tw_BmCMBCalculator*>> place_;
 };
 
 }  // namespace Calculator

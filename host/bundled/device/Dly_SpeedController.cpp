@@ -32,7 +32,7 @@ Dly_SpeedController::Dly_SpeedController(const PM_PIC* pic) {
     data_->device = pic->data().part.file.device;
     data_->grade = grade.name;
     data_->speed_data = grade;
-    data_->calculator = std::make_shared<Tw_BmCMBCalculator*>(nullptr);
+    data_->calculator = std::make_shared<std::atomic<Tw_BmCMBCalculator*>>(nullptr);
     const auto keywords = Device::Keywords();
     for (std::size_t i = 0; i < keywords.size(); ++i) {
       if (!grade.figures[i]) continue;

@@ -2,6 +2,7 @@
 #ifndef VORKEL_HOST_BUNDLED_DEVICE_PERSONALITY_H_
 #define VORKEL_HOST_BUNDLED_DEVICE_PERSONALITY_H_
 
+#include <atomic>
 #include <functional>
 #include <memory>
 #include <string>
@@ -39,7 +40,7 @@ struct Dly_SpeedController::Data {
   // The calculator that was made for this controller, null when there is none. Calculators
   // belong to those who asked for them: one that is destroyed clears this place, and one that
   // outlives the controller keeps the place alive.
-  std::shared_ptr<Tw_BmCMBCalculator*> calculator;
+  std::shared_ptr<std::atomic<Tw_BmCMBCalculator*>> calculator;
 };
 
 #endif  // VORKEL_HOST_BUNDLED_DEVICE_PERSONALITY_H_

@@ -3,13 +3,15 @@
 // Tested by initialisers_test.cpp.
 #include "host/Initialisers.h"
 
+#include <atomic>
+
 namespace Host {
 namespace {
 
 // Counting starts in the static initialisation of other libraries, so the counters must be
 // constants until then.
 template <typename Service>
-constinit int user_count = 0;
+constinit std::atomic<int> user_count = 0;
 
 }  // namespace
 

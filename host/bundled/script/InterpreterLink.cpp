@@ -17,7 +17,8 @@ std::shared_ptr<const InterpreterLink> InterpreterLink::Of(Tcl_Interp* interp) n
   try {
     auto* owner = static_cast<Owner*>(Tcl_GetAssocData(interp, kAssociation, nullptr));
     if (owner == nullptr) {
-      auto made = std::make_unique<Owner>(new InterpreterLink(interp));
+      auto made = std::make_unique<Owner>();
+      made->reset(new InterpreterLink(interp));
       owner = made.release();
       Tcl_SetAssocData(interp, kAssociation, &InterpreterEnds, owner);
     }

@@ -9,6 +9,7 @@
 
 #include <tcl.h>
 
+#include <atomic>
 #include <memory>
 
 namespace Script {
@@ -19,7 +20,8 @@ class InterpreterLink {
   // of reach, and when there is no memory.
   static std::shared_ptr<const InterpreterLink> Of(Tcl_Interp* interp) noexcept;
 
-  // The interpreter; null once it has ended.
+  // The interpreter; null once it has ended. Prototypes are asked for theirs in other threads than
+  // its own, too.
   Tcl_Interp* interp() const { return interp_; }
 
  private:
@@ -27,7 +29,7 @@ class InterpreterLink {
 
   static void InterpreterEnds(ClientData link, Tcl_Interp* interp);
 
-  Tcl_Interp* interp_;
+  std::atomic<Tcl_Interp*> interp_;
 };
 
 }  // namespace Script

@@ -1,17 +1,27 @@
 #include "host/bundled/script/TclAccess.h"
 
+#include <atomic>
+#include <mutex>
+
 namespace Script {
 namespace {
 
 // The oldest Tcl whose stubs table has all the functions that this library calls.
 constexpr char kOldestTcl[] = "8.4";
 
+// Whether the stubs table is there for all threads.
+constinit std::atomic<bool> reached = false;
+constinit std::mutex reaching;
+
 }  // namespace
 
 bool ReachTcl(Tcl_Interp* interp) {
   if (interp == nullptr) return false;
+  if (reached) return true;
+  const std::lock_guard lock(reaching);
   // Asking twice would be right as well, but Tcl_InitStubs empties the interpreter's result.
-  return tclStubsPtr != nullptr || Tcl_InitStubs(interp, kOldestTcl, 0) != nullptr;
+  if (!reached) reached = tclStubsPtr != nullptr || Tcl_InitStubs(interp, kOldestTcl, 0) != nullptr;
+  return reached;
 }
 
 int SetResultObject(Tcl_Interp* interp, Tcl_Obj* object) {

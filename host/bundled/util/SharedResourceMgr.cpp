@@ -1,6 +1,7 @@
 // Tested by shared_objects_test.cpp.
 #include <functional>
 #include <map>
+#include <mutex>
 #include <string>
 
 #include "host/Util_SharedResourceMgr.h"
@@ -8,7 +9,10 @@
 namespace Util {
 namespace {
 
-using Resources = std::map<std::string, void*, std::less<>>;
+struct Resources {
+  std::mutex mutex;
+  std::map<std::string, void*, std::less<>> by_name;
+};
 
 // Never destroyed: statics of other libraries may ask until the very end of the process.
 Resources& AllResources() {
@@ -19,12 +23,16 @@ Resources& AllResources() {
 }  // namespace
 
 void* Details::SharedResourceMgr::find(const Port::StringBase& name) {
-  const auto found = AllResources().find(name.View());
-  return found == AllResources().end() ? nullptr : found->second;
+  Resources& resources = AllResources();
+  const std::lock_guard lock(resources.mutex);
+  const auto found = resources.by_name.find(name.View());
+  return found == resources.by_name.end() ? nullptr : found->second;
 }
 
 void Details::SharedResourceMgr::insert(const Port::StringBase& name, void* resource) {
-  AllResources().try_emplace(std::string(name.View()), resource);
+  Resources& resources = AllResources();
+  const std::lock_guard lock(resources.mutex);
+  resources.by_name.try_emplace(std::string(name.View()), resource);
 }
 
 IllegalMethodCalledException::~IllegalMethodCalledException() = default;

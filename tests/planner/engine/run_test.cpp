@@ -324,8 +324,8 @@ TEST_F(RunTest, AHostWithADecimalCommaHasTheSameAnswers) {
             Loop(Primitive::kTsyn, 27 * 8, 1, {{3 * 8, 0, 0}, {9 * 8, 0, 0}}));
 }
 
-// The engine has one variable for the primitive of the run, which a PLL and a TSYN at a time would
-// take from each other: a PLL could get an M of 2 and a TSYN lose its fractions.
+// Were the primitive of the run that of the process, a PLL and a TSYN at a time would take it from
+// each other: a PLL could get an M of 2 and a TSYN lose its fractions.
 TEST_F(RunTest, RunsOfSeveralThreadsDoNotDisturbEachOther) {
   const Request pll = Ask({300}, {Out(600), Out(600)});
   const Request tsyn = Ask({300}, {Out(600), Out(600)});
