@@ -27,7 +27,8 @@ class Factor {
     if (denominator_ == 0) return CompareSlowly(a, b);
     return static_cast<Wide>(numerator_) * a <=> static_cast<Wide>(denominator_) * b;
   }
-  // The whole number that is next to value x a, below or above; `most` where that is smaller.
+  // The whole number that is next to value x a, below or above; `most`, which is
+  // below 2^60, where that is smaller.
   std::int64_t Floor(std::int64_t a, std::int64_t most) const;
   std::int64_t Ceiling(std::int64_t a, std::int64_t most) const;
 
