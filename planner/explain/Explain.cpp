@@ -15,24 +15,43 @@ namespace {
 // Only the first conflicts are told with their changes; there can be thousands.
 constexpr std::size_t kMostWithChanges = 6;
 
-// The changes of the demands of a conflict with which all demands of a question go.
-std::vector<Change> ChangesIn(const Question& question, const std::vector<Demand>& conflict) {
-  std::vector<Change> changes;
-  for (const Demand& demand : conflict) {
-    for (Change& change : ChangesOf(question, demand)) changes.push_back(std::move(change));
-  }
-  return changes;
-}
+// The changes of demands with which all demands of a question go. A demand can be in many
+// conflicts; its changes are looked for once.
+class ChangesToAll {
+ public:
+  explicit ChangesToAll(const Question& question) : question_(question) {}
 
-Conflict Described(const Question& question, const std::vector<Demand>& demands, Set conflict) {
+  std::vector<Change> In(const std::vector<Demand>& conflict) {
+    std::vector<Change> changes;
+    for (const Demand& demand : conflict) {
+      const std::vector<Change>& own = Of(demand);
+      changes.insert(changes.end(), own.begin(), own.end());
+    }
+    return changes;
+  }
+
+ private:
+  const std::vector<Change>& Of(const Demand& demand) {
+    for (const auto& [known, changes] : known_) {
+      if (known == demand) return changes;
+    }
+    return known_.emplace_back(demand, ChangesOf(question_, demand)).second;
+  }
+
+  const Question& question_;
+  std::vector<std::pair<Demand, std::vector<Change>>> known_;
+};
+
+Conflict Described(const Question& question, const std::vector<Demand>& demands, Set conflict,
+                   ChangesToAll* changes) {
   Conflict described;
   described.demands = In(demands, conflict);
-  described.changes = ChangesIn(question, described.demands);
+  described.changes = changes->In(described.demands);
   if (described.changes.empty()) {
     described.lifts_all = false;
     Question alone = question;
     alone.relaxed = OnlyWith(demands, conflict);
-    described.changes = ChangesIn(alone, described.demands);
+    described.changes = ChangesToAll(alone).In(described.demands);
   }
   return described;
 }
@@ -67,9 +86,10 @@ OfPrimitive ExplainOne(const Request& request, const Device& device, Primitive p
   one.questions = found.questions;
   one.is_complete = found.complete;
   const Question question{request, device, primitive, {}};
+  ChangesToAll changes(question);
   for (const Set conflict : found.conflicts) {
     if (one.conflicts.size() < kMostWithChanges) {
-      one.conflicts.push_back(Described(question, demands, conflict));
+      one.conflicts.push_back(Described(question, demands, conflict, &changes));
     } else {
       one.conflicts.push_back({In(demands, conflict), {}, false});
     }

@@ -11,6 +11,7 @@
 #include <vector>
 
 #include "host/bundled/calculator/Slack.h"
+#include "planner/search/Fractions.h"
 #include "planner/search/VcoSpans.h"
 
 namespace planner::search {
@@ -197,15 +198,22 @@ class KruWithin::Question {
   // jitter tells them apart, and it is no smaller with the others.
   template <typename Take>
   void ForEachRatio(const Span& span, const Take& take) const {
-    for (int d = 1; d <= last_d_; ++d) {
-      const double low = std::ceil(std::min(span.lowest * d, last_m_ + 1.0));
-      const int first = std::max(first_m_, static_cast<int>(low));
+    for (int d = LeastD(span); d <= last_d_ && span.lowest * d <= last_m_; ++d) {
+      const int first = std::max(first_m_, static_cast<int>(std::ceil(span.lowest * d)));
       const int last = static_cast<int>(std::min<double>(span.highest * d, last_m_));
       for (int m = first; m <= last; ++m) {
         if (!IsFirstOfRatio(m, d)) continue;
         if (!take(m, d)) return;
       }
     }
+  }
+
+  // No smaller D has an M with which M / D is in the span; above the largest D where none has one.
+  int LeastD(const Span& span) const {
+    if (!(span.lowest > 0)) return 1;
+    const Fraction simplest =
+        SimplestIn(span.lowest * (1 - kWider), span.highest * (1 + kWider), last_d_);
+    return static_cast<int>(std::min<std::int64_t>(simplest.denominator, last_d_ + 1));
   }
 
   bool IsFirstOfRatio(int m, int d) const {
@@ -215,8 +223,7 @@ class KruWithin::Question {
     return common <= (first_m_ + lowest - 1) / lowest;
   }
 
-  // --- KRU_SP
-  // -------------------------------------------------------------------------------------
+  // --- KRU_SP ------------------------------------------------------------------------------------
 
   // Only the jitter tells a PHASE_SHIFT of 0 from others.
   std::optional<Settings> AnswerSp(const KruBase& line) {
@@ -319,8 +326,7 @@ class KruWithin::Question {
     });
   }
 
-  // --- KRU_CLKGEN
-  // ---------------------------------------------------------------------------------
+  // --- KRU_CLKGEN --------------------------------------------------------------------------------
 
   std::optional<Settings> AnswerClkgen() {
     shifts_[0] = true;
@@ -389,8 +395,7 @@ class KruWithin::Question {
     return false;
   }
 
-  // --- Pins
-  // ----------------------------------------------------------------------------------------
+  // --- Pins --------------------------------------------------------------------------------------
 
   // The first PHASE_SHIFT with which each output has a pin, and the first such pins.
   std::optional<Settings> WithPins(const KruBase& base) const {
