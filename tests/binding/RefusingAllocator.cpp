@@ -11,15 +11,18 @@ constexpr int kNever = -1;
 // Constants until a test sets them: allocations begin before main.
 constinit std::size_t refusedSize = kNoSize;
 constinit int allocationsUntilRefusal = kNever;
+constinit bool refusesAllBehind = false;
 constinit int refusals = 0;
 constinit std::size_t countedSize = kNoSize;
 constinit int frees = 0;
 
 void* Allocate(std::size_t size) noexcept {
-  if (allocationsUntilRefusal != kNever && allocationsUntilRefusal-- == 0) {
+  if (allocationsUntilRefusal == 0) {
+    if (!refusesAllBehind) allocationsUntilRefusal = kNever;
     ++refusals;
     return nullptr;
   }
+  if (allocationsUntilRefusal != kNever) --allocationsUntilRefusal;
   return std::malloc(size == 0 ? 1 : size);
 }
 
@@ -38,6 +41,17 @@ RefuseAfter::RefuseAfter(int allocations) {
 }
 
 RefuseAfter::~RefuseAfter() { allocationsUntilRefusal = kNever; }
+
+RefuseFrom::RefuseFrom(int allocations) {
+  allocationsUntilRefusal = allocations;
+  refusesAllBehind = true;
+  refusals = 0;
+}
+
+RefuseFrom::~RefuseFrom() {
+  allocationsUntilRefusal = kNever;
+  refusesAllBehind = false;
+}
 
 int Refusals() { return refusals; }
 

@@ -24,6 +24,15 @@ class RefuseAfter {
   RefuseAfter& operator=(const RefuseAfter&) = delete;
 };
 
+// The same for all allocations from that one on.
+class RefuseFrom {
+ public:
+  explicit RefuseFrom(int allocations);
+  ~RefuseFrom();
+  RefuseFrom(const RefuseFrom&) = delete;
+  RefuseFrom& operator=(const RefuseFrom&) = delete;
+};
+
 // How many allocations were refused since the last of these objects was made.
 int Refusals();
 

@@ -25,9 +25,18 @@ std::string FindFolder() {
   return found.empty() ? (folder / "devices").native() : found;
 }
 
+bool IsFound() noexcept {
+  try {
+    return !BundledFolder().empty();
+  } catch (...) {
+    return false;
+  }
+}
+
 // The system may know the library by a path relative to the current directory of the time
-// when it was loaded, so the question is asked then and not at the first use.
-[[maybe_unused]] const std::string& asked_at_load = BundledFolder();
+// when it was loaded, so the question is asked then and not at the first use. Nobody could be told
+// that there is no memory for the answer: then the first use asks again.
+[[maybe_unused]] const bool asked_at_load = IsFound();
 
 }  // namespace
 

@@ -8,7 +8,7 @@ namespace Device {
 
 // The folder "devices" that comes with the library (or program) that this code is part of, see
 // Shipped.h, as an absolute path; the one beside it when there is none. Empty when the system does
-// not tell where that is.
+// not tell where that is. Throws std::bad_alloc.
 const std::string& BundledFolder();
 
 }  // namespace Device

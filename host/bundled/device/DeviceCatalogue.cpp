@@ -1,9 +1,12 @@
 #include "host/bundled/device/DeviceCatalogue.h"
 
+#include <dirent.h>
+
 #include <algorithm>
+#include <cerrno>
 #include <cstdlib>
-#include <filesystem>
-#include <system_error>
+#include <memory>
+#include <new>
 #include <utility>
 
 #include "host/bundled/device/BundledFolder.h"
@@ -13,6 +16,13 @@ namespace {
 
 constexpr char kSearchPathVariable[] = "VORKEL_DEVICES";
 constexpr std::string_view kExtension = ".toml";
+
+struct CloseFolder {
+  void operator()(DIR* folder) const { closedir(folder); }
+};
+
+// The system's own: the walk of the standard library ends the process when it gets no memory.
+using OpenFolder = std::unique_ptr<DIR, CloseFolder>;
 
 std::vector<std::string> SearchFolders() {
   std::vector<std::string> folders;
@@ -39,13 +49,17 @@ DeviceCatalogue DeviceCatalogue::ListFolders(std::vector<std::string> folders) {
 }
 
 void DeviceCatalogue::AddFolder(const std::string& folder) {
-  std::error_code error;
-  std::filesystem::directory_iterator entry(folder, error);
-  const std::filesystem::directory_iterator end;
-  for (; !error && entry != end; entry.increment(error)) {
-    const std::string name = entry->path().filename().native();
+  const OpenFolder open(opendir(folder.c_str()));
+  if (open == nullptr) {
+    if (errno == ENOMEM) throw std::bad_alloc();
+    return;
+  }
+  const std::string beginning = folder.ends_with('/') ? folder : folder + '/';
+  while (const dirent* const entry = readdir(open.get())) {
+    const std::string_view name = entry->d_name;
     if (name.size() <= kExtension.size() || !name.ends_with(kExtension)) continue;
-    files_.try_emplace(name.substr(0, name.size() - kExtension.size()), entry->path().native());
+    files_.try_emplace(std::string(name.substr(0, name.size() - kExtension.size())),
+                       beginning + std::string(name));
   }
 }
 

@@ -1,6 +1,13 @@
 // How the text of a device file becomes a DeviceFile, or a list of its mistakes.
 //
 // Tested by device_file_test.cpp, and examine_test.cpp.
+//
+// The parser is compiled into this file, without exceptions. That of the system's library makes an
+// exception of what is wrong with a text in places where no other may pass: where there is no memory
+// for it, the process ends.
+#define TOML_HEADER_ONLY 1
+#define TOML_EXCEPTIONS 0
+#define TOML_ENABLE_FORMATTERS 0
 #include <toml++/toml.h>
 
 #include <algorithm>
@@ -302,6 +309,14 @@ class Builder {
   bool has_grades_ = false;
 };
 
+// The parser is not told the path: where there is no memory to note it, the process ends. And a
+// number for which there is no memory is wrong to it. So what it takes for wrong is read once more: a
+// mistake is there again.
+toml::parse_result ParseToml(std::string_view text) {
+  toml::parse_result result = toml::parse(text);
+  return result ? std::move(result) : toml::parse(text);
+}
+
 }  // namespace
 
 Examination DeviceFile::Examine(std::string_view text, const std::string& path,
@@ -311,11 +326,13 @@ Examination DeviceFile::Examine(std::string_view text, const std::string& path,
   result.file.device = device;
   try {
     RequireParsable(path, text);
-    const toml::table root = toml::parse(text, std::string_view(path));
-    Builder(text, device, &result).Build(root);
-  } catch (const toml::parse_error& error) {
-    result.mistakes.push_back(
-        {PositionOf(error.source()), std::string(error.description()), NameKind::kNone, {}});
+    const toml::parse_result parsed = ParseToml(text);
+    if (parsed) {
+      Builder(text, device, &result).Build(parsed.table());
+    } else {
+      result.mistakes.push_back({PositionOf(parsed.error().source()),
+                                 std::string(parsed.error().description()), NameKind::kNone, {}});
+    }
   } catch (const DeviceError& error) {
     result.mistakes.push_back({error.position(), error.reason(), NameKind::kNone, {}});
   }

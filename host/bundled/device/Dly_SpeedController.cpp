@@ -3,6 +3,7 @@
 
 #include <exception>
 #include <limits>
+#include <new>
 
 #include "host/bundled/device/KeywordTable.h"
 #include "host/bundled/device/Personality.h"
@@ -38,6 +39,8 @@ Dly_SpeedController::Dly_SpeedController(const PM_PIC* pic) {
       if (!grade.figures[i]) continue;
       data_->figures.emplace(keywords[i].name, Device::SpeedFigure(*grade.figures[i]));
     }
+  } catch (const std::bad_alloc&) {
+    Device::ReportAndThrow("out of memory");
   } catch (const std::exception& error) {
     Device::ReportAndThrow(error.what());
   }

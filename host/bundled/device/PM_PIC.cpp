@@ -2,6 +2,7 @@
 #include "host/PM_PIC.h"
 
 #include <exception>
+#include <new>
 #include <utility>
 
 #include "host/bundled/device/Personality.h"
@@ -24,6 +25,8 @@ PM_PIC::PM_PIC(const Port::StringBase& partName, bool isPartName, PM_PARTNAME_BI
                             ? Device::FindPart(catalogue, partName.View())
                             : Device::Part{Device::FindDevice(catalogue, partName.View()), {}, {}};
     data_ = std::make_unique<Data>(Data{std::move(part)});
+  } catch (const std::bad_alloc&) {
+    Device::ReportAndThrow("out of memory");
   } catch (const std::exception& error) {
     Device::ReportAndThrow(error.what());
   }

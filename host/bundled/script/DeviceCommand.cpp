@@ -2,6 +2,7 @@
 
 #include <charconv>
 #include <exception>
+#include <new>
 #include <string>
 #include <string_view>
 #include <system_error>
@@ -10,6 +11,7 @@
 #include "host/bundled/device/DeviceCatalogue.h"
 #include "host/bundled/device/DeviceFile.h"
 #include "host/bundled/device/KeywordTable.h"
+#include "host/bundled/script/TclAccess.h"
 
 namespace Script {
 namespace {
@@ -200,6 +202,8 @@ int Dispatch(Tcl_Interp* interp, int objc, Tcl_Obj* const objv[]) {
 int DevicesCommand(ClientData, Tcl_Interp* interp, int objc, Tcl_Obj* const objv[]) {
   try {
     return Dispatch(interp, objc, objv);
+  } catch (const std::bad_alloc&) {
+    return ErrorResult(interp, "out of memory");
   } catch (const std::exception& error) {
     Tcl_SetObjResult(interp, NewText(error.what()));
     return TCL_ERROR;
