@@ -1,4 +1,4 @@
-// Tested by explain_inputs_test.cpp.
+// Tested by inputs_test.cpp.
 #include "planner/explain/Inputs.h"
 
 #include "planner/search/Within.h"

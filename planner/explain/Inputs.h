@@ -1,6 +1,6 @@
 // Input clocks with which all frequencies are exact.
 //
-// Tested by explain_inputs_test.cpp.
+// Tested by inputs_test.cpp.
 #ifndef VORKEL_PLANNER_EXPLAIN_INPUTS_H_
 #define VORKEL_PLANNER_EXPLAIN_INPUTS_H_
 

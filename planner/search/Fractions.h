@@ -14,9 +14,9 @@ struct Fraction {
   std::int64_t denominator;
 };
 
-// The quotient from `lowest` to `highest`, which are above 0, with the smallest denominator, and of
-// those with the smallest numerator. No other quotient in the interval has a smaller numerator,
-// either. Where the denominator is above `most` it is some number above `most`.
+// The quotient from `lowest` to `highest`, which are above 0 and up to 10^15, with the smallest
+// denominator, and of those with the smallest numerator. No other quotient in the interval has a
+// smaller numerator, either. Where the denominator is above `most` it is some number above `most`.
 //
 // The way there is that of Euclid: with the same whole part, the simplest is that of what is left,
 // upside down. What rounding does is as if the ends were off by a few units in the last place.
