@@ -46,10 +46,7 @@ TEST(Subsets, OfNothingOnlyTheEmptySet) {
   EXPECT_EQ(subsets.Next(), std::nullopt);
 }
 
-// Of two sets, the one that has the first element in which they differ.
-bool IsBefore(Set a, Set b) { return (a & (a ^ b) & (~(a ^ b) + 1)) != 0; }
-
-TEST(Subsets, NextIsTheFirstOfAllThatAreNotSettled) {
+TEST(Subsets, NextIsNotSettledAndAnyMoreWouldBe) {
   compare::Random random(17);
   int settled = 0;
   for (int i = 0; i < 3000; ++i) {
@@ -67,15 +64,21 @@ TEST(Subsets, NextIsTheFirstOfAllThatAreNotSettled) {
         subsets.SettleAbove(set);
       }
     }
-    std::optional<Set> first;
-    for (Set set = 0; set <= all; ++set) {
-      const bool is_settled =
-          std::any_of(below.begin(), below.end(), [&](Set one) { return (set & ~one) == 0; }) ||
-          std::any_of(above.begin(), above.end(), [&](Set one) { return (one & ~set) == 0; });
-      if (!is_settled && (!first || IsBefore(set, *first))) first = set;
+    const auto is_settled = [&](Set set) {
+      return std::any_of(below.begin(), below.end(), [&](Set one) { return (set & ~one) == 0; }) ||
+             std::any_of(above.begin(), above.end(), [&](Set one) { return (one & ~set) == 0; });
+    };
+    const std::optional<Set> next = subsets.Next();
+    if (!next) {
+      ++settled;
+      for (Set set = 0; set <= all; ++set) ASSERT_TRUE(is_settled(set)) << i;
+      continue;
     }
-    ASSERT_EQ(subsets.Next(), first) << i;
-    if (!first) ++settled;
+    ASSERT_EQ(*next & ~all, Set{0}) << i;
+    ASSERT_FALSE(is_settled(*next)) << i;
+    for (Set element = 1; element <= all; element <<= 1) {
+      ASSERT_TRUE((*next & element) != 0 || is_settled(*next | element)) << i;
+    }
   }
   EXPECT_GT(settled, 200);
   EXPECT_LT(settled, 2800);
