@@ -19,8 +19,8 @@ struct Method {
 
 inline constexpr int kMethods = 40;
 
-// All methods in the order in which they are searched. Static initialisation builds the table; where
-// there was no memory for it, all names are empty until FindMethod has built it.
+// All methods in the order in which they are searched. Static initialisation builds the table;
+// where there was no memory for it, all names are empty until FindMethod has built it.
 const std::array<Method, kMethods>& MethodTable();
 
 // The first method with exactly that name, or null. Throws std::bad_alloc when there is no memory

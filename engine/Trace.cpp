@@ -16,9 +16,8 @@ Trace::~Trace() {
   if (error_ == 0 && std::fflush(stdout) != 0) error_ = errno;
   if (error_ == 0) return;
   try {
-    Message()->issueError(
-        "Internal trace error -- could not write to standard output: %s\n",
-        std::generic_category().message(error_).c_str());
+    Message()->issueError("Internal trace error -- could not write to standard output: %s\n",
+                          std::generic_category().message(error_).c_str());
   } catch (...) {
     // No memory for the message: there is nobody else to tell.
   }

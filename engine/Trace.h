@@ -6,9 +6,9 @@
 //
 // With the trace off it costs one test; its arguments are not evaluated.
 //
-// Where standard output cannot be written, be it closed or its device full, the rest of the trace is
-// lost and the end of the run issues a message. What is lost does not come out later, in a file that
-// is opened in place of a closed standard output.
+// Where standard output is closed or its device is full, the rest of the trace is lost and the end
+// of the run issues a message. What is lost does not come out later, in a file that is opened in
+// place of a closed standard output.
 #ifndef VORKEL_ENGINE_TRACE_H_
 #define VORKEL_ENGINE_TRACE_H_
 

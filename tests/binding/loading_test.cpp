@@ -109,7 +109,8 @@ bool IsFailure(const std::string& answer) {
 }
 
 // Runs `prepare` and then, without one allocation after the other, `call`. It fails or has the
-// answer that it has with memory, and blames no file for it. It has that answer once there is memory again.
+// answer that it has with memory, and blames no file for it. Once there is memory again, it has
+// that answer.
 template <typename Refuse>
 void ExpectFailures(const std::string& prepare, const std::string& call) {
   const Interp interp;
@@ -191,9 +192,9 @@ TYPED_TEST(CallsWithout, OfTheFirstReadOfADevice) {
 }
 
 TYPED_TEST(CallsWithout, OfAHandle) {
-  ASSERT_NO_FATAL_FAILURE(ExpectFailuresAreTold<TypeParam>(
-      "if {![info exists h]} {set h [Ip::Vorkel::Init]}",
-      "$h SetDevice a_device_of_which_the_name_is_long"));
+  ASSERT_NO_FATAL_FAILURE(
+      ExpectFailuresAreTold<TypeParam>("if {![info exists h]} {set h [Ip::Vorkel::Init]}",
+                                       "$h SetDevice a_device_of_which_the_name_is_long"));
   for (const char* call :
        {"$h GetSpdKeyValue D_KRU_CLK0_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MINPERIOD",
         "$h GetSpdKeyValue AN_UNKNOWN_KEYWORD", "$h AnUnknownMethodOfAHandle",

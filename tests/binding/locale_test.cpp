@@ -71,11 +71,11 @@ TEST(LocaleTest, NumbersWithPointsAreReadWhole) {
   const CommaLocale locale;
   if (!CommaLocale::IsSet()) GTEST_SKIP() << "localedef can make no locale with a comma";
   EXPECT_EQ(AnswersAndTrace("{SetDevice vk40} {GetVcoFreq 74.25 10 1 1} "
-                            "{PLLCalculateActualOutFreqs {148.5 74.25} 74.25 0 2 false false false} "
+                            "{PLLCalculateActualOutFreqs {148.5 74.25} 74.25 0 2 false false 0} "
                             "GetChosenVCO {GetChosenOutFreqN 1}"),
             "SetDevice vk40: 0 \n"
             "GetVcoFreq 74.25 10 1 1: 0 742.500\n"
-            "PLLCalculateActualOutFreqs {148.5 74.25} 74.25 0 2 false false false: 0 1\n"
+            "PLLCalculateActualOutFreqs {148.5 74.25} 74.25 0 2 false false 0: 0 1\n"
             "GetChosenVCO: 0 445.500\n"
             "GetChosenOutFreqN 1: 0 74.250\n");
 }

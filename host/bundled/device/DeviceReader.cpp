@@ -2,9 +2,9 @@
 //
 // Tested by device_file_test.cpp, and examine_test.cpp.
 //
-// The parser is compiled into this file, without exceptions. That of the system's library makes an
-// exception of what is wrong with a text in places where no other may pass: where there is no memory
-// for it, the process ends.
+// The parser is compiled into this file, without exceptions. That of the system's library makes
+// an exception of what is wrong with a text in places where no other may pass: where there is no
+// memory for it, the process ends.
 #define TOML_HEADER_ONLY 1
 #define TOML_EXCEPTIONS 0
 #define TOML_ENABLE_FORMATTERS 0
@@ -310,8 +310,8 @@ class Builder {
 };
 
 // The parser is not told the path: where there is no memory to note it, the process ends. And a
-// number for which there is no memory is wrong to it. So what it takes for wrong is read once more: a
-// mistake is there again.
+// number for which there is no memory is wrong to it. So what it takes for wrong is read once more:
+// a mistake is there again.
 toml::parse_result ParseToml(std::string_view text) {
   toml::parse_result result = toml::parse(text);
   return result ? std::move(result) : toml::parse(text);
