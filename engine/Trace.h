@@ -5,10 +5,6 @@
 //   TRACE(trace, "DLL---- number of valid VCOs: %d\n", count);
 //
 // With the trace off it costs one test; its arguments are not evaluated.
-//
-// Where standard output is closed or its device is full, the rest of the trace is lost and the end
-// of the run issues a message. What is lost does not come out later, in a file that is opened in
-// place of a closed standard output.
 #ifndef VORKEL_ENGINE_TRACE_H_
 #define VORKEL_ENGINE_TRACE_H_
 
@@ -17,8 +13,7 @@ namespace Ip {
 class Trace {
  public:
   explicit Trace(bool on) : on_(on) {}
-  // Flushes, so that the lines keep their place among what the caller prints after the run, and
-  // issues the message about lines that are lost.
+  // Flushes, so that the lines keep their place among what the caller prints after the run.
   ~Trace();
   Trace(const Trace&) = delete;
   Trace& operator=(const Trace&) = delete;
@@ -30,7 +25,6 @@ class Trace {
 
  private:
   bool on_;
-  mutable int error_ = 0;  // why lines are lost, as errno; 0 while none are
 };
 
 }  // namespace Ip
