@@ -46,7 +46,7 @@ class SpanStore {
     Spans spans = make();
     count_ += spans.size();
     if (count_ > kMost) {
-      // Some MB are enough: questions that follow each other differ in little.
+      // 32 MB are enough: questions that follow each other differ in little.
       count_ = spans.size();
       for (Kept& other : kept_) other.reset();
     }
