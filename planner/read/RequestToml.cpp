@@ -1,14 +1,13 @@
 // Tested by request_toml_test.cpp.
 #include "planner/read/RequestToml.h"
 
-#include <toml++/toml.h>
-
 #include <algorithm>
 #include <cstddef>
 #include <string>
 #include <utility>
 #include <vector>
 
+#include "host/bundled/device/Toml.h"
 #include "planner/read/Letters.h"
 #include "planner/read/RequestTree.h"
 
@@ -109,16 +108,16 @@ Draft ReadToml(std::string_view text, std::string_view file, Mistakes* mistakes)
     mistakes->push_back(SyntaxMistake(file, {1, 1}, "it has more dots than any request"));
     return {};
   }
-  try {
-    const toml::table root = toml::parse(text);
-    Node node = Builder(text).Of(root);
-    node.position = {1, 1};
-    return ReadTree(node, file, Naming::kEntries, mistakes);
-  } catch (const toml::parse_error& error) {
+  const toml::parse_result parsed = Device::ParseToml(text);
+  if (!parsed) {
+    const toml::parse_error& error = parsed.error();
     mistakes->push_back(
         SyntaxMistake(file, PositionOf(error.source()), std::string(error.description())));
     return {};
   }
+  Node node = Builder(text).Of(parsed.table());
+  node.position = {1, 1};
+  return ReadTree(node, file, Naming::kEntries, mistakes);
 }
 
 }  // namespace planner::read

@@ -59,7 +59,8 @@ TEST_F(LocaleTest, TheHostKeepsItsOwn) {
   EXPECT_EQ(Half(), "0,5");
   EXPECT_STREQ(std::setlocale(LC_ALL, nullptr), "comma");
 
-  const locale_t own = newlocale(LC_ALL_MASK, "comma", nullptr);
+  // A copy of the process's: newlocale() never frees the folders that it has looked into.
+  const locale_t own = duplocale(LC_GLOBAL_LOCALE);
   ASSERT_NE(own, nullptr);
   std::setlocale(LC_ALL, "C");
   const locale_t before = uselocale(own);

@@ -1,15 +1,6 @@
 // How the text of a device file becomes a DeviceFile, or a list of its mistakes.
 //
 // Tested by device_file_test.cpp, and examine_test.cpp.
-//
-// The parser is compiled into this file, without exceptions. That of the system's library makes
-// an exception of what is wrong with a text in places where no other may pass: where there is no
-// memory for it, the process ends.
-#define TOML_HEADER_ONLY 1
-#define TOML_EXCEPTIONS 0
-#define TOML_ENABLE_FORMATTERS 0
-#include <toml++/toml.h>
-
 #include <algorithm>
 #include <cmath>
 #include <utility>
@@ -18,6 +9,7 @@
 #include "host/bundled/device/FigureText.h"
 #include "host/bundled/device/FileText.h"
 #include "host/bundled/device/KeywordTable.h"
+#include "host/bundled/device/Toml.h"
 
 namespace Device {
 namespace {
@@ -308,14 +300,6 @@ class Builder {
   bool has_packages_ = false;
   bool has_grades_ = false;
 };
-
-// The parser is not told the path: where there is no memory to note it, the process ends. And a
-// number for which there is no memory is wrong to it. So what it takes for wrong is read once more:
-// a mistake is there again.
-toml::parse_result ParseToml(std::string_view text) {
-  toml::parse_result result = toml::parse(text);
-  return result ? std::move(result) : toml::parse(text);
-}
 
 }  // namespace
 
