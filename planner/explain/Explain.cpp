@@ -85,7 +85,7 @@ OfPrimitive ExplainOne(const Request& request, const Device& device, Primitive p
       FindConflicts(demands.size(), [&](Set set) { return within.Exists(OnlyWith(demands, set)); });
   one.questions = found.questions;
   one.is_complete = found.complete;
-  const Question question{request, device, primitive, {}};
+  const Question question{request, device, primitive, {}, &within};
   ChangesToAll changes(question);
   for (const Set conflict : found.conflicts) {
     if (one.conflicts.size() < kMostWithChanges) {

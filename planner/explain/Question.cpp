@@ -6,7 +6,7 @@
 namespace planner::explain {
 
 std::optional<Settings> Question::Ask() const {
-  return search::Within(request, device, primitive).Find(relaxed);
+  return search::Within(request, device, primitive, unchanged).Find(relaxed);
 }
 
 Answer Question::Judge(const Settings& settings) const {

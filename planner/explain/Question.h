@@ -20,6 +20,9 @@ struct Question {
   Device device;
   Primitive primitive = Primitive::kPll;
   search::Relaxed relaxed;
+  // The question before something was changed, which outlives this one; or null. Most of what it
+  // has prepared is right here, too.
+  const search::Within* unchanged = nullptr;
 
   // Settings that meet all that is left of the demands and limits; the first that are found.
   std::optional<Settings> Ask() const;

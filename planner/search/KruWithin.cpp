@@ -11,7 +11,7 @@
 #include <vector>
 
 #include "host/bundled/calculator/Slack.h"
-#include "planner/search/Fractions.h"
+#include "planner/search/Denominators.h"
 #include "planner/search/VcoSpans.h"
 
 namespace planner::search {
@@ -51,8 +51,7 @@ class KruWithin::Question {
     last_d_ = relaxed.d ? kRelaxedD : largest;
     for (std::size_t i = 0; i < task.Outputs().size(); ++i) {
       all_ |= Of(i);
-      const Relaxed::OfOutput& own = OwnOf(i);
-      asks_for_jitter_ = asks_for_jitter_ || (!own.jitter && task.Outputs()[i].Jitter().IsAsked());
+      asks_for_jitter_ = asks_for_jitter_ || AsksForJitter(i);
       asks_for_phase_ = asks_for_phase_ || PhasesOf(i) != nullptr;
     }
     if (relaxed.dividers) {
@@ -111,7 +110,7 @@ class KruWithin::Question {
     if (!own.duty && output.AsksForDuty() && !output.IsDutyMet(source, base.divide_halves)) {
       return false;
     }
-    return own.jitter || !output.Jitter().IsAsked() ||
+    return !AsksForJitter(place) ||
            output.Jitter().IsMet(task_.JitterOf(base, pin.facts->pin, shifted_));
   }
 
@@ -150,6 +149,24 @@ class KruWithin::Question {
   // The ratios of M to D with which a pin serves an output, but for the jitter; they are rounded
   // outwards. Empty when it cannot.
   std::optional<Span> SpanOf(const KruPin& pin, std::size_t place, const KruBase& base) const {
+    std::optional<Span> span = SpanWithoutJitter(pin, place, base);
+    if (!span) return std::nullopt;
+    if (AsksForJitter(place)) LeaveKnown(base.divide_by_2 ? 2 : 1, &*span);
+    return Outwards(*span);
+  }
+
+  static std::optional<Span> Outwards(const Span& span) {
+    const Span wider = {span.lowest * (1 - kWider), span.highest * (1 + kWider)};
+    return wider.lowest > wider.highest ? std::nullopt : std::optional(wider);
+  }
+
+  bool AsksForJitter(std::size_t place) const {
+    return !OwnOf(place).jitter && task_.Outputs()[place].Jitter().IsAsked();
+  }
+
+  // Likewise, with any jitter, and as they are worked out.
+  std::optional<Span> SpanWithoutJitter(const KruPin& pin, std::size_t place,
+                                        const KruBase& base) const {
     const KruOutput& output = task_.Outputs()[place];
     const Relaxed::OfOutput& own = OwnOf(place);
     if (!IsConnected(pin, output, base)) return std::nullopt;
@@ -162,7 +179,6 @@ class KruWithin::Question {
     unit.d = 1;
     const KruRatio ratio = RatioOf(pin.facts->source, unit);
     const double scale = static_cast<double>(ratio.b) / static_cast<double>(ratio.a);
-    const double line_scale = base.divide_by_2 ? 2 : 1;
     Span span = {0, HUGE_VAL};
     if (!own.frequency) {
       const FrequencyDemand& frequency = output.Frequency();
@@ -175,10 +191,6 @@ class KruWithin::Question {
       span.lowest = std::max(span.lowest, scale * range.Lowest());
       span.highest = std::min(span.highest, scale * range.Highest());
     }
-    if (!own.jitter && output.Jitter().IsAsked()) LeaveKnown(line_scale, &span);
-    span.lowest *= 1 - kWider;
-    span.highest *= 1 + kWider;
-    if (span.lowest > span.highest) return std::nullopt;
     return span;
   }
 
@@ -198,7 +210,8 @@ class KruWithin::Question {
   // jitter tells them apart, and it is no smaller with the others.
   template <typename Take>
   void ForEachRatio(const Span& span, const Take& take) const {
-    for (int d = LeastD(span); d <= last_d_ && span.lowest * d <= last_m_; ++d) {
+    const Denominators ds(span, last_d_);
+    for (int d = ds.First(); d <= last_d_ && span.lowest * d <= last_m_; d = ds.Next(d)) {
       const int first = std::max(first_m_, static_cast<int>(std::ceil(span.lowest * d)));
       const int last = static_cast<int>(std::min<double>(span.highest * d, last_m_));
       for (int m = first; m <= last; ++m) {
@@ -206,14 +219,6 @@ class KruWithin::Question {
         if (!take(m, d)) return;
       }
     }
-  }
-
-  // No smaller D has an M with which M / D is in the span; above the largest D where none has one.
-  int LeastD(const Span& span) const {
-    if (!(span.lowest > 0)) return 1;
-    const Fraction simplest =
-        SimplestIn(span.lowest * (1 - kWider), span.highest * (1 + kWider), last_d_);
-    return static_cast<int>(std::min<std::int64_t>(simplest.denominator, last_d_ + 1));
   }
 
   bool IsFirstOfRatio(int m, int d) const {
@@ -328,30 +333,68 @@ class KruWithin::Question {
 
   // --- KRU_CLKGEN --------------------------------------------------------------------------------
 
+  // The ratios of M to D with which an output is on a pin, but for the jitter: on CLKFX or
+  // CLKFX180, and on CLKFXDV, of a divide by 1; with another they are as many times as large.
+  struct OnPins {
+    std::optional<Span> undivided;
+    std::optional<Span> divided;
+    bool asks_for_jitter = false;
+  };
+
   std::optional<Settings> AnswerClkgen() {
     shifts_[0] = true;
+    std::vector<OnPins> outputs(task_.Outputs().size());
+    for (std::size_t i = 0; i < outputs.size(); ++i) {
+      outputs[i].asks_for_jitter = AsksForJitter(i);
+      for (const bool divided : {false, true}) {
+        ForEachPin(true, divided, [&](const KruPin& pin) {
+          if (!ShiftsOf(pin, i)[0]) return;
+          const KruBase line = {.divide_halves = divided ? 2 : 0};
+          const std::optional<Span> span = SpanWithoutJitter(pin, i, line);
+          if (span) (divided ? outputs[i].divided : outputs[i].undivided) = span;
+        });
+      }
+    }
     // First without CLKFXDV.
-    if (auto settings = AnswerClkgenWith({})) return settings;
+    if (auto settings = AnswerClkgenWith({}, outputs)) return settings;
     for (const int halves : divides_) {
-      if (auto settings = AnswerClkgenWith({.divide_halves = halves})) return settings;
+      if (auto settings = AnswerClkgenWith({.divide_halves = halves}, outputs)) return settings;
     }
     return std::nullopt;
   }
 
-  std::optional<Settings> AnswerClkgenWith(const KruBase& line) {
-    Spans spans = {{0, HUGE_VAL}};
-    for (std::size_t i = 0; i < task_.Outputs().size(); ++i) {
-      Spans own;
-      const auto add = [&](const KruPin& pin) {
-        if (!ShiftsOf(pin, i)[0]) return;
-        if (const std::optional<Span> span = SpanOf(pin, i, line)) own.push_back(*span);
-      };
-      ForEachPin(true, false, add);
-      if (line.divide_halves != 0) ForEachPin(true, true, add);
-      std::sort(own.begin(), own.end(),
-                [](const Span& a, const Span& b) { return a.lowest < b.lowest; });
-      spans = Common(spans, own);
-      if (spans.empty()) return std::nullopt;
+  // The spans of an output with a divide, at most two.
+  void SpansOf(const OnPins& output, int divide_halves, Spans* spans) const {
+    const auto add = [&](Span span) {
+      if (output.asks_for_jitter) LeaveKnown(1, &span);
+      const std::optional<Span> wider = Outwards(span);
+      if (wider) spans->push_back(*wider);
+    };
+    if (output.undivided) add(*output.undivided);
+    if (output.divided && divide_halves != 0) {
+      const double divide = divide_halves / 2.0;
+      add({output.divided->lowest * divide, output.divided->highest * divide});
+    }
+    if (spans->size() < 2) return;
+    Span lower = spans->front();
+    Span upper = spans->back();
+    if (upper.lowest < lower.lowest) std::swap(lower, upper);
+    spans->clear();
+    AddSpan(lower.lowest, lower.highest, spans);
+    AddSpan(upper.lowest, upper.highest, spans);
+  }
+
+  std::optional<Settings> AnswerClkgenWith(const KruBase& line,
+                                           const std::vector<OnPins>& outputs) {
+    Spans& spans = spans_;
+    spans.assign({{0, HUGE_VAL}});
+    for (const OnPins& output : outputs) {
+      own_.clear();
+      left_.clear();
+      SpansOf(output, line.divide_halves, &own_);
+      Common(spans, own_, &left_);
+      if (left_.empty()) return std::nullopt;
+      std::swap(spans, left_);
     }
     for (const Span& span : spans) {
       std::optional<Settings> settings;
@@ -367,26 +410,12 @@ class KruWithin::Question {
     return std::nullopt;
   }
 
-  // Where two sets of spans meet; those of `others` can overlap.
-  static Spans Common(const Spans& spans, const Spans& others) {
-    Spans merged;
-    for (const Span& other : others) AddSpan(other.lowest, other.highest, &merged);
-    Spans common;
-    for (const Span& span : spans) {
-      for (const Span& other : merged) {
-        AddSpan(std::max(span.lowest, other.lowest), std::min(span.highest, other.highest),
-                &common);
-      }
-    }
-    return common;
-  }
-
   // Whether a jitter that is asked for is too large already with this M and D: with others that
   // follow it is no smaller.
   bool IsHopeless(const KruBase& base) const {
     if (!asks_for_jitter_ || !task_.Model().RisesWithSettings()) return false;
     for (std::size_t i = 0; i < task_.Outputs().size(); ++i) {
-      if (OwnOf(i).jitter) continue;
+      if (!AsksForJitter(i)) continue;
       const double jitter = task_.JitterOf(base, Pin::kClkfx, false);
       if (jitter != answer::kUnknownJitter && !task_.Outputs()[i].Jitter().IsMet(jitter)) {
         return true;
@@ -447,6 +476,10 @@ class KruWithin::Question {
   bool doubled_ = false;
   Shifts shifts_;         // those that are tried
   bool shifted_ = false;  // they are above 0
+  // Kept for their memory.
+  Spans spans_;
+  Spans own_;
+  Spans left_;
 };
 
 std::optional<Settings> KruWithin::Find(const Relaxed& relaxed) const {

@@ -9,14 +9,36 @@
 #include <utility>
 
 #include "hardware/Loop.h"
-#include "planner/search/Fractions.h"
+#include "planner/search/Denominators.h"
 #include "planner/search/LoopSweeps.h"
 
 namespace planner::search {
 
 using hardware::kEighths;
 
-LoopWithin::LoopWithin(const Request& request, const Device& device, Primitive primitive)
+LoopWithin::Asked::Asked(std::size_t place, Cause all, const LoopWithin& within)
+    : index(place),
+      cause(std::move(all)),
+      frequency(within.request_, cause.demand),
+      range(within.inputs_, cause.range),
+      first_range(within.first_input_, cause.range),
+      shape(within.request_, cause.demand, cause.largest_count),
+      long_shape(within.request_, cause.demand, kRelaxedDivider),
+      max_jitter(cause.demand.max_jitter) {}
+
+LoopWithin::Cause LoopWithin::CauseOf(std::size_t index) const {
+  Cause cause = {request_.inputs, request_.outputs[index],
+                 limits_.OutputOf(static_cast<int>(index)), limits_.max_count};
+  Output& demand = cause.demand;
+  demand.tolerance = request_.ToleranceOf(demand);
+  demand.phase_tolerance = request_.PhaseToleranceOf(demand);
+  demand.duty_tolerance = request_.DutyToleranceOf(demand);
+  demand.max_jitter = request_.MaxJitterOf(demand);
+  return cause;
+}
+
+LoopWithin::LoopWithin(const Request& request, const Device& device, Primitive primitive,
+                       const LoopWithin* like)
     : request_(request),
       limits_(device.Loop(primitive)),
       primitive_(primitive),
@@ -26,17 +48,21 @@ LoopWithin::LoopWithin(const Request& request, const Device& device, Primitive p
       first_input_{request.inputs.front(), request.inputs.front()},
       jitter_(device, request) {
   for (std::size_t i = 0; i < request_.outputs.size(); ++i) {
-    const Output& asked = request_.outputs[i];
-    if (!asked.used) continue;
-    const Range& range = limits_.OutputOf(static_cast<int>(i));
-    outputs_.push_back(
-        {i, FrequencyDemand(request_, asked), RatioRange(inputs_, range),
-         RatioRange(first_input_, range), OutputShape(request_, asked, limits_.max_count),
-         OutputShape(request_, asked, kRelaxedDivider), request_.MaxJitterOf(asked)});
+    if (!request_.outputs[i].used) continue;
+    Cause cause = CauseOf(i);
+    AskedPointer asked;
+    if (like != nullptr) {
+      const auto same = std::find_if(
+          like->outputs_.begin(), like->outputs_.end(),
+          [&](const AskedPointer& one) { return one->index == i && one->cause == cause; });
+      if (same != like->outputs_.end()) asked = *same;
+    }
+    if (!asked) asked = std::make_shared<const Asked>(i, std::move(cause), *this);
+    outputs_.push_back(std::move(asked));
   }
   // Those with the fewest dividers come first.
-  std::sort(outputs_.begin(), outputs_.end(), [](const Asked& a, const Asked& b) {
-    return a.frequency.InputPerAsked() < b.frequency.InputPerAsked();
+  std::sort(outputs_.begin(), outputs_.end(), [](const AskedPointer& a, const AskedPointer& b) {
+    return a->frequency.InputPerAsked() < b->frequency.InputPerAsked();
   });
 }
 
@@ -51,11 +77,11 @@ class LoopWithin::Question {
         largest_((relaxed.dividers ? kRelaxedDivider
                                    : hardware::LargestDivider(within.limits_.max_count)) *
                  kEighths) {
-    for (const Asked& output : within_.outputs_) {
-      const Relaxed::OfOutput& own = relaxed_.outputs[output.index];
-      if (!own.jitter && output.max_jitter) jitter_.Add(*output.max_jitter);
-      const bool has_shape =
-          (output.shape.AsksForPhase() && !own.phase) || (output.shape.AsksForDuty() && !own.duty);
+    for (const AskedPointer& output : within_.outputs_) {
+      const Relaxed::OfOutput& own = relaxed_.outputs[output->index];
+      if (!own.jitter && output->max_jitter) jitter_.Add(*output->max_jitter);
+      const bool has_shape = (output->shape.AsksForPhase() && !own.phase) ||
+                             (output->shape.AsksForDuty() && !own.duty);
       asks_for_shape_ = asks_for_shape_ || has_shape;
     }
   }
@@ -108,17 +134,23 @@ class LoopWithin::Question {
     with_fractions_ = with_fractions;
     Spans spans = {{grid.lowest, grid.highest}};
     Spans left;
-    for (std::size_t place = 0; place < within_.outputs_.size(); ++place) {
+    for (const AskedPointer& output : within_.outputs_) {
       left.clear();
-      MeetOutput(place, spans, &left);
+      MeetOutput(*output, spans, &left);
       if (left.empty()) return std::nullopt;
       std::swap(spans, left);
     }
     const int step = m_kind == MKind::kWhole ? kEighths : grid.step;
+    const int largest = grid.rows.back().d;
+    const double largest_m = LargestM(grid) * (1 + kWider);
     for (const Span& span : spans) {
-      const std::int64_t least_d = LeastD(span, step, grid.rows.back().d);
-      for (const Row& row : grid.rows) {
-        if (row.d < least_d) continue;
+      const Denominators ds({span.lowest / step, span.highest / step}, largest);
+      auto at = grid.rows.begin();
+      for (int d = ds.First(); d <= largest && span.lowest * d <= largest_m; d = ds.Next(d)) {
+        at = std::lower_bound(at, grid.rows.end(), d,
+                              [](const Row& one, int wanted) { return one.d < wanted; });
+        if (at->d != d) continue;
+        const Row& row = *at;
         if (span.highest * (1 + kWider) <= hopeless_ * row.d) break;
         Settings settings;
         Outcome outcome = Outcome::kNot;
@@ -132,12 +164,10 @@ class LoopWithin::Question {
     return std::nullopt;
   }
 
-  // No smaller D has an M with which M / D is in the span.
-  static std::int64_t LeastD(const Span& span, int step, int largest) {
-    if (!(span.lowest > 0)) return 1;
-    return SimplestIn(span.lowest / step * (1 - kWider), span.highest / step * (1 + kWider),
-                      largest)
-        .denominator;
+  static int LargestM(const LoopGrid& grid) {
+    int largest = kEighths;
+    for (const Row& row : grid.rows) largest = std::max(largest, row.last);
+    return largest;
   }
 
   int StepOf(const Asked& output) const {
@@ -150,12 +180,10 @@ class LoopWithin::Question {
            divider >= hardware::kSmallestFractionalDivider * kEighths;
   }
 
-  // Leaves of spans what output `place` of those used leaves.
-  void MeetOutput(std::size_t place, const Spans& spans, Spans* left) const {
-    const Asked& output = within_.outputs_[place];
+  // Leaves of spans what an output leaves.
+  void MeetOutput(const Asked& output, const Spans& spans, Spans* left) const {
     const Relaxed::OfOutput& own = relaxed_.outputs[output.index];
-    const SpanCase one = {.output = place,
-                          .frequency = own.frequency,
+    const SpanCase one = {.frequency = own.frequency,
                           .phase = own.phase,
                           .duty = own.duty,
                           .range = own.range,
@@ -163,16 +191,16 @@ class LoopWithin::Question {
                           .second_input = relaxed_.second_input,
                           .moves = moves_,
                           .in_eighths = StepOf(output) == 1};
-    const SpanStore::Kept kept = within_.spans_.Of(one, [&] {
+    const SpanStore::Kept kept = output.spans.Of(one, [&] {
       Spans all;
-      MeetOutput(output, {{0, HUGE_VAL}}, &all);
+      WorkOutSpans(output, {{0, HUGE_VAL}}, &all);
       return all;
     });
     if (kept) return Common(spans, *kept, left);
-    MeetOutput(output, spans, left);
+    WorkOutSpans(output, spans, left);
   }
 
-  void MeetOutput(const Asked& output, const Spans& spans, Spans* left) const {
+  void WorkOutSpans(const Asked& output, const Spans& spans, Spans* left) const {
     const Relaxed::OfOutput& own = relaxed_.outputs[output.index];
     const RatioRange& range = relaxed_.second_input ? output.first_range : output.range;
     SpanOutput ends = {.lowest = 0,
@@ -249,9 +277,9 @@ class LoopWithin::Question {
       }
     }
     std::array<int, kMostOutputs> dividers{};
-    for (const Asked& output : within_.outputs_) {
-      dividers[output.index] = DividerOf(output, m, d);
-      if (dividers[output.index] == 0) return Outcome::kNot;
+    for (const AskedPointer& output : within_.outputs_) {
+      dividers[output->index] = DividerOf(*output, m, d);
+      if (dividers[output->index] == 0) return Outcome::kNot;
     }
     *settings = SettingsOf(m, d, dividers);
     return Outcome::kFound;
@@ -262,11 +290,11 @@ class LoopWithin::Question {
     made.outputs.resize(within_.request_.outputs.size());
     bool is_whole = m % kEighths == 0;
     for (const int divider : dividers) is_whole = is_whole && divider % kEighths == 0;
-    for (const Asked& output : within_.outputs_) {
-      LoopOutput& set = made.outputs[output.index];
-      set.divider = dividers[output.index];
+    for (const AskedPointer& output : within_.outputs_) {
+      LoopOutput& set = made.outputs[output->index];
+      set.divider = dividers[output->index];
       if (!is_whole && !relaxed_.nothing_moves) continue;
-      const OutputShape& shape = ShapeOf(output);
+      const OutputShape& shape = ShapeOf(*output);
       set.phase = shape.Step(set.divider);
       set.high_time = shape.HighTime(set.divider);
     }

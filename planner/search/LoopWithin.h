@@ -7,6 +7,8 @@
 #ifndef VORKEL_PLANNER_SEARCH_LOOPWITHIN_H_
 #define VORKEL_PLANNER_SEARCH_LOOPWITHIN_H_
 
+#include <cstddef>
+#include <memory>
 #include <optional>
 #include <vector>
 
@@ -27,23 +29,42 @@ namespace planner::search {
 
 class LoopWithin {
  public:
-  LoopWithin(const Request& request, const Device& device, Primitive primitive);
+  // `like` is another question to the same primitive, or null: the outputs of which all is the same
+  // there are prepared once for both.
+  LoopWithin(const Request& request, const Device& device, Primitive primitive,
+             const LoopWithin* like);
 
   std::optional<Settings> Find(const Relaxed& relaxed) const;
 
  private:
   class Question;
 
+  // All that the rest of an output depends on.
+  struct Cause {
+    std::vector<Rational> inputs;
+    Output demand;  // with the tolerances that count
+    Range range;
+    int largest_count;
+    bool operator==(const Cause&) const = default;
+  };
+
   // A used output.
   struct Asked {
+    Asked(std::size_t place, Cause all, const LoopWithin& within);
+
     std::size_t index;
+    Cause cause;
     FrequencyDemand frequency;
     RatioRange range;        // with each input
     RatioRange first_range;  // with the first input alone
     OutputShape shape;
     OutputShape long_shape;  // without the limit of high and low times
     std::optional<Rational> max_jitter;
+    mutable SpanStore spans;
   };
+  using AskedPointer = std::shared_ptr<const Asked>;
+
+  Cause CauseOf(std::size_t index) const;
 
   Request request_;
   LoopLimits limits_;
@@ -51,9 +72,8 @@ class LoopWithin {
   bool fractions_;
   Inputs inputs_;
   Inputs first_input_;
-  std::vector<Asked> outputs_;
+  std::vector<AskedPointer> outputs_;
   answer::LoopJitter jitter_;
-  mutable SpanStore spans_;
 };
 
 }  // namespace planner::search

@@ -52,9 +52,13 @@ class OutputShape {
     Rational exact;
     Rational tolerance;
     double per_unit = 0;
+    double value = 0;      // `exact`
+    double tolerated = 0;  // `tolerance`
   };
   static Demand DemandOf(const Rational& asked, const Rational& tolerance, const Rational& unit);
   static ShapeError Judge(const Demand& demand, const Rational& error);
+  static ShapeError Compare(const Demand& demand, std::int64_t part, int whole);
+  static std::int64_t NearestOf(const Demand& demand, int factor, int per);
 
   int count_;
   Demand phase_;  // in turns

@@ -1,4 +1,4 @@
-// The spans of the VCO that outputs leave, kept for many questions.
+// The spans of the VCO that an output leaves, kept for many questions.
 #ifndef VORKEL_PLANNER_SEARCH_SPANSTORE_H_
 #define VORKEL_PLANNER_SEARCH_SPANSTORE_H_
 
@@ -15,8 +15,7 @@ namespace planner::search {
 
 // What the spans of an output depend on, of all that a question can switch.
 struct SpanCase {
-  std::size_t output;  // its place, below 8
-  bool frequency;      // does not count; likewise the next three
+  bool frequency;  // does not count; likewise the next three
   bool phase;
   bool duty;
   bool range;
@@ -46,7 +45,7 @@ class SpanStore {
     Spans spans = make();
     count_ += spans.size();
     if (count_ > kMost) {
-      // 32 MB are enough: questions that follow each other differ in little.
+      // 8 MB are enough: questions that follow each other differ in little.
       count_ = spans.size();
       for (Kept& other : kept_) other.reset();
     }
@@ -54,11 +53,11 @@ class SpanStore {
   }
 
  private:
-  static constexpr std::size_t kMost = 2'000'000;
-  static constexpr std::size_t kPlaces = std::size_t{1} << 11;
+  static constexpr std::size_t kMost = 500'000;
+  static constexpr std::size_t kPlaces = std::size_t{1} << 8;
 
   static std::size_t PlaceOf(const SpanCase& one) {
-    std::size_t place = one.output;
+    std::size_t place = 0;
     for (const bool bit : {one.frequency, one.phase, one.duty, one.range, one.dividers,
                            one.second_input, one.moves, one.in_eighths}) {
       place = place << 1 | (bit ? 1 : 0);

@@ -61,7 +61,10 @@ void Meet(const Spans& spans, const SpanOutput& output, const IsAllowed& is_allo
     for (int divider = first; divider <= last; divider += output.step) {
       const double lowest = std::max(span.lowest, divider * output.lowest * (1 - kWider));
       const double highest = std::min(span.highest, divider * output.highest * (1 + kWider));
-      if (lowest <= highest && is_allowed(divider)) AddSpan(lowest, highest, left);
+      if (lowest > highest || !is_allowed(divider)) continue;
+      AddSpan(lowest, highest, left);
+      // All that follows lies in there.
+      if (highest == span.highest) break;
     }
   }
 }

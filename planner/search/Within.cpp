@@ -13,10 +13,11 @@ struct Asked {
   std::optional<LoopWithin> loop;
   std::optional<KruWithin> kru;
 
-  Asked(const Request& request, const Device& device, Primitive primitive) {
+  Asked(const Request& request, const Device& device, Primitive primitive, const Asked* like) {
     if (!device.Has(primitive) || !answer::Refusals(request, primitive).empty()) return;
     if (hardware::IsLoop(primitive)) {
-      loop.emplace(request, device, primitive);
+      loop.emplace(request, device, primitive,
+                   like != nullptr && like->loop ? &*like->loop : nullptr);
     } else {
       kru.emplace(request, device, primitive);
     }
@@ -30,18 +31,22 @@ struct Asked {
 };
 
 struct Within::Implementation {
-  Implementation(const Request& request, const Device& device, Primitive primitive)
-      : nominal(request, device, primitive) {
+  Implementation(const Request& request, const Device& device, Primitive primitive,
+                 const Implementation* like)
+      : nominal(request, device, primitive, like != nullptr ? &like->nominal : nullptr) {
     if (request.input_tolerance == 0) return;
-    in_corners.emplace(request, answer::Narrowed(device, request.input_tolerance), primitive);
+    in_corners.emplace(request, answer::Narrowed(device, request.input_tolerance), primitive,
+                       like != nullptr && like->in_corners ? &*like->in_corners : nullptr);
   }
 
   Asked nominal;
   std::optional<Asked> in_corners;  // with a tolerance of the inputs
 };
 
-Within::Within(const Request& request, const Device& device, Primitive primitive)
-    : implementation_(std::make_unique<const Implementation>(request, device, primitive)) {}
+Within::Within(const Request& request, const Device& device, Primitive primitive,
+               const Within* like)
+    : implementation_(std::make_unique<const Implementation>(
+          request, device, primitive, like != nullptr ? like->implementation_.get() : nullptr)) {}
 
 Within::~Within() = default;
 Within::Within(Within&&) noexcept = default;

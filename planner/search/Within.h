@@ -70,7 +70,9 @@ struct Relaxed {
 // May be asked from several threads at once.
 class Within {
  public:
-  Within(const Request& request, const Device& device, Primitive primitive);
+  // `like` was made for the same primitive, or is null: what is the same there is prepared once.
+  Within(const Request& request, const Device& device, Primitive primitive,
+         const Within* like = nullptr);
   ~Within();
   Within(Within&&) noexcept;
   Within& operator=(Within&&) noexcept;

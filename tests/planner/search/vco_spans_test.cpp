@@ -119,9 +119,9 @@ TEST(SpanStore, KeepsWhatIsAskedForTwice) {
 TEST(SpanStore, TellsAllCasesApart) {
   SpanStore store;
   for (int round = 0; round < 2; ++round) {
-    for (std::size_t i = 0; i < 2048; ++i) {
+    for (std::size_t i = 0; i < 256; ++i) {
       const auto bit = [i](int n) { return (i >> n & 1) != 0; };
-      const SpanCase one = {.output = i >> 8, .frequency = bit(0), .phase = bit(1),
+      const SpanCase one = {.frequency = bit(0), .phase = bit(1),
                             .duty = bit(2), .range = bit(3), .dividers = bit(4),
                             .second_input = bit(5), .moves = bit(6), .in_eighths = bit(7)};
       const double number = static_cast<double>(i);
