@@ -26,7 +26,8 @@ using compare::Kind;
 
 constexpr Kind kKinds[] = {Kind::kCommon,      Kind::kConstructed,  Kind::kShifted,
                            Kind::kRangeEnds,   Kind::kMeetingEnds,  Kind::kRoundFigures,
-                           Kind::kInfeasible,  Kind::kLowOutput,    Kind::kWild};
+                           Kind::kInfeasible,  Kind::kLowOutput,    Kind::kSlowVco,
+                           Kind::kWild};
 constexpr int kRequestsOfKind = 20'000;
 constexpr unsigned kSeedsOfKind = 1'000'003;
 

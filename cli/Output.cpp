@@ -8,6 +8,7 @@
 #include <cerrno>
 #include <csignal>
 #include <cstdio>
+#include <cstdlib>
 #include <cstring>
 #include <optional>
 #include <string_view>
@@ -82,14 +83,28 @@ void WriteThrough(const std::string& text, const std::string& path) {
   if (file.Close() != 0) Throw(errno, false);
 }
 
+// What a file can be read and written by, and whose it is.
+struct Rights {
+  mode_t mode;
+  std::optional<std::pair<uid_t, gid_t>> owners;  // those of a file that was there
+};
+
+// Of a file that was not there: what the user does not mask.
+mode_t UsualMode() {
+  constexpr mode_t kAll = 0666;
+  const mode_t masked = umask(0);
+  umask(masked);
+  return kAll & ~masked;
+}
+
 // A file beside another one, with a name of its own, that is gone unless it takes the other's
-// place.
+// place. Until then nobody else can read it. One that was left by a process that was killed is in
+// nobody's way.
 class Draft {
  public:
   explicit Draft(const std::string& path) : path_(path) {
-    name_ = FolderOf(path) + ".vorkel." + std::to_string(getpid());
-    constexpr mode_t kMode = 0666;  // without what the user masks
-    descriptor_.emplace(open(name_.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, kMode));
+    name_ = FolderOf(path) + ".vorkel.XXXXXX";
+    descriptor_.emplace(mkostemp(name_.data(), O_CLOEXEC));
     if (descriptor_->number() < 0) {
       name_.clear();
       Throw(errno);
@@ -101,9 +116,16 @@ class Draft {
   Draft(const Draft&) = delete;
   Draft& operator=(const Draft&) = delete;
 
-  void Write(const std::string& text, std::optional<mode_t> mode) {
+  void Write(const std::string& text, const Rights& rights) {
     WriteTo(descriptor_->number(), text);
-    if (mode && fchmod(descriptor_->number(), *mode) != 0) Throw(errno, false);
+    // Who may not give a file away keeps it.
+    if (rights.owners &&
+        fchown(descriptor_->number(), rights.owners->first, rights.owners->second) != 0 &&
+        errno != EPERM) {
+      Throw(errno, false);
+    }
+    // Some file systems have the same rights for all files.
+    if (fchmod(descriptor_->number(), rights.mode) != 0 && errno != EPERM) Throw(errno, false);
     // Some file systems have no such call, and then nothing to wait for.
     if (fsync(descriptor_->number()) != 0 && errno != EINVAL && errno != ENOSYS) {
       Throw(errno, false);
@@ -139,7 +161,8 @@ void WriteWhole(const std::string& text, const std::string& name) {
   }
   constexpr mode_t kRights = 07777;
   Draft draft(path);
-  draft.Write(text, is_there ? std::optional<mode_t>(status.st_mode & kRights) : std::nullopt);
+  draft.Write(text, is_there ? Rights{status.st_mode & kRights, {{status.st_uid, status.st_gid}}}
+                             : Rights{UsualMode(), {}});
   draft.TakePlace();
 }
 

@@ -41,6 +41,8 @@ namespace eval ::tcl_request {
   # The processor time of the process in seconds, and its memory in KiB.
   variable most_time 2
   variable most_memory 262144
+  # How many letters are read to find where commands end.
+  variable most_read 20000000
   # The letters of a value and of a message, and how many clocks are listed: no request has more.
   variable longest 1000
   variable most_clocks 1000
@@ -253,7 +255,9 @@ proc ::tcl_request::Begin {number} {
 # The commands of a text, each with the line on which it begins: what is wrong is told with a
 # line, and not even a command that never ends takes it away. Several on one line stay together.
 proc ::tcl_request::Chunks {text} {
+  variable most_read
   set chunks {}
+  set read 0
   set chunk ""
   set number 0
   set first 1
@@ -267,6 +271,10 @@ proc ::tcl_request::Chunks {text} {
     append chunk $line \n
     # What is open stays so where nothing of a line can close it.
     if {$number > $first && !$continued && ![regexp {[\]\}"]} $line]} continue
+    # A long command is read again with each line that could end it.
+    if {[incr read [string length $chunk]] > $most_read} {
+      Refuse "the command that begins here is longer than any request, or is not closed"
+    }
     if {[info complete $chunk]} {
       lappend chunks $first $chunk
       set chunk ""

@@ -289,6 +289,31 @@ Case DrawLowOutput(Random& random) {
   return drawn;
 }
 
+// Made from a setting of a device whose VCO has but a few MHz; output 0 can be moved a little.
+Case DrawSlowVco(Random& random) {
+  Case drawn;
+  DrawOptions(drawn.request, random);
+  plain::PllLimits& limits = drawn.limits;
+  limits = DeviceLimits(drawn.request.prim, true);
+  limits.vcoMin = random.Real(2, 30);
+  limits.vcoMax = limits.vcoMin * random.Real(1.2, 3);
+  limits.clkoutMin = random.Real(0.01, 0.2);
+  limits.clkoutMax = limits.clkoutMaxIo = limits.vcoMax;
+  limits.pfdMin = random.Real(0.05, 1);
+  limits.vcoTarget = random.Real(limits.vcoMin, limits.vcoMax);
+  drawn.request.inFreq = random.OneIn(2) ? random.Int(1, 12) : random.Real(0.5, 12);
+  drawn.request.inFreq2 = 0;
+  Setting setting = DrawSetting(drawn, random);
+  setting.div0 = random.Int(8, 128);
+  std::vector<std::string> outputs = Outputs(setting, drawn.request.count, random);
+  if (random.OneIn(2)) {
+    outputs[0] = Number("%.6f", setting.vco / setting.div0 + random.Real(-0.02, 0.02));
+  }
+  drawn.request.outFreqs = Join(outputs);
+  DrawPhasesAndDutyCycles(drawn.request, random);
+  return drawn;
+}
+
 Case DrawWild(Random& random) {
   static const std::vector<std::string> odd = {
       "0",   "-0",  "-100", "1e308", "1e-308", "inf",  "-inf", "nan",  "0x64", "abc",
@@ -326,6 +351,7 @@ const char* KindName(Kind kind) {
     case Kind::kRoundFigures: return "RoundFigures";
     case Kind::kInfeasible: return "Infeasible";
     case Kind::kLowOutput: return "LowOutput";
+    case Kind::kSlowVco: return "SlowVco";
     case Kind::kWild: return "Wild";
   }
   return "";
@@ -344,6 +370,7 @@ Case DrawCase(Kind kind, Random& random) {
     case Kind::kRoundFigures: return DrawRoundFigures(random);
     case Kind::kInfeasible: return DrawInfeasible(random);
     case Kind::kLowOutput: return DrawLowOutput(random);
+    case Kind::kSlowVco: return DrawSlowVco(random);
     case Kind::kWild: return DrawWild(random);
   }
   return {};

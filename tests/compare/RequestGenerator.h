@@ -23,6 +23,7 @@ enum class Kind {
   kInfeasible,   // nothing serves it: the search goes through all fudges
   kLowOutput,    // an output so low that only the lower VCO frequencies serve it
   kWild,         // zero, negative, huge, inf, nan, text, short and long lists, odd counts
+  kSlowVco,      // a VCO so slow that outputs are below 1 MHz
 };
 const char* KindName(Kind kind);
 

@@ -141,7 +141,7 @@ INSTANTIATE_TEST_SUITE_P(Kinds, PassFilterProperty,
                          testing::Values(Kind::kCommon, Kind::kConstructed, Kind::kShifted,
                                          Kind::kRangeEnds, Kind::kMeetingEnds,
                                          Kind::kRoundFigures, Kind::kInfeasible, Kind::kLowOutput,
-                                         Kind::kWild),
+                                         Kind::kSlowVco, Kind::kWild),
                          [](const testing::TestParamInfo<Kind>& parameter) {
                            return KindName(parameter.param);
                          });

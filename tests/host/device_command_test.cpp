@@ -64,6 +64,28 @@ TEST_F(DeviceCommandTest, DescribesADevice) {
   EXPECT_EQ(Described("dev", "calculator slow"), "");
 }
 
+// Of one group and of both: those that a grade lacks are left out, and no more.
+TEST_F(DeviceCommandTest, ListsTheCoefficients) {
+  const std::string kru =
+      "KRU_KAPPA = 80\nKRU_TAP_STEP = 40.5\nKRU_BUFFER_JITTER = 4\nKRU_PHASE_ERROR = 200\n";
+  const std::string loop =
+      "LOOP_LEAKAGE = 60\nLOOP_KAPPA = 40\nLOOP_KAPPA_VCO = 800\nLOOP_BANDWIDTH_LOW = 0.01\n"
+      "LOOP_BANDWIDTH_OPTIMIZED = 0.02\nLOOP_BANDWIDTH_HIGH = 0.04\nLOOP_BUFFER_JITTER = 3\n"
+      "LOOP_DETERMINISTIC_JITTER = 30\nLOOP_STATIC_OFFSET = 60\n";
+  folder_.Write("dev.toml", "device = \"dev\"\npackages = [\"p1\"]\n[grade.1.calculator]\n" + kru +
+                                "[grade.2.calculator]\n" + loop + "[grade.3.calculator]\n" + kru +
+                                loop);
+  const std::string kru_listed =
+      "KRU_KAPPA 80 KRU_TAP_STEP 40.5 KRU_BUFFER_JITTER 4 KRU_PHASE_ERROR 200";
+  const std::string loop_listed =
+      "LOOP_KAPPA 40 LOOP_KAPPA_VCO 800 LOOP_BANDWIDTH_LOW 0.01 LOOP_BANDWIDTH_OPTIMIZED 0.02 "
+      "LOOP_BANDWIDTH_HIGH 0.04 LOOP_BUFFER_JITTER 3 LOOP_DETERMINISTIC_JITTER 30 "
+      "LOOP_STATIC_OFFSET 60 LOOP_LEAKAGE 60";
+  EXPECT_EQ(Described("dev", "calculator 1"), kru_listed);
+  EXPECT_EQ(Described("dev", "calculator 2"), loop_listed);
+  EXPECT_EQ(Described("dev", "calculator 3"), loop_listed + " " + kru_listed);
+}
+
 TEST_F(DeviceCommandTest, DescribesADeviceWithoutDefaults) {
   folder_.Write("dev.toml",
                 "device = \"dev\"\npackages = [\"p1\"]\n[grade.1]\n"

@@ -3,6 +3,7 @@
 // Tested by device_file_test.cpp, and examine_test.cpp.
 #include <algorithm>
 #include <cmath>
+#include <set>
 #include <utility>
 
 #include "host/bundled/device/DeviceFile.h"
@@ -156,14 +157,15 @@ class Builder {
       return;
     }
     if (packages->empty()) Note(node, "\"packages\" must name at least one package");
-    for (const toml::node& element : *packages) TakePackage(element);
+    std::set<std::string> seen;
+    for (const toml::node& element : *packages) TakePackage(element, &seen);
     has_packages_ = mistakes_.size() == mistakes;
   }
 
-  void TakePackage(const toml::node& element) {
+  void TakePackage(const toml::node& element, std::set<std::string>* seen) {
     const auto package = Text("packages", element);
     if (!package || !RequireName("package", *package, element)) return;
-    if (file_.HasPackage(*package)) {
+    if (!seen->insert(*package).second) {
       Note(element, "duplicate package " + Quoted(*package));
       return;
     }
