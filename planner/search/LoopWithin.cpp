@@ -191,7 +191,8 @@ class LoopWithin::Question {
                           .second_input = relaxed_.second_input,
                           .moves = moves_,
                           .in_eighths = StepOf(output) == 1};
-    const SpanStore::Kept kept = output.spans.Of(one, [&] {
+    constexpr std::size_t kMany = 64;
+    const SpanStore::Kept kept = output.spans.Of(one, spans.size() > kMany, [&] {
       Spans all;
       WorkOutSpans(output, {{0, HUGE_VAL}}, &all);
       return all;

@@ -30,15 +30,15 @@ class SpanStore {
  public:
   using Kept = std::shared_ptr<const Spans>;
 
-  // The spans of a case, which `make` works out when they are not there. None the first time: who
-  // asks but once needs a few of them, and has these sooner by himself.
+  // The spans of a case, which `make` works out when they are not there. None the first time,
+  // unless many are wanted: who asks but once for a few of them has these sooner by himself.
   template <typename Make>
-  Kept Of(const SpanCase& one, const Make& make) {
+  Kept Of(const SpanCase& one, bool wants_many, const Make& make) {
     const std::lock_guard lock(mutex_);
     const std::size_t place = PlaceOf(one);
     Kept& kept = kept_[place];
     if (kept) return kept;
-    if (!was_asked_[place]) {
+    if (!wants_many && !was_asked_[place]) {
       was_asked_[place] = true;
       return nullptr;
     }

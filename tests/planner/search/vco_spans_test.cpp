@@ -104,16 +104,23 @@ TEST(SpanStore, KeepsWhatIsAskedForTwice) {
   const SpanCase one{};
   SpanCase other{};
   other.moves = true;
-  EXPECT_EQ(store.Of(one, make), nullptr);
-  EXPECT_EQ(store.Of(other, make), nullptr);
+  EXPECT_EQ(store.Of(one, false, make), nullptr);
+  EXPECT_EQ(store.Of(other, false, make), nullptr);
   EXPECT_EQ(made, 0);
-  const SpanStore::Kept kept = store.Of(one, make);
+  const SpanStore::Kept kept = store.Of(one, false, make);
   ASSERT_NE(kept, nullptr);
   EXPECT_THAT(*kept, testing::ElementsAre(IsSpan(1, 2)));
-  EXPECT_EQ(store.Of(one, make), kept);
+  EXPECT_EQ(store.Of(one, false, make), kept);
   EXPECT_EQ(made, 1);
-  EXPECT_NE(store.Of(other, make), kept);
+  EXPECT_NE(store.Of(other, false, make), kept);
   EXPECT_EQ(made, 2);
+}
+
+TEST(SpanStore, HasManyTheFirstTime) {
+  SpanStore store;
+  const SpanStore::Kept kept = store.Of({}, true, [] { return Spans{{1, 2}}; });
+  ASSERT_NE(kept, nullptr);
+  EXPECT_THAT(*kept, testing::ElementsAre(IsSpan(1, 2)));
 }
 
 TEST(SpanStore, TellsAllCasesApart) {
@@ -125,7 +132,7 @@ TEST(SpanStore, TellsAllCasesApart) {
                             .duty = bit(2), .range = bit(3), .dividers = bit(4),
                             .second_input = bit(5), .moves = bit(6), .in_eighths = bit(7)};
       const double number = static_cast<double>(i);
-      const SpanStore::Kept kept = store.Of(one, [&] { return Spans{{number, number}}; });
+      const SpanStore::Kept kept = store.Of(one, false, [&] { return Spans{{number, number}}; });
       ASSERT_EQ(kept == nullptr, round == 0);
       if (kept) {
         ASSERT_EQ(kept->front().lowest, number);
