@@ -33,7 +33,9 @@
 # single command costs is not seen there, so the interpreter lives in a process of its own, whose
 # memory and processor time are bounded, and which tells each command that it begins. When that
 # process does not live to answer, the line of its last command is known, and the answer is an
-# error. None of these bounds depends on how busy the machine is.
+# error. None of these bounds depends on how busy the machine is, and only that of time on how fast
+# it is: the others end what costs far less. What a request says depends on neither: it has no clock
+# and no random numbers.
 
 namespace eval ::tcl_request {
   variable script [file normalize [info script]]
@@ -52,9 +54,9 @@ namespace eval ::tcl_request {
   variable switches {exact feedback prefer_max_vco int_div0 engine any_order}
   variable options {input {jitter tolerance}
     output {phase duty tolerance phase_tolerance duty_tolerance max_jitter}}
-  # Commands of a safe interpreter that wait, reach other interpreters, or need a channel, of which
-  # there is none.
-  variable withheld {after vwait update interp
+  # Commands of a safe interpreter that wait, know the time, reach other interpreters, or need a
+  # channel, of which there is none.
+  variable withheld {after vwait update interp clock time
     puts gets read close flush eof seek tell fblocked fcopy fileevent chan}
   # The line of the command that runs, and what the commands have said so far: each a list of its
   # line and what is said of it.
@@ -296,6 +298,9 @@ proc ::tcl_request::Interpreter {} {
   }
   foreach name $withheld {
     interp eval $child [list rename $name {}]
+  }
+  foreach name {rand srand} {
+    interp eval $child [list rename ::tcl::mathfunc::$name {}]
   }
   interp limit $child commands -value $most_commands
   return $child

@@ -8,6 +8,7 @@
 #include "planner/read/Options.h"
 #include "planner/read/Settings.h"
 #include "planner/report/ErrorData.h"
+#include "planner/report/JsonText.h"
 
 namespace python {
 
@@ -67,7 +68,7 @@ string WithArguments(const string& sentence) {
 }  // namespace
 
 string Text(const ordered_json& data) {
-  return data.dump(-1, ' ', false, ordered_json::error_handler_t::replace);
+  return planner::report::JsonText(data);
 }
 
 void RefuseMistakes(const planner::read::Mistakes& mistakes) {

@@ -17,9 +17,10 @@ using std::string;
 constexpr std::string_view kEnding = ".toml";
 constexpr int kLargest = 1'000'000;  // bytes
 
-// Through Tcl, so that files of a virtual file system are files, too.
+// Through Tcl, so that files of a virtual file system are files, too. To Tcl a tilde at the
+// beginning is somebody's folder; here it is a letter of a name.
 string Contents(const string& path) {
-  Tcl_Obj* const name = Object(path);
+  Tcl_Obj* const name = Object(path.starts_with('~') ? "./" + path : path);
   Tcl_IncrRefCount(name);
   Tcl_Channel channel = Tcl_FSOpenFileChannel(nullptr, name, "r", 0);
   Tcl_DecrRefCount(name);

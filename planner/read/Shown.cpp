@@ -12,13 +12,6 @@ namespace planner::read {
 
 namespace {
 
-// Letters that move the cursor, or change the direction of what follows.
-bool IsControl(char32_t letter) {
-  return letter < 0x20 || (letter >= 0x7f && letter <= 0x9f) ||
-         (letter >= 0x200b && letter <= 0x200f) || (letter >= 0x2028 && letter <= 0x202e) ||
-         (letter >= 0x2060 && letter <= 0x206f) || letter == 0xfeff;
-}
-
 void AppendHex(std::uint32_t value, int digits, std::string* text) {
   constexpr std::string_view kDigits = "0123456789abcdef";
   for (int shift = 4 * (digits - 1); shift >= 0; shift -= 4) {
@@ -35,7 +28,7 @@ std::string Escaped(std::string_view text, std::size_t most) {
     if (!letter.is_valid) {
       shown += "\\x";
       AppendHex(static_cast<unsigned char>(text[place]), 2, &shown);
-    } else if (IsControl(letter.code)) {
+    } else if (MovesText(letter.code)) {
       const bool is_short = letter.code < 0x100;
       shown += is_short ? "\\x" : "\\u";
       AppendHex(letter.code, is_short ? 2 : 4, &shown);

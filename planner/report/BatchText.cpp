@@ -11,6 +11,7 @@
 #include "planner/report/ErrorData.h"
 #include "planner/report/FindingText.h"
 #include "planner/report/Json.h"
+#include "planner/report/JsonText.h"
 #include "planner/report/Numbers.h"
 #include "planner/report/PartText.h"
 #include "planner/report/SettingsText.h"
@@ -25,14 +26,11 @@ using batch::Status;
 using nlohmann::ordered_json;
 using std::string;
 
-string Dumped(const ordered_json& data) {
-  return data.dump(-1, ' ', false, ordered_json::error_handler_t::replace);
-}
-
 // A text as its user has written it; a number, too.
 string IdJson(const Outcome& outcome) {
   if (!outcome.id) return "null";
-  return outcome.id->type == read::NodeType::kNumber ? outcome.id->text : Dumped(outcome.id->text);
+  return outcome.id->type == read::NodeType::kNumber ? outcome.id->text
+                                                     : JsonText(outcome.id->text);
 }
 
 ordered_json Trouble(const char* kind, const string& message) {
@@ -88,9 +86,9 @@ string JsonLineOf(const Outcome& outcome, const BatchForm& form) {
     line += JsonLine(plan.request, *outcome.device,
                      form.all ? CompareEntries(plan) : PlanEntries(plan, 1), plan.front_cut);
   } else if (outcome.plan) {
-    line += ",\"reasons\":" + Dumped(ReasonsOf(outcome));
+    line += ",\"reasons\":" + JsonText(ReasonsOf(outcome));
   } else {
-    line += ",\"errors\":" + Dumped(ErrorsOf(outcome, form));
+    line += ",\"errors\":" + JsonText(ErrorsOf(outcome, form));
   }
   return line + "}\n";
 }

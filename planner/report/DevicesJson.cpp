@@ -6,6 +6,7 @@
 #include "planner/report/Data.h"
 #include "planner/report/DevicesText.h"
 #include "planner/report/DoubtText.h"
+#include "planner/report/JsonText.h"
 #include "planner/report/Limits.h"
 #include "planner/report/TclDict.h"
 
@@ -121,9 +122,7 @@ ordered_json DeviceData(const Description& description, const std::vector<string
   return Document(ordered_json::array({DescriptionData(description, &grades)}));
 }
 
-string Text(const ordered_json& data) {
-  return data.dump(2, ' ', false, ordered_json::error_handler_t::replace) + "\n";
-}
+string Text(const ordered_json& data) { return JsonText(data, 2) + "\n"; }
 
 }  // namespace
 

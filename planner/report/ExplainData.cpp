@@ -6,6 +6,7 @@
 #include "planner/report/Data.h"
 #include "planner/report/ExplainText.h"
 #include "planner/report/ExplainWords.h"
+#include "planner/report/JsonText.h"
 #include "planner/report/TclDict.h"
 
 namespace planner::report {
@@ -185,10 +186,7 @@ class Data {
 }  // namespace
 
 std::string ExplainJson(const Explanation& explanation, const Device& device) {
-  return Data(explanation, device)
-             .All()
-             .dump(2, ' ', false, ordered_json::error_handler_t::replace) +
-         "\n";
+  return JsonText(Data(explanation, device).All(), 2) + "\n";
 }
 
 std::string ExplainTcl(const Explanation& explanation, const Device& device) {

@@ -8,6 +8,7 @@
 #include "planner/answer/Rank.h"
 #include "planner/report/Data.h"
 #include "planner/report/FrontText.h"
+#include "planner/report/JsonText.h"
 #include "planner/report/TclDict.h"
 
 namespace planner::report {
@@ -105,16 +106,12 @@ std::vector<Entry> BestEntries(const plan::Plan& plan, std::size_t number, std::
 
 string Json(const Request& request, const Device& device, const std::vector<Entry>& entries,
             const std::vector<Primitive>& front_cut) {
-  // What is no UTF-8 in a text of others is replaced.
-  return Document(request, device, entries, front_cut)
-             .dump(2, ' ', false, ordered_json::error_handler_t::replace) +
-         "\n";
+  return JsonText(Document(request, device, entries, front_cut), 2) + "\n";
 }
 
 string JsonLine(const Request& request, const Device& device, const std::vector<Entry>& entries,
                 const std::vector<Primitive>& front_cut) {
-  return Document(request, device, entries, front_cut)
-      .dump(-1, ' ', false, ordered_json::error_handler_t::replace);
+  return JsonText(Document(request, device, entries, front_cut));
 }
 
 string Tcl(const Request& request, const Device& device, const std::vector<Entry>& entries,

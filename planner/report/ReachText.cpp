@@ -8,6 +8,7 @@
 
 #include "planner/report/Csv.h"
 #include "planner/report/Data.h"
+#include "planner/report/JsonText.h"
 #include "planner/report/Numbers.h"
 #include "planner/report/ReachData.h"
 #include "planner/report/SettingsText.h"
@@ -85,7 +86,7 @@ class JsonWriter final : public Writer {
              const Sink& sink)
       : Writer(sink), request_(request), device_(device), question_(question) {}
   void Begin() override {
-    string head = ReachHead(request_, device_, question_).dump();
+    string head = JsonText(ReachHead(request_, device_, question_));
     head.pop_back();
     Put(head + ",\"primitives\":[");
   }
@@ -103,7 +104,7 @@ class JsonWriter final : public Writer {
     Add(GapData(reach, request_, gap));
   }
   void AddCount(const Reach& reach, const reach::Counted& counted) override {
-    Put("," + CountData(reach, counted).dump().substr(1));
+    Put("," + JsonText(CountData(reach, counted)).substr(1));
   }
   void EndPrimitive(const Reach&, std::int64_t all, std::int64_t shown) override {
     if (question_.kind == Kind::kCount) return;
@@ -121,7 +122,7 @@ class JsonWriter final : public Writer {
  private:
   void Add(const ordered_json& data) {
     Put(std::exchange(is_first_, false) ? "\n" : ",\n");
-    Put(data.dump());
+    Put(JsonText(data));
   }
 
   const Request& request_;

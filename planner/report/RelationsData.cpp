@@ -5,6 +5,7 @@
 #include <vector>
 
 #include "planner/report/Data.h"
+#include "planner/report/JsonText.h"
 #include "planner/report/Relations.h"
 #include "planner/report/TclDict.h"
 
@@ -138,10 +139,7 @@ string ClockName(const Request& request, const Clock& clock) {
 
 string RelationsJson(const Request& request, const Device& device, const Answer& answer,
                      const relations::Rule& rule) {
-  // What is no UTF-8 in a text of others is replaced.
-  return Document(request, device, answer, rule)
-             .dump(2, ' ', false, ordered_json::error_handler_t::replace) +
-         "\n";
+  return JsonText(Document(request, device, answer, rule), 2) + "\n";
 }
 
 string RelationsTcl(const Request& request, const Device& device, const Answer& answer,

