@@ -49,7 +49,7 @@ TEST(Denominators, NoneWithoutAQuotient) { EXPECT_THAT(All({2.51, 2.512}, 40), I
 TEST(Denominators, EachWithAQuotientIsAmongThem) {
   compare::Random random(9);
   int fewer = 0;
-  for (int i = 0; i < 20'000; ++i) {
+  for (int i = 0; i < 3'000; ++i) {
     const int most = random.Int(1, 300);
     const double width = std::pow(10, random.Real(-14, 0));
     // About a quotient, or about nothing.
@@ -70,7 +70,7 @@ TEST(Denominators, EachWithAQuotientIsAmongThem) {
     EXPECT_EQ(place, all.size());
     if (static_cast<int>(all.size()) < most / 2) ++fewer;
   }
-  EXPECT_GT(fewer, 5000);
+  EXPECT_GT(fewer, 700);
 }
 
 }  // namespace

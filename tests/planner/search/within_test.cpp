@@ -369,6 +369,59 @@ void CompareRelaxedLoops(Primitive primitive) {
   EXPECT_GT(no, 5);
 }
 
+// One thing of a request or a device is another: a demand, a tolerance for all, an input, a limit.
+void ChangeOne(Random& random, Request* request, Device* device, Primitive primitive) {
+  LoopLimits& limits = primitive == Primitive::kPll ? *device->pll : *device->tsyn;
+  Output& output = request->outputs[static_cast<std::size_t>(
+      random.Int(0, static_cast<int>(request->outputs.size()) - 1))];
+  const Rational some(random.Int(1, 400), 10);
+  switch (random.Int(0, 11)) {
+    case 0: output.frequency = some; break;
+    case 1: output.phase = some; break;
+    case 2: output.duty = some; break;
+    case 3: output.tolerance = some * 100; break;
+    case 4: output.phase_tolerance = some; break;
+    case 5: output.duty_tolerance = some; break;
+    case 6: output.max_jitter = some * 20; break;
+    case 7: request->tolerance = some * 100; break;
+    case 8: request->phase_tolerance = request->duty_tolerance = some; break;
+    case 9: request->inputs[0] = some; break;
+    case 10: limits.output.highest = limits.output.lowest + some; break;
+    default: limits.max_count = random.Int(2, 64); break;
+  }
+}
+
+// Where a question is prepared with the help of another one, its answers are what they are without.
+void CompareWithHelp(Primitive primitive) {
+  Random random(static_cast<std::uint64_t>(primitive) + 300);
+  int yes = 0;
+  int no = 0;
+  for (int i = 0; i < 300 && !testing::Test::HasFailure(); ++i) {
+    const Rational input = drawn::Input(random);
+    const Device device = drawn::SmallDevice(random, primitive, input);
+    const Request request = drawn::RequestFor(random, device, primitive, input, 4);
+    const Relaxed relaxed = DrawRelaxed(random, request.outputs.size(), random.OneIn(2));
+    SCOPED_TRACE(std::to_string(i) + " " + std::string(Name(primitive)) + " " +
+                 drawn::TextOf(request) + "\n" + TextOf(relaxed));
+    const Within first(request, device, primitive);
+    for (int turn = 0; turn < 2; ++turn) (void)first.Find(relaxed);
+    for (int change = 0; change < 4; ++change) {
+      Request changed = request;
+      Device other = device;
+      ChangeOne(random, &changed, &other, primitive);
+      const std::optional<Settings> alone = Within(changed, other, primitive).Find(relaxed);
+      const Within helped(changed, other, primitive, &first);
+      for (int turn = 0; turn < 3; ++turn) EXPECT_EQ(helped.Find(relaxed), alone);
+      ++(alone ? yes : no);
+    }
+  }
+  EXPECT_GT(yes, 100);
+  EXPECT_GT(no, 100);
+}
+
+TEST(Within, AnswersTheSameWithTheHelpOfAnotherPll) { CompareWithHelp(Primitive::kPll); }
+TEST(Within, AnswersTheSameWithTheHelpOfAnotherTsyn) { CompareWithHelp(Primitive::kTsyn); }
+
 TEST(Within, FindsWhatIsBeyondTheHardwareOfAPll) { CompareRelaxedLoops(Primitive::kPll); }
 TEST(Within, FindsWhatIsBeyondTheHardwareOfATsyn) { CompareRelaxedLoops(Primitive::kTsyn); }
 
