@@ -33,13 +33,6 @@ inline Letter LetterAt(std::string_view text, std::size_t place) {
   return {code, size, true};
 }
 
-// Whether a letter moves the cursor, or changes the direction of what follows.
-inline bool MovesText(char32_t letter) {
-  return letter < 0x20 || (letter >= 0x7f && letter <= 0x9f) ||
-         (letter >= 0x200b && letter <= 0x200f) || (letter >= 0x2028 && letter <= 0x202e) ||
-         (letter >= 0x2060 && letter <= 0x206f) || letter == 0xfeff;
-}
-
 inline bool IsUtf8(std::string_view text) {
   for (std::size_t place = 0; place < text.size();) {
     const Letter letter = LetterAt(text, place);

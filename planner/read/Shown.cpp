@@ -6,6 +6,7 @@
 #include <cstdint>
 #include <numeric>
 
+#include "host/bundled/port/ShownText.h"
 #include "planner/read/Letters.h"
 
 namespace planner::read {
@@ -28,7 +29,7 @@ std::string Escaped(std::string_view text, std::size_t most) {
     if (!letter.is_valid) {
       shown += "\\x";
       AppendHex(static_cast<unsigned char>(text[place]), 2, &shown);
-    } else if (MovesText(letter.code)) {
+    } else if (Port::MovesText(letter.code)) {
       const bool is_short = letter.code < 0x100;
       shown += is_short ? "\\x" : "\\u";
       AppendHex(letter.code, is_short ? 2 : 4, &shown);

@@ -6,6 +6,7 @@
 #include <nlohmann/json.hpp>
 #include <string_view>
 
+#include "host/bundled/port/ShownText.h"
 #include "planner/read/Letters.h"
 
 namespace planner::report {
@@ -25,7 +26,7 @@ std::string JsonText(const ordered_json& data, int indent) {
       continue;
     }
     const read::Letter letter = read::LetterAt(text, place);
-    if (read::MovesText(letter.code)) {
+    if (Port::MovesText(letter.code)) {
       shown.append(text, taken, place - taken);
       shown += fmt::format("\\u{:04x}", static_cast<unsigned>(letter.code));
       taken = place + letter.size;

@@ -89,6 +89,9 @@ class KruWithin::Question {
   const Relaxed::OfOutput& OwnOf(std::size_t place) const {
     return relaxed_.outputs[static_cast<std::size_t>(task_.Outputs()[place].Index())];
   }
+  bool AsksForJitter(std::size_t place) const {
+    return !OwnOf(place).jitter && task_.Outputs()[place].Jitter().IsAsked();
+  }
   // Null where the phase does not count.
   const PhaseTable* PhasesOf(std::size_t place) const {
     return OwnOf(place).phase ? nullptr : task_.Outputs()[place].Phases();
@@ -155,16 +158,7 @@ class KruWithin::Question {
     return Outwards(*span);
   }
 
-  static std::optional<Span> Outwards(const Span& span) {
-    const Span wider = {span.lowest * (1 - kWider), span.highest * (1 + kWider)};
-    return wider.lowest > wider.highest ? std::nullopt : std::optional(wider);
-  }
-
-  bool AsksForJitter(std::size_t place) const {
-    return !OwnOf(place).jitter && task_.Outputs()[place].Jitter().IsAsked();
-  }
-
-  // Likewise, with any jitter, and as they are worked out.
+  // Those with any jitter, not yet rounded.
   std::optional<Span> SpanWithoutJitter(const KruPin& pin, std::size_t place,
                                         const KruBase& base) const {
     const KruOutput& output = task_.Outputs()[place];
@@ -192,6 +186,12 @@ class KruWithin::Question {
       span.highest = std::min(span.highest, scale * range.Highest());
     }
     return span;
+  }
+
+  // Empty where the ends have passed each other.
+  static std::optional<Span> Outwards(const Span& span) {
+    const Span wider = {span.lowest * (1 - kWider), span.highest * (1 + kWider)};
+    return wider.lowest > wider.highest ? std::nullopt : std::optional(wider);
   }
 
   // Leaves of a span where the jitter of the synthesiser is known: about where CLKFX is in range.

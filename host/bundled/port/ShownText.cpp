@@ -11,20 +11,6 @@ unsigned char ByteAt(std::string_view text, std::size_t index) {
 
 bool IsContinuation(unsigned char byte) { return (byte & 0xc0) == 0x80; }
 
-// The control characters of ASCII, and those of 8 bits.
-bool IsControl(unsigned char byte) { return byte < 0x20 || (byte >= 0x7f && byte < 0xa0); }
-
-// Whether a letter of three bytes has no width, or turns what follows: U+200B to U+200F, U+2028 to
-// U+202E, U+2060 to U+206F and U+FEFF.
-bool TurnsText(std::string_view letter) {
-  if (letter == "\xef\xbb\xbf") return true;
-  const auto last = static_cast<unsigned char>(letter[2]);
-  if (letter.starts_with("\xe2\x80")) {
-    return (last >= 0x8b && last <= 0x8f) || (last >= 0xa8 && last <= 0xae);
-  }
-  return letter.starts_with("\xe2\x81") && last >= 0xa0 && last <= 0xaf;
-}
-
 // How many bytes the letter has that begins at the index; 1 where none of several bytes does.
 std::size_t LetterSize(std::string_view text, std::size_t index) {
   const unsigned char first = ByteAt(text, index);
@@ -35,9 +21,19 @@ std::size_t LetterSize(std::string_view text, std::size_t index) {
   return size;
 }
 
-void AppendControl(unsigned char byte, std::string* line) {
-  constexpr char kDigits[] = "0123456789abcdef";
-  switch (byte) {
+// The number of a letter of one, two or three bytes; 0xff, which moves nothing, of a longer one.
+char32_t NumberOf(std::string_view letter) {
+  const auto bits = [&](std::size_t i) { return char32_t{ByteAt(letter, i)} & 0x3f; };
+  switch (letter.size()) {
+    case 1: return ByteAt(letter, 0);
+    case 2: return (bits(0) & 0x1f) << 6 | bits(1);
+    case 3: return (bits(0) & 0x0f) << 12 | bits(1) << 6 | bits(2);
+    default: return 0xff;
+  }
+}
+
+void AppendNumber(char32_t number, std::string* line) {
+  switch (number) {
     case '\n':
       *line += "\\n";
       return;
@@ -48,38 +44,26 @@ void AppendControl(unsigned char byte, std::string* line) {
       *line += "\\t";
       return;
     default:
-      *line += "\\x";
-      *line += kDigits[byte >> 4];
-      *line += kDigits[byte & 15];
+      char text[12];
+      std::snprintf(text, sizeof text, number < 0x100 ? "\\x%02x" : "\\u%04x",
+                    static_cast<unsigned>(number));
+      *line += text;
   }
-}
-
-// Of a letter of three bytes.
-void AppendNumber(std::string_view letter, std::string* line) {
-  const unsigned number = (ByteAt(letter, 0) & 0x0fu) << 12 | (ByteAt(letter, 1) & 0x3fu) << 6 |
-                          (ByteAt(letter, 2) & 0x3fu);
-  char text[8];
-  std::snprintf(text, sizeof text, "\\u%04x", number);
-  *line += text;
 }
 
 }  // namespace
 
 std::string Escaped(std::string_view text) {
-  constexpr unsigned char kLeadOfControls = 0xc2;
   std::string line;
   for (std::size_t i = 0; i < text.size();) {
-    const std::size_t size = LetterSize(text, i);
-    const unsigned char last = ByteAt(text, i + size - 1);
-    const bool may_control = size == 1 || (size == 2 && ByteAt(text, i) == kLeadOfControls);
-    if (may_control && IsControl(last)) {
-      AppendControl(last, &line);
-    } else if (size == 3 && TurnsText(text.substr(i, size))) {
-      AppendNumber(text.substr(i, size), &line);
+    const std::string_view letter = text.substr(i, LetterSize(text, i));
+    const char32_t number = NumberOf(letter);
+    if (MovesText(number)) {
+      AppendNumber(number, &line);
     } else {
-      line += text.substr(i, size);
+      line += letter;
     }
-    i += size;
+    i += letter.size();
   }
   return line;
 }

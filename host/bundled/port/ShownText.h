@@ -11,7 +11,15 @@
 
 namespace Port {
 
-// The text with its control characters as \n, \r, \t or \x1b. Letters of UTF-8 stay as they are.
+// Whether a letter moves the cursor of a terminal, has no width, or turns what follows.
+constexpr bool MovesText(char32_t letter) {
+  return letter < 0x20 || (letter >= 0x7f && letter <= 0x9f) ||
+         (letter >= 0x200b && letter <= 0x200f) || (letter >= 0x2028 && letter <= 0x202e) ||
+         (letter >= 0x2060 && letter <= 0x206f) || letter == 0xfeff;
+}
+
+// The text with the letters that move it as \n, \r, \t, \x1b or \u202e. Other letters of UTF-8 stay
+// as they are.
 std::string Escaped(std::string_view text);
 
 // The same for the beginning of a text that is longer than `most` bytes, with "..." behind it.

@@ -219,6 +219,28 @@ std::string TextOf(const Relaxed& relaxed) {
   return text;
 }
 
+// A request to a small device, with something that does not count.
+struct Drawn {
+  Device device;
+  Request request;
+  Relaxed relaxed;
+};
+
+Drawn Draw(Random& random, Primitive primitive, int most_outputs, bool beyond_hardware) {
+  const Rational input = drawn::Input(random);
+  Drawn one;
+  one.device = drawn::SmallDevice(random, primitive, input);
+  one.request = drawn::RequestFor(random, one.device, primitive, input, most_outputs);
+  one.relaxed = DrawRelaxed(random, one.request.outputs.size(), beyond_hardware);
+  return one;
+}
+
+std::string TextOf(int number, Primitive primitive, const Request& request,
+                   const Relaxed& relaxed) {
+  return std::to_string(number) + " " + std::string(Name(primitive)) + " " +
+         drawn::TextOf(request) + "\n" + TextOf(relaxed);
+}
+
 // What is found is as asked for.
 bool IsWithin(const Request& request, const Device& device, Primitive primitive,
               const Relaxed& relaxed, const Settings& settings) {
@@ -239,12 +261,8 @@ void CompareWithSearch(Primitive primitive) {
   int no = 0;
   const int requests = kRequests[static_cast<std::size_t>(primitive)];
   for (int i = 0; i < requests && !testing::Test::HasFailure(); ++i) {
-    const Rational input = drawn::Input(random);
-    const Device device = drawn::SmallDevice(random, primitive, input);
-    const Request request = drawn::RequestFor(random, device, primitive, input, 4);
-    const Relaxed relaxed = DrawRelaxed(random, request.outputs.size(), false);
-    SCOPED_TRACE(std::to_string(i) + " " + std::string(Name(primitive)) + " " +
-                 drawn::TextOf(request) + "\n" + TextOf(relaxed));
+    const auto [device, request, relaxed] = Draw(random, primitive, 4, false);
+    SCOPED_TRACE(TextOf(i, primitive, request, relaxed));
     Request without = request;
     for (std::size_t k = 0; k < request.outputs.size(); ++k) {
       Output& output = without.outputs[k];
@@ -350,12 +368,8 @@ void CompareRelaxedLoops(Primitive primitive) {
   int yes = 0;
   int no = 0;
   for (int i = 0; i < 300 && !testing::Test::HasFailure(); ++i) {
-    const Rational input = drawn::Input(random);
-    const Device device = drawn::SmallDevice(random, primitive, input);
-    const Request request = drawn::RequestFor(random, device, primitive, input, 3);
-    const Relaxed relaxed = DrawRelaxed(random, request.outputs.size(), true);
-    SCOPED_TRACE(std::to_string(i) + " " + std::string(Name(primitive)) + " " +
-                 drawn::TextOf(request) + "\n" + TextOf(relaxed));
+    const auto [device, request, relaxed] = Draw(random, primitive, 3, true);
+    SCOPED_TRACE(TextOf(i, primitive, request, relaxed));
     const std::optional<Settings> settings = Within(request, device, primitive).Find(relaxed);
     if (settings) {
       EXPECT_TRUE(IsWithin(request, device, primitive, relaxed, *settings));
@@ -397,12 +411,8 @@ void CompareWithHelp(Primitive primitive) {
   int yes = 0;
   int no = 0;
   for (int i = 0; i < 300 && !testing::Test::HasFailure(); ++i) {
-    const Rational input = drawn::Input(random);
-    const Device device = drawn::SmallDevice(random, primitive, input);
-    const Request request = drawn::RequestFor(random, device, primitive, input, 4);
-    const Relaxed relaxed = DrawRelaxed(random, request.outputs.size(), random.OneIn(2));
-    SCOPED_TRACE(std::to_string(i) + " " + std::string(Name(primitive)) + " " +
-                 drawn::TextOf(request) + "\n" + TextOf(relaxed));
+    const auto [device, request, relaxed] = Draw(random, primitive, 4, i % 2 == 0);
+    SCOPED_TRACE(TextOf(i, primitive, request, relaxed));
     const Within first(request, device, primitive);
     for (int turn = 0; turn < 2; ++turn) (void)first.Find(relaxed);
     for (int change = 0; change < 4; ++change) {
@@ -465,12 +475,8 @@ void CompareRelaxedKrus(Primitive primitive) {
   int yes = 0;
   int no = 0;
   for (int i = 0; i < 300 && !testing::Test::HasFailure(); ++i) {
-    const Rational input = drawn::Input(random);
-    const Device device = drawn::SmallDevice(random, primitive, input);
-    const Request request = drawn::RequestFor(random, device, primitive, input, 3);
-    const Relaxed relaxed = DrawRelaxed(random, request.outputs.size(), true);
-    SCOPED_TRACE(std::to_string(i) + " " + std::string(Name(primitive)) + " " +
-                 drawn::TextOf(request) + "\n" + TextOf(relaxed));
+    const auto [device, request, relaxed] = Draw(random, primitive, 3, true);
+    SCOPED_TRACE(TextOf(i, primitive, request, relaxed));
     const std::optional<Settings> settings = Within(request, device, primitive).Find(relaxed);
     if (settings) {
       EXPECT_TRUE(IsWithin(request, device, primitive, relaxed, *settings));
