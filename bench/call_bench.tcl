@@ -5,12 +5,13 @@
 #
 # PACKAGE_FOLDER has the package's pkgIndex.tcl, COMMAND_LIBRARY is that of empty_command.cpp, and
 # TABLE the file that the summary goes to (standard output without it). The times are medians of
-# rounds in which all that is compared takes its turn.
+# rounds in which all that is compared takes its turn. Then, what handles cost.
 
 namespace eval call_bench {
     variable rounds 41
     variable unrolled 20        ;# calls in the body of a loop, so that the loop does not count
     variable enough 0.002       ;# seconds that a loop works at least
+    variable handles 20000      ;# made, to see what one costs
     variable goal 1.5           ;# times the empty command with its conversions, at most
     variable methods {
         {GetChosenVCO}
@@ -104,6 +105,46 @@ proc call_bench::new_handle {} {
     return $handle
 }
 
+# A new handle as a script begins with: it is made, takes a device and answers a first request.
+proc call_bench::first_answer {} {
+    new_handle
+}
+
+# Bytes of memory that the process has.
+proc call_bench::memory {} {
+    set status [open /proc/self/status]
+    regexp {VmRSS:\s+(\d+) kB} [read $status] -> kilobytes
+    close $status
+    expr {$kilobytes * 1024}
+}
+
+# Seconds and bytes of one handle of `count` that `script` makes. Handles live as long as the
+# process, so what they take adds up.
+proc call_bench::of_a_handle {count script} {
+    # A first one, for what is made once in a process.
+    uplevel #0 $script
+    set before [memory]
+    set start [Bench::WorkedSeconds]
+    for {set i 0} {$i < $count} {incr i} $script
+    set seconds [expr {([Bench::WorkedSeconds] - $start) / $count}]
+    list $seconds [expr {double([memory] - $before) / $count}]
+}
+
+# What handles cost: alone, and with a device and an answer.
+proc call_bench::handles {channel} {
+    variable handles
+    puts $channel "\n| Handles | of one: time | memory |"
+    puts $channel "|---|---:|---:|"
+    foreach {name script} {
+        "made" Ip::Vorkel::Init
+        "made, with a device and a first answer" ::call_bench::first_answer
+    } {
+        lassign [of_a_handle $handles $script] seconds bytes
+        puts $channel [format "| %d %s | %.1f us | %.1f kB |" $handles $name \
+            [expr {$seconds * 1e6}] [expr {$bytes / 1024}]]
+    }
+}
+
 # The method is nothing to be timed unless it answers.
 proc call_bench::check {handle words} {
     if {[catch {$handle {*}$words} answer]} {error "$words: $answer"}
@@ -131,6 +172,7 @@ proc call_bench::main {package library {table ""}} {
         "\nOne call of %s from Tcl: %.2f us; an empty command: %.2f us." $solving \
         [expr {[median [dict get $seconds $handle]] * 1e6}] \
         [expr {[median [dict get $seconds ::Bench::Empty]] * 1e6}]]
+    handles $channel
     if {$table ne ""} {close $channel}
 }
 

@@ -63,6 +63,8 @@ class VorkelImp {
   // One value of the device's speed data: MHz, ns or a count, by keyword. False, with the
   // reason issued as a message and `value` untouched, when it cannot be read.
   bool GetSpdKeyValue(Port::StringBase keyword, double* value);
+  // The same, for those who keep their keyword.
+  bool ReadSpeedData(const Port::StringBase& keyword, double* value);
 
   // Fill the limits from the speed data. Each stops at the first keyword that cannot be read
   // and returns false; the fields read before it keep their new values.

@@ -2,7 +2,7 @@
 //
 // Tested by limit_loaders_test.cpp.
 
-#include <span>
+#include <vector>
 
 #include "engine/Ip_VorkelImp.h"
 #include "engine/pll/Stages.h"
@@ -13,60 +13,78 @@ namespace {
 
 template <typename Limits>
 struct Key {
-  const char* keyword;
+  Port::StringBase keyword;
   double Limits::*field;
 };
 
-// O_MAX_HT_LT is read twice; a host that counts its reads sees both.
-constexpr Key<PllLimits> kPllKeys[] = {
-    {"VCOCLK_FREQ_MIN", &PllLimits::vcoMin},
-    {"VCOCLK_FREQ_MAX", &PllLimits::vcoMax},
-    {"CLKOUT_FREQ_MIN_GCLK", &PllLimits::clkoutMin},
-    {"CLKOUT_FREQ_MAX_GCLK", &PllLimits::clkoutMax},
-    {"CLKPFD_FREQ_MIN", &PllLimits::pfdMin},
-    {"CLKPFD_FREQ_MAX", &PllLimits::pfdMax},
-    {"O_MAX_HT_LT", &PllLimits::maxHighLowCount},
-    {"CLKOUT_FREQ_MAX_IOCLK", &PllLimits::clkoutMaxIo},
-    {"O_MAX_HT_LT", &PllLimits::maxHighLowCount},
-};
+template <typename Limits>
+using Keys = std::vector<Key<Limits>>;
 
-constexpr Key<PllLimits> kTsynKeys[] = {
-    {"TSYN_VCOCLK_FREQ_MIN", &PllLimits::vcoMin},
-    {"TSYN_VCOCLK_FREQ_MAX", &PllLimits::vcoMax},
-    {"TSYN_CLKOUT_FREQ_MIN", &PllLimits::clkoutMin},
-    {"TSYN_CLKOUT_FREQ_MAX", &PllLimits::clkoutMax},
-    {"TSYN_CLKPFD_FREQ_MIN", &PllLimits::pfdMin},
-    {"TSYN_CLKPFD_FREQ_MAX", &PllLimits::pfdMax},
-    {"TSYN_VCOCLK_FREQ_TARGET", &PllLimits::vcoTarget},
-    {"O_MAX_HT_LT", &PllLimits::maxHighLowCount},
-    {"TSYN_CLKPFD_FREQ_MAX_LBW", &PllLimits::_maxPfdLowB},
-};
+// The host is asked for every keyword at every load, in the order of the table; its strings are
+// made at the first. They are never destroyed: a run may come at the very end of the process.
+
+// O_MAX_HT_LT is read twice; a host that counts its reads sees both.
+const Keys<PllLimits>& PllKeys() {
+  static const auto* const keys = new Keys<PllLimits>{
+      {"VCOCLK_FREQ_MIN", &PllLimits::vcoMin},
+      {"VCOCLK_FREQ_MAX", &PllLimits::vcoMax},
+      {"CLKOUT_FREQ_MIN_GCLK", &PllLimits::clkoutMin},
+      {"CLKOUT_FREQ_MAX_GCLK", &PllLimits::clkoutMax},
+      {"CLKPFD_FREQ_MIN", &PllLimits::pfdMin},
+      {"CLKPFD_FREQ_MAX", &PllLimits::pfdMax},
+      {"O_MAX_HT_LT", &PllLimits::maxHighLowCount},
+      {"CLKOUT_FREQ_MAX_IOCLK", &PllLimits::clkoutMaxIo},
+      {"O_MAX_HT_LT", &PllLimits::maxHighLowCount},
+  };
+  return *keys;
+}
+
+const Keys<PllLimits>& TsynKeys() {
+  static const auto* const keys = new Keys<PllLimits>{
+      {"TSYN_VCOCLK_FREQ_MIN", &PllLimits::vcoMin},
+      {"TSYN_VCOCLK_FREQ_MAX", &PllLimits::vcoMax},
+      {"TSYN_CLKOUT_FREQ_MIN", &PllLimits::clkoutMin},
+      {"TSYN_CLKOUT_FREQ_MAX", &PllLimits::clkoutMax},
+      {"TSYN_CLKPFD_FREQ_MIN", &PllLimits::pfdMin},
+      {"TSYN_CLKPFD_FREQ_MAX", &PllLimits::pfdMax},
+      {"TSYN_VCOCLK_FREQ_TARGET", &PllLimits::vcoTarget},
+      {"O_MAX_HT_LT", &PllLimits::maxHighLowCount},
+      {"TSYN_CLKPFD_FREQ_MAX_LBW", &PllLimits::_maxPfdLowB},
+  };
+  return *keys;
+}
 
 // The KRU keywords are periods: the shortest period is the highest frequency.
-constexpr Key<KruLimits> kKruKeys[] = {
-    {"D_KRU_CLK0_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MINPERIOD", &KruLimits::_kruClk0Max},
-    {"D_KRU_CLK0_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MAXPERIOD", &KruLimits::_kruClk0Min},
-    {"D_KRU_CLK0_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_2X_MINPERIOD", &KruLimits::_kruClk0Max2x},
-    {"D_KRU_CLK90_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MINPERIOD", &KruLimits::_kruClk90Max},
-    {"D_KRU_CLK90_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MAXPERIOD", &KruLimits::_kruClk90Min},
-    {"D_KRU_CLK90_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_2X_MINPERIOD",
-     &KruLimits::_kruClk90Max2x},
-    {"D_KRU_CLK2X_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MINPERIOD", &KruLimits::_kruClk2xMax},
-    {"D_KRU_CLK2X_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MAXPERIOD", &KruLimits::_kruClk2xMin},
-    {"D_KRU_CLKDV_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MINPERIOD", &KruLimits::_kruClkdvMax},
-    {"D_KRU_CLKDV_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MAXPERIOD", &KruLimits::_kruClkdvMin},
-    {"D_KRU_CLKDV_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_2X_MINPERIOD",
-     &KruLimits::_kruClkdvMax2x},
-    {"D_KRU_CLKFX_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MINPERIOD", &KruLimits::_kruClkfxMax},
-    {"D_KRU_CLKFX_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MAXPERIOD", &KruLimits::_kruClkfxMin},
-};
+const Keys<KruLimits>& KruKeys() {
+  static const auto* const keys = new Keys<KruLimits>{
+      {"D_KRU_CLK0_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MINPERIOD", &KruLimits::_kruClk0Max},
+      {"D_KRU_CLK0_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MAXPERIOD", &KruLimits::_kruClk0Min},
+      {"D_KRU_CLK0_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_2X_MINPERIOD", &KruLimits::_kruClk0Max2x},
+      {"D_KRU_CLK90_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MINPERIOD", &KruLimits::_kruClk90Max},
+      {"D_KRU_CLK90_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MAXPERIOD", &KruLimits::_kruClk90Min},
+      {"D_KRU_CLK90_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_2X_MINPERIOD",
+       &KruLimits::_kruClk90Max2x},
+      {"D_KRU_CLK2X_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MINPERIOD", &KruLimits::_kruClk2xMax},
+      {"D_KRU_CLK2X_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MAXPERIOD", &KruLimits::_kruClk2xMin},
+      {"D_KRU_CLKDV_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MINPERIOD", &KruLimits::_kruClkdvMax},
+      {"D_KRU_CLKDV_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MAXPERIOD", &KruLimits::_kruClkdvMin},
+      {"D_KRU_CLKDV_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_2X_MINPERIOD",
+       &KruLimits::_kruClkdvMax2x},
+      {"D_KRU_CLKFX_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MINPERIOD", &KruLimits::_kruClkfxMax},
+      {"D_KRU_CLKFX_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MAXPERIOD", &KruLimits::_kruClkfxMin},
+  };
+  return *keys;
+}
 
-constexpr Key<KruLimits> kKruClkgenKeys[] = {
-    {"D_KRU_CLKFX_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MINPERIOD", &KruLimits::_kruClkfxMax},
-    {"D_KRU_CLKFX_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MAXPERIOD", &KruLimits::_kruClkfxMin},
-    {"D_KRU_CLKFXDV_CLKIN_DIVIDE_BY_2_FALSE_MAXPERIOD", &KruLimits::_kruClkfxdvMin},
-    {"D_KRU_CLKFXDV_CLKIN_DIVIDE_BY_2_FALSE_MINPERIOD", &KruLimits::_kruClkfxdvMax},
-};
+const Keys<KruLimits>& KruClkgenKeys() {
+  static const auto* const keys = new Keys<KruLimits>{
+      {"D_KRU_CLKFX_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MINPERIOD", &KruLimits::_kruClkfxMax},
+      {"D_KRU_CLKFX_CLKIN_DIVIDE_BY_2_FALSE_CLK_FEEDBACK_1X_MAXPERIOD", &KruLimits::_kruClkfxMin},
+      {"D_KRU_CLKFXDV_CLKIN_DIVIDE_BY_2_FALSE_MAXPERIOD", &KruLimits::_kruClkfxdvMin},
+      {"D_KRU_CLKFXDV_CLKIN_DIVIDE_BY_2_FALSE_MINPERIOD", &KruLimits::_kruClkfxdvMax},
+  };
+  return *keys;
+}
 
 double AsRead(double value) { return value; }
 
@@ -74,11 +92,10 @@ double AsRead(double value) { return value; }
 double FrequencyOfPeriod(double period) { return 1000.0 / period; }
 
 template <typename Limits>
-bool Load(VorkelImp& imp, std::span<const Key<Limits>> keys, Limits& limits,
-          double (*convert)(double)) {
+bool Load(VorkelImp& imp, const Keys<Limits>& keys, Limits& limits, double (*convert)(double)) {
   for (const Key<Limits>& key : keys) {
     double value = 0.0;
-    if (!imp.GetSpdKeyValue(key.keyword, &value)) return false;
+    if (!imp.ReadSpeedData(key.keyword, &value)) return false;
     limits.*key.field = convert(value);
   }
   return true;
@@ -88,20 +105,20 @@ bool Load(VorkelImp& imp, std::span<const Key<Limits>> keys, Limits& limits,
 
 bool VorkelImp::LoadPllLimits(int prim) {
   switch (prim) {
-    case Pll::kPll: return Load<PllLimits>(*this, kPllKeys, pllLimits, AsRead);
-    case Pll::kTsyn: return Load<PllLimits>(*this, kTsynKeys, pllLimits, AsRead);
+    case Pll::kPll: return Load(*this, PllKeys(), pllLimits, AsRead);
+    case Pll::kTsyn: return Load(*this, TsynKeys(), pllLimits, AsRead);
     default: return false;
   }
 }
 
 bool VorkelImp::LoadKruLimits() {
-  return Load<KruLimits>(*this, kKruKeys, kruLimits, FrequencyOfPeriod);
+  return Load(*this, KruKeys(), kruLimits, FrequencyOfPeriod);
 }
 
 // No driver calls this: a KRU_CLKGEN run works with the limits as they stand, the defaults or
 // what the last KRU_SP run has loaded for CLKFX. That is meant so.
 bool VorkelImp::LoadKruClkgenLimits() {
-  return Load<KruLimits>(*this, kKruClkgenKeys, kruLimits, FrequencyOfPeriod);
+  return Load(*this, KruClkgenKeys(), kruLimits, FrequencyOfPeriod);
 }
 
 }  // namespace Ip

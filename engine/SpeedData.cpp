@@ -49,6 +49,10 @@ bool VorkelImp::EnsureSpeedController() {
 }
 
 bool VorkelImp::GetSpdKeyValue(Port::StringBase keyword, double* value) {
+  return ReadSpeedData(keyword, value);
+}
+
+bool VorkelImp::ReadSpeedData(const Port::StringBase& keyword, double* value) {
   if (keyword.IsEmpty()) {
     Message()->issueError("Internal GetSpdKeyValue() error -- keyword is empty\n");
     return false;

@@ -19,7 +19,9 @@ void Begin(Pll::PllState& pll, bool preferMaxVco, bool intDiv0Only, bool minPowe
 int Solve(VorkelImp& imp, const Port::StringBase& outFreqs, double inFreq2, const Pll::Run& run) {
   const Pll::ResultCode prepared = PrepareVcoRange(imp, outFreqs, inFreq2, run);
   if (prepared != Pll::kSolved) return prepared;
-  return FudgeLoop(imp, run) ? Pll::kSolved : Pll::kNoSolution;
+  const bool solved = FudgeLoop(imp, run);
+  imp.pll.KeepChosen();
+  return solved ? Pll::kSolved : Pll::kNoSolution;
 }
 
 }  // namespace

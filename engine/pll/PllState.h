@@ -47,8 +47,17 @@ struct PllState {
   VcoCandidateTable _vcoCandidates;
   SolutionTable _solutions;
 
-  // The answer of the last run; points into _vcoCandidates. Null when that found none.
+  // The answer of the last run; null when that found none. A pass chooses one of _vcoCandidates.
+  // The end of the run keeps it in `answer`, since the next run of any object of this thread
+  // takes the table over.
   const VcoCandidate* chosen = nullptr;
+  VcoCandidate answer{};
+
+  void KeepChosen() {
+    if (chosen == nullptr || chosen == &answer) return;
+    answer = *chosen;
+    chosen = &answer;
+  }
 };
 
 }  // namespace Ip::Pll

@@ -38,15 +38,16 @@ struct VcoCandidate {
 };
 
 // The table `_vcoCandidates`. A slot is the index of the output-0 divider step that made its
-// candidate, so a walk over the table goes by rising Div0. The records stand in the table
-// itself: making and dropping candidates allocates nothing.
+// candidate, so a walk over the table goes by rising Div0.
+//
+// The records take a third of a megabyte and are of no use after a run, so all tables of a thread
+// have the same ones: a table that is emptied takes them over, and the candidates of another are
+// gone. Making and dropping candidates allocates nothing.
 class VcoCandidateTable {
  public:
   using Slots = SlotSet<MAX_VCO_CANDIDATES>;
 
-  // The records are left as they are until a slot is taken: an object that never runs a
-  // PLL search then costs no memory pages for them.
-  VcoCandidateTable() {}  // NOLINT: not "= default", which would zero the records
+  VcoCandidateTable() = default;
   VcoCandidateTable(const VcoCandidateTable&) = delete;
   VcoCandidateTable& operator=(const VcoCandidateTable&) = delete;
 
@@ -54,13 +55,13 @@ class VcoCandidateTable {
   const Slots& Occupied() const { return occupied_; }
 
   // The candidate in an occupied slot.
-  VcoCandidate& operator[](int slot) { return records_[static_cast<std::size_t>(slot)]; }
-  const VcoCandidate& operator[](int slot) const {
-    return records_[static_cast<std::size_t>(slot)];
-  }
+  VcoCandidate& operator[](int slot) { return records_[slot]; }
+  const VcoCandidate& operator[](int slot) const { return records_[slot]; }
 
-  // Puts a new candidate into `slot`, in place of any that is there.
+  // Puts a new candidate into `slot`, in place of any that is there. A table that was never emptied
+  // takes the records first.
   void Put(int slot, double vco, double div0) {
+    if (records_ == nullptr) records_ = RecordsOfThread();
     VcoCandidate& candidate = (*this)[slot];
     candidate = VcoCandidate{};
     candidate.vco = vco;
@@ -69,13 +70,20 @@ class VcoCandidateTable {
   }
 
   void Empty(int slot) { occupied_.Erase(slot); }
-  void EmptyAll() { occupied_.Clear(); }
+  // Takes the records of the running thread. Throws std::bad_alloc where there is no memory for
+  // them, at the first time in a thread.
+  void EmptyAll() {
+    occupied_.Clear();
+    records_ = RecordsOfThread();
+  }
   // Empties every slot outside `kept`, which holds occupied slots only.
   void KeepOnly(const Slots& kept) { occupied_ = kept; }
 
  private:
+  static VcoCandidate* RecordsOfThread();
+
   Slots occupied_;
-  std::array<VcoCandidate, MAX_VCO_CANDIDATES> records_;
+  VcoCandidate* records_ = nullptr;  // MAX_VCO_CANDIDATES
 };
 
 }  // namespace Ip::Pll

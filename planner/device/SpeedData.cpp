@@ -12,7 +12,7 @@
 namespace planner {
 namespace {
 
-// A controller copies what it needs of the file, so that it needs no more than the one grade.
+// A controller keeps the file that it is given, so it is given no more than the one grade.
 std::unique_ptr<Dly_SpeedController> ControllerFor(const ::Device::DeviceFile& file,
                                                    std::string_view grade) {
   const ::Device::Grade* const data = file.FindGrade(grade);
@@ -24,7 +24,8 @@ std::unique_ptr<Dly_SpeedController> ControllerFor(const ::Device::DeviceFile& f
   part.device = file.device;
   part.grades.push_back(*data);
   const PM_PIC pic(std::make_unique<PM_PIC::Data>(
-      PM_PIC::Data{::Device::Part{std::move(part), std::nullopt, data->name}}));
+      PM_PIC::Data{::Device::Part{std::make_shared<const ::Device::DeviceFile>(std::move(part)),
+                                  std::nullopt, data->name}}));
   return std::make_unique<Dly_SpeedController>(&pic);
 }
 
@@ -35,6 +36,6 @@ SpeedData::SpeedData(const ::Device::DeviceFile& file, std::string_view grade)
 
 SpeedData::~SpeedData() = default;
 
-const ::Device::Grade& SpeedData::grade() const { return controller_->data().speed_data; }
+const ::Device::Grade& SpeedData::grade() const { return *controller_->data().grade; }
 
 }  // namespace planner

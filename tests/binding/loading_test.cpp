@@ -185,10 +185,31 @@ TYPED_TEST(CallsWithout, OfBadDeviceFiles) {
   rmdir(folder.c_str());
 }
 
-// Each on a handle that has read nothing yet.
+// Each on a handle that has read nothing yet, of a file that was read before, and of one that has
+// changed.
 TYPED_TEST(CallsWithout, OfTheFirstReadOfADevice) {
   ExpectFailuresAreTold<TypeParam>("set h [Ip::Vorkel::Init]; $h SetDevice vk20-2",
                                    "$h GetSpdKeyValue TSYN_VCOCLK_FREQ_MAX");
+}
+
+TYPED_TEST(CallsWithout, OfTheFirstReadOfAChangedDevice) {
+  std::string folder = testing::TempDir() + "vorkel_loading_XXXXXX";
+  ASSERT_NE(mkdtemp(folder.data()), nullptr);
+  const std::string path = folder + "/changing.toml";
+  ExpectFailuresAreTold<TypeParam>("set env(VORKEL_DEVICES) " + folder + "\nset path " + path + R"(
+      set file [open $path w]
+      puts $file "# [incr changes]
+        device = \"changing\"
+        packages = \[\"p\"]
+        default_grade = \"1\"
+        \[grade.1]
+        O_MAX_HT_LT = 64"
+      close $file
+      set h [Ip::Vorkel::Init]
+      $h SetDevice changing)",
+                                   "$h GetSpdKeyValue O_MAX_HT_LT");
+  std::remove(path.c_str());
+  rmdir(folder.c_str());
 }
 
 TYPED_TEST(CallsWithout, OfAHandle) {
@@ -200,7 +221,7 @@ TYPED_TEST(CallsWithout, OfAHandle) {
         "$h GetSpdKeyValue AN_UNKNOWN_KEYWORD", "$h AnUnknownMethodOfAHandle",
         "$h PLLCalculateActualOutFreqs {148.5 74.25 148.5} 74.25 0 3 false false false",
         "$h TSYNCalculateActualOutFreqs {148.5 74.25 148.5} 74.25 0 3 false false false",
-        "$h GetClosestSolution {148.5 74.25} {22.5 180.0 45.0} {37.5 50.00 25.0} 74.25 0 2 false "
+        "$h GetClosestSolution {148.5 74.25} {22.50 180.00 45.0} {37.5 50.00 25.0} 74.25 0 2 false "
         "false true false",
         "$h KruCalculateActuals {37.125 55.6875} {0.000000 0.000000} 74.25 2 true false",
         "$h KruClkgenCalculateActuals {55.6875 27.84375} {0.000000 0.000000} 74.25 2 false",

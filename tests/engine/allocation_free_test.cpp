@@ -1,4 +1,5 @@
-// A pass of the search allocates nothing: all it works on stands in the implementation object.
+// A pass of the search allocates nothing: all it works on stands in the implementation object, or
+// is made once for a thread.
 //
 // The program has an allocator of its own, which counts.
 
@@ -53,6 +54,7 @@ VorkelImp& Prepared(const Request& request) {
     imp.requests.reqDutyCycle[n] = 50;
   }
   imp.requests.reqPhase[0] = request.phase;
+  imp.pll._vcoCandidates.EmptyAll();  // takes the records of the thread, which makes them once
   return imp;
 }
 

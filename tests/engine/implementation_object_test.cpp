@@ -118,6 +118,9 @@ TEST_F(ImplementationObjectTest, HasTheDefaultSolverState) {
   EXPECT_EQ(imp_.pll.chosen, nullptr);
 }
 
+// Scripts make thousands of them, and each lives as long as the process.
+TEST_F(ImplementationObjectTest, IsSmall) { EXPECT_LE(sizeof(VorkelImp), 2048u); }
+
 TEST_F(ImplementationObjectTest, HasEmptyRequests) {
   EXPECT_EQ(imp_.requests.reqOutFreq.size(), 7u);
   EXPECT_THAT(imp_.requests.reqOutFreq, Each(0.0));

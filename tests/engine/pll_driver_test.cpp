@@ -7,6 +7,7 @@
 #include <cstdio>
 #include <cstdlib>
 #include <string>
+#include <thread>
 
 #include "engine/pll/Stages.h"
 #include "tests/engine/EngineTest.h"
@@ -532,6 +533,33 @@ TEST_F(PllDriverTest, WithoutTheTraceFlagNothingIsPrinted) {
   run("2000", "0", 0);
   const std::string text = capture.Text();
   EXPECT_EQ(text, "");
+}
+
+// --- Several objects -----------------------------------------------------------------------
+
+// Both answers are those of slot 1, a divider of 2: 250 x 2, and 300 x 2 from 100 x 6.
+TEST_F(PllDriverTest, TheAnswerStaysWhenAnotherObjectRuns) {
+  VorkelImp& other = engine_test::NewImp();
+  other.SetDevice(kPart);
+  ASSERT_EQ(imp_.CalculateMinPowerOutFreqs("250 125", 100, 0, 2, false, false, kPll, false), 1);
+  ASSERT_EQ(other.CalculateMinPowerOutFreqs("300 100", 100, 0, 2, false, false, kPll, false), 1);
+  EXPECT_EQ(imp_.GetChosenVCO(), 500.0);
+  EXPECT_EQ(imp_.GetChosenDivN(1), 4);
+  EXPECT_EQ(other.GetChosenVCO(), 600.0);
+  EXPECT_EQ(other.GetChosenDivN(1), 6);
+}
+
+// 250 MHz from 100: the VCO of 500 is 100 x 5, that of 1000 is larger.
+TEST_F(PllDriverTest, TheAnswerStaysWhenItsThreadEnds) {
+  int code = 0;
+  std::thread([&] {
+    code = imp_.CalculateMinPowerOutFreqs("250", 100, 0, 1, false, false, kPll, false);
+  }).join();
+  ASSERT_EQ(code, 1);
+  EXPECT_EQ(imp_.GetChosenVCO(), 500.0);
+  EXPECT_EQ(imp_.GetChosenM(), 5.0);
+  EXPECT_EQ(imp_.CalculateMinPowerOutFreqs("300", 100, 0, 1, false, false, kPll, false), 1);
+  EXPECT_EQ(imp_.GetChosenVCO(), 600.0);
 }
 
 // What a script prints after a run must come after the trace of the run, so the trace is out

@@ -6,6 +6,7 @@
 #include <gtest/gtest.h>
 
 #include <memory>
+#include <thread>
 
 #include "tests/engine/EngineTest.h"
 
@@ -97,6 +98,29 @@ TEST_F(VcoCandidateTableTest, EmptiesOneSlotOrAllOrAllBut) {
   EXPECT_EQ(table_[1009].vco, 1109.0);
   table_.EmptyAll();
   EXPECT_THAT(SlotsOf(table_.Occupied()), IsEmpty());
+}
+
+TEST_F(VcoCandidateTableTest, SharesItsRecordsWithTheOthersOfTheThread) {
+  VcoCandidateTable other;
+  table_.EmptyAll();
+  other.Put(5, 400.0, 4.0);
+  EXPECT_EQ(&other[5], &table_[5]);
+  EXPECT_THAT(SlotsOf(table_.Occupied()), IsEmpty());
+  EXPECT_LE(sizeof(VcoCandidateTable), 256u);
+}
+
+TEST_F(VcoCandidateTableTest, TakesTheRecordsOfTheThreadThatEmptiesIt) {
+  table_.EmptyAll();
+  const VcoCandidate* const here = &table_[0];
+  const VcoCandidate* there = nullptr;
+  std::thread([&] {
+    table_.EmptyAll();
+    table_.Put(1009, 400.0, 4.0);
+    there = &table_[0];
+  }).join();
+  EXPECT_NE(there, here);
+  table_.EmptyAll();
+  EXPECT_EQ(&table_[0], here);
 }
 
 TEST(VcoCandidate, HasTheDividersOfItsOutputs) {

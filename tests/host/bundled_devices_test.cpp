@@ -16,7 +16,7 @@ using Device::DeviceFile;
 using Device::Grade;
 
 DeviceFile Bundled(std::string_view device) {
-  return FindDevice(DeviceCatalogue::ListFolders({BUNDLED_DEVICES}), device);
+  return *FindDevice(DeviceCatalogue::ListFolders({BUNDLED_DEVICES}), device);
 }
 
 std::vector<DeviceFile> AllBundled() {

@@ -20,9 +20,9 @@ constexpr int kClk0 = 1, kClk90 = 2, kClk180 = 3, kClk270 = 4, kClk2x = 5, kClk2
 
 class Operations : public testing::Test {
  protected:
-  Asked pll_{BundledGrade("vk10", "1"), "vk10-1"};   // PLL and both KRUs
-  Asked tsyn_{BundledGrade("vk20", "2"), "vk20-2"};  // TSYN alone
-  Asked vk40_{BundledGrade("vk40", "2"), "vk40-2"};  // all
+  Asked pll_{BundledGrade("vk10", "1"), "vk10"};   // PLL and both KRUs
+  Asked tsyn_{BundledGrade("vk20", "2"), "vk20"};  // TSYN alone
+  Asked vk40_{BundledGrade("vk40", "2"), "vk40"};  // all
 };
 
 // A refusal whose sentence begins and ends so.
@@ -92,7 +92,7 @@ TEST_F(Operations, DividersLeaveJitterAsItIs) {
 }
 
 TEST_F(Operations, TheSlowerGradeHasMoreJitter) {
-  Asked slow(BundledGrade("vk40", "1"), "vk40-1");
+  Asked slow(BundledGrade("vk40", "1"), "vk40");
   for (const char* setting : {"LOW", "OPTIMIZED", "HIGH"}) {
     EXPECT_GT(slow.Jitter(100, 10, 1, setting, 4, 100).figure,
               vk40_.Jitter(100, 10, 1, setting, 4, 100).figure);

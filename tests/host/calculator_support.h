@@ -21,7 +21,7 @@ inline constexpr double kInfinity = std::numeric_limits<double>::infinity();
 // The speed data of a bundled device at one grade.
 inline Device::Grade BundledGrade(std::string_view device, std::string_view grade) {
   const auto catalogue = Device::DeviceCatalogue::ListFolders({BUNDLED_DEVICES});
-  return *Device::FindDevice(catalogue, device).FindGrade(grade);
+  return *Device::FindDevice(catalogue, device)->FindGrade(grade);
 }
 
 // The file of a device "dev" whose grade "1" is made of these lines.
@@ -64,10 +64,14 @@ struct Answer {
 // as NaN, and so does every figure of a refused query, which must write none.
 class Asked {
  public:
-  explicit Asked(Device::Grade grade, std::string name = "dev-1")
-      : place_(std::make_shared<std::atomic<Tw_BmCMBCalculator*>>(nullptr)),
-        calculator_(std::make_unique<Calculator::DeviceCalculator>(std::move(grade),
-                                                                   std::move(name), place_)) {}
+  explicit Asked(Device::Grade grade, const std::string& device = "dev")
+      : place_(std::make_shared<std::atomic<Tw_BmCMBCalculator*>>(nullptr)) {
+    auto file = std::make_shared<Device::DeviceFile>();
+    file->device = device;
+    file->grades.push_back(std::move(grade));
+    calculator_ =
+        std::make_unique<Calculator::DeviceCalculator>(file, file->grades.front(), place_);
+  }
 
   Tw_BmCMBCalculator& calculator() { return *calculator_; }
 

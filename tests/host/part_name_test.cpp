@@ -17,7 +17,7 @@ class PartNameTest : public testing::Test {
   std::string Meaning(const std::string& part_name) {
     try {
       const Part part = FindPart(Catalogue(), part_name);
-      return part.file.device + ' ' + part.package.value_or("-") + ' ' + part.grade.value_or("-");
+      return part.file->device + ' ' + part.package.value_or("-") + ' ' + part.grade.value_or("-");
     } catch (const Device::DeviceError& error) {
       return error.what();
     }
@@ -25,7 +25,7 @@ class PartNameTest : public testing::Test {
 
   std::string DeviceMeaning(const std::string& device) {
     try {
-      return FindDevice(Catalogue(), device).device;
+      return FindDevice(Catalogue(), device)->device;
     } catch (const Device::DeviceError& error) {
       return error.what();
     }

@@ -58,8 +58,8 @@ TEST_F(PersonalityTest, FillsWhatThePartNameLeavesOut) {
 
 // Without a file or a search path: the controller has the figures of the given device.
 TEST_F(PersonalityTest, CanBeThatOfADeviceInMemory) {
-  Device::DeviceFile file = Device::DeviceFile::Parse(
-      "device = \"dev\"\npackages = [\"p\"]\n[grade.1]\nO_MAX_HT_LT = 64\n", "nowhere", "dev");
+  auto file = std::make_shared<const Device::DeviceFile>(Device::DeviceFile::Parse(
+      "device = \"dev\"\npackages = [\"p\"]\n[grade.1]\nO_MAX_HT_LT = 64\n", "nowhere", "dev"));
   PM_PIC pic(std::make_unique<PM_PIC::Data>(
       PM_PIC::Data{Device::Part{std::move(file), std::nullopt, "1"}}));
   const Dly_SpeedController controller(&pic);
@@ -126,8 +126,17 @@ TEST_F(PersonalityTest, OutlivesFileAndPersonality) {
   const Dly_SpeedController controller(pic.get());
   pic.reset();
   EXPECT_EQ(controller.GetBelDelay("VCOCLK_FREQ_MAX", nullptr) * 1e9, 1000.0);
-  EXPECT_EQ(controller.data().device, "dev");
-  EXPECT_EQ(controller.data().grade, "g1");
+  EXPECT_EQ(controller.data().file->device, "dev");
+  EXPECT_EQ(controller.data().grade->name, "g1");
+}
+
+TEST_F(PersonalityTest, SharesWhatTheFileSays) {
+  folder_.WriteDevice("dev");
+  const PM_PIC one = Personality("dev-g1");
+  const PM_PIC other = Personality("devp1-g2");
+  EXPECT_EQ(one.data().part.file, other.data().part.file);
+  const Dly_SpeedController controller(&one);
+  EXPECT_EQ(controller.data().file, one.data().part.file);
 }
 
 TEST_F(PersonalityTest, HasNoSpeedDataWithoutAGrade) {

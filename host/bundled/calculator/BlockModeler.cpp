@@ -23,10 +23,10 @@ Tw_BmCMBCalculator* Tw_BmPhysicalBlockModeler::GetCMBCalculator(Dly_SpeedControl
   static constinit std::mutex making;
   const std::lock_guard lock(making);
   if (Tw_BmCMBCalculator* const made = *data.calculator) return made;
-  const Device::Grade& grade = data.speed_data;
+  const Device::Grade& grade = *data.grade;
   if (!grade.Has(Device::CoefficientGroup::kLoop) && !grade.Has(Device::CoefficientGroup::kKru)) {
     return nullptr;
   }
   // The caller owns it. It notes itself in the controller's place.
-  return new Calculator::DeviceCalculator(grade, data.device + '-' + data.grade, data.calculator);
+  return new Calculator::DeviceCalculator(data.file, grade, data.calculator);
 }

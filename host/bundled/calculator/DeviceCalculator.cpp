@@ -29,9 +29,13 @@ bool Answer(Port::StringBase* error, Operation operation) {
 
 }  // namespace
 
-DeviceCalculator::DeviceCalculator(Device::Grade grade, std::string device_name,
+DeviceCalculator::DeviceCalculator(std::shared_ptr<const Device::DeviceFile> file,
+                                   const Device::Grade& grade,
                                    std::shared_ptr<std::atomic<Tw_BmCMBCalculator*>> place)
-    : grade_(std::move(grade)), device_name_(std::move(device_name)), place_(std::move(place)) {
+    : file_(std::move(file)),
+      grade_(grade),
+      device_name_(file_->device + '-' + grade.name),
+      place_(std::move(place)) {
   *place_ = this;
 }
 

@@ -17,9 +17,9 @@ namespace Calculator {
 
 class DeviceCalculator final : public Tw_BmCMBCalculator {
  public:
-  // `place` is the controller's note of its living calculator: it names this one until this one
-  // is destroyed. `device_name` is for error sentences.
-  DeviceCalculator(Device::Grade grade, std::string device_name,
+  // `grade` is one of `file`. `place` is the controller's note of its living calculator: it names
+  // this one until this one is destroyed.
+  DeviceCalculator(std::shared_ptr<const Device::DeviceFile> file, const Device::Grade& grade,
                    std::shared_ptr<std::atomic<Tw_BmCMBCalculator*>> place);
   ~DeviceCalculator() override;
 
@@ -44,8 +44,9 @@ class DeviceCalculator final : public Tw_BmCMBCalculator {
   // Throws ArgumentError when the grade does not have the coefficients of the group.
   void RequireCoefficients(Device::CoefficientGroup group, const char* primitives) const;
 
-  Device::Grade grade_;
-  std::string device_name_;
+  std::shared_ptr<const Device::DeviceFile> file_;
+  const Device::Grade& grade_;
+  std::string device_name_;  // for error sentences
   std::shared_ptr<std::atomic<Tw_BmCMBCalculator*>> place_;
 };
 

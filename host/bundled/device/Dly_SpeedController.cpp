@@ -4,6 +4,7 @@
 #include <exception>
 #include <limits>
 #include <new>
+#include <optional>
 
 #include "host/bundled/device/KeywordTable.h"
 #include "host/bundled/device/Personality.h"
@@ -11,17 +12,19 @@
 
 namespace {
 
+constexpr double kNoFigure = std::numeric_limits<double>::max();
+
 // The grade that the personality stands for. Throws DeviceError when it has none.
 const Device::Grade& GradeOf(const PM_PIC* pic) {
   if (pic == nullptr) throw Device::DeviceError("there is no device to read the speed data of");
   const Device::Part& part = pic->data().part;
   if (part.grade) {
-    const Device::Grade* const grade = part.file.FindGrade(*part.grade);
+    const Device::Grade* const grade = part.file->FindGrade(*part.grade);
     if (grade != nullptr) return *grade;
   }
-  throw Device::ErrorAt(part.file.path, part.file.grades_position,
-                        "no speed grade was given for device \"" + part.file.device +
-                            "\", which has " + Device::JoinNames(part.file.GradeNames()));
+  throw Device::ErrorAt(part.file->path, part.file->grades_position,
+                        "no speed grade was given for device \"" + part.file->device +
+                            "\", which has " + Device::JoinNames(part.file->GradeNames()));
 }
 
 }  // namespace
@@ -30,14 +33,12 @@ Dly_SpeedController::Dly_SpeedController(const PM_PIC* pic) {
   try {
     const Device::Grade& grade = GradeOf(pic);
     data_ = std::make_unique<Data>();
-    data_->device = pic->data().part.file.device;
-    data_->grade = grade.name;
-    data_->speed_data = grade;
+    data_->file = pic->data().part.file;
+    data_->grade = &grade;
     data_->calculator = std::make_shared<std::atomic<Tw_BmCMBCalculator*>>(nullptr);
-    const auto keywords = Device::Keywords();
-    for (std::size_t i = 0; i < keywords.size(); ++i) {
-      if (!grade.figures[i]) continue;
-      data_->figures.emplace(keywords[i].name, Device::SpeedFigure(*grade.figures[i]));
+    data_->figures.reserve(grade.figures.size());
+    for (const std::optional<double>& figure : grade.figures) {
+      data_->figures.push_back(figure ? Device::SpeedFigure(*figure) : kNoFigure);
     }
   } catch (const std::bad_alloc&) {
     Device::ReportAndThrow("out of memory");
@@ -50,6 +51,6 @@ Dly_SpeedController::~Dly_SpeedController() = default;
 
 double Dly_SpeedController::GetBelDelay(const Port::StringBase& key,
                                         const Pds_PdmBlock* /*block*/) const {
-  const auto found = data_->figures.find(key.View());
-  return found == data_->figures.end() ? std::numeric_limits<double>::max() : found->second;
+  const auto index = Device::FindKeyword(key.View());
+  return index ? data_->figures[*index] : kNoFigure;
 }

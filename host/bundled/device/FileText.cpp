@@ -4,6 +4,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <optional>
 #include <system_error>
@@ -32,11 +33,13 @@ class OpenFile {
   OpenFile(const OpenFile&) = delete;
   OpenFile& operator=(const OpenFile&) = delete;
 
-  void RequireRegular() const {
+  // The size of the file, which must be a regular one.
+  std::size_t RegularSize() const {
     struct stat status {};
     if (fstat(descriptor_, &status) != 0) throw CannotRead(path_, SystemReason());
     if (S_ISDIR(status.st_mode)) throw CannotRead(path_, "it is a directory");
     if (!S_ISREG(status.st_mode)) throw CannotRead(path_, "it is not a regular file");
+    return static_cast<std::size_t>(status.st_size);
   }
 
   // The next bytes into `buffer`; how many, 0 at the end.
@@ -81,15 +84,14 @@ void RequireFewDots(const std::string& path, std::string_view text) {
 
 std::string ReadFileText(const std::string& path) {
   const OpenFile file(path);
-  file.RequireRegular();
-  std::string text(kLargestFile + 1, '\0');
+  // A byte more than the file has now, so that the end is met; it may grow all the same.
+  std::string text(std::min(file.RegularSize(), kLargestFile) + 1, '\0');
   std::size_t length = 0;
-  while (length < text.size()) {
-    const std::size_t count = file.Read(text.data() + length, text.size() - length);
-    if (count == 0) break;
+  while (const std::size_t count = file.Read(text.data() + length, text.size() - length)) {
     length += count;
+    RequireShort(path, length);
+    if (length == text.size()) text.resize(kLargestFile + 1);
   }
-  RequireShort(path, length);
   text.resize(length);
   return text;
 }

@@ -1,6 +1,6 @@
 #include "host/bundled/device/KeywordTable.h"
 
-#include <algorithm>
+#include <cstdint>
 #include <iterator>
 
 namespace Device {
@@ -45,15 +45,56 @@ constexpr Keyword kKeywords[] = {
     {"D_KRU_CLKFXDV_CLKIN_DIVIDE_BY_2_FALSE_MAXPERIOD", Unit::kNanoseconds, kKruClkgen},
 };
 
+// Every run of a search asks for a dozen keywords, so a keyword is found by a number that is made
+// of its length and a few of its letters, with a factor for which no two keywords share a place.
+constexpr std::size_t kShortest = 11;  // of the keywords, in letters
+
+constexpr std::uint32_t NumberOf(std::string_view name) {
+  // These tell the pins, the feedbacks, and minimum and maximum apart.
+  std::uint32_t number = 0;
+  for (const std::size_t place : {std::size_t{9}, std::size_t{10}, name.size() - 2,
+                                  name.size() - 7, name.size() > 12 ? name.size() - 12 : 0}) {
+    number = number * 31 + static_cast<unsigned char>(name[place]);
+  }
+  return number * 31 + static_cast<std::uint32_t>(name.size());
+}
+
+// Places by number, for one factor. 0 is a free place; others are one more than an index.
+struct Places {
+  static constexpr unsigned kBits = 7;
+
+  constexpr std::size_t Of(std::uint32_t number) const { return number * factor >> (32 - kBits); }
+
+  // False when two keywords share a place.
+  constexpr bool Fill() {
+    for (std::uint8_t& place : one_more_than_index) place = 0;
+    for (std::size_t i = 0; i < std::size(kKeywords); ++i) {
+      std::uint8_t& place = one_more_than_index[Of(NumberOf(kKeywords[i].name))];
+      if (place != 0) return false;
+      place = static_cast<std::uint8_t>(i + 1);
+    }
+    return true;
+  }
+
+  std::uint32_t factor = 1;
+  std::uint8_t one_more_than_index[std::size_t{1} << kBits] = {};
+};
+
+constexpr Places kPlaces = [] {
+  Places places;
+  while (!places.Fill()) places.factor = places.factor * 1664525 + 2;
+  return places;
+}();
+
 }  // namespace
 
 std::span<const Keyword> Keywords() { return kKeywords; }
 
 std::optional<std::size_t> FindKeyword(std::string_view name) {
-  const auto found = std::find_if(std::begin(kKeywords), std::end(kKeywords),
-                                  [name](const Keyword& keyword) { return keyword.name == name; });
-  if (found == std::end(kKeywords)) return std::nullopt;
-  return static_cast<std::size_t>(found - std::begin(kKeywords));
+  if (name.size() < kShortest) return std::nullopt;
+  const std::uint8_t place = kPlaces.one_more_than_index[kPlaces.Of(NumberOf(name))];
+  if (place == 0 || kKeywords[place - 1].name != name) return std::nullopt;
+  return place - std::size_t{1};
 }
 
 std::string_view PrimitiveName(Primitive primitive) {

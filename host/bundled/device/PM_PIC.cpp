@@ -38,7 +38,7 @@ PM_PIC::~PM_PIC() = default;
 
 bool PM_PIC::fill_defaults() {
   Device::Part& part = data_->part;
-  const bool has_package = FillDefault(part.file.default_package, &part.package);
-  const bool has_grade = FillDefault(part.file.default_grade, &part.grade);
+  const bool has_package = FillDefault(part.file->default_package, &part.package);
+  const bool has_grade = FillDefault(part.file->default_grade, &part.grade);
   return has_package && has_grade;
 }

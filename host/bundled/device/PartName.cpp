@@ -2,6 +2,8 @@
 
 #include <utility>
 
+#include "host/bundled/device/KeptFiles.h"
+
 namespace Device {
 namespace {
 
@@ -31,7 +33,7 @@ std::string UnknownDetail(std::string_view what, std::string_view detail,
 // Fills in the package and grade that `rest`, the part name behind the device, names. What is
 // wrong with them, or nothing.
 std::optional<DeviceError> TakeRest(std::string_view rest, std::string_view part_name, Part* part) {
-  const DeviceFile& file = part->file;
+  const DeviceFile& file = *part->file;
   const std::size_t dash = rest.find('-');
   const std::string_view package = rest.substr(0, dash);
   if (!package.empty()) {
@@ -80,10 +82,11 @@ Part FindPart(const DeviceCatalogue& catalogue, std::string_view part_name) {
   throw DeviceError(UnknownDevice(catalogue, "part name", part_name));
 }
 
-DeviceFile FindDevice(const DeviceCatalogue& catalogue, std::string_view device) {
+std::shared_ptr<const DeviceFile> FindDevice(const DeviceCatalogue& catalogue,
+                                             std::string_view device) {
   const std::string* const path = catalogue.FindFile(device);
   if (path == nullptr) throw DeviceError(UnknownDevice(catalogue, "device name", device));
-  return DeviceFile::Read(*path, device);
+  return ReadKept(*path, device);
 }
 
 }  // namespace Device

@@ -10,6 +10,7 @@
 #ifndef VORKEL_HOST_BUNDLED_DEVICE_PARTNAME_H_
 #define VORKEL_HOST_BUNDLED_DEVICE_PARTNAME_H_
 
+#include <memory>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -19,9 +20,10 @@
 
 namespace Device {
 
-// A device in one package and speed grade, as far as the part name tells them.
+// A device in one package and speed grade, as far as the part name tells them. Parts of one device
+// share what its file says.
 struct Part {
-  DeviceFile file;
+  std::shared_ptr<const DeviceFile> file;  // never null
   std::optional<std::string> package;
   std::optional<std::string> grade;
 };
@@ -32,7 +34,8 @@ struct Part {
 Part FindPart(const DeviceCatalogue& catalogue, std::string_view part_name);
 
 // The device of exactly that name, without package and grade. Throws as above.
-DeviceFile FindDevice(const DeviceCatalogue& catalogue, std::string_view device);
+std::shared_ptr<const DeviceFile> FindDevice(const DeviceCatalogue& catalogue,
+                                             std::string_view device);
 
 }  // namespace Device
 
