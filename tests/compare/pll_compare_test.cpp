@@ -27,27 +27,6 @@ struct Load {
   friend void PrintTo(const Load& load, std::ostream* out) { *out << KindName(load.kind); }
 };
 
-// True when the plain search finds nothing within the first fudges: it would go on for up to
-// seconds, and its trace for tens of megabytes, so that a run can afford few of these.
-bool GoesFar(const Case& drawn) {
-  plain::RequestLists lists;
-  plain::PllState state;
-  plain::Trace trace(false);
-  const int prepared =
-      plain::PrepareVcoRange(drawn.request, drawn.limits, lists, state, trace);
-  if (prepared != plain::kSolved) return false;
-  if (drawn.request.closest) {
-    plain::ParseList(drawn.request.phases, drawn.request.count, plain::kMaxOutputs, lists.phase);
-    plain::ParseList(drawn.request.dutyCycles, drawn.request.count, plain::kMaxOutputs,
-                     lists.dutyCycle);
-  }
-  double fudge = 0.0;
-  for (int pass = 0; pass < 100; ++pass, fudge += 0.001) {
-    if (plain::SolverPass(fudge, drawn.request, drawn.limits, lists, state, trace)) return false;
-  }
-  return true;
-}
-
 class PllCompare : public testing::TestWithParam<Load> {};
 
 TEST_P(PllCompare, ProductAnswersAsThePlainSearch) {
@@ -64,7 +43,7 @@ TEST_P(PllCompare, ProductAnswersAsThePlainSearch) {
     Random random(static_cast<std::uint64_t>(load.kind) * 1'000'003 + static_cast<unsigned>(i));
     const Case drawn = DrawCase(load.kind, random);
     bool traced = i % load.traceEvery == 0;
-    if (GoesFar(drawn)) {
+    if (plain::GoesFar(drawn.request, drawn.limits, {})) {
       if (farLeft-- <= 0) continue;
       traced = traced && farTracesLeft-- > 0;
     } else if (load.kind == Kind::kInfeasible) {

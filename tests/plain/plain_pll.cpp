@@ -192,4 +192,20 @@ PllAnswer SolvePll(const PllRequest& request, const PllLimits& limits, RequestLi
   return answer;
 }
 
+bool GoesFar(const PllRequest& request, const PllLimits& limits, RequestLists lists,
+             int passes) {
+  PllState state;
+  Trace trace(false);
+  if (PrepareVcoRange(request, limits, lists, state, trace) != kSolved) return false;
+  if (request.closest) {
+    ParseList(request.phases, request.count, kMaxOutputs, lists.phase);
+    ParseList(request.dutyCycles, request.count, kMaxOutputs, lists.dutyCycle);
+  }
+  double fudge = 0.0;
+  for (int pass = 0; pass < passes; ++pass, fudge += kFudgeStep) {
+    if (SolverPass(fudge, request, limits, lists, state, trace)) return false;
+  }
+  return true;
+}
+
 }  // namespace plain

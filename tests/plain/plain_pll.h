@@ -87,6 +87,11 @@ struct PllAnswer {
 PllAnswer SolvePll(const PllRequest& request, const PllLimits& limits, RequestLists& lists,
                    Trace& trace);
 
+// True when the search finds nothing within the first `passes` fudges: it can go on for up to
+// seconds, and its trace for tens of megabytes, so that tests can afford few of these.
+bool GoesFar(const PllRequest& request, const PllLimits& limits, RequestLists lists,
+             int passes = 100);
+
 // ---- Single stages, for comparing stage by stage ----
 
 // One configuration under search.
