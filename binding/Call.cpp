@@ -1,16 +1,44 @@
 #include "binding/Call.h"
 
 #include <array>
+#include <atomic>
+#include <charconv>
 #include <cstdarg>
 #include <cstdio>
 #include <cstdlib>
 #include <string>
+#include <system_error>
+
+#include "engine/FixedText.h"
+#include "engine/Messages.h"
+#include "engine/StandardOutput.h"
+#include "engine/Trace.h"
 
 namespace Ip {
 
 namespace {
 
 constexpr int kWordsBeforeArguments = 2;  // the handle and the method name
+
+// Whether the loss that goes on has been told.
+constinit std::atomic<bool> loss_is_told = false;
+
+void TellLostTrace(int loss) {
+  if (loss == kWritten) {
+    loss_is_told = false;
+    return;
+  }
+  if (loss_is_told.exchange(true)) return;
+  try {
+    const std::string reason = loss == kStandsForAnother
+                                   ? "it is closed, and another file has its number"
+                                   : std::generic_category().message(loss);
+    Message()->issueError("The trace could not be written to standard output: %s\n",
+                          reason.c_str());
+  } catch (...) {
+    // No memory for the message. The answer of the calculation is there all the same.
+  }
+}
 
 }  // namespace
 
@@ -66,13 +94,32 @@ int Call::Answer(const char* format, ...) const {
   return AnswerText(text.data());
 }
 
+int Call::AnswerNumber(const char* format, double number) const {
+  std::array<char, kLongestFixed + 1> text;
+  char* const end = WriteFixed3(number, text.data());
+  if (end == nullptr) return Answer(format, number);
+  *end = '\0';
+  return AnswerText(text.data());
+}
+
+int Call::AnswerCount(int count) const {
+  std::array<char, 16> text;
+  *std::to_chars(text.data(), text.data() + text.size(), count).ptr = '\0';
+  return AnswerText(text.data());
+}
+
+int Call::AnswerRun(bool traced, const char* text) const {
+  if (traced) TellLostTrace(Trace::LossOfLast());
+  return AnswerText(text);
+}
+
 int Call::Fail(const char* message) const {
   Tcl::SetResult(interp_, message);
   return TCL_ERROR;
 }
 
 int Call::AnswerQuery(bool answered, double figure, const Port::StringBase& error) const {
-  return answered ? Answer("%3.3f", figure) : Fail(error.CStr());
+  return answered ? AnswerNumber("%3.3f", figure) : Fail(error.CStr());
 }
 
 }  // namespace Ip

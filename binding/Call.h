@@ -44,6 +44,14 @@ class Call {
   int AnswerText(const char* text) const;
   [[gnu::format(printf, 2, 3)]] int Answer(const char* format, ...) const;
 
+  // The same for a number, by "%3.3f" or "%4.3f", and for a count, by "%d".
+  int AnswerNumber(const char* format, double number) const;
+  int AnswerCount(int count) const;
+
+  // The answer of a calculation. A trace of it that could not be written is told by a message:
+  // once, until one could be written again.
+  int AnswerRun(bool traced, const char* text) const;
+
   // Sets the result of a method that has failed and returns TCL_ERROR.
   int Fail(const char* message) const;
 

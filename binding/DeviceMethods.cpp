@@ -17,7 +17,7 @@ int VorkelPtrHandle::GetSpdKeyValue(int objc, Words objv, Tcl_Interp* interp) {
         std::string("Unable to get value from speedsfile for keyword ") + keyword.CStr();
     return call.Fail(message.c_str());
   }
-  return call.Answer("%3.3f", value);
+  return call.AnswerNumber("%3.3f", value);
 }
 
 int VorkelPtrHandle::SetDevice(int objc, Words objv, Tcl_Interp* interp) {

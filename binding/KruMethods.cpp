@@ -18,7 +18,7 @@ int VorkelPtrHandle::KruCalculateActuals(int objc, Words objv, Tcl_Interp* inter
   const bool verbose = call.Flag(5);
   const int code =
       imp->KruCalculateActuals(outFreqs, phases, inFreq, numOut, feedbackUsed, verbose);
-  return call.AnswerText(KruResultText(false, code, numOut));
+  return call.AnswerRun(verbose, KruResultText(false, code, numOut));
 }
 
 // Frequency and phase lists, input frequency, number of outputs and trace flag.
@@ -32,31 +32,31 @@ int VorkelPtrHandle::KruClkgenCalculateActuals(int objc, Words objv, Tcl_Interp*
   const int numOut = call.Count(3);
   const bool verbose = call.Flag(4);
   const int code = imp->KruClkgenCalculateActuals(outFreqs, phases, inFreq, numOut, verbose);
-  return call.AnswerText(KruResultText(true, code, numOut));
+  return call.AnswerRun(verbose, KruResultText(true, code, numOut));
 }
 
 int VorkelPtrHandle::GetKruChosenM(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
   const VorkelImp* imp = call.Object(*this, 0, "GetKruChosenM");
-  return imp == nullptr ? TCL_ERROR : call.Answer("%d", imp->GetKruChosenM());
+  return imp == nullptr ? TCL_ERROR : call.AnswerCount(imp->GetKruChosenM());
 }
 
 int VorkelPtrHandle::GetKruChosenD(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
   const VorkelImp* imp = call.Object(*this, 0, "GetKruChosenD");
-  return imp == nullptr ? TCL_ERROR : call.Answer("%d", imp->GetKruChosenD());
+  return imp == nullptr ? TCL_ERROR : call.AnswerCount(imp->GetKruChosenD());
 }
 
 int VorkelPtrHandle::GetKruChosenPhaseShift(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
   const VorkelImp* imp = call.Object(*this, 0, "GetKruChosenPhaseShift");
-  return imp == nullptr ? TCL_ERROR : call.Answer("%d", imp->GetKruChosenPhaseShift());
+  return imp == nullptr ? TCL_ERROR : call.AnswerCount(imp->GetKruChosenPhaseShift());
 }
 
 int VorkelPtrHandle::GetKruChosenPhaseOffset(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
   const VorkelImp* imp = call.Object(*this, 0, "GetKruChosenPhaseOffset");
-  return imp == nullptr ? TCL_ERROR : call.Answer("%3.3f", imp->GetKruChosenPhaseOffset());
+  return imp == nullptr ? TCL_ERROR : call.AnswerNumber("%3.3f", imp->GetKruChosenPhaseOffset());
 }
 
 // CLKDV and CLKFXDV are one value, which the two methods write differently.
@@ -92,7 +92,7 @@ int VorkelPtrHandle::GetKruChosenOutFreqN(int objc, Words objv, Tcl_Interp* inte
   if (imp == nullptr) return TCL_ERROR;
   const double inputFreq = call.Number(0);
   const int n = call.Count(1);
-  return call.Answer("%4.3f", imp->GetKruChosenOutFreqN(inputFreq, n));
+  return call.AnswerNumber("%4.3f", imp->GetKruChosenOutFreqN(inputFreq, n));
 }
 
 }  // namespace Ip

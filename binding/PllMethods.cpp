@@ -20,7 +20,7 @@ int CalculateOutFreqs(const Call& call, VorkelImp& imp, int prim, PllEntry entry
   const bool verbose = call.Flag(6);
   const int code = imp.CalculateMinPowerOutFreqs(outFreqs, inFreq, inFreq2, count, preferMaxVco,
                                                  intDiv0Only, prim, verbose);
-  return call.AnswerText(PllResultText(entry, code, count));
+  return call.AnswerRun(verbose, PllResultText(entry, code, count));
 }
 
 }  // namespace
@@ -61,67 +61,70 @@ int VorkelPtrHandle::GetClosestSolution(int objc, Words objv, Tcl_Interp* interp
   const bool verbose = call.Flag(9);
   const int code = imp->GetClosestSolution(outFreqs, phases, dutyCycles, inFreq, inFreq2, count,
                                            preferMaxVco, intDiv0Only, prim, verbose);
-  return call.AnswerText(PllResultText(PllEntry::kClosestSolution, code, count));
+  return call.AnswerRun(verbose, PllResultText(PllEntry::kClosestSolution, code, count));
 }
 
 int VorkelPtrHandle::GetChosenM(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
   const VorkelImp* imp = call.Object(*this, 0, "GetChosenM");
-  return imp == nullptr ? TCL_ERROR : call.Answer("%3.3f", imp->GetChosenM());
+  return imp == nullptr ? TCL_ERROR : call.AnswerNumber("%3.3f", imp->GetChosenM());
 }
 
 int VorkelPtrHandle::GetChosenMInt(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
   const VorkelImp* imp = call.Object(*this, 0, "GetChosenMInt");
-  return imp == nullptr ? TCL_ERROR : call.Answer("%d", TruncateToInt(imp->GetChosenM()));
+  return imp == nullptr ? TCL_ERROR : call.AnswerCount(TruncateToInt(imp->GetChosenM()));
 }
 
 int VorkelPtrHandle::GetChosenD(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
   const VorkelImp* imp = call.Object(*this, 0, "GetChosenD");
-  return imp == nullptr ? TCL_ERROR : call.Answer("%d", imp->GetChosenD());
+  return imp == nullptr ? TCL_ERROR : call.AnswerCount(imp->GetChosenD());
 }
 
 int VorkelPtrHandle::GetChosenDiv0(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
   const VorkelImp* imp = call.Object(*this, 0, "GetChosenDiv0");
-  return imp == nullptr ? TCL_ERROR : call.Answer("%3.3f", imp->GetChosenDiv0());
+  return imp == nullptr ? TCL_ERROR : call.AnswerNumber("%3.3f", imp->GetChosenDiv0());
 }
 
 int VorkelPtrHandle::GetChosenDiv0Int(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
   const VorkelImp* imp = call.Object(*this, 0, "GetChosenDiv0Int");
-  return imp == nullptr ? TCL_ERROR : call.Answer("%d", TruncateToInt(imp->GetChosenDiv0()));
+  return imp == nullptr ? TCL_ERROR : call.AnswerCount(TruncateToInt(imp->GetChosenDiv0()));
 }
 
 int VorkelPtrHandle::GetChosenDivN(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
   const VorkelImp* imp = call.Object(*this, 1, "GetChosenDivN");
-  return imp == nullptr ? TCL_ERROR : call.Answer("%d", imp->GetChosenDivN(call.Count(0)));
+  return imp == nullptr ? TCL_ERROR : call.AnswerCount(imp->GetChosenDivN(call.Count(0)));
 }
 
 int VorkelPtrHandle::GetChosenVCO(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
   const VorkelImp* imp = call.Object(*this, 0, "GetChosenVCO");
-  return imp == nullptr ? TCL_ERROR : call.Answer("%4.3f", imp->GetChosenVCO());
+  return imp == nullptr ? TCL_ERROR : call.AnswerNumber("%4.3f", imp->GetChosenVCO());
 }
 
 int VorkelPtrHandle::GetChosenOutFreqN(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
   const VorkelImp* imp = call.Object(*this, 1, "GetChosenOutFreqN");
-  return imp == nullptr ? TCL_ERROR : call.Answer("%4.3f", imp->GetChosenOutFreqN(call.Count(0)));
+  if (imp == nullptr) return TCL_ERROR;
+  return call.AnswerNumber("%4.3f", imp->GetChosenOutFreqN(call.Count(0)));
 }
 
 int VorkelPtrHandle::GetChosenPhaseN(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
   const VorkelImp* imp = call.Object(*this, 1, "GetChosenPhaseN");
-  return imp == nullptr ? TCL_ERROR : call.Answer("%4.3f", imp->GetChosenPhaseN(call.Count(0)));
+  if (imp == nullptr) return TCL_ERROR;
+  return call.AnswerNumber("%4.3f", imp->GetChosenPhaseN(call.Count(0)));
 }
 
 int VorkelPtrHandle::GetChosenDutyCycleN(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
   const VorkelImp* imp = call.Object(*this, 1, "GetChosenDutyCycleN");
-  return imp == nullptr ? TCL_ERROR : call.Answer("%4.3f", imp->GetChosenDutyCycleN(call.Count(0)));
+  if (imp == nullptr) return TCL_ERROR;
+  return call.AnswerNumber("%4.3f", imp->GetChosenDutyCycleN(call.Count(0)));
 }
 
 }  // namespace Ip

@@ -138,13 +138,13 @@ int VorkelPtrHandle::GetPLLPeriodPhaseDutyCycle(int objc, Words objv, Tcl_Interp
 int VorkelPtrHandle::GetLatestPhase(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
   const VorkelImp* imp = call.Object(*this, 0, "GetLatestPhase");
-  return imp == nullptr ? TCL_ERROR : call.Answer("%3.3f", imp->GetLatestPhase());
+  return imp == nullptr ? TCL_ERROR : call.AnswerNumber("%3.3f", imp->GetLatestPhase());
 }
 
 int VorkelPtrHandle::GetLatestDutyCycle(int objc, Words objv, Tcl_Interp* interp) {
   const Call call(objc, objv, interp);
   const VorkelImp* imp = call.Object(*this, 0, "GetLatestDutyCycle");
-  return imp == nullptr ? TCL_ERROR : call.Answer("%3.3f", imp->GetLatestDutyCycle());
+  return imp == nullptr ? TCL_ERROR : call.AnswerNumber("%3.3f", imp->GetLatestDutyCycle());
 }
 
 int VorkelPtrHandle::TSYNCalculateActualPhase(int objc, Words objv, Tcl_Interp* interp) {
@@ -154,7 +154,7 @@ int VorkelPtrHandle::TSYNCalculateActualPhase(int objc, Words objv, Tcl_Interp* 
   const double phase = call.Number(0);
   const double divider = call.Number(1);
   const bool flag = call.Flag(2);
-  return call.Answer("%3.3f", imp->TSYNCalculateActualPhase(&phase, &divider, flag));
+  return call.AnswerNumber("%3.3f", imp->TSYNCalculateActualPhase(&phase, &divider, flag));
 }
 
 // The flag is read as that of the phase is, and has no effect either. The engine answers with a
@@ -166,7 +166,8 @@ int VorkelPtrHandle::TSYNCalculateActualDutyCycle(int objc, Words objv, Tcl_Inte
   const double dutyCycle = call.Number(0);
   const double divider = call.Number(1);
   [[maybe_unused]] const bool flag = call.Flag(2);
-  return call.Answer("%3.3f", imp->TSYNCalculateActualDutyCycle(&dutyCycle, &divider) * 100.0);
+  const double actual = imp->TSYNCalculateActualDutyCycle(&dutyCycle, &divider);
+  return call.AnswerNumber("%3.3f", actual * 100.0);
 }
 
 }  // namespace Ip

@@ -5,15 +5,24 @@
 //   TRACE(trace, "DLL---- number of valid VCOs: %d\n", count);
 //
 // With the trace off it costs one test; its arguments are not evaluated.
+//
+// A trace can have a gigabyte, so lines are gathered, and written block by block. A trace that
+// cannot be written ends there: the run goes on without it, and has the same answer.
+//
+// Tested by trace_test.cpp.
 #ifndef VORKEL_ENGINE_TRACE_H_
 #define VORKEL_ENGINE_TRACE_H_
+
+#include <array>
+#include <cstddef>
 
 namespace Ip {
 
 class Trace {
  public:
-  explicit Trace(bool on) : on_(on) {}
-  // Flushes, so that the lines keep their place among what the caller prints after the run.
+  explicit Trace(bool on);
+  // Writes what is left, so that the lines keep their place among what the caller prints after the
+  // run.
   ~Trace();
   Trace(const Trace&) = delete;
   Trace& operator=(const Trace&) = delete;
@@ -23,8 +32,16 @@ class Trace {
   // Prints a line; `format` and what follows are those of printf.
   [[gnu::format(printf, 2, 3)]] void Print(const char* format, ...) const;
 
+  // How lines of the last trace of this thread that was on have got lost; kWritten when none have.
+  // See StandardOutput.h.
+  static int LossOfLast();
+
  private:
-  bool on_;
+  void Write() const;
+
+  mutable bool on_;
+  mutable std::size_t used_ = 0;
+  mutable std::array<char, 32768> block_;  // whole lines
 };
 
 }  // namespace Ip

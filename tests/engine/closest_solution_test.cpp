@@ -29,6 +29,9 @@ using testing::Not;
 constexpr int kTsyn = 0;
 constexpr int kPll = 1;
 
+// Slots from one candidate of a test to the next; 101 have room in the table.
+constexpr int kApart = 9;
+
 // Lines of the trace. Those of one test at least are written out whole below.
 constexpr char kNoClk0[] = "DLL------- no matches for clk0, so try with higher threshold\n";
 constexpr char kOneForClk0[] = "DLL------- only one exact solution for clk0, so use it\n";
@@ -83,7 +86,7 @@ class ClosestSolutionTest : public testing::Test {
  protected:
   // A new candidate, with nothing to tell it from the request on any output.
   VcoCandidate& Add(double vco) {
-    const int slot = 10 * added_++;
+    const int slot = kApart * added_++;
     table_.Put(slot, vco, 4);
     table_[slot].m = 8;
     table_[slot].d = 1;
@@ -94,7 +97,7 @@ class ClosestSolutionTest : public testing::Test {
   void AddThree() {
     for (const double vco : {700.0, 800.0, 900.0}) Add(vco);
   }
-  VcoCandidate& operator[](int index) { return table_[10 * index]; }
+  VcoCandidate& operator[](int index) { return table_[kApart * index]; }
 
   const VcoCandidate* Select(int count, int prim = kPll) {
     const VcoCandidate* selected = nullptr;
@@ -271,7 +274,7 @@ TEST_F(ClosestSolutionTest, LeavesTheCandidates) {
   (*this)[1].phaseDiff[1] = 0.6;
   (*this)[2].phaseDiff[1] = 90;
   ASSERT_EQ(SelectVco(2), 700.0);
-  EXPECT_THAT(SlotsOf(table_.Occupied()), ElementsAre(0, 10, 20));
+  EXPECT_THAT(SlotsOf(table_.Occupied()), ElementsAre(0, kApart, 2 * kApart));
 }
 
 // --- Final choice by VCO -------------------------------------------------------------------
