@@ -14,7 +14,7 @@ VORKEL_ROOT=$(cd -P -- "$(dirname -- "${BASH_SOURCE[0]}")/.." && pwd -P)
 readonly PROGRAM_FOLDERS=(hardware host engine planner cli tcl binding)
 readonly PROGRAM_SOURCES=(CMakeLists.txt devices doc examples hdl library packaging python
   "${PROGRAM_FOLDERS[@]}")
-readonly TEST_SOURCES=(tests)
+readonly TEST_SOURCES=(fuzz tests)
 
 # The exit status of a script whose set-up fails. Those that call ./vorkel take 1 for an answer of
 # the program.
@@ -43,17 +43,21 @@ end_set_up() {
 
 # --- Debian packages ---------------------------------------------------------------------
 
-# Prints the Debian packages that a job needs: `packages_for program|tests|benchmarks|packages|libcxx`.
+# Prints the Debian packages that a job needs: `packages_for program|tests|benchmarks|packages|libcxx|fuzz`.
 packages_for() {
   printf '%s\n' g++ cmake ninja-build tcl8.6 tcl8.6-dev tcllib libtomlplusplus-dev \
     libboost-dev libcli11-dev libfmt-dev nlohmann-json3-dev
   case $1 in
     tests) printf '%s\n' libgtest-dev libgmock-dev opensta iverilog verilator make ghdl yosys \
-      parallel procps \
+      parallel procps valgrind \
       pkg-config pybind11-dev python3-dev python3-pytest python3-yaml man-db ;;
     benchmarks) printf '%s\n' libbenchmark-dev ;;
     packages) printf '%s\n' pybind11-dev python3-dev dpkg-dev file ;;
     libcxx) printf '%s\n' clang-14 libc++-14-dev libc++abi-14-dev ;;
+    fuzz)
+      packages_for tests
+      printf '%s\n' clang-14 libclang-rt-14-dev
+      ;;
   esac
 }
 

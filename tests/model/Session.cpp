@@ -133,7 +133,7 @@ std::optional<Difference> Session::Run(const Step& step) {
   const std::size_t number = steps_++;
   std::string text = Compare(given, expected);
   if (text.empty()) return std::nullopt;
-  return Difference{number, std::move(expected), std::move(text)};
+  return Difference{number, TextOf(step), std::move(text)};
 }
 
 std::optional<Difference> Play(const Steps& steps, const NewWorld& new_world, bool far) {

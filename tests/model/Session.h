@@ -16,8 +16,8 @@ using NewWorld = std::function<std::unique_ptr<World>()>;
 
 // Where an answer is not the model's.
 struct Difference {
-  std::size_t step = 0;
-  Answer expected;
+  std::size_t step = 0;  // of those that were run
+  std::string line;
   std::string text;  // in words
 };
 

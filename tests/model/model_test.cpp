@@ -75,7 +75,7 @@ std::string Report(int number, const Script& script, const Difference& differenc
   for (const auto& [device, text] : files) folder.Write(device + ".toml", text);
   const Steps fewer = Shrunk(script.steps, PlainWorld);
   return "script " + std::to_string(number) + ", step " + std::to_string(difference.step) + ": " +
-         difference.text + "\n" +
+         difference.line + ": " + difference.text + "\n" +
          TclTest("script-" + std::to_string(number), fewer, PlainWorld, files);
 }
 
