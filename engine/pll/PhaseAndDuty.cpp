@@ -6,6 +6,7 @@
 
 #include "engine/Numbers.h"
 #include "engine/pll/Stages.h"
+#include "engine/timing/LongWalks.h"
 #include "engine/timing/OutputSteps.h"
 
 namespace Ip::Pll {
@@ -24,8 +25,8 @@ double Difference(double requested, double achievable) {
 // A request that is neither positive nor negative, NaN among them, keeps 0.
 double AchievablePhase(double requested, double divider) {
   if (divider == 0.0) return 0.0;
-  if (requested > 0.0) return NearestPhaseStep(requested, PhaseStep(divider), true);
-  if (requested < 0.0) return NearestPhaseStep(requested, PhaseStep(divider), false);
+  if (requested > 0.0) return NearestPhaseStepOfAny(requested, PhaseStep(divider), true);
+  if (requested < 0.0) return NearestPhaseStepOfAny(requested, PhaseStep(divider), false);
   return 0.0;
 }
 
@@ -54,7 +55,7 @@ void GetPhasesAndDutyCycles(VorkelImp& imp, const Run& run) {
       candidate.phase[output] = AchievablePhase(reqPhase, divider);
       candidate.phaseDiff[output] = Difference(reqPhase, candidate.phase[output]);
       candidate.dutyCycle[output] =
-          NearestDutyCycle(reqDutyCycle, divider, imp.pllLimits.maxHighLowCount);
+          NearestDutyCycleOfAny(reqDutyCycle, divider, imp.pllLimits.maxHighLowCount);
       candidate.dutyDiff[output] = Difference(reqDutyCycle / 100.0, candidate.dutyCycle[output]);
     }
   }

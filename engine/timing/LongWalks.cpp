@@ -10,11 +10,15 @@ namespace Ip {
 
 namespace {
 
-// Walks of up to this many steps, some milliseconds at the most, are walked.
-constexpr double kLongestWalk = 1e6;
+// Walks of up to so many steps are walked: the window takes as long.
+constexpr double kLongestPhaseWalk = 16;
+constexpr double kLongestDutyWalk = 128;
 
-// Steps looked at on either side of the request.
+// Steps looked at on either side of the request. A quotient below 2^40 is off by less than one, so
+// that its whole part is off by one at the most; those from there on get some more.
 constexpr int kWindow = 8;
+constexpr int kNarrowWindow = 3;
+constexpr double kNarrow = 1099511627776.0;  // 2^40
 
 // Less than the step of any divider.
 constexpr double kSmallestPhaseStep = 1e-307;
@@ -38,10 +42,11 @@ double WholeBefore(double k) { return k <= kAllWhole ? k - 1.0 : std::nextafter(
 double WalkWindow(double phase, double step, bool positive) {
   const double end = positive ? std::min(phase, 360.0) : std::min(phase + 360.0, 360.0);
   double k = std::floor(end / step);
-  for (int i = 0; i < kWindow && k > 0.0; ++i) k = WholeBefore(k);
+  const int window = k < kNarrow ? kNarrowWindow : kWindow;
+  for (int i = 0; i < window && k > 0.0; ++i) k = WholeBefore(k);
   k = std::max(k, 0.0);
   double best = positive ? k * step : k * step - 360.0;
-  for (int i = 0; i < 2 * kWindow && k * step <= 360.0; ++i, k = WholeAfter(k)) {
+  for (int i = 0; i < 2 * window && k * step <= 360.0; ++i, k = WholeAfter(k)) {
     const double candidate = positive ? k * step : k * step - 360.0;
     if (candidate == phase) return candidate;
     const double bestDistance =
@@ -110,7 +115,9 @@ double NearestPhaseStepOfAny(double phase, double step, bool positive) {
     // The multiples run away from the range; only the first one is in it.
     return !positive && phase == -360.0 ? phase : 0.0;
   }
-  if (360.0 / step <= kLongestWalk || step == 0.0) return NearestPhaseStep(phase, step, positive);
+  if (360.0 / step <= kLongestPhaseWalk || step == 0.0) {
+    return NearestPhaseStep(phase, step, positive);
+  }
   if (step < kSmallestPhaseStep) return 0.0;  // no divider's
   // Nothing replaces the first multiple for a request below the range, nor for a NaN.
   if (!positive && !(phase > -360.0)) return -360.0;
@@ -127,7 +134,7 @@ double NearestDutyCycleOfAny(double percent, double divider, double maxHighLowCo
   if (range.step < 0.0) return MeetBelow(requested, range);
   // A step that does not move the upper end leaves the walk standing somewhere below it.
   if (range.step == 0.0 || range.highest + range.step == range.highest) return 0.0;
-  if ((range.highest - range.lowest) / range.step > kLongestWalk) {
+  if ((range.highest - range.lowest) / range.step > kLongestDutyWalk) {
     range.lowest = AddUpTo(range.lowest, range.step, LastNearest(requested, range));
     // Beyond the request no step comes nearer.
     range.highest = std::min(range.highest, range.lowest + 3 * kWindow * range.step);

@@ -85,6 +85,36 @@ TEST(NearestPhaseStepOfAny, IsThePlainWalkOfShortOnes) {
   }
 }
 
+// A quotient from 2^40 on has another window than one below.
+TEST(NearestPhaseStepOfAny, FindsTheStepOnBothSidesOfAWiderWindow) {
+  constexpr double kSteps = 1099511627776.0;  // 2^40
+  for (const double divider : {kSteps / 8.0, kSteps / 4.0}) {
+    const double step = PhaseStep(divider);
+    for (const double phase : {45.0, 180.0 - step, 180.0, 180.0 + step, 315.0, -45.0, -315.0}) {
+      // A power of two of steps a turn: each of these phases is one.
+      EXPECT_EQ(NearestPhaseStepOfAny(phase, step, phase > 0), phase) << divider;
+      EXPECT_EQ(NearestPhaseStepOfAny(phase + step / 8, step, phase > 0),
+                phase > 0 ? phase : phase + step)
+          << divider;
+    }
+  }
+}
+
+// Upward it is the nearest, and downward the first that is not below.
+TEST(NearestPhaseStepOfAny, IsThePlainWalkOfEveryDivider) {
+  Numbers numbers(8);
+  for (double divider = 1; divider <= 128; divider += 0.125) {
+    const double step = PhaseStep(divider);
+    for (int i = 0; i < 24; ++i) ComparePhase(SomePhase(numbers, step), step);
+    for (const double phase : {45.0, 90.0, 180.0, 270.0, 360.0}) {
+      for (const double near : {Below(phase), phase, Above(phase)}) {
+        ComparePhase(near, step);
+        ComparePhase(-near, step);
+      }
+    }
+  }
+}
+
 // One to six million steps each.
 TEST(NearestPhaseStepOfAny, IsThePlainWalkOfLongOnes) {
   Numbers numbers(2);
@@ -106,7 +136,7 @@ TEST(NearestPhaseStepOfAny, IsThePlainWalkOfVeryLongOnes) {
 }
 
 TEST(NearestPhaseStepOfAny, IsThePlainWalkWhereShortMeetsLong) {
-  for (const double divider : {124999.0, 125000.0, 125001.0, 125000.5}) {
+  for (const double divider : {1.875, 2.0, 2.125, 2.25, 124999.0, 125000.0, 125001.0}) {
     const double step = PhaseStep(divider);
     for (const double phase : {100.0, -100.0, 360.0, -360.0, 1e-9, -1e-9, 400.0, -400.0}) {
       ComparePhase(phase, step);
@@ -187,6 +217,20 @@ double SomeDuty(Numbers& numbers, double divider, double count) {
       return numbers.Between(40, 60);
     default:
       return numbers.Between(0, 100);
+  }
+}
+
+TEST(NearestDutyCycleOfAny, IsThePlainWalkOfEveryDivider) {
+  Numbers numbers(9);
+  for (double divider = 1; divider <= 128; divider += 0.125) {
+    for (const double count : {32.0, 64.0, 100.5, 128.0}) {
+      for (int i = 0; i < 6; ++i) CompareDuty(SomeDuty(numbers, divider, count), divider, count);
+      for (const double percent : {12.5, 25.0, 50.0, 75.0}) {
+        for (const double near : {Below(percent), percent, Above(percent)}) {
+          CompareDuty(near, divider, count);
+        }
+      }
+    }
   }
 }
 
