@@ -1,7 +1,8 @@
 // The five Tcl functions that the package calls, through the interpreter's stubs table.
 //
 // The table is the one that the Tcl library exports, where it exports one; so the package
-// loads into Tcl 8.4 to 8.6 and is linked against none.
+// loads into Tcl 8.4 to 8.6 and is linked against none. Compiled with the headers of Tcl 9 it loads
+// into that.
 #ifndef VORKEL_BINDING_TCLCALLS_H_
 #define VORKEL_BINDING_TCLCALLS_H_
 

@@ -8,6 +8,10 @@
 
 #include <locale.h>
 
+#ifdef _WIN32
+#include <string>
+#endif
+
 namespace Ip {
 
 // While it lives, the thread that has made it is in the C locale. The last one made is the first
@@ -20,7 +24,12 @@ class CLocale {
   CLocale& operator=(const CLocale&) = delete;
 
  private:
+#ifdef _WIN32
+  int mode_before_;
+  std::string before_;
+#else
   locale_t before_;
+#endif
 };
 
 }  // namespace Ip

@@ -1,6 +1,7 @@
 // Tested by devices.test.
 #include <nlohmann/json.hpp>
 
+#include "host/TclVersion.h"
 #include "planner/device/Check.h"
 #include "planner/report/ErrorData.h"
 #include "planner/report/TclDict.h"
@@ -29,7 +30,7 @@ string Contents(const string& path) {
   }
   Tcl_SetChannelOption(nullptr, channel, "-translation", "binary");
   string bytes(static_cast<std::size_t>(kLargest) + 1, '\0');
-  const int count = Tcl_Read(channel, bytes.data(), kLargest + 1);
+  const Tcl::Size count = Tcl_Read(channel, bytes.data(), kLargest + 1);
   const int error = Tcl_GetErrno();
   Tcl_Close(nullptr, channel);
   if (count < 0) throw Failure::OfUsage("no_file", path, path + ": " + Tcl_ErrnoMsg(error));

@@ -6,7 +6,7 @@
 #include "tcl/Commands.h"
 
 extern "C" __attribute__((visibility("default"))) int Vorkel_Init(Tcl_Interp* interp) {
-  if (Tcl_InitStubs(interp, "8.6", 0) == nullptr) return TCL_ERROR;
+  if (Tcl_InitStubs(interp, TCL_VERSION, 0) == nullptr) return TCL_ERROR;
   tcl::MakeCommands(interp);
   return Tcl_PkgProvide(interp, "vorkel", "1.1");
 }

@@ -1,9 +1,11 @@
 #include "tcl/Objects.h"
 
+#include "host/TclVersion.h"
+
 namespace tcl {
 
 std::string Text(Tcl_Obj* object) {
-  int length = 0;
+  Tcl::Size length = 0;
   const char* const bytes = Tcl_GetStringFromObj(object, &length);
   std::string text(bytes, static_cast<std::size_t>(length));
   for (std::size_t i = text.find("\xc0\x80"); i != std::string::npos;
@@ -18,7 +20,7 @@ Tcl_Obj* Object(std::string_view text) {
 }
 
 std::optional<std::vector<Tcl_Obj*>> List(Tcl_Obj* object) {
-  int count = 0;
+  Tcl::Size count = 0;
   Tcl_Obj** items = nullptr;
   if (Tcl_ListObjGetElements(nullptr, object, &count, &items) != TCL_OK) return std::nullopt;
   return std::vector<Tcl_Obj*>(items, items + count);

@@ -12,7 +12,7 @@ VORKEL_ROOT=$(cd -P -- "$(dirname -- "${BASH_SOURCE[0]}")/.." && pwd -P)
 # The folders that the package is built from. A tree that is configured with tests builds the
 # package alone by the targets of these folders.
 readonly PROGRAM_FOLDERS=(hardware host engine planner cli tcl binding)
-readonly PROGRAM_SOURCES=(CMakeLists.txt devices doc examples hdl library packaging python
+readonly PROGRAM_SOURCES=(CMakeLists.txt cmake devices doc examples hdl library packaging python
   "${PROGRAM_FOLDERS[@]}")
 readonly TEST_SOURCES=(fuzz tests)
 
@@ -43,7 +43,8 @@ end_set_up() {
 
 # --- Debian packages ---------------------------------------------------------------------
 
-# Prints the Debian packages that a job needs: `packages_for program|tests|benchmarks|packages|libcxx|fuzz`.
+# Prints the Debian packages that a job needs:
+# `packages_for program|tests|benchmarks|packages|libcxx|fuzz|ports|tcl9`.
 packages_for() {
   printf '%s\n' g++ cmake ninja-build tcl8.6 tcl8.6-dev tcllib libtomlplusplus-dev \
     libboost-dev libcli11-dev libfmt-dev nlohmann-json3-dev
@@ -58,6 +59,10 @@ packages_for() {
       packages_for tests
       printf '%s\n' clang-14 libclang-rt-14-dev
       ;;
+    ports) printf '%s\n' clang-14 libc++-14-dev libc++abi-14-dev llvm-14 lld-14 \
+      g++-aarch64-linux-gnu qemu-user-static g++-i686-linux-gnu g++-mingw-w64-x86-64-posix wine64 \
+      wine ;;
+    tcl9) printf '%s\n' mmdebstrap dpkg-dev ;;
   esac
 }
 

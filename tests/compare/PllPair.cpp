@@ -4,6 +4,7 @@
 
 #include "tests/compare/Difference.h"
 #include "tests/engine/EngineTest.h"
+#include "tests/plain/plain_lists.h"
 #include "tests/support/CaptureTrace.h"
 #include "tests/support/FakeHost.h"
 
@@ -32,6 +33,25 @@ plain::PllLimits PublishLimits(const plain::PllLimits& wanted, int prim) {
                     wanted.maxPfdLowB});
   }
   return limits;
+}
+
+bool GoesFar(const Case& drawn) {
+  plain::RequestLists lists;
+  plain::PllState state;
+  plain::Trace trace(false);
+  const int prepared =
+      plain::PrepareVcoRange(drawn.request, drawn.limits, lists, state, trace);
+  if (prepared != plain::kSolved) return false;
+  if (drawn.request.closest) {
+    plain::ParseList(drawn.request.phases, drawn.request.count, plain::kMaxOutputs, lists.phase);
+    plain::ParseList(drawn.request.dutyCycles, drawn.request.count, plain::kMaxOutputs,
+                     lists.dutyCycle);
+  }
+  double fudge = 0.0;
+  for (int pass = 0; pass < 100; ++pass, fudge += 0.001) {
+    if (plain::SolverPass(fudge, drawn.request, drawn.limits, lists, state, trace)) return false;
+  }
+  return true;
 }
 
 PllPair::PllPair() : imp_(engine_test::NewImp()) { imp_.SetDevice(kComparedPart); }
@@ -76,6 +96,7 @@ std::string PllPair::FirstDifference(const Case& drawn, bool traced) {
   if (drawn.request.prim == plain::kPrimPll) limits.maxPfdLowB = maxPfdLowB_;
   plain::Trace trace(traced);
   answer_ = plain::SolvePll(drawn.request, limits, lists_, trace);
+  plainTrace_ = trace.Text();
   if (traced) {
     std::optional<CaptureTrace> capture(std::in_place);
     const int code = RunProduct(drawn.request, true);

@@ -17,6 +17,10 @@ inline constexpr const char* kComparedPart = "dut";
 // Gives limits to the product, as speed data of kComparedPart. Returns them as it reads them.
 plain::PllLimits PublishLimits(const plain::PllLimits& limits, int prim);
 
+// True when the plain search finds nothing within the first fudges: it would go on for up to
+// seconds, and its trace for tens of megabytes, so that a run can afford few of these.
+bool GoesFar(const Case& drawn);
+
 class PllPair {
  public:
   PllPair();
@@ -26,8 +30,9 @@ class PllPair {
   // more: the answer must not depend on the flag.
   std::string FirstDifference(const Case& drawn, bool traced);
 
-  // The plain solver's last answer.
+  // The plain solver's last answer, and its trace when that was asked for.
   const plain::PllAnswer& Answer() const { return answer_; }
+  const std::string& PlainTrace() const { return plainTrace_; }
 
  private:
   int RunProduct(const plain::PllRequest& request, bool traced);
@@ -36,6 +41,7 @@ class PllPair {
   Ip::VorkelImp& imp_;
   plain::RequestLists lists_;
   plain::PllAnswer answer_;
+  std::string plainTrace_;
   // What the limits keep from run to run: only a TSYN load sets the low-bandwidth maximum.
   double maxPfdLowB_ = 300.0;
 };

@@ -10,7 +10,6 @@
 #include <string>
 
 #include "tests/compare/PllPair.h"
-#include "tests/plain/plain_lists.h"
 
 namespace compare {
 namespace {

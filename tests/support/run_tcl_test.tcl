@@ -20,8 +20,8 @@ tcltest::configure -verbose {body error start} -singleproc 1 {*}[lrange $argv 1 
 set ::vorkelFailed 0
 set ::vorkelRun 0
 proc tcltest::cleanupTestsHook {} {
-    set ::vorkelFailed $tcltest::numTests(Failed)
-    set ::vorkelRun [expr {$tcltest::numTests(Passed) + $tcltest::numTests(Failed)}]
+    set ::vorkelFailed $::tcltest::numTests(Failed)
+    set ::vorkelRun [expr {$::tcltest::numTests(Passed) + $::tcltest::numTests(Failed)}]
 }
 
 # A file that ends with an error of its own has failed, too.

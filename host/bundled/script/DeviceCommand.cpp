@@ -8,6 +8,7 @@
 #include <system_error>
 #include <vector>
 
+#include "host/TclVersion.h"
 #include "host/bundled/device/DeviceCatalogue.h"
 #include "host/bundled/device/DeviceFile.h"
 #include "host/bundled/device/KeywordTable.h"
@@ -38,7 +39,7 @@ Tcl_Obj* NewFileText(std::string_view text) {
 }
 
 std::string TextOf(Tcl_Obj* object) {
-  int length = 0;
+  Tcl::Size length = 0;
   const char* const text = Tcl_GetStringFromObj(object, &length);
   Tcl_DString converted;
   Tcl_UtfToExternalDString(nullptr, text, length, &converted);

@@ -3,11 +3,10 @@
 #include <atomic>
 #include <mutex>
 
+#include "host/TclVersion.h"
+
 namespace Script {
 namespace {
-
-// The oldest Tcl whose stubs table has all the functions that this library calls.
-constexpr char kOldestTcl[] = "8.4";
 
 // Whether the stubs table is there for all threads.
 constinit std::atomic<bool> reached = false;
@@ -20,7 +19,7 @@ bool ReachTcl(Tcl_Interp* interp) {
   if (reached) return true;
   const std::lock_guard lock(reaching);
   // Asking twice would be right as well, but Tcl_InitStubs empties the interpreter's result.
-  if (!reached) reached = tclStubsPtr != nullptr || Tcl_InitStubs(interp, kOldestTcl, 0) != nullptr;
+  if (!reached) reached = tclStubsPtr != nullptr || Tcl_InitStubs(interp, Tcl::kOldest, 0) != nullptr;
   return reached;
 }
 
