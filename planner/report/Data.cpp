@@ -128,7 +128,7 @@ void AddWritten(ordered_json* object, const char* name, const std::optional<Rati
 ordered_json RequestedOutput(const Output& output) {
   // As the readers of requests have it.
   if (!output.used) return "-";
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["frequency"] = WrittenNumber(output.frequency);
   if (!output.asked) data["asked"] = false;
   AddWritten(&data, "phase", output.phase);
@@ -149,7 +149,7 @@ void AddOfInputs(ordered_json* data, const Request& request, const char* name,
 }
 
 ordered_json LoopData(const Request& request, const Answer& answer, const LoopSettings& settings) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   AddOfInputs(&data, request, "vco", answer.vco);
   AddOfInputs(&data, request, "pfd", answer.pfd);
   if (settings.m % hardware::kEighths == 0) {
@@ -190,7 +190,7 @@ ordered_json LimitsData(const Device& device, const Answer& answer) {
   const auto* loop = std::get_if<LoopSettings>(&answer.settings);
   if (loop == nullptr) return nullptr;
   const LoopLimits& limits = device.Loop(loop->primitive);
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["vco"] = RangeData(limits.vco);
   AddExact(&data, "vco_margin", answer.vco_margin);
   data["pfd"] = RangeData(limits.PfdOf(loop->bandwidth));
@@ -226,7 +226,7 @@ void AddPlace(ordered_json* data, const Settings& settings, std::size_t index) {
 ordered_json OutputData(const Request& request, const Device& device, const Answer& answer,
                         std::size_t index) {
   const OutputAnswer& output = answer.outputs[index];
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["index"] = index;
   data["used"] = output.used;
   if (!output.used) return data;
@@ -260,7 +260,7 @@ ordered_json OutputData(const Request& request, const Device& device, const Answ
 
 // What the ranking goes by.
 ordered_json RankingData(const Answer& answer) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["class"] = answer.within ? "met" : answer.violations.empty() ? "missed" : "broken";
   AddExact(&data, "worst_error", answer.worst_error);
   data["max_jitter"] = OrNull(answer.max_jitter);
@@ -333,14 +333,14 @@ ordered_json WrittenNumber(const Rational& value) {
 }
 
 ordered_json RangeData(const Range& range) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   AddExact(&data, "lowest", range.lowest);
   AddExact(&data, "highest", range.highest);
   return data;
 }
 
 ordered_json RequestData(const Request& request, const Device& device) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["device"] = device.part;
   if (request.primitive) data["primitive"] = Name(*request.primitive);
   data["inputs"] = ordered_json::array();
@@ -364,7 +364,7 @@ ordered_json RequestData(const Request& request, const Device& device) {
 }
 
 ordered_json FindingData(const Finding& finding, const Device& device, const Answer* answer) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["kind"] = KindName(finding.kind);
   data["primitive"] =
       finding.primitive ? ordered_json(Name(*finding.primitive)) : ordered_json(nullptr);
@@ -385,7 +385,7 @@ ordered_json FindingData(const Finding& finding, const Device& device, const Ans
 }
 
 ordered_json AnswerData(const Request& request, const Device& device, const Answer& answer) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["primitive"] = Name(answer.primitive);
   data["source"] = SourceName(answer);
   data["variant"] = answer.source.variant;

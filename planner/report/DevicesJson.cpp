@@ -30,7 +30,7 @@ ordered_json OrNull(const std::optional<T>& value) {
 
 ordered_json PrimitiveData(const GradeDescription& grade, Primitive primitive) {
   const PrimitiveRanges ranges = RangesOf(grade, primitive);
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["primitive"] = Name(primitive);
   data["vco"] = RangeOrNull(ranges.vco);
   data["pfd"] = RangeOrNull(ranges.pfd);
@@ -49,7 +49,7 @@ const char* UnitOf(std::string_view keyword) {
 }
 
 ordered_json GradeData(const GradeDescription& grade) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["name"] = grade.name;
   data["primitives"] = ordered_json::array();
   for (const Primitive primitive : grade.primitives) {
@@ -57,7 +57,7 @@ ordered_json GradeData(const GradeDescription& grade) {
   }
   data["limits"] = ordered_json::array();
   for (const device::Limit& limit : grade.limits) {
-    ordered_json entry;
+    ordered_json entry = ordered_json::object();
     entry["keyword"] = limit.keyword;
     entry["unit"] = UnitOf(limit.keyword);
     AddExact(&entry, "value", limit.value);
@@ -71,7 +71,7 @@ ordered_json GradeData(const GradeDescription& grade) {
 }
 
 ordered_json DescriptionData(const Description& description, const std::vector<string>* grades) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["name"] = description.name;
   data["usable"] = true;
   data["about"] = description.about;
@@ -91,7 +91,7 @@ ordered_json DescriptionData(const Description& description, const std::vector<s
 
 ordered_json ComplaintData(const device::Listed& listed) {
   const device::FileComplaint& complaint = *listed.complaint;
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["name"] = listed.name;
   data["usable"] = false;
   data["file"] = complaint.file;
@@ -102,7 +102,7 @@ ordered_json ComplaintData(const device::Listed& listed) {
 }
 
 ordered_json Document(ordered_json devices) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["format"] = "vorkel-devices";
   data["version"] = kDevicesVersion;
   data["devices"] = std::move(devices);

@@ -108,7 +108,7 @@ string NameOf(PartError::Kind kind) {
 }
 
 ordered_json FileMistakeData(const device::Mistake& mistake) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["places"] = ordered_json::array();
   for (const auto& place : mistake.places) {
     data["places"].push_back({{"line", place.line}, {"column", place.column}});
@@ -120,7 +120,7 @@ ordered_json FileMistakeData(const device::Mistake& mistake) {
 }
 
 ordered_json DoubtData(const device::Doubt& doubt) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["keyword"] = doubt.keyword;
   AddExact(&data, "value", doubt.value);
   data["other"] = doubt.other;
@@ -135,7 +135,7 @@ ordered_json DoubtData(const device::Doubt& doubt) {
 }
 
 ordered_json GradeData(const device::GradeDescription& grade) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["name"] = grade.name;
   data["primitives"] = ordered_json::array();
   for (const Primitive one : grade.primitives) data["primitives"].push_back(Name(one));
@@ -149,7 +149,7 @@ ordered_json GradeData(const device::GradeDescription& grade) {
 }  // namespace
 
 ordered_json MistakeData(const read::Mistake& mistake) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["kind"] = NameOf(mistake.kind);
   data["entry"] = mistake.place.entry;
   data["index"] =
@@ -162,7 +162,7 @@ ordered_json MistakeData(const read::Mistake& mistake) {
 }
 
 ordered_json PartErrorData(const PartError& error) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["kind"] = NameOf(error.kind);
   data["entry"] = "device";
   data["text"] = error.name;
@@ -172,7 +172,7 @@ ordered_json PartErrorData(const PartError& error) {
 }
 
 ordered_json RefusedData(const Answer& answer, const Device& device) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["primitive"] = Name(answer.primitive);
   data["message"] = RefusalText(answer, device);
   data["refusals"] = ordered_json::array();
@@ -183,7 +183,7 @@ ordered_json RefusedData(const Answer& answer, const Device& device) {
 }
 
 ordered_json CheckData(const device::Checked& checked, const string& file) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["file"] = file;
   data["usable"] = checked.mistakes.empty();
   data["mistakes"] = ordered_json::array();
@@ -197,7 +197,7 @@ ordered_json CheckData(const device::Checked& checked, const string& file) {
 }
 
 ordered_json DiscrepancyData(const verify::Discrepancy& discrepancy, const string& file) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["path"] = discrepancy.path;
   data["found"] = discrepancy.found;
   data["expected"] = discrepancy.expected;

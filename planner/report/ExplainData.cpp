@@ -94,7 +94,7 @@ class Data {
       : explanation_(explanation), request_(explanation.request), device_(device) {}
 
   ordered_json All() const {
-    ordered_json data;
+    ordered_json data = ordered_json::object();
     data["format"] = "vorkel-explanation";
     data["version"] = kExplanationVersion;
     data["request"] = RequestData(request_, device_);
@@ -103,7 +103,7 @@ class Data {
     for (const OfPrimitive& one : explanation_.primitives) data["primitives"].push_back(Of(one));
     data["inputs"] = ordered_json::array();
     for (const explain::InputThatServes& input : explanation_.inputs) {
-      ordered_json entry;
+      ordered_json entry = ordered_json::object();
       AddExact(&entry, "frequency", input.frequency);
       entry["primitives"] = ordered_json::array();
       for (const Primitive primitive : input.primitives) {
@@ -116,7 +116,7 @@ class Data {
 
  private:
   ordered_json Of(const Demand& demand, Primitive primitive) const {
-    ordered_json data;
+    ordered_json data = ordered_json::object();
     data["kind"] = KindName(demand.kind);
     data["output"] = demand.output >= 0 ? ordered_json(demand.output) : ordered_json(nullptr);
     // Of all outputs together no words are told.
@@ -135,7 +135,7 @@ class Data {
   }
 
   ordered_json Of(const Change& change, Primitive primitive) const {
-    ordered_json data;
+    ordered_json data = ordered_json::object();
     data["kind"] = KindName(change.kind);
     data["demand"] = Of(change.demand, primitive);
     AddExact(&data, "value", change.value);
@@ -151,7 +151,7 @@ class Data {
   }
 
   ordered_json Of(const OfPrimitive& one) const {
-    ordered_json data;
+    ordered_json data = ordered_json::object();
     data["primitive"] = Name(one.primitive);
     data["possible"] = one.is_met;
     data["refusals"] = ordered_json::array();

@@ -30,7 +30,7 @@ ordered_json UnitsData() {
 }
 
 ordered_json EntryData(const Request& request, const Device& device, const Entry& entry) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["number"] = entry.number > 0 ? ordered_json(entry.number) : ordered_json(nullptr);
   data["tradeoff"] = entry.is_tradeoff;
   data.update(AnswerData(request, device, *entry.answer));
@@ -39,7 +39,7 @@ ordered_json EntryData(const Request& request, const Device& device, const Entry
 
 ordered_json Document(const Request& request, const Device& device,
                       const std::vector<Entry>& entries, const std::vector<Primitive>& front_cut) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["format"] = "vorkel-plan";
   data["version"] = kPlanVersion;
   data["units"] = UnitsData();

@@ -50,7 +50,7 @@ const char* KindName(Kind kind) {
 }
 
 ordered_json SettingsData(const Request& request, const Settings& settings) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   if (const auto* const loop = std::get_if<LoopSettings>(&settings)) {
     const int divider = loop->outputs.back().divider;
     AddExact(&data, "vco", VcoOf(request, *loop));
@@ -88,7 +88,7 @@ ordered_json Jitter(double jitter) {
 
 ordered_json ReachHead(const Request& request, const Device& device,
                        const ReachQuestion& question) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["format"] = "vorkel-reach";
   data["version"] = kReachVersion;
   data["device"] = device.part;
@@ -105,7 +105,7 @@ ordered_json ReachHead(const Request& request, const Device& device,
 
 ordered_json PointData(const Reach& reach, const Request& request, const Point& point,
                        const Rational* near) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   const Rational frequency = reach.FrequencyOf(point);
   AddExact(&data, "frequency", frequency);
   data["multiply"] = point.multiply;
@@ -120,7 +120,7 @@ ordered_json PointData(const Reach& reach, const Request& request, const Point& 
 }
 
 ordered_json GapData(const Reach& reach, const Request& request, const reach::Gap& gap) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   AddExact(&data, "width", Width(reach, gap));
   AddExact(&data, "width_ppm", Ppm(Width(reach, gap), reach.FrequencyOf(gap.below)));
   data["below"] = PointData(reach, request, gap.below, nullptr);
@@ -129,7 +129,7 @@ ordered_json GapData(const Reach& reach, const Request& request, const reach::Ga
 }
 
 ordered_json CountData(const Reach& reach, const reach::Counted& counted) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["count"] = counted.count;
   for (const auto& [name, point] :
        {std::pair("lowest", counted.lowest), std::pair("highest", counted.highest)}) {

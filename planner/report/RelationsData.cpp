@@ -58,7 +58,7 @@ void AddExactOrNull(ordered_json* data, const string& name, const std::optional<
 }
 
 ordered_json ClockData(const Request& request, const Clock& clock) {
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["name"] = ClockName(request, clock);
   data["input"] = clock.input;
   data["outputs"] = ordered_json::array();
@@ -84,7 +84,7 @@ ordered_json RelationData(const Request& request, const Relations& relations,
   const auto known = [&](const Rational& value) {
     return is_synchronous ? std::optional(value) : std::nullopt;
   };
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["from"] = ClockName(request, relations.clocks[relation.from]);
   data["to"] = ClockName(request, relations.clocks[relation.to]);
   data["synchronous"] = is_synchronous;
@@ -109,7 +109,7 @@ ordered_json RelationData(const Request& request, const Relations& relations,
 ordered_json Document(const Request& request, const Device& device, const Answer& answer,
                       const relations::Rule& rule) {
   const Relations relations = RelationsOf(request, answer, rule);
-  ordered_json data;
+  ordered_json data = ordered_json::object();
   data["format"] = "vorkel-relations";
   data["version"] = kRelationsVersion;
   data["units"] = UnitsData();

@@ -41,7 +41,7 @@ ordered_json Parts(int count, int of) {
 }
 
 ordered_json Ends(const Range& range) {
-  ordered_json object;
+  ordered_json object = ordered_json::object();
   Put(&object, "lowest", range.lowest);
   Put(&object, "highest", range.highest);
   return object;
@@ -76,7 +76,7 @@ class Entries {
       : request_(request), device_(device), answer_(answer), order_(order), sentences_(sentences) {}
 
   ordered_json All() {
-    ordered_json all;
+    ordered_json all = ordered_json::object();
     all["primitive"] = Name(answer_.primitive);
     const Source& source = answer_.source;
     const bool is_given = answer_.solved && !source.engine && !source.search;
@@ -94,7 +94,7 @@ class Entries {
 
  private:
   ordered_json FindingOf(const Finding& finding) const {
-    ordered_json entry;
+    ordered_json entry = ordered_json::object();
     entry["kind"] = verify::WordOf(finding.kind);
     entry["primitive"] =
         finding.primitive ? ordered_json(Name(*finding.primitive)) : ordered_json(nullptr);
@@ -154,7 +154,7 @@ class Entries {
   }
 
   ordered_json LoopEntries(const LoopSettings& set) const {
-    ordered_json entries;
+    ordered_json entries = ordered_json::object();
     const bool has_second = request_.inputs.size() > 1;
     Put(&entries, "vco", VcoOf(request_.inputs[0], set.m, set.d));
     if (has_second) Put(&entries, "vco_second", VcoOf(request_.inputs[1], set.m, set.d));
@@ -207,7 +207,7 @@ class Entries {
 
   ordered_json LimitsOf(const LoopSettings& set) const {
     const LoopLimits& limits = device_.Loop(set.primitive);
-    ordered_json entries;
+    ordered_json entries = ordered_json::object();
     entries["vco"] = Ends(limits.vco);
     Put(&entries, "vco_margin", answer_.vco_margin);
     entries["pfd"] = Ends(set.bandwidth == Bandwidth::kLow ? limits.pfd_low : limits.pfd);
@@ -217,7 +217,7 @@ class Entries {
   }
 
   ordered_json Ranking() const {
-    ordered_json entries;
+    ordered_json entries = ordered_json::object();
     entries["class"] = !answer_.violations.empty() ? "broken" : answer_.within ? "met" : "missed";
     Put(&entries, "worst_error", answer_.worst_error);
     entries["max_jitter"] = Number(answer_.max_jitter);
@@ -229,7 +229,7 @@ class Entries {
   ordered_json OutputAt(std::size_t place) const {
     const OutputAnswer& output = answer_.outputs[place];
     const Output& asked = AskedAt(place);
-    ordered_json entries;
+    ordered_json entries = ordered_json::object();
     entries["index"] = place;
     entries["used"] = asked.used;
     if (!asked.used) return entries;

@@ -82,7 +82,7 @@ class Work {
   }
 
   void DoHead() {
-    ordered_json head;
+    ordered_json head = ordered_json::object();
     head["format"] = "vorkel-plan";
     head["version"] = kVersion;
     head["units"] = Units();
@@ -147,7 +147,7 @@ class Work {
 
   ordered_json Numbered(const Settings& settings, const PlaceOrder& order) const {
     const auto place = kept_->standing.PlaceOf(settings, order);
-    ordered_json entries;
+    ordered_json entries = ordered_json::object();
     entries["number"] = place ? ordered_json(*place + 1) : ordered_json(nullptr);
     entries["tradeoff"] = kept_->standing.TradeoffOf(settings, order).has_value();
     return entries;
@@ -201,7 +201,7 @@ class Work {
     } else {
       answer.solved = true;
     }
-    ordered_json entries;
+    ordered_json entries = ordered_json::object();
     entries["number"] = nullptr;
     entries["tradeoff"] = false;
     if (answer.solved) {

@@ -9,7 +9,7 @@
 #include "binding/VorkelPtrHandle.h"
 #include "tests/binding/FakeHandles.h"
 #include "tests/binding/FakeStubs.h"
-#include "tests/binding/RefusingAllocator.h"
+#include "tests/support/RefusingAllocator.h"
 
 // Defined in binding/PackageEntry.cpp.
 extern "C" int InitVorkel(ClientData data, Tcl_Interp* interp, int objc, Tcl_Obj* const* objv);

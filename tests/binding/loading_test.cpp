@@ -13,7 +13,7 @@
 #include <string>
 #include <type_traits>
 
-#include "tests/binding/RefusingAllocator.h"
+#include "tests/support/RefusingAllocator.h"
 
 // Implementation objects live until the process ends; the leak checker need not tell.
 extern "C" const char* __asan_default_options() { return "detect_leaks=0"; }

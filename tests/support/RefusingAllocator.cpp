@@ -1,4 +1,4 @@
-#include "tests/binding/RefusingAllocator.h"
+#include "tests/support/RefusingAllocator.h"
 
 #include <cstdlib>
 #include <new>

@@ -1,7 +1,7 @@
 // An allocator that can be told to refuse memory and to count what is freed: the operators new and
 // delete of the program that is linked with RefusingAllocator.cpp.
-#ifndef VORKEL_TESTS_BINDING_REFUSINGALLOCATOR_H_
-#define VORKEL_TESTS_BINDING_REFUSINGALLOCATOR_H_
+#ifndef VORKEL_TESTS_SUPPORT_REFUSINGALLOCATOR_H_
+#define VORKEL_TESTS_SUPPORT_REFUSINGALLOCATOR_H_
 
 #include <cstddef>
 
@@ -47,4 +47,4 @@ class CountFrees {
   int Count() const;
 };
 
-#endif  // VORKEL_TESTS_BINDING_REFUSINGALLOCATOR_H_
+#endif  // VORKEL_TESTS_SUPPORT_REFUSINGALLOCATOR_H_
