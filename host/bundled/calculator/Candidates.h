@@ -11,8 +11,8 @@
 #ifndef VORKEL_HOST_BUNDLED_CALCULATOR_CANDIDATES_H_
 #define VORKEL_HOST_BUNDLED_CALCULATOR_CANDIDATES_H_
 
+#include <algorithm>
 #include <string>
-#include <string_view>
 #include <utility>
 #include <vector>
 
@@ -30,23 +30,29 @@ class Candidates {
   const std::vector<Device::Primitive>& primitives() const { return primitives_; }
 
   // Keeps the primitives for which `accepts(primitive)` is true. When there is none, throws
-  // ArgumentError: "<statement>, but must be <range_of(primitive)> for a <name>[, or ...]."
-  template <typename Accepts, typename RangeOf>
-  void Keep(std::string_view statement, Accepts accepts, RangeOf range_of) {
-    std::vector<Device::Primitive> left;
+  // ArgumentError: "<statement()>, but must be <range_of(primitive)> for a <name>[, or ...]."
+  template <typename StatementOf, typename Accepts, typename RangeOf>
+  void Keep(StatementOf statement, Accepts accepts, RangeOf range_of) {
+    const auto is_refused = [&accepts](Device::Primitive primitive) { return !accepts(primitive); };
+    if (std::all_of(primitives_.begin(), primitives_.end(), is_refused)) {
+      Refuse(statement(), Ranges(range_of));
+    }
+    std::erase_if(primitives_, is_refused);
+  }
+
+ private:
+  template <typename RangeOf>
+  std::string Ranges(RangeOf range_of) const {
     std::string ranges;
     for (const Device::Primitive primitive : primitives_) {
-      if (accepts(primitive)) left.push_back(primitive);
       if (!ranges.empty()) ranges += ", or ";
       ranges += range_of(primitive);
       ranges += " for a ";
       ranges += Device::PrimitiveName(primitive);
     }
-    if (left.empty()) Refuse(statement, ranges);
-    primitives_ = std::move(left);
+    return ranges;
   }
 
- private:
   std::vector<Device::Primitive> primitives_;
 };
 

@@ -36,16 +36,26 @@ DeviceCalculator::DeviceCalculator(std::shared_ptr<const Device::DeviceFile> fil
       grade_(grade),
       device_name_(file_->device + '-' + grade.name),
       place_(std::move(place)) {
+  if (grade_.Has(Device::CoefficientGroup::kLoop)) loop_ = LoopCoefficients::Of(grade_);
+  if (grade_.Has(Device::CoefficientGroup::kKru)) kru_ = KruCoefficients::Of(grade_);
   *place_ = this;
 }
 
 DeviceCalculator::~DeviceCalculator() { *place_ = nullptr; }
 
-void DeviceCalculator::RequireCoefficients(Device::CoefficientGroup group,
-                                           const char* primitives) const {
-  if (grade_.Has(group)) return;
+void DeviceCalculator::RefuseWithout(const char* primitives) const {
   throw ArgumentError("Device " + device_name_ + " has no calculator coefficients for " +
                       primitives + ".");
+}
+
+const LoopCoefficients& DeviceCalculator::RequireLoop() const {
+  if (!loop_) RefuseWithout("PLL and TSYN");
+  return *loop_;
+}
+
+const KruCoefficients& DeviceCalculator::RequireKru() const {
+  if (!kru_) RefuseWithout("KRU_SP and KRU_CLKGEN");
+  return *kru_;
 }
 
 // a1 input frequency (MHz), a2 M, a3 D, a4 feedback divider (0 or 1: none). This is arithmetic,
@@ -69,7 +79,7 @@ bool DeviceCalculator::PllPkToPkJitter(double a1, double a2, double a3, Port::St
                                        double* jitter) {
   return Answer(error, [&] {
     LoopArguments arguments(grade_, device_name_);
-    RequireCoefficients(Device::CoefficientGroup::kLoop, "PLL and TSYN");
+    const LoopCoefficients& coefficients = RequireLoop();
     CheckInputFrequency(a1);
     arguments.CheckM(a2);
     arguments.CheckD(a3);
@@ -79,7 +89,7 @@ bool DeviceCalculator::PllPkToPkJitter(double a1, double a2, double a3, Port::St
     const Loop loop = {.pfd = a1 / a3, .vco = a1 * a2 / a3, .bandwidth = bandwidth};
     arguments.CheckPfd(loop.pfd, bandwidth);
     arguments.CheckVco(loop.vco);
-    *jitter = LoopPkToPkJitter(LoopCoefficients::Of(grade_), loop, a6);
+    *jitter = LoopPkToPkJitter(coefficients, loop, a6);
   });
 }
 
@@ -91,7 +101,7 @@ bool DeviceCalculator::KruPkToPkJitter(double a1, int pin, bool isKruClkgen, boo
   return Answer(error, [&] {
     auto arguments = KruArguments::Certain(grade_, device_name_,
                                            isKruClkgen ? Device::kKruClkgen : Device::kKruSp);
-    RequireCoefficients(Device::CoefficientGroup::kKru, "KRU_SP and KRU_CLKGEN");
+    const KruCoefficients& coefficients = RequireKru();
     CheckInputFrequency(a1);
     const KruPin& output = arguments.CheckPin(pin);
     arguments.CheckFlag("CLKIN_DIVIDE_BY_2", f1);
@@ -103,7 +113,7 @@ bool DeviceCalculator::KruPkToPkJitter(double a1, int pin, bool isKruClkgen, boo
         .input = a1, .divide_by_2 = f1, .feedback = f2, .phase_shift = f3, .m = a2, .d = a3};
     arguments.CheckFrequency(output.source == KruSource::kDivider ? LineFrequency(settings)
                                                                   : PinFrequency(output, settings));
-    *jitter = Calculator::KruPkToPkJitter(KruCoefficients::Of(grade_), output, settings);
+    *jitter = Calculator::KruPkToPkJitter(coefficients, output, settings);
   });
 }
 
@@ -112,21 +122,20 @@ bool DeviceCalculator::PllPhaseError(double a1, double a2, Port::StringBase t3,
                                      Port::StringBase* error, double* phaseError) {
   return Answer(error, [&] {
     LoopArguments arguments(grade_, device_name_);
-    RequireCoefficients(Device::CoefficientGroup::kLoop, "PLL and TSYN");
+    const LoopCoefficients& coefficients = RequireLoop();
     CheckInputFrequency(a1);
     arguments.CheckD(a2);
     const Bandwidth bandwidth = BandwidthOf(t3.View());
     const double pfd = a1 / a2;
     arguments.CheckPfd(pfd, bandwidth);
-    *phaseError = LoopPhaseError(LoopCoefficients::Of(grade_), pfd, bandwidth);
+    *phaseError = LoopPhaseError(coefficients, pfd, bandwidth);
   });
 }
 
 bool DeviceCalculator::KruPhaseError(Port::StringBase* error, double* phaseError) {
   return Answer(error, [&] {
     KruArguments::Any(grade_, device_name_);
-    RequireCoefficients(Device::CoefficientGroup::kKru, "KRU_SP and KRU_CLKGEN");
-    *phaseError = KruCoefficients::Of(grade_).phase_error;
+    *phaseError = RequireKru().phase_error;
   });
 }
 

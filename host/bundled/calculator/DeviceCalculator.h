@@ -8,9 +8,11 @@
 
 #include <atomic>
 #include <memory>
+#include <optional>
 #include <string>
 
 #include "host/Tw_BmCMBCalculator.h"
+#include "host/bundled/calculator/Coefficients.h"
 #include "host/bundled/device/DeviceFile.h"
 
 namespace Calculator {
@@ -41,11 +43,15 @@ class DeviceCalculator final : public Tw_BmCMBCalculator {
                                double* dutyCycle) override;
 
  private:
-  // Throws ArgumentError when the grade does not have the coefficients of the group.
-  void RequireCoefficients(Device::CoefficientGroup group, const char* primitives) const;
+  // Throw ArgumentError when the grade does not have the coefficients.
+  const LoopCoefficients& RequireLoop() const;
+  const KruCoefficients& RequireKru() const;
+  [[noreturn]] void RefuseWithout(const char* primitives) const;
 
   std::shared_ptr<const Device::DeviceFile> file_;
   const Device::Grade& grade_;
+  std::optional<LoopCoefficients> loop_;
+  std::optional<KruCoefficients> kru_;
   std::string device_name_;  // for error sentences
   std::shared_ptr<std::atomic<Tw_BmCMBCalculator*>> place_;
 };

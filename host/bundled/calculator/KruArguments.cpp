@@ -71,7 +71,7 @@ KruArguments KruArguments::Certain(const Device::Grade& grade, std::string_view 
 const KruPin& KruArguments::CheckPin(int code) {
   pin_ = &PinOf(code);
   candidates_.Keep(
-      "Pin is " + std::string(pin_->name),
+      [this] { return "Pin is " + std::string(pin_->name); },
       [this](Primitive primitive) {
         return primitive == Device::kKruSp || pin_->source == KruSource::kSynthesiser;
       },
@@ -84,7 +84,7 @@ const KruPin& KruArguments::CheckPin(int code) {
 void KruArguments::CheckFlag(std::string_view what, bool flag) {
   if (!flag) return;
   candidates_.Keep(
-      std::string(what) + " is true",
+      [what] { return std::string(what) + " is true"; },
       [](Primitive primitive) { return primitive == Device::kKruSp; },
       [](Primitive) { return std::string("false"); });
 }
@@ -93,7 +93,7 @@ void KruArguments::CheckRatioPart(std::string_view what, double value, double lo
   const bool optional = pin_->source != KruSource::kSynthesiser;
   if (optional && value == 0.0) return;
   candidates_.Keep(
-      Statement(what, value),
+      [=] { return Statement(what, value); },
       [=](Primitive primitive) { return IsWhole(value, lowest, LargestRatioPart(primitive)); },
       [=](Primitive primitive) {
         return (optional ? "0 (none) or " : "") + std::string("a whole number from ") +
@@ -109,7 +109,7 @@ void KruArguments::CheckDivide(double divide) {
   const bool optional = pin_->source != KruSource::kDivider;
   if (optional && divide == 0.0) return;
   candidates_.Keep(
-      Statement("CLKDV divide", divide),
+      [=] { return Statement("CLKDV divide", divide); },
       [=](Primitive primitive) { return IsDivide(primitive, divide); },
       [=](Primitive primitive) {
         return (optional ? "0 (none), " : "") + RangeOfDivide(primitive);

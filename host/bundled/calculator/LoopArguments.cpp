@@ -22,6 +22,16 @@ constexpr double kEighth = 1.0 / hardware::kEighths;
 constexpr double kLeastFractionalM = hardware::kSmallestTsynM;
 constexpr double kLeastFractionalDivider = hardware::kSmallestFractionalDivider;
 
+// Where the limits stand among the figures of a grade.
+std::size_t IndexOf(std::string_view keyword) { return *Device::FindKeyword(keyword); }
+
+const LoopArguments::Limit kVcoMin = {IndexOf("VCOCLK_FREQ_MIN"), IndexOf("TSYN_VCOCLK_FREQ_MIN")};
+const LoopArguments::Limit kVcoMax = {IndexOf("VCOCLK_FREQ_MAX"), IndexOf("TSYN_VCOCLK_FREQ_MAX")};
+const LoopArguments::Limit kPfdMin = {IndexOf("CLKPFD_FREQ_MIN"), IndexOf("TSYN_CLKPFD_FREQ_MIN")};
+const LoopArguments::Limit kPfdMax = {IndexOf("CLKPFD_FREQ_MAX"), IndexOf("TSYN_CLKPFD_FREQ_MAX")};
+const std::size_t kPfdMaxOfLow = IndexOf("TSYN_CLKPFD_FREQ_MAX_LBW");
+const std::size_t kLargestCount = IndexOf("O_MAX_HT_LT");
+
 bool IsTsynValue(double value, double least, double largest) {
   return value == 1.0 || (IsWithin(value, least, largest) && IsMultiple(value, kEighth));
 }
@@ -73,14 +83,15 @@ LoopArguments::LoopArguments(const Device::Grade& grade, std::string_view device
 
 void LoopArguments::CheckM(double m) {
   candidates_.Keep(
-      Statement("M", m), [m](Primitive primitive) { return IsM(primitive, m); }, RangeOfM);
+      [m] { return Statement("M", m); },
+      [m](Primitive primitive) { return IsM(primitive, m); }, RangeOfM);
 }
 
 void LoopArguments::CheckD(double d) const { CheckWhole("D", d, 1.0, kLargestD); }
 
 void LoopArguments::CheckOutputDivider(double divider) {
   candidates_.Keep(
-      Statement("Output divider", divider),
+      [divider] { return Statement("Output divider", divider); },
       [divider](Primitive primitive) { return IsOutputDivider(primitive, divider); },
       RangeOfOutputDivider);
 }
@@ -88,7 +99,7 @@ void LoopArguments::CheckOutputDivider(double divider) {
 void LoopArguments::CheckFeedbackDivider(double divider) {
   if (divider == 0.0) return;
   candidates_.Keep(
-      Statement("Feedback divider", divider),
+      [divider] { return Statement("Feedback divider", divider); },
       [divider](Primitive primitive) { return IsOutputDivider(primitive, divider); },
       [](Primitive primitive) { return "0 (none) or " + RangeOfOutputDivider(primitive); });
 }
@@ -108,7 +119,7 @@ void LoopArguments::CheckInputJitter(double picoseconds) const {
 double LoopArguments::CheckLargestCount(double count, double divider) const {
   // The longest high time, half a VCO cycle more than the count, must reach the shortest.
   const double least = divider == 1.0 ? 0.5 : (divider - 0.5) / 2.0;
-  const double largest = count == 0.0 ? *grade_.Figure("O_MAX_HT_LT") : count;
+  const double largest = count == 0.0 ? *grade_.figures[kLargestCount] : count;
   if (IsWithin(largest, least, std::numeric_limits<double>::max())) return largest;
   if (count == 0.0) {
     Refuse(Statement("Output divider", divider), "at most " + NumberText(2.0 * largest + 0.5) +
@@ -120,38 +131,36 @@ double LoopArguments::CheckLargestCount(double count, double divider) const {
              " for an output divider of " + NumberText(divider));
 }
 
-double LoopArguments::Limit(Primitive primitive, std::string_view keyword) const {
-  std::string full(primitive == Device::kTsyn ? "TSYN_" : "");
-  full += keyword;
-  return *grade_.Figure(full);
+double LoopArguments::Of(const Limit& limit, Primitive primitive) const {
+  return *grade_.figures[primitive == Device::kTsyn ? limit.tsyn : limit.pll];
 }
 
 void LoopArguments::CheckPfd(double pfd, Bandwidth bandwidth) {
   // Only the TSYN has a limit of its own for a narrow loop.
   const auto highest = [&](Primitive primitive) {
     const bool low = primitive == Device::kTsyn && bandwidth == Bandwidth::kLow;
-    return Limit(primitive, low ? "CLKPFD_FREQ_MAX_LBW" : "CLKPFD_FREQ_MAX");
+    return low ? *grade_.figures[kPfdMaxOfLow] : Of(kPfdMax, primitive);
   };
   candidates_.Keep(
-      "PFD frequency (input frequency / D) is " + FrequencyText(pfd),
+      [pfd] { return "PFD frequency (input frequency / D) is " + FrequencyText(pfd); },
       [&](Primitive primitive) {
-        return IsWithinLimits(pfd, Limit(primitive, "CLKPFD_FREQ_MIN"), highest(primitive));
+        return IsWithinLimits(pfd, Of(kPfdMin, primitive), highest(primitive));
       },
       [&](Primitive primitive) {
-        return FrequencyRange(Limit(primitive, "CLKPFD_FREQ_MIN"), highest(primitive));
+        return FrequencyRange(Of(kPfdMin, primitive), highest(primitive));
       });
 }
 
 void LoopArguments::CheckVco(double vco) {
   candidates_.Keep(
-      "VCO frequency (input frequency x M / D) is " + FrequencyText(vco),
+      [vco] { return "VCO frequency (input frequency x M / D) is " + FrequencyText(vco); },
       [&](Primitive primitive) {
-        return IsWithinLimits(vco, Limit(primitive, "VCOCLK_FREQ_MIN"),
-                              Limit(primitive, "VCOCLK_FREQ_MAX"));
+        return IsWithinLimits(vco, Of(kVcoMin, primitive),
+                              Of(kVcoMax, primitive));
       },
       [&](Primitive primitive) {
-        return FrequencyRange(Limit(primitive, "VCOCLK_FREQ_MIN"),
-                              Limit(primitive, "VCOCLK_FREQ_MAX"));
+        return FrequencyRange(Of(kVcoMin, primitive),
+                              Of(kVcoMax, primitive));
       });
 }
 

@@ -4,6 +4,7 @@
 #ifndef VORKEL_HOST_BUNDLED_CALCULATOR_LOOPARGUMENTS_H_
 #define VORKEL_HOST_BUNDLED_CALCULATOR_LOOPARGUMENTS_H_
 
+#include <cstddef>
 #include <string_view>
 
 #include "host/bundled/calculator/Candidates.h"
@@ -24,6 +25,12 @@ bool IsFractional(double value);
 // the device can take the argument together with those before it.
 class LoopArguments {
  public:
+  // A limit that either primitive has, by its keyword index.
+  struct Limit {
+    std::size_t pll;
+    std::size_t tsyn;
+  };
+
   // Throws ArgumentError when the grade has neither PLL nor TSYN. `device_name` is for the
   // sentence. The grade must outlive the checks.
   LoopArguments(const Device::Grade& grade, std::string_view device_name);
@@ -46,7 +53,7 @@ class LoopArguments {
   void CheckVco(double vco);
 
  private:
-  double Limit(Device::Primitive primitive, std::string_view keyword) const;
+  double Of(const Limit& limit, Device::Primitive primitive) const;
 
   const Device::Grade& grade_;
   Candidates candidates_;

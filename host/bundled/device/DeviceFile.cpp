@@ -33,15 +33,17 @@ std::optional<double> Grade::CoefficientOf(std::string_view coefficient_name) co
 }
 
 bool Grade::Has(Primitive primitive) const {
-  for (const Keyword& keyword : Keywords()) {
-    if ((keyword.primitives & primitive) != 0 && !Figure(keyword.name)) return false;
+  const auto keywords = Keywords();
+  for (std::size_t i = 0; i < keywords.size(); ++i) {
+    if ((keywords[i].primitives & primitive) != 0 && !figures[i]) return false;
   }
   return true;
 }
 
 bool Grade::Has(CoefficientGroup group) const {
-  for (const Coefficient& coefficient : Coefficients()) {
-    if (coefficient.group == group && !CoefficientOf(coefficient.name)) return false;
+  const auto all = Coefficients();
+  for (std::size_t i = 0; i < all.size(); ++i) {
+    if (all[i].group == group && !coefficients[i]) return false;
   }
   return true;
 }
