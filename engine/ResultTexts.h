@@ -35,12 +35,8 @@ inline const char* PllResultText(PllEntry entry, int code, int count) {
 
 // The same for a Kru::ResultCode of a KRU_SP or a KRU_CLKGEN.
 inline const char* KruResultText(bool isKruClkgen, int code, int numOut) {
-  switch (code) {
-    case Kru::kSolved: return "1";
-    case Kru::kNoSpeedData: return "Could not get data from speedsfile.";
-    case Kru::kNoConfiguration: break;
-    default: return "";
-  }
+  if (code == Kru::kSolved) return "1";
+  if (code == Kru::kNoSpeedData) return "Could not get data from speedsfile.";
   if (isKruClkgen) {
     return numOut == 1
                ? "The KRU_CLKGEN cannot support the requested output frequency and phase."

@@ -81,7 +81,8 @@ class Rational {
 
  private:
   struct Large;
-  explicit Rational(Large large);  // reduces, and keeps it small where it fits
+  // Reduces, and keeps it small where it fits. Its denominator is not 0.
+  explicit Rational(Large large);
   Large Widened() const;
 
   std::int64_t numerator_ = 0;

@@ -1,13 +1,15 @@
 // Tested by kru_test.cpp.
 #include "hardware/Kru.h"
 
+#include <cassert>
+
 namespace hardware {
 
 const PinFacts& FactsOf(Pin pin) {
   for (const PinFacts& facts : kPins) {
     if (facts.pin == pin) return facts;
   }
-  return kPins.front();
+  return (assert(false), kPins.front());  // not reached: those are all pins but kNone
 }
 
 Rational PinRatio(Pin pin, const KruRatios& ratios) {

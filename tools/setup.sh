@@ -44,14 +44,17 @@ end_set_up() {
 # --- Debian packages ---------------------------------------------------------------------
 
 # Prints the Debian packages that a job needs:
-# `packages_for program|tests|benchmarks|packages|libcxx|fuzz|ports|tcl9`.
+# `packages_for program|tests|coverage|benchmarks|packages|libcxx|fuzz|ports|tcl9`.
 packages_for() {
   printf '%s\n' g++ cmake ninja-build tcl8.6 tcl8.6-dev tcllib libtomlplusplus-dev \
     libboost-dev libcli11-dev libfmt-dev nlohmann-json3-dev
   case $1 in
-    tests) printf '%s\n' libgtest-dev libgmock-dev opensta iverilog verilator make ghdl yosys \
-      parallel procps valgrind \
-      pkg-config pybind11-dev python3-dev python3-pytest python3-yaml man-db ;;
+    tests | coverage)
+      printf '%s\n' libgtest-dev libgmock-dev opensta iverilog verilator make ghdl yosys \
+        parallel procps valgrind \
+        pkg-config pybind11-dev python3-dev python3-pytest python3-yaml man-db
+      [[ $1 == tests ]] || printf '%s\n' gcovr
+      ;;
     benchmarks) printf '%s\n' libbenchmark-dev ;;
     packages) printf '%s\n' pybind11-dev python3-dev dpkg-dev file ;;
     libcxx) printf '%s\n' clang-14 libc++-14-dev libc++abi-14-dev ;;
@@ -126,7 +129,7 @@ apt_get() {
 
 # --- The stamp ---------------------------------------------------------------------------
 
-# Prints the state of the sources of a build: `fingerprint program|tests`.
+# Prints the state of the sources of a build: `fingerprint program|tests|...`.
 fingerprint() {
   local sources=("${PROGRAM_SOURCES[@]}") present=() name
   [[ $1 == program ]] || sources+=("${TEST_SOURCES[@]}")
@@ -208,7 +211,7 @@ bring_up_to_date() {
   state=$(fingerprint "$what")
   discard_foreign_configuration "$folder"
   install_packages "$what"
-  if [[ $what == tests ]]; then
+  if [[ $what == tests || $what == coverage ]]; then
     configure "$folder" -DVORKEL_TESTS=ON "$@"
   else
     # A tree with tests stays one: going back and forth would configure it every time.
@@ -233,7 +236,7 @@ bring_up_to_date() {
   printf '%s\n' "$state" >"$folder/.built-$what"
 }
 
-# `set_up FOLDER program|tests OPTION...`: keeps the folder for this run, see `lock`, and has what
+# `set_up FOLDER program|tests|... OPTION...`: keeps the folder for this run, see `lock`, and has what
 # it is to hold in it. Whatever fails ends the script.
 set_up() {
   trap end_set_up EXIT

@@ -77,7 +77,8 @@ Loaded LoadAndUse(int allocations) {
 template <typename Refuse>
 int StatusOfLoad(int allocations) {
   const pid_t child = fork();
-  if (child == 0) _exit(LoadAndUse<Refuse>(allocations));
+  // By way of what libraries do at the end, such as writing down what has been run of them.
+  if (child == 0) std::exit(LoadAndUse<Refuse>(allocations));
   int status = 0;
   EXPECT_EQ(waitpid(child, &status, 0), child);
   return WIFEXITED(status) ? WEXITSTATUS(status) : -WTERMSIG(status);

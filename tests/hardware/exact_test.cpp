@@ -40,6 +40,25 @@ TEST(Rational, CountsBeyondTwoWords) {
   EXPECT_EQ(Rational(1) / square * square, Rational(1));
 }
 
+TEST(Rational, DividesByWhatIsBelowZero) {
+  EXPECT_EQ(Rational(3) / Rational(-2), Rational(-3, 2));
+  EXPECT_EQ(Rational(-3, 5) / Rational(-2, 7), Rational(21, 10));
+  const Rational large = Rational(kMost) * kMost;
+  EXPECT_EQ(Rational(2) / -large, Rational(-2) / large);
+  EXPECT_LT(Rational(2) / -large, Rational(0));
+}
+
+// Equal numbers are in the same form; so no large one equals a small one.
+TEST(Rational, IsEqualByValueInBothForms) {
+  const Rational large = Rational(kMost) * kMost;
+  EXPECT_TRUE(large == Rational(kMost) * kMost);
+  EXPECT_FALSE(large == large + 1);
+  EXPECT_FALSE(large == Rational(kMost));
+  EXPECT_FALSE(Rational(kMost) == large);
+  EXPECT_FALSE(Rational(2, 3) == Rational(2, 5));
+  EXPECT_FALSE(Rational(2, 3) == Rational(1, 3));
+}
+
 TEST(Rational, HasTheLeastWordToo) {
   const Rational least = kLeast;
   EXPECT_EQ(least.NumeratorText(), "-9223372036854775808");
@@ -77,10 +96,14 @@ TEST(Rational, FloorAndRound) {
   const Rational large = Rational(kMost) * kMost;
   EXPECT_EQ((large + Rational(1, 2)).Floor(), large);
   EXPECT_EQ((-large - Rational(1, 2)).Floor(), -large - 1);
+  EXPECT_EQ((-large).Floor(), -large);
   EXPECT_EQ(Rational(7).Whole(), 7);
   EXPECT_EQ(Rational(7, 2).Whole(), std::nullopt);
   EXPECT_EQ(large.Whole(), std::nullopt);
   EXPECT_TRUE(large.IsWhole());
+  EXPECT_FALSE((large + Rational(1, 2)).IsWhole());
+  EXPECT_TRUE(Rational(7).IsWhole());
+  EXPECT_FALSE(Rational(7, 2).IsWhole());
 }
 
 TEST(Rational, TellsItsWordsWhereItFits) {
@@ -126,6 +149,11 @@ TEST(Rational, GoesToTheNearestDouble) {
   const Rational huge = Rational::FromDecimal("1", 400);
   EXPECT_EQ(huge.ToDouble(), std::numeric_limits<double>::max());
   EXPECT_EQ((-huge).ToDouble(), -std::numeric_limits<double>::max());
+  // The largest double is 2^1024 - 2^971. Half-way to 2^1024 the even one would be that.
+  const Rational largest = Rational::FromDouble(std::numeric_limits<double>::max());
+  const Rational over = largest + Rational::FromDouble(std::ldexp(1.0, 970));
+  EXPECT_EQ(over.ToDouble(), std::numeric_limits<double>::max());
+  EXPECT_EQ((-over).ToDouble(), -std::numeric_limits<double>::max());
   EXPECT_EQ((Rational(1) / huge).ToDouble(), 0.0);
 }
 

@@ -93,6 +93,14 @@ TEST_F(DeviceFileTest, ReportsWhatCannotBeRead) {
   EXPECT_THAT(ErrorAtPath(loop), StartsWith(loop + ": cannot be read: "));
 }
 
+// A regular file that opens, and has nothing at its beginning that could be read: the memory of
+// this process.
+TEST_F(DeviceFileTest, ReportsWhatStopsInReading) {
+  const std::string link = folder_.File("memory.toml");
+  std::filesystem::create_symlink("/proc/self/mem", link);
+  EXPECT_EQ(ErrorAtPath(link), link + ": cannot be read: Input/output error");
+}
+
 TEST_F(DeviceFileTest, ReportsHugeFiles) {
   EXPECT_EQ(Error(std::string(Device::kLargestFile + 1, '#')),
             ": is longer than 262144 bytes, which no device file is");

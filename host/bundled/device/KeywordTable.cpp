@@ -1,5 +1,6 @@
 #include "host/bundled/device/KeywordTable.h"
 
+#include <cassert>
 #include <cstdint>
 #include <iterator>
 
@@ -108,7 +109,7 @@ std::string_view PrimitiveName(Primitive primitive) {
     case kKruClkgen:
       return "KRU_CLKGEN";
   }
-  return "";
+  return (assert(false), "");  // not reached: those are all primitives
 }
 
 std::string_view UnitName(Unit unit) {
@@ -120,7 +121,7 @@ std::string_view UnitName(Unit unit) {
     case Unit::kCount:
       return "count";
   }
-  return "";
+  return (assert(false), "");  // not reached: those are all units
 }
 
 }  // namespace Device
