@@ -56,7 +56,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
       setenv("VORKEL_DEVICES", VORKEL_SOURCE_DIR "/devices", 1) == 0;
   if (!are_devices_found) return -1;
   const std::string_view text = fuzz::TextOf(data, size);
-  if (!IsPlain(text)) return -1;
+  // The names of handles differ from run to run, and are not compared.
+  if (!IsPlain(text) || text.find("::Script::handle") != std::string_view::npos) return -1;
   model::Steps steps = {{Step::Kind::kCreate, 0, {}}};
   for (const std::string& line : fuzz::Split(text, '\n')) {
     if (steps.size() < kMostSteps && !line.empty()) steps.push_back(StepOf(line));
