@@ -4,6 +4,8 @@
 
 #include <optional>
 #include <string>
+#include <string_view>
+#include <utility>
 #include <vector>
 
 #include "fuzz/Fuzz.h"
@@ -67,6 +69,16 @@ inline void FinishDraft(const planner::read::Draft& draft, planner::read::Mistak
   const std::string said = Text(OptionsOf(ByOutputs(reading->request)));
   const std::string read = Text(OptionsOf(ByOutputs(same->request)));
   Require(read == said, "another request:\n" + said + "is read as\n" + read);
+}
+
+// Reads a request with the reader of its format.
+using Reader = planner::read::Draft (*)(std::string_view text, std::string_view file,
+                                        planner::read::Mistakes* mistakes);
+inline int ReadRequest(Reader reader, std::string_view text) {
+  planner::read::Mistakes mistakes;
+  const planner::read::Draft draft = reader(text, "request", &mistakes);
+  FinishDraft(draft, std::move(mistakes));
+  return 0;
 }
 
 }  // namespace fuzz

@@ -7,15 +7,17 @@
 #include <gtest/gtest.h>
 #include <malloc.h>
 
-#ifdef __SANITIZE_ADDRESS__
-#include <sanitizer/allocator_interface.h>
-#endif
-
+#include <cstddef>
 #include <cstdlib>
 #include <string>
 
 // Defined in binding/PackageEntry.cpp.
 extern "C" int Ip_vorkel_Init(Tcl_Interp* interp);
+
+#ifdef __SANITIZE_ADDRESS__
+// Of the sanitizer's run-time library; g++ brings no header for it.
+extern "C" std::size_t __sanitizer_get_current_allocated_bytes();
+#endif
 
 // Implementation objects live until the process ends; the leak checker need not tell.
 extern "C" const char* __asan_default_options() { return "detect_leaks=0"; }

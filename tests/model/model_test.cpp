@@ -97,8 +97,12 @@ TEST(ModelTest, ThePackageAnswersAsTheModel) {
       ++differences;
       ADD_FAILURE() << Report(number, script, *difference);
     }
+    if (is_long && number % 500 == 499) {
+      std::printf("%d scripts, %d steps\n", number + 1, tally.steps);
+      std::fflush(stdout);
+    }
   }
-  std::printf("%d scripts, %d steps\n", scripts, tally.steps);
+  if (!is_long) std::printf("%d scripts, %d steps\n", scripts, tally.steps);
   // All methods were called, and those that calculate often.
   int methods = 0;
   for (const auto& [name, count] : tally.methods) methods += count > scripts / 20 ? 1 : 0;
