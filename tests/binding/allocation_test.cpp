@@ -71,18 +71,20 @@ TEST_F(Creation, WithoutMemoryForTheHandleFails) {
 }
 
 // Whatever is refused on the way, nothing is thrown at Tcl, which is C. Of all that is made, only
-// the handle is missed with an error.
+// the handle is missed with an error. Each time in an interpreter of its own, since the first handle
+// of one makes what all its handles share; and there the next handle has all.
 TEST_F(Creation, FailsForWantOfTheHandleOnlyAndThrowsNothing) {
   int refused = 1;
   int failed = 0;
   for (int allocations = 0; refused > 0; ++allocations) {
     ASSERT_LT(allocations, 1000);
+    TestInterp interp;
     int status = TCL_ERROR;
     std::string thrown;
     {
       const RefuseAfter refuse(allocations);
       try {
-        status = InitVorkel(nullptr, interp_.get(), 0, nullptr);
+        status = InitVorkel(nullptr, interp.get(), 0, nullptr);
       } catch (const std::exception& error) {
         thrown = error.what();
       }
@@ -90,10 +92,12 @@ TEST_F(Creation, FailsForWantOfTheHandleOnlyAndThrowsNothing) {
     }
     EXPECT_EQ(thrown, "") << "after " << allocations << " allocations";
     if (!thrown.empty()) continue;
-    const bool saysSo = interp_.Result() == "Ip::Vorkel::Init: out of memory.";
+    const bool saysSo = interp.Result() == "Ip::Vorkel::Init: out of memory.";
     EXPECT_EQ(saysSo, status == TCL_ERROR) << "after " << allocations << " allocations";
     if (status == TCL_ERROR) ++failed;
-    interp_.SetResult("");
+    ASSERT_EQ(InitVorkel(nullptr, interp.get(), 0, nullptr), TCL_OK);
+    EXPECT_EQ(interp.Eval(interp.Result() + " GetChosenM"), TCL_OK) << interp.Result();
+    EXPECT_EQ(interp.Result(), "0.000") << "after " << allocations << " allocations";
   }
   EXPECT_EQ(failed, 1);
 }
