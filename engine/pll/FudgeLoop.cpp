@@ -3,8 +3,11 @@
 //
 // Tested by fudge_loop_test.cpp.
 
+#include <algorithm>
 #include <optional>
 
+#include "engine/pll/Div0Steps.h"
+#include "engine/pll/Fudges.h"
 #include "engine/pll/PassFilter.h"
 #include "engine/pll/Stages.h"
 
@@ -12,27 +15,41 @@ namespace Ip::Pll {
 
 namespace {
 
-constexpr double kFudgeStep = 0.001;       // MHz
-constexpr double kLargestFudge = 10.999;   // MHz; by repeated addition 11000 passes
+// What making the filter costs, in candidates that passes could try instead: its windows and its
+// first chunk, and the ranking of each output after output 0.
+constexpr int kCostOfFilter = 150;
+constexpr int kCostOfRankedOutput = 200;
+// What a pass costs beside its candidates.
+constexpr int kCostOfPass = 16;
+
+// The passes to be run before the filter is made: as many as cost what the filter costs. Most
+// fudges are so small that it would come too late. With a trace all passes run, since each has its
+// lines.
+int PassesBeforeFilter(const VorkelImp& imp, const Run& run) {
+  if (run.trace.On()) return kPasses;
+  const Div0Steps steps(HasIntegerDiv0(imp, run));
+  const double outFreq0 = imp.requests.reqOutFreq[0];
+  const int first = steps.FirstWorthTrying(outFreq0, imp.pll.minAdjVco);
+  const int last = outFreq0 > 0.0 ? steps.Below(imp.pll.maxAdjVco / outFreq0) : 0;
+  const int candidates = std::max(last - first + 1, 0);
+  const int filter = kCostOfFilter + kCostOfRankedOutput * (run.count - 1);
+  return 1 + filter / (2 * candidates + kCostOfPass);
+}
 
 }  // namespace
 
 bool FudgeLoop(VorkelImp& imp, const Run& run) {
-  double fudge = 0.0;
-  if (SolverPass(imp, fudge, run)) return true;
-  // The filter knows which of the other passes are worth running. With a trace all of them
-  // run, since each has its lines.
+  const int beforeFilter = PassesBeforeFilter(imp, run);
   std::optional<PassFilter> filter;
-  if (!run.trace.On()) {
-    filter.emplace(imp, run, kFudgeStep);
-    if (filter->IsHopeless()) return false;
-  }
-  for (;;) {
-    fudge += kFudgeStep;
-    TRACE(run.trace, "DLL- NO VALID VCOs found, so upping div0 fudge to %1.3f!\n", fudge);
-    if (fudge > kLargestFudge) break;
-    if (filter && !filter->MaySucceed(fudge)) continue;
-    if (SolverPass(imp, fudge, run)) return true;
+  for (int pass = 0; pass < kPasses; ++pass) {
+    if (pass >= beforeFilter) {
+      if (!filter) filter.emplace(imp, run);
+      pass = filter->NextFrom(pass);
+      if (pass == kPasses) break;
+    }
+    if (SolverPass(imp, FudgeOf(pass), run)) return true;
+    TRACE(run.trace, "DLL- NO VALID VCOs found, so upping div0 fudge to %1.3f!\n",
+          FudgeOf(pass + 1));
   }
   TRACE(run.trace, "DLL- NO VALID VCOs found for all possible div0 fudges!\n");
   return false;

@@ -85,8 +85,14 @@ bool WalkD(VcoCandidate& candidate, double pfdMin, double pfdMax, double step, c
   // With room for the remainder and for roundings.
   const double first = std::floor(std::fmax(run.inFreq / pfdMax - 1.0, 1.0));
   const double last = pfdMin > 0.0 ? run.inFreq / pfdMin + 1.0 : kDBelow;
+  // How far D x VCO / input may be from M, with the same room.
+  const double furthest = 2.0 * kLargestRemainder * ratio;
+  const double perStep = 1.0 / step;  // exact: a power of 2
   for (double d = first; d < kDBelow && d <= last; d += 1.0) {
-    const double m = std::floor(d * ratio / step + 0.5) * step;
+    const double realM = d * ratio;
+    if (realM >= kLargestM + 1.0) return false;
+    const double m = static_cast<int>(realM * perStep + 0.5) * step;
+    if (std::fabs(m - realM) > furthest) continue;
     if (m > kLargestM) return false;
     const bool exists = m == 1.0 || (m >= 2.0 && !IsInGap(m, run));
     if (exists && TakeM(candidate, m, pfdMin, pfdMax, run)) return true;
@@ -104,7 +110,7 @@ bool SearchMAndD(VcoCandidate& candidate, double pfdMin, double pfdMax, bool int
   return (isUsual ? WalkD : WalkM)(candidate, pfdMin, pfdMax, step, run);
 }
 
-bool CalculateMAndD(VorkelImp& imp, bool integerStep, const Run& run) {
+bool CalculateMAndD(VorkelImp& imp, bool integerStep, const Run& run, int enough) {
   VcoCandidateTable& candidates = imp.pll._vcoCandidates;
   const Trace& trace = run.trace;
   TRACE(trace, "DLL------- Calculating M and D\n");
@@ -112,12 +118,17 @@ bool CalculateMAndD(VorkelImp& imp, bool integerStep, const Run& run) {
   if (imp.lowBandwidth) {
     TRACE(trace, "DLL  --- Using _maxPfdLowB (%f) for PFD max\n", pfdMax);
   }
+  int found = 0;
   for (const int slot : candidates.Occupied()) {
-    if (!SearchMAndD(candidates[slot], imp.pllLimits.pfdMin, pfdMax, integerStep, run)) {
+    if (found == enough || !SearchMAndD(candidates[slot], imp.pllLimits.pfdMin, pfdMax,
+                                        integerStep, run)) {
       candidates.Empty(slot);
+    } else {
+      candidates[slot].ClearWhatIsLeft(run.count);
+      ++found;
     }
   }
-  if (candidates.Occupied().IsEmpty()) {
+  if (found == 0) {
     TRACE(trace, "DLL------------ No valid M and D was found!\n");
     return false;
   }

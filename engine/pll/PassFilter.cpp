@@ -3,6 +3,8 @@
 #include <algorithm>
 #include <cmath>
 
+#include "engine/pll/Fudges.h"
+
 namespace Ip::Pll {
 
 namespace {
@@ -99,28 +101,35 @@ class PassFilter::Attempts {
   double margin_;  // attempts
 };
 
-PassFilter::PassFilter(const VorkelImp& imp, const Run& run, double fudgeStep)
+PassFilter::PassFilter(const VorkelImp& imp, const Run& run)
     : imp_(imp),
-      fudgeStep_(fudgeStep),
       outFreq0_(imp.requests.reqOutFreq[0]),
       steps_(HasIntegerDiv0(imp, run)),
       ranking_(RankVcos(imp, run)),
       hopeless_(!CanSucceed(imp, run, ranking_)),
       applies_(std::fabs(outFreq0_) <= kLargestOutFreq0 && !IsBelowZero(imp, run)) {}
 
-bool PassFilter::MaySucceed(double fudge) {
-  if (!applies_) return true;
-  if (next_ == chunk_) WorkOutChunk(fudge);
-  return maybe_.Contains(next_++);
+int PassFilter::NextFrom(int pass) {
+  if (hopeless_) return kPasses;
+  if (!applies_) return pass;
+  while (pass < kPasses) {
+    if (pass >= first_ + chunk_) WorkOutChunk(pass);
+    const int next = maybe_.NextFrom(pass - first_);
+    if (next < chunk_) return first_ + next;
+    pass = first_ + chunk_;
+  }
+  return kPasses;
 }
 
-void PassFilter::WorkOutChunk(double firstFudge) {
-  chunk_ = std::clamp(chunk_ * kChunkGrowth, kFirstChunk, kLargestChunk);
-  next_ = 0;
+void PassFilter::WorkOutChunk(int firstPass) {
+  const int wanted = std::clamp(chunk_ * kChunkGrowth, kFirstChunk, kLargestChunk);
+  first_ = firstPass;
+  chunk_ = std::min(wanted, kPasses - firstPass);
   maybe_.Clear();
   left_.fill(kNothingLeft);
-  const Attempts upward(outFreq0_ + firstFudge, fudgeStep_, chunk_);
-  const Attempts downward(outFreq0_ - firstFudge, -fudgeStep_, chunk_);
+  const double fudge = FudgeOf(firstPass);
+  const Attempts upward(outFreq0_ + fudge, kFudgeStep, chunk_);
+  const Attempts downward(outFreq0_ - fudge, -kFudgeStep, chunk_);
   WorkOutAttempts(upward, &downward);
   WorkOutAttempts(downward, nullptr);
 }

@@ -53,15 +53,15 @@ namespace Ip::Pll {
 
 class PassFilter {
  public:
-  // For a run whose VCO range is prepared and whose first pass has failed.
-  PassFilter(const VorkelImp& imp, const Run& run, double fudgeStep);
+  // For a run whose VCO range is prepared.
+  PassFilter(const VorkelImp& imp, const Run& run);
 
   // True when no pass at all can succeed.
   bool IsHopeless() const { return hopeless_; }
 
-  // False when the pass at `fudge` (MHz) fails for certain. To be asked for each fudge in turn,
-  // from the one after 0 on.
-  bool MaySucceed(double fudge);
+  // The first pass from `pass` on, above 0, that may succeed; kPasses when all fail for certain. To
+  // be asked with rising passes.
+  int NextFrom(int pass);
 
  private:
   static constexpr int kLargestChunk = 1024;
@@ -69,22 +69,21 @@ class PassFilter {
   using AttemptSet = SlotSet<kLargestChunk>;
   class Attempts;
 
-  void WorkOutChunk(double firstFudge);
+  void WorkOutChunk(int firstPass);
   void WorkOutAttempts(const Attempts& attempts, const Attempts* next);
   template <typename Visit>
   void VisitSteps(const RankedRange& range, const Attempts& attempts, Visit visit) const;
 
   const VorkelImp& imp_;
-  const double fudgeStep_;
   const double outFreq0_;
   const Div0Steps steps_;
   const VcoRanking ranking_;
   const bool hopeless_;
   const bool applies_;  // rounding is small against a fudge step
 
-  // The chunk at hand: how many passes, the next to be asked for, and those that may succeed.
+  // The chunk at hand: its first pass, how many there are, and those that may succeed.
+  int first_ = 0;
   int chunk_ = 0;
-  int next_ = 0;
   AttemptSet maybe_;
 
   // The key of what each upward attempt of the chunk leaves for the downward one.

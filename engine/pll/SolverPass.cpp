@@ -22,6 +22,14 @@ int CountValidVcos(const VcoCandidateTable& candidates) {
   return count;
 }
 
+// How many valid candidates tell what is chosen. In the smallest-VCO mode, two: the first one is
+// chosen when VCOs rise with the slots, and whether it is the only one decides about its phases.
+// With a trace, each has its lines.
+int EnoughValidVcos(const VorkelImp& imp, bool vcosRise, const Run& run) {
+  const bool firstIsChosen = imp.pll._minPowerMode && vcosRise && !run.trace.On();
+  return firstIsChosen ? 2 : MAX_VCO_CANDIDATES;
+}
+
 // The valid candidate with the smallest VCO, the first of several.
 const VcoCandidate* SmallestVco(const VcoCandidateTable& candidates) {
   const VcoCandidate* smallest = nullptr;
@@ -71,13 +79,15 @@ bool SolverPass(VorkelImp& imp, double fudge, const Run& run) {
   // attempt goes over what the first has left once more, with the first one's count.
   int created = 0;
   for (const bool upward : {true, false}) {
+    const double outFreq0 = imp.requests.reqOutFreq[0];
+    const double shift = upward ? fudge : 0.0 - fudge;
+    const bool vcosRise = outFreq0 + shift > 0.0 && pll._vcoCandidates.Occupied().IsEmpty();
     if (upward || fudge != 0.0) {
-      created = EnumerateVcoCandidates(imp, imp.requests.reqOutFreq[0],
-                                       upward ? fudge : 0.0 - fudge, integerDiv0, run.trace);
+      created = EnumerateVcoCandidates(imp, outFreq0, shift, integerDiv0, run.trace);
     }
     if (created > 0) {
       if (run.count > 1 && !FindOutputDividers(imp, run)) continue;
-      if (!CalculateMAndD(imp, true, run)) continue;
+      if (!CalculateMAndD(imp, true, run, EnoughValidVcos(imp, vcosRise, run))) continue;
     }
     pll.chosen = Choose(imp, run);
     if (pll.chosen != nullptr) {

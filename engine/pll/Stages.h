@@ -64,8 +64,10 @@ int EnumerateVcoCandidates(VorkelImp& imp, double reqOutFreq0, double fudge, boo
 bool FindOutputDividers(VorkelImp& imp, const Run& run);
 
 // MultiplierSearch.cpp: finds M and D of every candidate and drops those that have none.
-// False when none is left. `integerStep`: M takes whole values, else steps of 0.125.
-bool CalculateMAndD(VorkelImp& imp, bool integerStep, const Run& run);
+// False when none is left. `integerStep`: M takes whole values, else steps of 0.125. When it has
+// accepted as many as are `enough`, it drops the others unseen.
+bool CalculateMAndD(VorkelImp& imp, bool integerStep, const Run& run,
+                    int enough = MAX_VCO_CANDIDATES);
 
 // The same for one candidate: the smallest M with inFreq x M / D equal to the candidate's VCO
 // within the remainder, and inFreq / D in [pfdMin, pfdMax] (MHz, inclusive). Sets m and d, or
@@ -89,8 +91,8 @@ bool SolverPass(VorkelImp& imp, double fudge, const Run& run);
 // or more outputs or when the caller forces it.
 bool HasIntegerDiv0(const VorkelImp& imp, const Run& run);
 
-// FudgeLoop.cpp: passes with fudges 0.000, 0.001, ... 10.999 MHz until one succeeds. Without a
-// trace, passes that fail for certain (PassFilter.h) are left out.
+// FudgeLoop.cpp: passes with the fudges of Fudges.h until one succeeds. Without a trace, passes
+// that fail for certain (PassFilter.h) are left out.
 bool FudgeLoop(VorkelImp& imp, const Run& run);
 
 // ChosenValues.cpp: prints the chosen configuration.

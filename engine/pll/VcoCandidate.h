@@ -16,7 +16,8 @@ namespace Ip::Pll {
 // One slot for each output-0 divider step of the fractional walk: 1, 2, 2.125, ... 128.
 inline constexpr int MAX_VCO_CANDIDATES = 1010;
 
-// One candidate. The search fills it stage by stage; what no stage has written is 0.
+// One candidate. The search fills it stage by stage. Many are made and few get far, so what later
+// stages write is left as it was until the M and D search accepts the candidate; then it is 0.
 struct VcoCandidate {
   double vco;   // VCO frequency, MHz
   double div0;  // divider of output 0: whole, or a multiple of 0.125
@@ -30,6 +31,20 @@ struct VcoCandidate {
   std::array<std::uint32_t, MAX_OUTPUTS> divN;  // dividers of outputs 1 to 6; [0] unused
 
   bool HasMAndD() const { return m != 0.0; }
+
+  // Makes 0 what no stage has written for a candidate with dividers for `count` outputs.
+  void ClearWhatIsLeft(int count) {
+    phase.fill(0.0);
+    phaseDiff.fill(0.0);
+    dutyCycle.fill(0.0);
+    dutyDiff.fill(0.0);
+    freqDiff[0] = 0.0;
+    divN[0] = 0;
+    for (auto n = static_cast<std::size_t>(count < 1 ? 1 : count); n < MAX_OUTPUTS; ++n) {
+      freqDiff[n] = 0.0;
+      divN[n] = 0;
+    }
+  }
 
   // The divider of output n, 0 <= n < MAX_OUTPUTS.
   double Divider(int n) const {
@@ -58,14 +73,15 @@ class VcoCandidateTable {
   VcoCandidate& operator[](int slot) { return records_[slot]; }
   const VcoCandidate& operator[](int slot) const { return records_[slot]; }
 
-  // Puts a new candidate into `slot`, in place of any that is there. A table that was never emptied
-  // takes the records first.
+  // Puts a new candidate into `slot`, in place of any that is there. It has no M and no D yet. A
+  // table that was never emptied takes the records first.
   void Put(int slot, double vco, double div0) {
     if (records_ == nullptr) records_ = RecordsOfThread();
     VcoCandidate& candidate = (*this)[slot];
-    candidate = VcoCandidate{};
     candidate.vco = vco;
     candidate.div0 = div0;
+    candidate.m = 0.0;
+    candidate.d = 0;
     occupied_.Insert(slot);
   }
 

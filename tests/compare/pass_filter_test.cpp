@@ -9,6 +9,7 @@
 
 #include <cstdlib>
 
+#include "engine/pll/Fudges.h"
 #include "tests/compare/PllPair.h"
 #include "tests/engine/EngineTest.h"
 #include "tests/plain/plain_lists.h"
@@ -16,8 +17,7 @@
 namespace compare {
 namespace {
 
-constexpr double kFudgeStep = 0.001;  // MHz
-constexpr int kPasses = 10'999;
+constexpr int kPasses = Ip::Pll::kPasses;
 
 struct Counts {
   int requests = 0;
@@ -64,18 +64,21 @@ bool CheckRequest(const Case& drawn, int checked, Random& random, Ip::VorkelImp&
   if (SolverPass(imp, 0.0, run)) return true;
 
   ++counts.requests;
-  Ip::Pll::PassFilter filter(imp, run, kFudgeStep);
+  Ip::Pll::PassFilter filter(imp, run);
   if (filter.IsHopeless()) ++counts.hopeless;
-  double fudge = 0.0;
-  for (int pass = 0; pass < kPasses; ++pass) {
-    fudge += kFudgeStep;
-    if (!filter.IsHopeless() && filter.MaySucceed(fudge)) {
+  // The loop may begin to ask for any pass.
+  const int first = random.OneIn(2) ? 1 : random.Int(1, 100);
+  int toRun = filter.NextFrom(first);
+  for (int pass = first; pass < kPasses; ++pass) {
+    if (pass == toRun) {
       ++counts.toRun;
+      toRun = filter.NextFrom(pass + 1);
       continue;
     }
     ++counts.leftOut;
-    if (pass >= checked && !random.OneIn(kPasses / checked)) continue;
+    if (pass >= first + checked && !random.OneIn(kPasses / checked)) continue;
     ++counts.checked;
+    const double fudge = Ip::Pll::FudgeOf(pass);
     if (plain::SolverPass(fudge, request, limits, lists, state, plainTrace)) {
       ADD_FAILURE() << "left out the pass at " << fudge << " of " << Describe(drawn);
       return false;
@@ -100,18 +103,13 @@ TEST(PassFilter, FindsTheOnlyFudgesOfAnExample) {
   const Ip::Pll::Run run = {100.0, 2, plain::kPrimPll, trace};
   ASSERT_EQ(PrepareVcoRange(imp, "197 70", 0.0, run), Ip::Pll::kSolved);
   ASSERT_FALSE(SolverPass(imp, 0.0, run));
-  Ip::Pll::PassFilter filter(imp, run, kFudgeStep);
+  Ip::Pll::PassFilter filter(imp, run);
   ASSERT_FALSE(filter.IsHopeless());
-  double fudge = 0.0;
-  for (int pass = 1; pass <= 1019; ++pass) {
-    fudge += kFudgeStep;
-    // 197.96 MHz and more, upward, meets ranges of the next percent.
-    if (pass >= 960 && pass <= 980) {
-      filter.MaySucceed(fudge);
-    } else {
-      EXPECT_EQ(filter.MaySucceed(fudge), pass > 980) << fudge;
-    }
-  }
+  // 197.96 MHz and more, upward, meets ranges of the next percent.
+  const int early = filter.NextFrom(1);
+  EXPECT_GE(early, 960);
+  EXPECT_LE(early, 981);
+  for (int pass = 981; pass <= 1019; ++pass) EXPECT_EQ(filter.NextFrom(pass), pass);
 }
 
 class PassFilterProperty : public testing::TestWithParam<Kind> {};

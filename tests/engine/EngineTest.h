@@ -66,6 +66,14 @@ inline int CountOf(const std::string& part, const std::string& text) {
   return count;
 }
 
+// Puts a candidate with nothing but these into a slot.
+inline void PutBare(Ip::Pll::VcoCandidateTable& table, int slot, double vco, double div0) {
+  table.Put(slot, vco, div0);
+  table[slot] = Ip::Pll::VcoCandidate{};
+  table[slot].vco = vco;
+  table[slot].div0 = div0;
+}
+
 // The slots of a set, in the order of its iteration.
 template <typename Set>
 std::vector<int> SlotsOf(const Set& set) {

@@ -112,7 +112,8 @@ TEST(AllocationFreeTable, WithHundredsOfCandidates) {
     EXPECT_EQ(Allocations() - before, 0u);
     EXPECT_TRUE(chosen);
     EXPECT_GT(candidates, 500);
-    EXPECT_GT(imp.pll._vcoCandidates.Occupied().Count(), 12);
+    // For the smallest VCO, two tell which one it is.
+    EXPECT_GT(imp.pll._vcoCandidates.Occupied().Count(), closest ? 12 : 1);
   }
 }
 

@@ -18,7 +18,7 @@ class ChosenValuesTest : public testing::Test {
  protected:
   // Chooses a candidate; the test fills it.
   VcoCandidate& Choose(double vco, double div0) {
-    imp_.pll._vcoCandidates.Put(5, vco, div0);
+    engine_test::PutBare(imp_.pll._vcoCandidates, 5, vco, div0);
     imp_.pll.chosen = &imp_.pll._vcoCandidates[5];
     return imp_.pll._vcoCandidates[5];
   }

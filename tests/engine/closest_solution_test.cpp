@@ -87,7 +87,7 @@ class ClosestSolutionTest : public testing::Test {
   // A new candidate, with nothing to tell it from the request on any output.
   VcoCandidate& Add(double vco) {
     const int slot = kApart * added_++;
-    table_.Put(slot, vco, 4);
+    engine_test::PutBare(table_, slot, vco, 4);
     table_[slot].m = 8;
     table_[slot].d = 1;
     return table_[slot];
@@ -244,7 +244,7 @@ TEST_F(ClosestSolutionTest, TheFirst100InSlotOrderAreGathered) {
 }
 
 TEST_F(ClosestSolutionTest, AFullTableFillsTheSolutions) {
-  for (int slot = 0; slot < 1010; ++slot) table_.Put(slot, 2000 - slot, 1);
+  for (int slot = 0; slot < 1010; ++slot) engine_test::PutBare(table_, slot, 2000 - slot, 1);
   EXPECT_EQ(SelectVco(1), 2000 - 99);
   EXPECT_THAT(trace_, HasSubstr(NoOthers(100)));
 }

@@ -18,6 +18,7 @@ using engine_test::Below;
 using engine_test::CountOf;
 using engine_test::kInfinity;
 using engine_test::kNan;
+using engine_test::PutBare;
 using engine_test::SlotsOf;
 using Ip::Trace;
 using Ip::VorkelImp;
@@ -191,8 +192,8 @@ TEST_F(OutputDividersTest, TheLastToleranceIsInclusive) {
 }
 
 TEST_F(OutputDividersTest, GivingUpLeavesTheTable) {
-  table_.Put(0, 400, 1);
-  table_.Put(9, 900, 2);
+  PutBare(table_, 0, 400, 1);
+  PutBare(table_, 9, 900, 2);
   Request(2000);
   EXPECT_FALSE(Find(2));
   EXPECT_EQ(trace_, GivenUp(1));
@@ -293,7 +294,7 @@ TEST_F(OutputDividersTest, ALaterOutputThatFailsLeavesWhatTheEarlierOnesDid) {
 }
 
 TEST_F(OutputDividersTest, AllSixFurtherOutputs) {
-  table_.Put(0, 960, 1);
+  PutBare(table_, 0, 960, 1);
   imp_.requests.reqOutFreq = {0, 480, 320, 240, 192, 160, 7.5};
   EXPECT_TRUE(Find(7));
   EXPECT_THAT(table_[0].divN, ElementsAre(0, 2, 3, 4, 5, 6, 128));

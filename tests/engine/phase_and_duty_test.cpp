@@ -29,7 +29,7 @@ class PhaseAndDutyTest : public testing::Test {
  protected:
   // A candidate in `slot` with whole M, and these dividers of outputs 0 and 1.
   VcoCandidate& Put(int slot, double div0, std::uint32_t div1 = 1) {
-    table_.Put(slot, 800, div0);
+    engine_test::PutBare(table_, slot, 800, div0);
     table_[slot].m = 8;
     table_[slot].d = 1;
     table_[slot].divN[1] = div1;

@@ -35,54 +35,60 @@ TEST_F(VcoCandidateTableTest, IsEmptyAtFirst) {
   EXPECT_THAT(SlotsOf(table_.Occupied()), IsEmpty());
 }
 
-TEST_F(VcoCandidateTableTest, PutsACandidateWithNothingButVcoAndDiv0) {
+TEST_F(VcoCandidateTableTest, PutsACandidateWithVcoAndDiv0AndNoMAndD) {
   table_.Put(3, 850.0, 2.125);
-  const VcoCandidate& candidate = table_[3];
-  EXPECT_EQ(candidate.vco, 850.0);
-  EXPECT_EQ(candidate.div0, 2.125);
-  EXPECT_EQ(candidate.m, 0.0);
-  EXPECT_EQ(candidate.d, 0u);
-  EXPECT_THAT(candidate.freqDiff, Each(0.0));
-  EXPECT_THAT(candidate.phase, Each(0.0));
-  EXPECT_THAT(candidate.phaseDiff, Each(0.0));
-  EXPECT_THAT(candidate.dutyCycle, Each(0.0));
-  EXPECT_THAT(candidate.dutyDiff, Each(0.0));
-  EXPECT_THAT(candidate.divN, Each(0u));
+  EXPECT_EQ(table_[3].vco, 850.0);
+  EXPECT_EQ(table_[3].div0, 2.125);
+  EXPECT_EQ(table_[3].m, 0.0);
+  EXPECT_EQ(table_[3].d, 0u);
 }
 
 TEST_F(VcoCandidateTableTest, APutTakesTheSlotOver) {
   table_.Put(0, 400.0, 4.0);
-  VcoCandidate& old = table_[0];
-  old.m = 4.0;
-  old.d = 1;
-  old.freqDiff.fill(1.0);
-  old.phase.fill(2.0);
-  old.phaseDiff.fill(3.0);
-  old.dutyCycle.fill(4.0);
-  old.dutyDiff.fill(5.0);
-  old.divN.fill(6);
+  table_[0].m = 4.0;
+  table_[0].d = 1;
   table_.Put(0, 500.0, 5.0);
   EXPECT_EQ(table_[0].vco, 500.0);
   EXPECT_EQ(table_[0].div0, 5.0);
   EXPECT_EQ(table_[0].m, 0.0);
   EXPECT_EQ(table_[0].d, 0u);
-  EXPECT_THAT(table_[0].freqDiff, Each(0.0));
-  EXPECT_THAT(table_[0].phase, Each(0.0));
-  EXPECT_THAT(table_[0].phaseDiff, Each(0.0));
-  EXPECT_THAT(table_[0].dutyCycle, Each(0.0));
-  EXPECT_THAT(table_[0].dutyDiff, Each(0.0));
-  EXPECT_THAT(table_[0].divN, Each(0u));
   EXPECT_THAT(SlotsOf(table_.Occupied()), ElementsAre(0));
 }
 
-TEST_F(VcoCandidateTableTest, ASlotTakenAgainAfterEmptyingHasNothingOfItsFormerCandidate) {
+TEST(VcoCandidate, ClearsWhatNoStageHasWritten) {
+  VcoCandidate candidate;
+  candidate.vco = 850.0;
+  candidate.div0 = 2.0;
+  candidate.m = 17.0;
+  candidate.d = 2;
+  candidate.freqDiff.fill(1.0);
+  candidate.phase.fill(2.0);
+  candidate.phaseDiff.fill(3.0);
+  candidate.dutyCycle.fill(4.0);
+  candidate.dutyDiff.fill(5.0);
+  candidate.divN.fill(6);
+  candidate.ClearWhatIsLeft(3);
+  EXPECT_EQ(candidate.vco, 850.0);
+  EXPECT_EQ(candidate.div0, 2.0);
+  EXPECT_EQ(candidate.m, 17.0);
+  EXPECT_EQ(candidate.d, 2u);
+  EXPECT_THAT(candidate.freqDiff, ElementsAre(0, 1, 1, 0, 0, 0, 0));
+  EXPECT_THAT(candidate.divN, ElementsAre(0, 6, 6, 0, 0, 0, 0));
+  EXPECT_THAT(candidate.phase, Each(0.0));
+  EXPECT_THAT(candidate.phaseDiff, Each(0.0));
+  EXPECT_THAT(candidate.dutyCycle, Each(0.0));
+  EXPECT_THAT(candidate.dutyDiff, Each(0.0));
+  candidate.divN.fill(6);
+  candidate.ClearWhatIsLeft(1);
+  EXPECT_THAT(candidate.divN, Each(0u));
+}
+
+TEST_F(VcoCandidateTableTest, ASlotTakenAgainAfterEmptyingHasNoM) {
   table_.Put(7, 400.0, 4.0);
   table_[7].m = 4.0;
-  table_[7].divN[2] = 8;
   table_.EmptyAll();
   table_.Put(7, 500.0, 5.0);
   EXPECT_FALSE(table_[7].HasMAndD());
-  EXPECT_EQ(table_[7].divN[2], 0u);
 }
 
 TEST_F(VcoCandidateTableTest, EmptiesOneSlotOrAllOrAllBut) {
