@@ -8,7 +8,7 @@
 
 #include "engine/pll/Div0Steps.h"
 #include "engine/pll/Fudges.h"
-#include "engine/pll/PassFilter.h"
+#include "engine/pll/filter/PassFilter.h"
 #include "engine/pll/Stages.h"
 
 namespace Ip::Pll {
@@ -48,6 +48,7 @@ bool FudgeLoop(VorkelImp& imp, const Run& run) {
       if (pass == kPasses) break;
     }
     if (SolverPass(imp, FudgeOf(pass), run)) return true;
+    if (pass == 0 && !run.trace.On() && IsHopelessAtOnce(imp, run)) return false;
     TRACE(run.trace, "DLL- NO VALID VCOs found, so upping div0 fudge to %1.3f!\n",
           FudgeOf(pass + 1));
   }

@@ -3,7 +3,7 @@
 // Every pass that the filter says "no" to is run by the plain search, for requests that a
 // first pass has not answered.
 
-#include "engine/pll/PassFilter.h"
+#include "engine/pll/filter/PassFilter.h"
 
 #include <gtest/gtest.h>
 

@@ -1,4 +1,4 @@
-#include "engine/pll/VcoWindows.h"
+#include "engine/pll/filter/VcoWindows.h"
 
 #include <gtest/gtest.h>
 

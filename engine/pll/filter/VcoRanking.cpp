@@ -1,56 +1,43 @@
-#include "engine/pll/VcoRanking.h"
+#include "engine/pll/filter/VcoRanking.h"
 
 #include <algorithm>
 #include <cmath>
 #include <limits>
-#include <tuple>
+#include <vector>
 
 #include "engine/pll/OutputDividers.h"
-#include "engine/pll/VcoWindows.h"
+#include "engine/pll/filter/Rounding.h"
+#include "engine/pll/filter/VcoWindows.h"
 
 namespace Ip::Pll {
 
 namespace {
 
-constexpr int kKeyBits = 5;  // for tolerance numbers 0 to kTolerances
-static_assert(kTolerances < (1 << kKeyBits) && kKeyBits * (MAX_OUTPUTS - 1) < 32);
-
 constexpr double kNoLimit = std::numeric_limits<double>::infinity();
-
-// What two frequencies that are computed in different ways may differ by, relative; and how far
-// bounds are moved to leave room for a VCO that is moved by that.
-constexpr double kRounding = 1e-12;
-constexpr double kSlack = 4.0 * kRounding;
-
-bool AreClose(double a, double b) { return std::fabs(a - b) <= kRounding * std::fabs(b); }
-
-// No candidate lies below it, in MHz, and above 0: output 0, shifted by a fudge, is 0 or as large
-// as the rounding of the fudge at least.
-constexpr double kSmallestVco = 1e-200;
 
 // A stretch of VCO frequencies, MHz, with one key; or a point.
 struct Stretch {
   double low;
   double high;
-  ToleranceKey key;
-  bool isServed;
-
-  void AppendDigit(int digit) {
-    key = key << kKeyBits | static_cast<ToleranceKey>(isServed ? digit : 0);
-    isServed = isServed && digit < kTolerances;
-  }
+  KeyDigits digits;
 };
 using Stretches = std::vector<Stretch>;
 
+// The widest tolerance that is worth a visit below the multiple, and one or two more: wider ones
+// end where the divider before still has the VCO, half a divider below.
+int WidestBelow(double divider) {
+  return std::min(kTolerances - 1, static_cast<int>(50.0 / divider) + 2);
+}
+
 // Visits the ends, in rising order, of the stretches that a divider of an output makes, with the
 // digit below each end. `f` is the requested frequency and `end`, the last of them, the VCO at
-// which the next divider takes over, MHz. Tolerances count from the widest below the multiple, -26,
-// to the widest above it.
+// which the next divider takes over, MHz. Tolerances count from the widest below the multiple, at
+// most -26, to the widest above it.
 template <typename Visit>
 void VisitDivider(double divider, double f, const OutputRange& range, double end, Visit visit) {
   const double served = std::min(divider * range.max, end);
   visit(std::min(divider * range.min, end), kTolerances);
-  for (int t = 1 - kTolerances; t < kTolerances; ++t) {
+  for (int t = -WidestBelow(divider); t < kTolerances; ++t) {
     if (t == 0) continue;
     const double x = divider * f * (t < 0 ? 1.0 - Tolerance(-t) : 1.0 + Tolerance(t));
     visit(std::min(x, served), t < 0 ? 1 - t : t);
@@ -95,11 +82,11 @@ Stretches CutByOutput(const VorkelImp& imp, const Run& run, int n, const Stretch
     if (AreClose(high, low)) points.push_back(low);
     while (stretch != stretches.end() && low < high) {
       if (AreClose(high, stretch->high)) points.push_back(high);
-      Stretch piece = {low, std::min(high, stretch->high), stretch->key, stretch->isServed};
-      piece.AppendDigit(digit);
+      Stretch piece = {low, std::min(high, stretch->high), stretch->digits};
+      piece.digits.Append(digit);
       low = piece.high;
       if (low == stretch->high) ++stretch;
-      if (!cut.empty() && cut.back().key == piece.key) {
+      if (!cut.empty() && cut.back().digits == piece.digits) {
         cut.back().high = piece.high;
       } else {
         cut.push_back(piece);
@@ -111,9 +98,9 @@ Stretches CutByOutput(const VorkelImp& imp, const Run& run, int n, const Stretch
 
 // The VCO range in stretches, none when it is empty; and where ends meet.
 Stretches FindStretches(const VorkelImp& imp, const Run& run, std::vector<double>& points) {
-  const double low = std::max(imp.pll.minAdjVco, kSmallestVco);
+  const double low = std::max(imp.pll.minAdjVco, kSmallestFrequency);
   if (!(low <= imp.pll.maxAdjVco && std::isfinite(low))) return {};
-  Stretches stretches = {{low, imp.pll.maxAdjVco, 0, true}};
+  Stretches stretches = {{low, imp.pll.maxAdjVco, {}}};
   for (int n = 1; n < run.count; ++n) stretches = CutByOutput(imp, run, n, stretches, points);
   return stretches;
 }
@@ -145,9 +132,9 @@ int DigitOfPoint(double point, double f, const OutputRange& range) {
 }
 
 Stretch MakePoint(const VorkelImp& imp, const Run& run, double point) {
-  Stretch made = {point, point, 0, true};
+  Stretch made = {point, point, {}};
   for (int n = 1; n < run.count; ++n) {
-    made.AppendDigit(DigitOfPoint(point, imp.requests.reqOutFreq[static_cast<std::size_t>(n)],
+    made.digits.Append(DigitOfPoint(point, imp.requests.reqOutFreq[static_cast<std::size_t>(n)],
                                   RangeOfOutput(imp.pllLimits, run.prim, n)));
   }
   return made;
@@ -161,10 +148,27 @@ Stretches FindStretchesAndPoints(const VorkelImp& imp, const Run& run) {
   AddMultiples(imp, run.count, points);
   std::sort(points.begin(), points.end());
   points.erase(std::unique(points.begin(), points.end()), points.end());
+  const auto stretches = static_cast<std::ptrdiff_t>(all.size());
   for (const double point : points) all.push_back(MakePoint(imp, run, point));
-  std::sort(all.begin(), all.end(),
-            [](const Stretch& a, const Stretch& b) { return a.low < b.low; });
+  std::inplace_merge(all.begin(), all.begin() + stretches, all.end(),
+                     [](const Stretch& a, const Stretch& b) { return a.low < b.low; });
   return all;
+}
+
+// The ranges, which are rising, by key and kind. They are sorted as one number each, which is a lot
+// faster.
+VcoRanking Sorted(const VcoRanking& rising) {
+  std::vector<std::uint64_t> order;
+  order.reserve(rising.size());
+  for (const RankedRange& range : rising) {
+    const auto kind = static_cast<std::uint64_t>(range.kind);
+    order.push_back((std::uint64_t{range.key} << 2 | kind) << 32 | order.size());
+  }
+  std::sort(order.begin(), order.end());
+  VcoRanking sorted;
+  sorted.reserve(rising.size());
+  for (const std::uint64_t entry : order) sorted.push_back(rising[entry & 0xffffffffu]);
+  return sorted;
 }
 
 }  // namespace
@@ -176,19 +180,22 @@ VcoRanking RankVcos(const VorkelImp& imp, const Run& run) {
   auto window = windows.begin();
   for (const Stretch& stretch : FindStretchesAndPoints(imp, run)) {
     using Kind = RankedRange::Kind;
-    ranking.push_back({stretch.low, stretch.high, stretch.key,
-                       stretch.isServed ? Kind::kServed : Kind::kUnserved});
-    if (!stretch.isServed) continue;
+    const auto& [key, isServed] = stretch.digits;
+    ranking.push_back({stretch.low, stretch.high, key, isServed ? Kind::kServed : Kind::kUnserved});
+    if (!isServed) continue;
     while (window != windows.end() && window->high < stretch.low) ++window;
+    if (ranking.back().IsPoint()) {
+      if (window != windows.end() && window->low <= stretch.low) {
+        ranking.back().kind = Kind::kAccepted;
+      }
+      continue;
+    }
     for (auto w = window; w != windows.end() && w->low <= stretch.high; ++w) {
-      ranking.push_back({std::max(stretch.low, w->low), std::min(stretch.high, w->high),
-                         stretch.key, Kind::kAccepted});
+      ranking.push_back({std::max(stretch.low, w->low), std::min(stretch.high, w->high), key,
+                         Kind::kAccepted});
     }
   }
-  std::sort(ranking.begin(), ranking.end(), [](const RankedRange& a, const RankedRange& b) {
-    return std::tie(a.key, a.kind, a.low) < std::tie(b.key, b.kind, b.low);
-  });
-  return ranking;
+  return Sorted(ranking);
 }
 
 }  // namespace Ip::Pll

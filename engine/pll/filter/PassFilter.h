@@ -1,4 +1,11 @@
-// Which passes of the fudge loop are worth running.
+// Which passes of the fudge loop are worth running. The page to begin with in this folder:
+//
+//   VcoWindows    the VCO frequencies that have an M and a D
+//   ToleranceKey  what the divider search makes of a VCO frequency, in one number
+//   VcoRanking    both together: ranges of VCO frequencies, by what the divider search prefers
+//   Attempts      a run of passes in one direction, and which of them come into a range
+//   PassFilter    the way down the ranking with a run of passes
+//   Rounding      how far doubles may be off, for all of them
 //
 // A request that cannot be met at the requested output-0 frequency goes through up to 11000
 // passes, each with two attempts: output 0 a fudge higher, and a fudge lower. Nearly all of
@@ -31,25 +38,35 @@
 // that no candidate of the upward attempt has a smaller key, and that no new one takes the slot,
 // since the VCO of the step is then below the VCO range.
 //
-// Why a "no" is safe. The ranges are met with a margin, a hundred times what all roundings in
-// their ends, here and in the search can come to. A range where an attempt may succeed is met
-// where a candidate may lie in it, margins included; one that puts others out is met only where a
-// candidate lies in it for certain, within its margins; and for certain there is no candidate with
-// a smaller key where none is even in the margins of the ranges with smaller keys. A point puts
-// out nothing: nothing lies there for certain.
+// A point of the ranking is met by a candidate that lies on it, but for rounding. There the filter
+// looks at the candidate itself, with the doubles of the search: what its key is, and, where that
+// decides, whether it has an M and a D. So it does at the ends of what may succeed. Such a
+// candidate takes its place by its own key, behind ranges with smaller ones.
+//
+// Why a "no" is safe. Ranges are met with a margin, a hundred times what all roundings in their
+// ends, here and in the search can come to (Rounding.h). A range where an attempt may succeed is
+// met where a candidate may lie in it, margins included; one that puts others out is met only where
+// a candidate lies in it for certain, within its margins, or has been looked at; and for certain
+// there is no candidate with a smaller key where none is even in the margins of the ranges with
+// smaller keys.
 //
 // Tested by pass_filter_test.cpp, and by comparing whole answers with a plain search.
-#ifndef VORKEL_ENGINE_PLL_PASSFILTER_H_
-#define VORKEL_ENGINE_PLL_PASSFILTER_H_
+#ifndef VORKEL_ENGINE_PLL_FILTER_PASSFILTER_H_
+#define VORKEL_ENGINE_PLL_FILTER_PASSFILTER_H_
 
 #include <array>
+#include <vector>
 
 #include "engine/pll/Div0Steps.h"
 #include "engine/pll/SlotSet.h"
 #include "engine/pll/Stages.h"
-#include "engine/pll/VcoRanking.h"
+#include "engine/pll/filter/VcoRanking.h"
 
 namespace Ip::Pll {
+
+// Whether no pass at all can succeed, as far as that can be told without a filter: no VCO has an M
+// and a D, or an output is out of reach. For a run whose VCO range is prepared.
+bool IsHopelessAtOnce(const VorkelImp& imp, const Run& run);
 
 class PassFilter {
  public:
@@ -67,14 +84,22 @@ class PassFilter {
   static constexpr int kLargestChunk = 1024;
   static constexpr ToleranceKey kNothingLeft = ~ToleranceKey{0};  // above all keys
   using AttemptSet = SlotSet<kLargestChunk>;
-  class Attempts;
+  class Walk;
+
+  // A candidate that was looked at: its VCO in MHz, its attempt and its key; and whether it is
+  // worth looking for its M and D.
+  struct Candidate {
+    double vco;
+    int attempt;
+    ToleranceKey key;
+    bool mayHaveMAndD;
+  };
 
   void WorkOutChunk(int firstPass);
-  void WorkOutAttempts(const Attempts& attempts, const Attempts* next);
-  template <typename Visit>
-  void VisitSteps(const RankedRange& range, const Attempts& attempts, Visit visit) const;
+  bool HasMAndD(double vco) const;
 
   const VorkelImp& imp_;
+  const Run& run_;
   const double outFreq0_;
   const Div0Steps steps_;
   const VcoRanking ranking_;
@@ -88,8 +113,11 @@ class PassFilter {
 
   // The key of what each upward attempt of the chunk leaves for the downward one.
   std::array<ToleranceKey, kLargestChunk> left_;
+
+  // The candidates of a walk whose turn comes later: a heap, the smallest key on top.
+  std::vector<Candidate> later_;
 };
 
 }  // namespace Ip::Pll
 
-#endif  // VORKEL_ENGINE_PLL_PASSFILTER_H_
+#endif  // VORKEL_ENGINE_PLL_FILTER_PASSFILTER_H_

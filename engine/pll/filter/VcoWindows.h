@@ -7,12 +7,11 @@
 //
 // The windows are an outer bound: each is a little wider than the stages accept, so a VCO
 // outside all of them is refused for certain, and one inside is refused only at the very ends.
-// The ends are worked out in a handful of double operations, each exact to 2^-53, and then
-// moved outward by 1e-9 of their value, millions of times what the operations can be off.
+// The ends are moved outward by kMargin (Rounding.h), millions of times what they can be off.
 //
 // Tested by vco_windows_test.cpp.
-#ifndef VORKEL_ENGINE_PLL_VCOWINDOWS_H_
-#define VORKEL_ENGINE_PLL_VCOWINDOWS_H_
+#ifndef VORKEL_ENGINE_PLL_FILTER_VCOWINDOWS_H_
+#define VORKEL_ENGINE_PLL_FILTER_VCOWINDOWS_H_
 
 #include <vector>
 
@@ -32,6 +31,9 @@ using VcoWindows = std::vector<VcoWindow>;
 // The windows of a run whose VCO range is prepared and whose primitive is that of the process.
 VcoWindows FindVcoWindows(const VorkelImp& imp, const Run& run);
 
+// Whether there is any.
+bool HasVcoWindow(const VorkelImp& imp, const Run& run);
+
 }  // namespace Ip::Pll
 
-#endif  // VORKEL_ENGINE_PLL_VCOWINDOWS_H_
+#endif  // VORKEL_ENGINE_PLL_FILTER_VCOWINDOWS_H_
