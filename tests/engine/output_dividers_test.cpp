@@ -72,7 +72,7 @@ class OutputDividersTest : public testing::Test {
   // Whether one candidate of this VCO serves output 1 at this frequency; 2 outputs.
   bool Serves(double vco, double requested) {
     table_.EmptyAll();
-    table_.Put(0, vco, 1);
+    PutBare(table_, 0, vco, 1);
     Request(requested);
     return Find(2);
   }
@@ -84,7 +84,7 @@ class OutputDividersTest : public testing::Test {
 };
 
 TEST_F(OutputDividersTest, ASingleOutputNeedsNoWork) {
-  table_.Put(4, 400, 4);
+  PutBare(table_, 4, 400, 4);
   for (const int count : {1, 0, -1, INT_MIN}) {
     EXPECT_TRUE(Find(count)) << count;
     EXPECT_EQ(trace_, "");
@@ -94,7 +94,7 @@ TEST_F(OutputDividersTest, ASingleOutputNeedsNoWork) {
 }
 
 TEST_F(OutputDividersTest, ExactDividers) {
-  for (const int div0 : {2, 3, 4, 5}) table_.Put(div0 - 1, 200 * div0, div0);
+  for (const int div0 : {2, 3, 4, 5}) PutBare(table_, div0 - 1, 200 * div0, div0);
   Request(50);
   EXPECT_TRUE(Find(2));
   EXPECT_THAT(SlotsOf(table_.Occupied()), ElementsAre(1, 2, 3, 4));
@@ -110,8 +110,8 @@ TEST_F(OutputDividersTest, ExactDividers) {
 }
 
 TEST_F(OutputDividersTest, AnExactOneDropsTheInexactOnes) {
-  table_.Put(3, 400, 4);
-  table_.Put(4, 450, 4.5);
+  PutBare(table_, 3, 400, 4);
+  PutBare(table_, 4, 450, 4.5);
   Request(100);
   EXPECT_TRUE(Find(2));
   EXPECT_THAT(SlotsOf(table_.Occupied()), ElementsAre(3));
@@ -129,9 +129,9 @@ TEST_F(OutputDividersTest, TheToleranceAddsUpStepByStep) {
 
 // 104, 101 and 102.5 MHz for 100: at 0.01 only 101 serves, and the others are not asked again.
 TEST_F(OutputDividersTest, TheFirstToleranceThatServesAnyDecides) {
-  table_.Put(0, 104, 1);
-  table_.Put(1, 101, 1);
-  table_.Put(2, 102.5, 1);
+  PutBare(table_, 0, 104, 1);
+  PutBare(table_, 1, 101, 1);
+  PutBare(table_, 2, 102.5, 1);
   Request(100);
   EXPECT_TRUE(Find(2));
   EXPECT_THAT(SlotsOf(table_.Occupied()), ElementsAre(1));
@@ -140,10 +140,10 @@ TEST_F(OutputDividersTest, TheFirstToleranceThatServesAnyDecides) {
 }
 
 TEST_F(OutputDividersTest, AllThatServeAtThatToleranceStay) {
-  table_.Put(0, 104.5, 1);
-  table_.Put(1, 95.25, 1);
-  table_.Put(2, 94, 1);
-  table_.Put(3, 104.125, 1);
+  PutBare(table_, 0, 104.5, 1);
+  PutBare(table_, 1, 95.25, 1);
+  PutBare(table_, 2, 94, 1);
+  PutBare(table_, 3, 104.125, 1);
   Request(100);
   EXPECT_TRUE(Find(2));
   EXPECT_THAT(SlotsOf(table_.Occupied()), ElementsAre(0, 1, 3));
@@ -249,11 +249,11 @@ TEST_F(OutputDividersTest, TheFirstToleranceIsThatOfTheWalk) {
 
 TEST_F(OutputDividersTest, EachOutputWorksOnWhatTheLastOneLeft) {
   // 50: all but 630. 75 (tolerance 0): 600 and 900. 40 (0): 400, 600, 800 would do; 600 is left.
-  table_.Put(0, 400, 1);
-  table_.Put(1, 600, 1);
-  table_.Put(2, 630, 1);
-  table_.Put(3, 800, 1);
-  table_.Put(4, 900, 1);
+  PutBare(table_, 0, 400, 1);
+  PutBare(table_, 1, 600, 1);
+  PutBare(table_, 2, 630, 1);
+  PutBare(table_, 3, 800, 1);
+  PutBare(table_, 4, 900, 1);
   Request(50, 75, 40);
   EXPECT_TRUE(Find(4));
   EXPECT_THAT(SlotsOf(table_.Occupied()), ElementsAre(1));
@@ -270,7 +270,7 @@ TEST_F(OutputDividersTest, EachOutputWorksOnWhatTheLastOneLeft) {
 }
 
 TEST_F(OutputDividersTest, TheToleranceStartsAgainForEachOutput) {
-  table_.Put(0, 450, 1);
+  PutBare(table_, 0, 450, 1);
   Request(100, 45);
   EXPECT_TRUE(Find(3));
   EXPECT_EQ(trace_, Looking(1) + Retries(1, 11) +
@@ -279,9 +279,9 @@ TEST_F(OutputDividersTest, TheToleranceStartsAgainForEachOutput) {
 }
 
 TEST_F(OutputDividersTest, ALaterOutputThatFailsLeavesWhatTheEarlierOnesDid) {
-  table_.Put(0, 400, 1);
-  table_.Put(1, 425, 1);
-  table_.Put(2, 800, 1);
+  PutBare(table_, 0, 400, 1);
+  PutBare(table_, 1, 425, 1);
+  PutBare(table_, 2, 800, 1);
   Request(200, 1900);
   EXPECT_FALSE(Find(3));
   EXPECT_THAT(SlotsOf(table_.Occupied()), ElementsAre(0, 2));
@@ -301,7 +301,7 @@ TEST_F(OutputDividersTest, AllSixFurtherOutputs) {
 }
 
 TEST_F(OutputDividersTest, ANewSearchOverwritesTheDividersOfAnEarlierOne) {
-  table_.Put(0, 400, 1);
+  PutBare(table_, 0, 400, 1);
   table_[0].divN[1] = 99;
   table_[0].freqDiff[1] = 9.9;
   Request(50);
@@ -340,7 +340,7 @@ TEST_F(OutputDividersTest, TheOutputMaximumIsThatOfTheFurtherOutputsOfAPll) {
     for (const double maximum : {200.0, Below(200)}) {
       imp_.pllLimits.clkoutMax = maximum;
       table_.EmptyAll();
-      table_.Put(0, 400, 1);
+      PutBare(table_, 0, 400, 1);
       imp_.requests.reqOutFreq.fill(100);
       imp_.requests.reqOutFreq[static_cast<std::size_t>(n)] = 200;
       EXPECT_EQ(Find(n + 1), maximum == 200.0) << n;
@@ -373,8 +373,8 @@ TEST_F(OutputDividersTest, ThePrimitiveIsThatOfTheRun) {
 // 390 does not serve 200 exactly, but within the limits; 400 would, but 200 is above them.
 TEST_F(OutputDividersTest, ACandidateOutsideTheLimitsGivesWayToAnInexactOne) {
   imp_.pllLimits.clkoutMaxIo = 198;
-  table_.Put(0, 400, 1);
-  table_.Put(1, 390, 1);
+  PutBare(table_, 0, 400, 1);
+  PutBare(table_, 1, 390, 1);
   Request(200);
   EXPECT_TRUE(Find(2));
   EXPECT_THAT(SlotsOf(table_.Occupied()), ElementsAre(1));
@@ -420,7 +420,7 @@ TEST_F(OutputDividersTest, ANegativeRequestIsTakenAsTheFormulaTakesIt) {
 }
 
 TEST_F(OutputDividersTest, IsSilentWithTheTraceOff) {
-  table_.Put(0, 450, 1);
+  PutBare(table_, 0, 450, 1);
   Request(100, 2000);
   const std::string text = engine_test::TraceOf(
       [&](const Trace& trace) {
