@@ -36,6 +36,9 @@ struct Request {
   double inFreq2 = 0;    // MHz; 0: no second input clock
   const char* phases = nullptr;  // degrees; null: the smallest VCO is asked for, not the closest
                                  // solution. All duty cycles are 50 percent.
+  const plain::PllLimits* limits = nullptr;  // of a device of its own
+  bool lowBandwidth = false;
+  bool preferMaxVco = false;
 };
 
 // --- Nothing serves them --------------------------------------------------------------------
@@ -182,8 +185,12 @@ inline constexpr Request kFudgeLarge[] = {
 //
 // What climbs from random requests towards slower ones have come to. Output 0 is low, the others
 // are clocks that several VCO frequencies fit about as well, and the one that fits best changes
-// from fudge to fudge. Some have a solution, far out, and some have none. In the last three, many
-// VCO frequencies are exact multiples of an output.
+// from fudge to fudge. Some have a solution, far out, and some have none. In those with multiples,
+// many VCO frequencies are multiples of an output, exactly or nearly so.
+inline constexpr plain::PllLimits kWideLimits = {
+    .vcoMin = 555.384, .vcoMax = 2192.97177, .clkoutMin = 4.691085506, .clkoutMax = 800,
+    .pfdMin = 10, .pfdMax = 328, .clkoutMaxIo = 1000, .maxHighLowCount = 103.7,
+    .vcoTarget = 826.2, .maxPfdLowB = 300};
 inline constexpr Request kHard[] = {
     {"TSYN 3, fits from fudge to fudge", kTsyn, 3, "16.569 54.75 225.851", 25.425, 0, "0 0 0"},
     {"TSYN 3, output 2 at its low end", kTsyn, 3, "12.288 297 5", 100, 0, "0 0 315"},
@@ -202,6 +209,12 @@ inline constexpr Request kHard[] = {
     {"TSYN 4, multiples, two inputs", kTsyn, 4, "17.44 13.167 57.25 52.323", 16.841, 17},
     {"TSYN 5, multiples", kTsyn, 5, "17.113 68.877 34.5 27.001 19.63", 13.5},
     {"TSYN 5, multiples, solved", kTsyn, 5, "11.838 7.725 22.84 6.093 42.156", 10.842, 13.067},
+    {"TSYN 4, multiples, nearly", kTsyn, 4, "13.5 12 24.01 24.264", 12.003, 12.044},
+    {"TSYN 5, multiples, nearly", kTsyn, 5, "15.06 15.6 19.012 23 25.01563953", 11.69937457},
+    {"TSYN 5, multiples, many", kTsyn, 5, "16.384 11 11.4 28.601 29.5", 10.48094136},
+    {"TSYN 4, output 1 at output 0", kTsyn, 4, "12.29 12.288 25 47.37942019", 12.288},
+    {"TSYN 5, wide VCO range", kTsyn, 5, "14.1 12 13.86837577 24.122 24.29169079", 11.99664573, 0,
+     "0 0 0 0 0", &kWideLimits, true, true},
 };
 
 // --- The sets -------------------------------------------------------------------------------

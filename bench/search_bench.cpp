@@ -2,19 +2,22 @@
 //
 //   search_bench [TABLE] [--benchmark_filter=REGEX]
 //
-// Each benchmark is one request; its name is that of the set, a slash and that of the request.
+// Each benchmark is one request; its name is that of the set, a slash and that of the request. The
+// requests are those of requests.h and drawn ones, with limits drawn at random.
 // An iteration is a round: both answer the request, each as often as fills a few milliseconds,
 // and the one that begins changes from round to round. The times are the medians of the rounds.
 // TABLE is the file that the summary goes to; without it, standard output.
 
 #include <benchmark/benchmark.h>
 
+#include <cmath>
 #include <cstdio>
 #include <cstdlib>
 #include <string>
 #include <vector>
 
 #include "bench/Contestants.h"
+#include "bench/DrawnRequests.h"
 #include "bench/Summary.h"
 #include "bench/Timing.h"
 #include "bench/requests.h"
@@ -33,10 +36,16 @@ constexpr const char* kTracedTitle = "traced, fudge up to 0.5 MHz";
 // Beyond it a trace has tens of megabytes.
 constexpr double kLargestTracedFudge = 0.5;  // MHz
 
-constexpr double kSlowest = 0.010;  // seconds; no untraced request may take longer
+constexpr double kSlowest = 0.004;  // seconds; no untraced request may take longer
 
-const plain::PllLimits& LimitsOf(int prim) {
-  return prim == kPll ? kPllLimits : kTsynLimits;
+// Of the drawn requests there are many, and nothing serves some: these take the plain search long.
+constexpr Goals kDrawnGoals = {.geometricMean = 0.0, .everyRatio = 0.9, .slowest = kSlowest};
+constexpr double kEnoughDrawn = 0.001;  // seconds
+constexpr int kDrawnRounds = 3;
+
+const plain::PllLimits& LimitsOf(const Request& request) {
+  if (request.limits != nullptr) return *request.limits;
+  return request.prim == kPll ? kPllLimits : kTsynLimits;
 }
 
 plain::PllRequest ToCall(const Request& request) {
@@ -46,6 +55,8 @@ plain::PllRequest ToCall(const Request& request) {
   call.outFreqs = request.outFreqs;
   call.inFreq = request.inFreq;
   call.inFreq2 = request.inFreq2;
+  call.preferMaxVco = request.preferMaxVco;
+  call.lowBandwidth = request.lowBandwidth;
   if (request.phases != nullptr) {
     call.closest = true;
     call.phases = request.phases;
@@ -60,10 +71,11 @@ Product& TheProduct() {
   return product;
 }
 
+constexpr double kRounding = 1e-9;  // of fudges, MHz
+
 // Ends the program when a request is not what its set says.
 void CheckClass(const RequestSet& set, const Request& request, const Outcome& outcome,
                 const char* who) {
-  constexpr double kRounding = 1e-9;  // MHz
   const bool rightCode = set.code == kAnyCode || outcome.code == set.code;
   if (rightCode && outcome.fudge >= set.lowestFudge - kRounding &&
       outcome.fudge <= set.highestFudge + kRounding) {
@@ -77,7 +89,7 @@ void CheckClass(const RequestSet& set, const Request& request, const Outcome& ou
 }
 
 Outcome ProductOutcome(const Request& request) {
-  compare::PublishLimits(LimitsOf(request.prim), request.prim);
+  compare::PublishLimits(LimitsOf(request), request.prim);
   return TheProduct().Found(TheProduct().Run(ToCall(request)));
 }
 
@@ -98,17 +110,19 @@ void RunRounds(benchmark::State& state, PlainTime plainTime, ProductTime product
   state.counters[kProductSeconds] = Median(productSeconds);
 }
 
-void Untraced(benchmark::State& state, const RequestSet& set, const Request& request) {
-  const plain::PllRequest call = ToCall(request);
-  Plain plain(compare::PublishLimits(LimitsOf(request.prim), request.prim));
+// `check` gets what the plain search has found.
+template <typename Check>
+void Untraced(benchmark::State& state, const plain::PllRequest& call,
+              const plain::PllLimits& limits, double enough, Check check) {
+  Plain plain(compare::PublishLimits(limits, call.prim));
   RunRounds(
       state,
       [&] {
-        const double seconds = SecondsOfCall(kEnough, [&] { plain.Run(call); });
-        CheckClass(set, request, plain.Found(), "plain search");
+        const double seconds = SecondsOfCall(enough, [&] { plain.Run(call); });
+        check(plain.Found());
         return seconds;
       },
-      [&] { return SecondsOfCall(kEnough, [&] { TheProduct().Run(call); }); });
+      [&] { return SecondsOfCall(enough, [&] { TheProduct().Run(call); }); });
 }
 
 // Both traces go into memory that grows with them. The plain search formats every line twice, the
@@ -116,7 +130,7 @@ void Untraced(benchmark::State& state, const RequestSet& set, const Request& req
 // its time is left out.
 void Traced(benchmark::State& state, const Request& request) {
   const plain::PllRequest call = ToCall(request);
-  Plain plain(compare::PublishLimits(LimitsOf(request.prim), request.prim));
+  Plain plain(compare::PublishLimits(LimitsOf(request), request.prim));
   std::size_t plainCharacters = 0;
   std::size_t productCharacters = 0;
   {
@@ -153,9 +167,40 @@ void RegisterUntraced(Summary& summary) {
       CheckClass(set, request, ProductOutcome(request), "product");
       benchmark::RegisterBenchmark(
           (std::string(set.name) + "/" + request.name).c_str(),
-          [&](benchmark::State& state) { Untraced(state, set, request); })
+          [&](benchmark::State& state) {
+            Untraced(state, ToCall(request), LimitsOf(request), kEnough,
+                     [&](const Outcome& outcome) {
+                       CheckClass(set, request, outcome, "plain search");
+                     });
+          })
           ->UseManualTime()
           ->Iterations(set.rounds);
+    }
+  }
+}
+
+// Ends the program when the two do not agree.
+void CheckSame(const DrawnRequest& request, const Outcome& plain) {
+  const Outcome product = TheProduct().Found(TheProduct().Run(request.drawn.request));
+  if (product.code == plain.code && std::fabs(product.fudge - plain.fudge) <= kRounding) return;
+  std::fprintf(stderr, "search_bench: %s is answered %d and %d, with fudges of %.6f and %.6f MHz\n",
+               request.name.c_str(), product.code, plain.code, product.fudge, plain.fudge);
+  std::exit(1);
+}
+
+void RegisterDrawn(Summary& summary, const std::vector<std::vector<DrawnRequest>>& requests) {
+  for (std::size_t i = 0; i < requests.size(); ++i) {
+    const DrawnClass& drawnClass = DrawnClasses()[i];
+    summary.AddSet(drawnClass.name, std::string("drawn: ") + drawnClass.title, kDrawnGoals);
+    for (const DrawnRequest& request : requests[i]) {
+      benchmark::RegisterBenchmark(
+          (std::string(drawnClass.name) + "/" + request.name).c_str(),
+          [&](benchmark::State& state) {
+            Untraced(state, request.drawn.request, request.drawn.limits, kEnoughDrawn,
+                     [&](const Outcome& outcome) { CheckSame(request, outcome); });
+          })
+          ->UseManualTime()
+          ->Iterations(drawnClass.code == plain::kSolved ? kDrawnRounds : 1);
     }
   }
 }
@@ -187,6 +232,8 @@ int main(int argc, char** argv) {
     return 2;
   }
   bench::Summary summary;
+  const std::vector<std::vector<bench::DrawnRequest>> drawn = bench::DrawRequests();
+  bench::RegisterDrawn(summary, drawn);
   bench::RegisterUntraced(summary);
   bench::RegisterTraced(summary);
   benchmark::RunSpecifiedBenchmarks(&summary);
