@@ -1,4 +1,6 @@
 // A run of neighbouring attempts in one direction, and which of them bring output 0 into a range.
+//
+// Tested by pass_filter_test.cpp.
 #ifndef VORKEL_ENGINE_PLL_FILTER_ATTEMPTS_H_
 #define VORKEL_ENGINE_PLL_FILTER_ATTEMPTS_H_
 
