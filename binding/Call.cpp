@@ -26,17 +26,13 @@ constinit std::atomic<bool> loss_is_told = false;
 void TellLostTrace(int loss) {
   if (loss == kWritten) {
     loss_is_told = false;
-    return;
-  }
-  if (loss_is_told.exchange(true)) return;
-  try {
+  } else if (!loss_is_told) {
     const std::string reason = loss == kStandsForAnother
                                    ? "it is closed, and another file has its number"
                                    : std::generic_category().message(loss);
     Message()->issueError("The trace could not be written to standard output: %s\n",
                           reason.c_str());
-  } catch (...) {
-    // No memory for the message. The answer of the calculation is there all the same.
+    loss_is_told = true;
   }
 }
 

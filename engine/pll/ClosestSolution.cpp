@@ -10,7 +10,10 @@
 //
 // Tested by closest_solution_test.cpp.
 
+#include <algorithm>
 #include <cmath>
+#include <cstddef>
+#include <limits>
 
 #include "engine/pll/Stages.h"
 
@@ -24,6 +27,7 @@ constexpr int kAttempts = 60;
 constexpr double kToleranceStep = 0.5;
 constexpr double kZeroTolerance = 0.0001;  // what a gathering tolerance of 0 stands for
 constexpr double kSame = 0.0001;           // values of a narrowing pass this close are one
+constexpr double kInfinity = std::numeric_limits<double>::infinity();
 constexpr double kNarrowingStart = 100.0;  // best value before a pass; degrees, MHz, fraction
 
 // The tolerance of an attempt, given that of the attempt before: both schedules have these
@@ -38,11 +42,17 @@ double NextTolerance(int attempt, double previous) {
   }
 }
 
+// The tolerance from which on a candidate is close on an output. A difference that is no number
+// counts as `ofNan`.
+double ToleranceFor(const VcoCandidate& candidate, std::size_t output, double ofNan) {
+  const double phase = candidate.phaseDiff[output];
+  const double duty = candidate.dutyDiff[output];
+  return std::max(std::isnan(phase) ? ofNan : phase, std::isnan(duty) ? ofNan : duty);
+}
+
 // Fills _solutions, in slot order and as far as it goes, with the candidates within the
 // tolerance on output 0.
 int Gather(PllState& pll, double tolerance) {
-  if (tolerance == 0.0) tolerance = kZeroTolerance;
-  pll._solutions.EmptyAll();
   int gathered = 0;
   for (const int slot : pll._vcoCandidates.Occupied()) {
     VcoCandidate& candidate = pll._vcoCandidates[slot];
@@ -57,12 +67,20 @@ int Gather(PllState& pll, double tolerance) {
 // one step and the second starts over with the fixed entries; that is meant so.
 void FilterByOutput(SolutionTable& solutions, int n, const Trace& trace) {
   const auto output = static_cast<std::size_t>(n);
+  double enough = kInfinity;
+  for (const int slot : solutions.Occupied()) {
+    enough = std::min(enough, ToleranceFor(*solutions[slot], output, 0.0));
+  }
   double tolerance = 0.0;
   TRACE(trace, "DLL-------- looking for clk%d phase solutions with threshold2 = %f\n", n,
         tolerance);
   Slots kept;
   for (int attempt = 0; attempt < kAttempts; ++attempt) {
     tolerance = NextTolerance(attempt, tolerance);
+    if (enough > tolerance) {
+      TRACE(trace, "DLL--------- no matches for clk%d, so try with higher threshold\n", n);
+      continue;
+    }
     kept = solutions.Occupied();
     for (const int slot : solutions.Occupied()) {
       const VcoCandidate& solution = *solutions[slot];
@@ -73,13 +91,10 @@ void FilterByOutput(SolutionTable& solutions, int n, const Trace& trace) {
     const int count = kept.Count();
     if (count == 1) {
       TRACE(trace, "DLL--------- only one exact solution left, so use it\n");
-      break;
-    }
-    if (count > 1) {
+    } else {
       TRACE(trace, "DLL--------- %d solutions for clk%d, so test other oclks\n", count, n);
-      break;
     }
-    TRACE(trace, "DLL--------- no matches for clk%d, so try with higher threshold\n", n);
+    break;
   }
   solutions.KeepOnly(kept);
 }
@@ -215,15 +230,21 @@ const VcoCandidate* FinalChoice(VorkelImp& imp, const Run& run) {
                   [target](const VcoCandidate& c) { return std::fabs(c.vco - target); });
 }
 
-// Gathers with widening tolerance until there is a solution; their number.
+// Gathers with widening tolerance until there is a solution; their number. The candidates are
+// looked at once for the tolerance that is enough, and not at each of those that are not.
 int GatherFirst(PllState& pll, const Trace& trace) {
+  double enough = kInfinity;
+  for (const int slot : pll._vcoCandidates.Occupied()) {
+    enough = std::min(enough, ToleranceFor(pll._vcoCandidates[slot], 0, kInfinity));
+  }
+  pll._solutions.EmptyAll();
   double tolerance = 0.0;
   for (int attempt = 0; attempt < kAttempts; ++attempt) {
     if (attempt > 0) tolerance = NextTolerance(attempt, tolerance);
     TRACE(trace, "DLL---- looking for the clk0 phase solutions with threshold = %f\n",
           tolerance);
-    const int gathered = Gather(pll, tolerance);
-    if (gathered > 0) return gathered;
+    const double used = tolerance == 0.0 ? kZeroTolerance : tolerance;
+    if (enough <= used) return Gather(pll, used);
     TRACE(trace, "DLL------- no matches for clk0, so try with higher threshold\n");
   }
   return 0;

@@ -2,6 +2,10 @@
 #include <gtest/gtest.h>
 #include <sys/stat.h>
 
+#include <fstream>
+#include <iterator>
+#include <string>
+
 #include "host/bundled/device/DeviceFile.h"
 #include "host/bundled/device/FileText.h"
 #include "host/bundled/device/KeywordTable.h"
@@ -99,6 +103,14 @@ TEST_F(DeviceFileTest, ReportsWhatStopsInReading) {
   const std::string link = folder_.File("memory.toml");
   std::filesystem::create_symlink("/proc/self/mem", link);
   EXPECT_EQ(ErrorAtPath(link), link + ": cannot be read: Input/output error");
+}
+
+// A regular file of which the system says that it is empty.
+TEST_F(DeviceFileTest, ReadsAFileThatHasMoreThanItsSize) {
+  std::ifstream file("/proc/version");
+  const std::string text{std::istreambuf_iterator<char>(file), {}};
+  EXPECT_GT(text.size(), 1u);
+  EXPECT_EQ(Device::ReadFileText("/proc/version"), text);
 }
 
 TEST_F(DeviceFileTest, ReportsHugeFiles) {
