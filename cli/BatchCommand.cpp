@@ -113,6 +113,7 @@ Task ReadTask(std::string_view command, const std::vector<std::string>& words) {
   task.resume = given.Has("--resume");
   task.quiet = given.Has("--quiet");
   task.form = {given.Has("--csv"), given.Has("--all"), kLongestLine};
+  task.answers.plan.first_only = !task.form.all;
   if (task.resume && (task.output.empty() || task.output == "-")) {
     throw Failure::OfUsage("--resume goes on with a file: name it with -o");
   }

@@ -80,7 +80,7 @@ void Answerer::Make(const Line& line, Outcome* outcome) {
   }
   PlaceInBatch(line.number, &outcome->mistakes);
   if (!reading || !outcome->mistakes.empty() || !FindDevice(*reading, outcome)) return;
-  outcome->plan = plan::Make(reading->request, *outcome->device);
+  outcome->plan = plan::Make(reading->request, *outcome->device, task_.plan);
   outcome->status = !outcome->plan->IsSolved()             ? Status::kUnsolved
                     : outcome->plan->ranked.front().within ? Status::kWithin
                                                            : Status::kOff;

@@ -20,6 +20,7 @@ struct Task {
   std::string file;     // how mistakes name the batch
   read::Draft options;  // replaces what the lines say
   std::string device;   // of lines that name none
+  plan::Options plan = {};
 };
 
 class Answerer {

@@ -5,6 +5,7 @@
 
 #include "planner/answer/Evaluate.h"
 #include "planner/answer/Front.h"
+#include "planner/plan/Lead.h"
 #include "planner/plan/OfPrimitive.h"
 #include "planner/plan/Plan.h"
 
@@ -124,9 +125,13 @@ Plan Make(const Request& request, const Device& device, const Options& options) 
   used.search = options.search && !request.engine_only;
   Plan plan;
   plan.request = request;
+  std::vector<Primitive> primitives = PrimitivesOf(request, device);
+  std::optional<Lead> lead;
+  if (used.first_only && used.search) lead = LeadOf(request, device, primitives);
+  if (lead) primitives = {lead->primitive};
   std::vector<OfPrimitive> all;
-  for (const Primitive primitive : PrimitivesOf(request, device)) {
-    all.push_back(MakeOf(primitive, request, device, used));
+  for (const Primitive primitive : primitives) {
+    all.push_back(MakeOf(primitive, request, device, used, lead ? &lead->found : nullptr));
     const OfPrimitive& of = all.back();
     std::vector<Answer> shown = of.Shown();
     if (shown.empty()) {

@@ -40,8 +40,8 @@ void AskEngine(Primitive primitive, const Device& device, Attempt* attempt,
   }
 }
 
-void Search(Primitive primitive, const Device& device, Attempt* attempt) {
-  attempt->found = search::Search(attempt->placed, device, primitive);
+void TakeFound(search::Found found, const Device& device, Attempt* attempt) {
+  attempt->found = std::move(found);
   for (const search::Candidate& candidate : attempt->found.best) {
     Add(AnswerOf(*attempt, candidate.settings, device), &attempt->search);
   }
@@ -107,7 +107,7 @@ bool OfPrimitive::IsEngineSolved() const {
 }
 
 OfPrimitive MakeOf(Primitive primitive, const Request& request, const Device& device,
-                   const Options& options) {
+                   const Options& options, const search::Found* found) {
   OfPrimitive made;
   made.primitive = primitive;
   made.refusals = answer::Refusals(request, primitive);
@@ -115,7 +115,7 @@ OfPrimitive MakeOf(Primitive primitive, const Request& request, const Device& de
   const std::vector<answer::PlaceOrder> orders =
       request.any_order ? OrdersOf(request, device, primitive)
                         : std::vector<answer::PlaceOrder>{answer::AsRequested(request)};
-  bool found = false;
+  bool is_found = false;
   for (const answer::PlaceOrder& order : orders) {
     Attempt& attempt = made.attempts.emplace_back();
     attempt.order = order;
@@ -123,10 +123,13 @@ OfPrimitive MakeOf(Primitive primitive, const Request& request, const Device& de
     std::vector<Finding> refusals;
     if (options.engine) AskEngine(primitive, device, &attempt, &refusals);
     if (made.attempts.size() == 1) made.refusals = std::move(refusals);
-    if (options.search) Search(primitive, device, &attempt);
-    found = found || !attempt.search.empty();
+    if (options.search) {
+      TakeFound(found != nullptr ? *found : search::Search(attempt.placed, device, primitive),
+                device, &attempt);
+    }
+    is_found = is_found || !attempt.search.empty();
   }
-  if (options.search && !found) {
+  if (options.search && !is_found) {
     made.refusals.push_back({.kind = FindingKind::kNoSettings, .primitive = primitive});
   }
   return made;

@@ -38,9 +38,10 @@ struct OfPrimitive {
   bool IsEngineSolved() const;
 };
 
-// `options` are those of the plan, without the search where the request has none.
+// `options` are those of the plan, without the search where the request has none. `found`, if not
+// null, is what the search has found already, with the outputs in the order of the request.
 OfPrimitive MakeOf(Primitive primitive, const Request& request, const Device& device,
-                   const Options& options);
+                   const Options& options, const search::Found* found = nullptr);
 
 // One candidate of a search, as an answer to the request in the order of the attempt.
 Answer AnswerOf(const Attempt& attempt, const Settings& settings, const Device& device);

@@ -21,6 +21,10 @@ namespace planner::plan {
 struct Options {
   bool engine = true;
   bool search = true;
+  // For who shows nothing but what ranks first: that is the same, with all that is known of it, and
+  // is a trade-off when it is one in a whole plan. What ranks behind it, the front and front_cut
+  // may be those of its primitive alone.
+  bool first_only = false;
 };
 
 // Why the answer at place `first` of the ranking is before that at place `second`.

@@ -177,11 +177,12 @@ Found ResultOf(const Walk& walk) {
 
 }  // namespace
 
-Found SearchKru(const Request& request, const Device& device, Primitive primitive) {
+Found SearchKru(const Request& request, const Device& device, Primitive primitive, Depth depth) {
   const KruTask task(request, device, primitive);
   KruPhases phases(task);
   Found found = ResultOf(Walk(task, &phases, true));
-  return found.best.empty() ? ResultOf(Walk(task, &phases, false)) : found;
+  if (!found.best.empty() || depth == Depth::kMet) return found;
+  return ResultOf(Walk(task, &phases, false));
 }
 
 }  // namespace planner::search

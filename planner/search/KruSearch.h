@@ -13,7 +13,7 @@
 
 namespace planner::search {
 
-Found SearchKru(const Request& request, const Device& device, Primitive primitive);
+Found SearchKru(const Request& request, const Device& device, Primitive primitive, Depth depth);
 
 }  // namespace planner::search
 

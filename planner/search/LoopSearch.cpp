@@ -58,8 +58,9 @@ class LoopSearch {
     MakeGroups(primitive);
   }
 
-  Found Run() {
+  Found Run(Depth depth) {
     for (Group& group : groups_) TakeAllMet(&group);
+    if (depth == Depth::kMet) return Result();
     bool some_met = false;
     for (const Best& best : bests_) some_met = some_met || best.is_met;
     for (Group& group : groups_) TakeNearest(&group, !some_met);
@@ -271,8 +272,8 @@ class LoopSearch {
 
 }  // namespace
 
-Found SearchLoop(const Request& request, const Device& device, Primitive primitive) {
-  return LoopSearch(request, device, primitive).Run();
+Found SearchLoop(const Request& request, const Device& device, Primitive primitive, Depth depth) {
+  return LoopSearch(request, device, primitive).Run(depth);
 }
 
 }  // namespace planner::search

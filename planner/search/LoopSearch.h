@@ -14,7 +14,7 @@
 
 namespace planner::search {
 
-Found SearchLoop(const Request& request, const Device& device, Primitive primitive);
+Found SearchLoop(const Request& request, const Device& device, Primitive primitive, Depth depth);
 
 }  // namespace planner::search
 

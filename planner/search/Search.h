@@ -68,10 +68,17 @@ struct Found {
   bool complete = true;
 };
 
+// Whether to look for what comes nearest, too, where nothing meets all demands.
+enum class Depth {
+  kAll,
+  kMet,  // no: `best` and `front` have only what meets all demands
+};
+
 // The best settings of a primitive of the device, and the trade-offs. Empty when no setting keeps
 // the limits, and when the request has more inputs or outputs than the primitive. The request is
 // as Request.h says; its `primitive`, `any_order` and `engine_only` change nothing here.
-Found Search(const Request& request, const Device& device, Primitive primitive);
+Found Search(const Request& request, const Device& device, Primitive primitive,
+             Depth depth = Depth::kAll);
 
 }  // namespace planner::search
 
