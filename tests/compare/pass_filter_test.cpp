@@ -112,6 +112,55 @@ TEST(PassFilter, FindsTheOnlyFudgesOfAnExample) {
   for (int pass = 981; pass <= 1019; ++pass) EXPECT_EQ(filter.NextFrom(pass), pass);
 }
 
+// Prepares a run for a TSYN with a VCO of 600 to 1440 MHz, a PFD of 10 to 500 MHz and outputs of
+// 4.6875 to 800 MHz.
+Ip::VorkelImp& PrepareTsyn(const char* outFreqs, double inFreq2, const Ip::Pll::Run& run) {
+  const plain::PllLimits limits = {.vcoMin = 600, .vcoMax = 1440, .clkoutMin = 4.6875,
+                                   .clkoutMax = 800, .pfdMin = 10, .pfdMax = 500,
+                                   .clkoutMaxIo = 1000, .maxHighLowCount = 64, .vcoTarget = 1000,
+                                   .maxPfdLowB = 300};
+  PublishLimits(limits, plain::kPrimTsyn);
+  Ip::VorkelImp& imp = engine_test::NewImp();
+  imp.SetDevice(kComparedPart);
+  EXPECT_EQ(PrepareVcoRange(imp, outFreqs, inFreq2, run), Ip::Pll::kSolved);
+  return imp;
+}
+
+// Many candidates of this request are nearly, but not exactly, multiples of 12, 24.01 or 24.264
+// MHz. Taken for multiples, they would let hundreds of passes through before the one that succeeds.
+TEST(PassFilter, IsNotTakenInByWhatIsNearlyAMultiple) {
+  const Ip::Trace trace(false);
+  const Ip::Pll::Run run = {12.003, 4, plain::kPrimTsyn, trace};
+  Ip::VorkelImp& imp = PrepareTsyn("13.5 12 24.01 24.264", 12.044, run);
+  imp.pll._minPowerMode = true;
+  Ip::Pll::PassFilter filter(imp, run);
+  int failed = 0;
+  int pass = filter.NextFrom(1);
+  while (pass < kPasses && !SolverPass(imp, Ip::Pll::FudgeOf(pass), run)) {
+    ++failed;
+    pass = filter.NextFrom(pass + 1);
+  }
+  EXPECT_EQ(pass, 8809);
+  EXPECT_LT(failed, 10);
+}
+
+// Below the PFD range an input has no D. For 1100 MHz, 800 MHz are 27 percent too little, and for 3.5
+// MHz, 4.6875 are 34 too much; for 900 MHz, 800 are 11 too little.
+TEST(PassFilter, TellsAtOnceWhatIsOutOfReach) {
+  const Ip::Trace trace(false);
+  const auto isHopeless = [&](const char* outFreqs, double inFreq) {
+    const Ip::Pll::Run run = {inFreq, 2, plain::kPrimTsyn, trace};
+    return IsHopelessAtOnce(PrepareTsyn(outFreqs, 0.0, run), run);
+  };
+  EXPECT_FALSE(isHopeless("100 50", 100.0));
+  EXPECT_FALSE(isHopeless("100 900", 100.0));
+  EXPECT_TRUE(isHopeless("100 1100", 100.0));
+  EXPECT_TRUE(isHopeless("100 3.5", 100.0));
+  EXPECT_TRUE(isHopeless("100 50", 9.0));
+  EXPECT_TRUE(isHopeless("1460 50", 100.0));
+  EXPECT_FALSE(isHopeless("1440 50", 100.0));
+}
+
 class PassFilterProperty : public testing::TestWithParam<Kind> {};
 
 TEST_P(PassFilterProperty, LeavesOutNoPassThatSucceeds) {
