@@ -15,16 +15,17 @@ namespace Ip::Pll {
 
 namespace {
 
-// What making the filter costs, in candidates that passes could try instead: its windows and its
-// first chunk, and the ranking of each output after output 0.
-constexpr int kCostOfFilter = 150;
-constexpr int kCostOfRankedOutput = 200;
+// What is worth spending before the filter is made, in candidates that passes try. It is less than
+// half of what its windows and its first chunk cost, and the ranking of each output after output 0:
+// a pass takes a fraction of what it takes the plain search, so that even a request that the next
+// pass would have solved is answered sooner than by that.
+constexpr int kBudget = 120;
+constexpr int kBudgetOfRankedOutput = 110;
 // What a pass costs beside its candidates.
 constexpr int kCostOfPass = 16;
 
-// The passes to be run before the filter is made: as many as cost what the filter costs. Most
-// fudges are so small that it would come too late. With a trace all passes run, since each has its
-// lines.
+// The passes to be run before the filter is made. Most fudges are so small that it would come too
+// late. With a trace all passes run, since each has its lines.
 int PassesBeforeFilter(const VorkelImp& imp, const Run& run) {
   if (run.trace.On()) return kPasses;
   const Div0Steps steps(HasIntegerDiv0(imp, run));
@@ -32,8 +33,8 @@ int PassesBeforeFilter(const VorkelImp& imp, const Run& run) {
   const int first = steps.FirstWorthTrying(outFreq0, imp.pll.minAdjVco);
   const int last = outFreq0 > 0.0 ? steps.Below(imp.pll.maxAdjVco / outFreq0) : 0;
   const int candidates = std::max(last - first + 1, 0);
-  const int filter = kCostOfFilter + kCostOfRankedOutput * (run.count - 1);
-  return 1 + filter / (2 * candidates + kCostOfPass);
+  const int budget = kBudget + kBudgetOfRankedOutput * (run.count - 1);
+  return 1 + budget / (2 * candidates + kCostOfPass);
 }
 
 }  // namespace

@@ -144,8 +144,8 @@ TEST(PassFilter, IsNotTakenInByWhatIsNearlyAMultiple) {
   EXPECT_LT(failed, 10);
 }
 
-// Below the PFD range an input has no D. For 1100 MHz, 800 MHz are 27 percent too little, and for 3.5
-// MHz, 4.6875 are 34 too much; for 900 MHz, 800 are 11 too little.
+// Below the PFD range an input has no D. For 1100 MHz, 800 MHz are 27 percent too little, and for
+// 3.5 MHz, 4.6875 are 34 too much; for 900 MHz, 800 are 11 too little.
 TEST(PassFilter, TellsAtOnceWhatIsOutOfReach) {
   const Ip::Trace trace(false);
   const auto isHopeless = [&](const char* outFreqs, double inFreq) {
