@@ -73,8 +73,9 @@ void ByOutputs(Product& product, std::FILE* file) {
       for (int i = 0; i < kRequestsOfRow; ++i) {
         seconds.push_back(SecondsOf(product, Draw(random, prim, count)));
       }
-      WriteRow((prim == kPll ? "PLL, " : "TSYN, ") + std::to_string(count) + " outputs", seconds,
-               file);
+      WriteRow((prim == kPll ? "PLL, " : "TSYN, ") + std::to_string(count) +
+                   (count == 1 ? " output" : " outputs"),
+               seconds, file);
     }
   }
 }
@@ -85,9 +86,10 @@ void ByFudge(Product& product, std::FILE* file) {
     double largest;  // MHz
     std::vector<double> seconds;
   };
-  std::vector<Row> rows = {{"fudge 0", 0.0, {}},       {"fudge up to 0.001", 0.0015, {}},
-                           {"up to 0.01", 0.0105, {}}, {"up to 0.1", 0.1005, {}},
-                           {"up to 1", 1.0005, {}},    {"up to 11", 11.0, {}}};
+  std::vector<Row> rows = {
+      {"fudge 0", 0.0, {}},             {"fudge up to 0.001", 0.0015, {}},
+      {"fudge up to 0.01", 0.0105, {}}, {"fudge up to 0.1", 0.1005, {}},
+      {"fudge up to 1", 1.0005, {}},    {"fudge up to 11", 11.0, {}}};
   Row unsolved = {"no solution", 0.0, {}};
   Random random(2000);
   compare::PublishLimits(kTsynLimits, kTsyn);
