@@ -6,6 +6,12 @@ namespace {
 
 constexpr const char* kHandle = "::Script::handle";
 
+// The names of commands that no script has renamed stand for those that the host gives them.
+constexpr char kOwnName = '#';
+std::string Shown(const std::string& name) {
+  return name.starts_with(kOwnName) ? "HANDLE" : name;
+}
+
 }  // namespace
 
 std::string Nameless(const std::string& text) {
@@ -22,50 +28,62 @@ std::string Nameless(const std::string& text) {
   return nameless;
 }
 
-Answer World::Rename(const Step& step) {
-  Handle& handle = handles_[step.handle];
-  const std::string& wanted = step.words.front();
-  const std::string shown = handle.name.empty() ? "HANDLE" : handle.name;
-  if (handle.object == nullptr) {
-    return {false, "can't rename \"" + shown + "\": command doesn't exist", {}, {}};
-  }
-  if (names_[wanted]) {
+ObjectModel* World::ObjectOf(int variable) const {
+  const auto name = variables_.find(variable);
+  if (name == variables_.end()) return nullptr;
+  const auto command = commands_.find(name->second);
+  return command == commands_.end() ? nullptr : command->second.get();
+}
+
+Answer World::Rename(const std::string& name, const std::string& wanted) {
+  if (commands_.contains(wanted)) {
     return {false, "can't rename to \"" + wanted + "\": command already exists", {}, {}};
   }
-  names_[handle.name] = false;
-  names_[wanted] = true;
-  handle.name = wanted;
+  commands_[wanted] = commands_[name];
+  commands_.erase(name);
   return {true, wanted, {}, {}};
 }
 
 Answer World::Expect(const Step& step) {
+  const std::string variable = std::to_string(step.handle);
   if (step.kind == Step::Kind::kCreate) {
-    handles_[step.handle] = {"", std::make_shared<ObjectModel>()};
+    const std::string name = kOwnName + std::to_string(++created_);
+    variables_[step.handle] = name;
+    commands_[name] = std::make_shared<ObjectModel>();
     return {true, "HANDLE", {}, {}};
   }
-  const auto found = handles_.find(step.handle);
-  if (found == handles_.end()) {
-    return {false, "can't read \"h" + std::to_string(step.handle) + "\": no such variable", {}, {}};
+  const auto found = variables_.find(step.handle);
+  if (found == variables_.end()) {
+    return {false, "can't read \"h" + variable + "\": no such variable", {}, {}};
   }
-  if (step.kind == Step::Kind::kRename) return Rename(step);
-  Handle& handle = found->second;
-  const std::string shown = handle.name.empty() ? "HANDLE" : handle.name;
-  if (step.kind == Step::Kind::kDestroy) {
-    if (handle.object == nullptr) {
-      return {false, "can't delete \"" + shown + "\": command doesn't exist", {}, {}};
+  const std::string name = found->second;
+  ObjectModel* const object = ObjectOf(step.handle);
+  const bool is_there = object != nullptr;
+  switch (step.kind) {
+    case Step::Kind::kRename: {
+      if (!is_there) {
+        return {false, "can't rename \"" + Shown(name) + "\": command doesn't exist", {}, {}};
+      }
+      Answer answer = Rename(name, step.words.front());
+      if (answer.is_ok) variables_[step.handle] = step.words.front();
+      return answer;
     }
-    handle.object = nullptr;
-    names_[handle.name] = false;
-    return {true, "", {}, {}};
+    case Step::Kind::kDestroy:
+      if (!is_there) {
+        return {false, "can't delete \"" + Shown(name) + "\": command doesn't exist", {}, {}};
+      }
+      commands_.erase(name);
+      return {};
+    default:
+      break;
   }
-  if (handle.object == nullptr) return {false, "invalid command name \"" + shown + "\"", {}, {}};
-  return handle.object->Call(step.words);
+  if (!is_there) return {false, "invalid command name \"" + Shown(name) + "\"", {}, {}};
+  return object->Call(step.words);
 }
 
 bool World::GoesFar(const Step& step) const {
-  const auto found = handles_.find(step.handle);
-  return step.kind == Step::Kind::kCall && found != handles_.end() &&
-         found->second.object != nullptr && found->second.object->GoesFar(step.words);
+  const ObjectModel* const object = ObjectOf(step.handle);
+  return step.kind == Step::Kind::kCall && object != nullptr && object->GoesFar(step.words);
 }
 
 }  // namespace model

@@ -1,4 +1,4 @@
-// What a script finds: the handles that it has made, by the variables that hold them.
+// What a script finds: the commands of the handles that it has made, and the variables that name them.
 #ifndef VORKEL_TESTS_MODEL_WORLD_H_
 #define VORKEL_TESTS_MODEL_WORLD_H_
 
@@ -21,16 +21,14 @@ class World {
   bool GoesFar(const Step& step) const;
 
  private:
-  struct Handle {
-    std::string name;  // of the command, if the script has given it one
-    std::shared_ptr<ObjectModel> object;  // null: the command is no more
-  };
+  Answer Rename(const std::string& name, const std::string& wanted);
+  // Null when no command has the name that the variable holds.
+  ObjectModel* ObjectOf(int variable) const;
 
-  Answer Rename(const Step& step);
-
-  std::map<int, Handle> handles_;
-  // The names that scripts have given to commands, those that no variable holds among them.
-  std::map<std::string, bool> names_;
+  // A variable holds the name of a command, which may be no more, or be another one by now.
+  std::map<int, std::string> variables_;
+  std::map<std::string, std::shared_ptr<ObjectModel>> commands_;
+  int created_ = 0;
 };
 
 // The parts of an answer of Tcl that tell of no names of handles, which differ from run to run.
