@@ -1,15 +1,34 @@
 #include "engine/StandardOutput.h"
 
-#include <fcntl.h>
-#include <poll.h>
-#include <sys/stat.h>
-#include <unistd.h>
-
 #include <cerrno>
 #include <cstddef>
 #include <cstdio>
 
+#ifndef _WIN32
+#include <fcntl.h>
+#include <poll.h>
+#include <sys/stat.h>
+#include <unistd.h>
+#endif
+
 namespace Ip {
+
+namespace {
+
+// By the buffer of C.
+int WriteAsC(std::string_view text) {
+  const bool written = std::fwrite(text.data(), 1, text.size(), stdout) == text.size();
+  return written && std::fflush(stdout) == 0 ? kWritten : errno;
+}
+
+}  // namespace
+
+#ifdef _WIN32
+
+// There a file has nothing by which one for oneself could be told.
+int WriteToStandardOutput(std::string_view text) { return WriteAsC(text); }
+
+#else
 
 namespace {
 
@@ -81,9 +100,9 @@ int WriteToStandardOutput(std::string_view text) {
     if (std::fflush(stdout) != 0) return errno;
     return WriteAll(descriptor, text);
   }
-  // A stream in memory.
-  const bool written = std::fwrite(text.data(), 1, text.size(), stdout) == text.size();
-  return written && std::fflush(stdout) == 0 ? kWritten : errno;
+  return WriteAsC(text);  // a stream in memory
 }
+
+#endif  // _WIN32
 
 }  // namespace Ip
