@@ -9,7 +9,7 @@ namespace Ip::Pll {
 VcoCandidate* VcoCandidateTable::RecordsOfThread() {
   static constinit thread_local std::unique_ptr<VcoCandidate[]> records;
   if (records == nullptr) {
-    records = std::make_unique_for_overwrite<VcoCandidate[]>(MAX_VCO_CANDIDATES);
+    records.reset(new VcoCandidate[MAX_VCO_CANDIDATES]);  // libc++ 14 has no ..._for_overwrite
   }
   return records.get();
 }
