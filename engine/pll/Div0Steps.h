@@ -7,7 +7,7 @@
 
 #include <algorithm>
 
-#include "engine/pll/VcoCandidate.h"
+#include "engine/pll/PllState.h"
 
 namespace Ip::Pll {
 
@@ -43,6 +43,21 @@ class Div0Steps {
  private:
   double width_;
 };
+
+// Goes over the steps whose VCO, for an output 0 of `outFreq0` (MHz), lies in the working range, by
+// rising dividers: visit(step, vco) returns whether it wants more. Output 0 itself is not held
+// against the output limits; only the VCO range bounds it.
+template <typename Visit>
+void VisitVcos(const PllState& pll, const Div0Steps& steps, double outFreq0, Visit visit) {
+  for (int i = steps.FirstWorthTrying(outFreq0, pll.minAdjVco); i < steps.Count(); ++i) {
+    const double vco = outFreq0 * steps[i];
+    if (!(pll.minAdjVco <= vco && vco <= pll.maxAdjVco)) {
+      if (vco > pll.maxAdjVco && outFreq0 > 0.0) return;  // and so are all that follow
+      continue;
+    }
+    if (!visit(i, vco)) return;
+  }
+}
 
 }  // namespace Ip::Pll
 

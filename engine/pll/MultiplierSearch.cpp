@@ -110,21 +110,33 @@ bool SearchMAndD(VcoCandidate& candidate, double pfdMin, double pfdMax, bool int
   return (isUsual ? WalkD : WalkM)(candidate, pfdMin, pfdMax, step, run);
 }
 
+namespace {
+
+// Finds M and D of the candidate in a slot, or drops it.
+bool TakeOrDrop(VorkelImp& imp, int slot, bool integerStep, const Run& run) {
+  VcoCandidate& candidate = imp.pll._vcoCandidates[slot];
+  if (!SearchMAndD(candidate, imp.pllLimits.pfdMin, PfdMaximum(imp), integerStep, run)) {
+    imp.pll._vcoCandidates.Empty(slot);
+    return false;
+  }
+  candidate.ClearWhatIsLeft(run.count);
+  return true;
+}
+
+}  // namespace
+
 bool CalculateMAndD(VorkelImp& imp, bool integerStep, const Run& run, int enough) {
   VcoCandidateTable& candidates = imp.pll._vcoCandidates;
   const Trace& trace = run.trace;
   TRACE(trace, "DLL------- Calculating M and D\n");
-  const double pfdMax = PfdMaximum(imp);
   if (imp.lowBandwidth) {
-    TRACE(trace, "DLL  --- Using _maxPfdLowB (%f) for PFD max\n", pfdMax);
+    TRACE(trace, "DLL  --- Using _maxPfdLowB (%f) for PFD max\n", PfdMaximum(imp));
   }
   int found = 0;
   for (const int slot : candidates.Occupied()) {
-    if (found == enough || !SearchMAndD(candidates[slot], imp.pllLimits.pfdMin, pfdMax,
-                                        integerStep, run)) {
+    if (found == enough) {
       candidates.Empty(slot);
-    } else {
-      candidates[slot].ClearWhatIsLeft(run.count);
+    } else if (TakeOrDrop(imp, slot, integerStep, run)) {
       ++found;
     }
   }
@@ -133,6 +145,17 @@ bool CalculateMAndD(VorkelImp& imp, bool integerStep, const Run& run, int enough
     return false;
   }
   return true;
+}
+
+bool FindFirstValidVcos(VorkelImp& imp, double outFreq0, const Div0Steps& steps, const Run& run,
+                        int enough) {
+  int found = 0;
+  VisitVcos(imp.pll, steps, outFreq0, [&](int slot, double vco) {
+    imp.pll._vcoCandidates.Put(slot, vco, steps[slot]);
+    if (TakeOrDrop(imp, slot, true, run)) ++found;
+    return found < enough;
+  });
+  return found > 0;
 }
 
 }  // namespace Ip::Pll

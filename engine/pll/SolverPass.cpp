@@ -22,12 +22,14 @@ int CountValidVcos(const VcoCandidateTable& candidates) {
   return count;
 }
 
-// How many valid candidates tell what is chosen. In the smallest-VCO mode, two: the first one is
-// chosen when VCOs rise with the slots, and whether it is the only one decides about its phases.
-// With a trace, each has its lines.
-int EnoughValidVcos(const VorkelImp& imp, bool vcosRise, const Run& run) {
-  const bool firstIsChosen = imp.pll._minPowerMode && vcosRise && !run.trace.On();
-  return firstIsChosen ? 2 : MAX_VCO_CANDIDATES;
+// In the smallest-VCO mode two valid candidates tell what is chosen: the first one is when VCOs rise
+// with the slots, and whether it is the only one decides about its phases.
+constexpr int kEnoughRisingVcos = 2;
+
+// Whether the first valid candidate will be chosen. With a trace, all others have lines, too.
+bool FirstIsChosen(const VorkelImp& imp, double outFreq0, const Run& run) {
+  return imp.pll._minPowerMode && !run.trace.On() && outFreq0 > 0.0 &&
+         imp.pll._vcoCandidates.Occupied().IsEmpty();
 }
 
 // The valid candidate with the smallest VCO, the first of several.
@@ -72,7 +74,7 @@ bool SolverPass(VorkelImp& imp, double fudge, const Run& run) {
   pll._vcoCandidates.EmptyAll();
   pll.chosen = nullptr;
   VorkelImp::_prim = run.prim;
-  const bool integerDiv0 = HasIntegerDiv0(imp, run);
+  const Div0Steps steps(HasIntegerDiv0(imp, run));
 
   // The table is not emptied between the attempts: what the upward one has left takes part in
   // the downward one. With a fudge of 0 there is nothing to enumerate downward, and the second
@@ -81,13 +83,17 @@ bool SolverPass(VorkelImp& imp, double fudge, const Run& run) {
   for (const bool upward : {true, false}) {
     const double outFreq0 = imp.requests.reqOutFreq[0];
     const double shift = upward ? fudge : 0.0 - fudge;
-    const bool vcosRise = outFreq0 + shift > 0.0 && pll._vcoCandidates.Occupied().IsEmpty();
-    if (upward || fudge != 0.0) {
-      created = EnumerateVcoCandidates(imp, outFreq0, shift, integerDiv0, run.trace);
-    }
-    if (created > 0) {
-      if (run.count > 1 && !FindOutputDividers(imp, run)) continue;
-      if (!CalculateMAndD(imp, true, run, EnoughValidVcos(imp, vcosRise, run))) continue;
+    const bool enumerates = upward || fudge != 0.0;
+    const bool firstIsChosen = FirstIsChosen(imp, outFreq0 + shift, run);
+    if (firstIsChosen && run.count == 1) {
+      if (enumerates) FindFirstValidVcos(imp, outFreq0 + shift, steps, run, kEnoughRisingVcos);
+    } else {
+      if (enumerates) created = EnumerateVcoCandidates(imp, outFreq0, shift, steps, run.trace);
+      if (created > 0) {
+        if (run.count > 1 && !FindOutputDividers(imp, run)) continue;
+        const int enough = firstIsChosen ? kEnoughRisingVcos : MAX_VCO_CANDIDATES;
+        if (!CalculateMAndD(imp, true, run, enough)) continue;
+      }
     }
     pll.chosen = Choose(imp, run);
     if (pll.chosen != nullptr) {

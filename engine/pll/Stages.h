@@ -22,6 +22,7 @@
 
 #include "engine/Ip_VorkelImp.h"
 #include "engine/Trace.h"
+#include "engine/pll/Div0Steps.h"
 
 namespace Ip::Pll {
 
@@ -52,11 +53,10 @@ ResultCode PrepareVcoRange(VorkelImp& imp, const Port::StringBase& outFreqs, dou
                            const Run& run);
 
 // VcoEnumeration.cpp: makes a candidate of every output-0 divider whose VCO, for the requested
-// output-0 frequency plus `fudge` (both MHz), lies in the working range. Whole dividers 1 to
-// 128 when `integerDiv0`, else 1, 2, 2.125, ... 128. Slots of other dividers stay as they are.
-// Returns the number of candidates made.
-int EnumerateVcoCandidates(VorkelImp& imp, double reqOutFreq0, double fudge, bool integerDiv0,
-                           const Trace& trace);
+// output-0 frequency plus `fudge` (both MHz), lies in the working range. Slots of other dividers
+// stay as they are. Returns the number of candidates made.
+int EnumerateVcoCandidates(VorkelImp& imp, double reqOutFreq0, double fudge,
+                           const Div0Steps& steps, const Trace& trace);
 
 // OutputDividers.cpp: finds the dividers of outputs 1 to count - 1 and drops the candidates
 // that have none. False when an output has no divider on any candidate within the largest
@@ -69,7 +69,13 @@ bool FindOutputDividers(VorkelImp& imp, const Run& run);
 bool CalculateMAndD(VorkelImp& imp, bool integerStep, const Run& run,
                     int enough = MAX_VCO_CANDIDATES);
 
-// The same for one candidate: the smallest M with inFreq x M / D equal to the candidate's VCO
+// EnumerateVcoCandidates and CalculateMAndD in one, for a single output without a trace: makes a
+// candidate of each VCO that has a whole M and a D, by rising dividers, until there are `enough`.
+// `outFreq0`, MHz, has the fudge in it. False when there is none.
+bool FindFirstValidVcos(VorkelImp& imp, double outFreq0, const Div0Steps& steps, const Run& run,
+                        int enough);
+
+// The M and D of one candidate: the smallest M with inFreq x M / D equal to the candidate's VCO
 // within the remainder, and inFreq / D in [pfdMin, pfdMax] (MHz, inclusive). Sets m and d, or
 // returns false.
 bool SearchMAndD(VcoCandidate& candidate, double pfdMin, double pfdMax, bool integerStep,

@@ -107,7 +107,7 @@ TEST(AllocationFreeTable, WithHundredsOfCandidates) {
     const Ip::Pll::Run run = {request.inFreq, 1, kTsyn, trace};
     const std::size_t before = Allocations();
     const int candidates =
-        Ip::Pll::EnumerateVcoCandidates(imp, request.outFreqs[0], 0.0, false, trace);
+        Ip::Pll::EnumerateVcoCandidates(imp, request.outFreqs[0], 0.0, Ip::Pll::Div0Steps(false), trace);
     const bool chosen = Ip::Pll::SolverPass(imp, 0.0, run);
     EXPECT_EQ(Allocations() - before, 0u);
     EXPECT_TRUE(chosen);

@@ -111,6 +111,32 @@ TEST_F(SolverPassTest, MinPowerTakesTheSmallestVco) {
   EXPECT_EQ(imp_.pll.chosen, &table_[1]);
 }
 
+// 400, 600, 800 and 1000 MHz are valid. The first is chosen, and with the second it is certain that
+// it is not the only one. What would have lines in a trace is left out without one.
+TEST_F(SolverPassTest, WithoutATraceOneOutputStopsAtTheSecondValidVco) {
+  imp_.requests.reqOutFreq = {200};
+  EXPECT_TRUE(Pass(0, 1));
+  EXPECT_THAT(SlotsOf(table_.Occupied()), ElementsAre(1, 2, 3, 4));
+  EXPECT_EQ(imp_.GetChosenVCO(), 400.0);
+  EXPECT_TRUE(Ip::Pll::SolverPass(imp_, 0, {inFreq_, 1, kPll, Trace(false)}));
+  EXPECT_THAT(SlotsOf(table_.Occupied()), ElementsAre(1, 2));
+  EXPECT_EQ(imp_.GetChosenVCO(), 400.0);
+}
+
+// A PFD of 300 MHz and more at an input of 300 allows 600 MHz, M = 2 and D = 1, alone: that is the
+// only one, with and without a trace, and gets its phase.
+TEST_F(SolverPassTest, WithoutATraceTheOnlyVcoOfOneOutputHasItsPhase) {
+  imp_.requests.reqOutFreq = {200};
+  imp_.requests.reqPhase = {90};
+  imp_.requests.reqDutyCycle = {50};
+  imp_.pllLimits.pfdMin = 300;
+  inFreq_ = 300;
+  SetRange(400, 800);
+  EXPECT_TRUE(Ip::Pll::SolverPass(imp_, 0, {inFreq_, 1, kPll, Trace(false)}));
+  EXPECT_THAT(SlotsOf(table_.Occupied()), ElementsAre(2));
+  EXPECT_EQ(imp_.GetChosenPhaseN(0), 90.0);
+}
+
 TEST_F(SolverPassTest, MinPowerAmongSeveralWorksOutNoPhases) {
   imp_.requests.reqOutFreq = {200};
   imp_.requests.reqPhase = {90};

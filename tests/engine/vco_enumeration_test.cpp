@@ -33,7 +33,7 @@ class VcoEnumerationTest : public testing::Test {
   int Enumerate(double freq, double fudge, bool integerDiv0) {
     int created = -1;
     trace_ = engine_test::TraceOf([&](const Trace& trace) {
-      created = Ip::Pll::EnumerateVcoCandidates(imp_, freq, fudge, integerDiv0, trace);
+      created = Ip::Pll::EnumerateVcoCandidates(imp_, freq, fudge, Ip::Pll::Div0Steps(integerDiv0), trace);
     });
     return created;
   }
@@ -145,8 +145,8 @@ TEST_F(VcoEnumerationTest, IsSilentWithTheTraceOff) {
   SetRange(400, 1080);
   const std::string text = engine_test::TraceOf(
       [&](const Trace& trace) {
-        Ip::Pll::EnumerateVcoCandidates(imp_, 200, 0, true, trace);
-        Ip::Pll::EnumerateVcoCandidates(imp_, 0, 0, true, trace);
+        Ip::Pll::EnumerateVcoCandidates(imp_, 200, 0, Ip::Pll::Div0Steps(true), trace);
+        Ip::Pll::EnumerateVcoCandidates(imp_, 0, 0, Ip::Pll::Div0Steps(true), trace);
       },
       false);
   EXPECT_EQ(text, "");
