@@ -1,6 +1,6 @@
 // Lines of answers that an earlier run has written.
 //
-// Each begins with the same entries in the same order (report/BatchJson.h writes them):
+// Each begins with the same entries in the same order (report/BatchText.h writes them):
 //
 //     {"line":17,"digest":"00f1e2d3c4b5a697","status":"within","primitive":"TSYN","id":...}
 //

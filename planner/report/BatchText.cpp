@@ -1,4 +1,4 @@
-// Tested by batch.test.
+// Tested by batch_text_test.cpp and batch.test.
 #include "planner/report/BatchText.h"
 
 #include <algorithm>

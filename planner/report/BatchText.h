@@ -1,7 +1,7 @@
 // What becomes of the lines of a batch: as lines of JSON, as rows for a spreadsheet, and in
 // numbers. doc/batch.md describes them.
 //
-// Tested by batch.test.
+// Tested by batch_text_test.cpp and batch.test.
 #ifndef VORKEL_PLANNER_REPORT_BATCHTEXT_H_
 #define VORKEL_PLANNER_REPORT_BATCHTEXT_H_
 

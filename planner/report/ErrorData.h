@@ -1,6 +1,6 @@
 // What is wrong with a call, and with files, as data: for scripts, which get it with the error.
 //
-// Tested by tests/tcl and tests/python.
+// Tested by error_data_test.cpp.
 #ifndef VORKEL_PLANNER_REPORT_ERRORDATA_H_
 #define VORKEL_PLANNER_REPORT_ERRORDATA_H_
 

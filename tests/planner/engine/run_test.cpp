@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <stdexcept>
 #include <string>
 #include <thread>
 #include <utility>
@@ -311,6 +312,19 @@ TEST_F(RunTest, AnswersAsAnyObjectOfTheEngine) {
   EXPECT_EQ(settings.d, other.GetChosenD());
   EXPECT_EQ(settings.outputs[0].divider / 8.0, other.GetChosenDiv0());
   EXPECT_EQ(settings.outputs[1].divider / 8, other.GetChosenDivN(1));
+}
+
+// Who asks for a primitive that the device has not, has not looked: nothing is made of it.
+TEST_F(RunTest, APrimitiveWithoutLimitsIsAMistakeOfTheCaller) {
+  const std::string text =
+      "device = \"bare\"\npackages = [\"p\"]\n[grade.1]\nO_MAX_HT_LT = 64\n" + engine_test::kTsyn;
+  const planner::Device bare = planner::device::FromFile(
+      ::Device::DeviceFile::Parse(text, "bare.toml", "bare"), "p", "1");
+  const Request request = Ask({100}, {Out(200)});
+  EXPECT_THROW(planner::engine::RunLoop(request, bare, Primitive::kPll, {}, false),
+               std::logic_error);
+  EXPECT_THROW(planner::engine::RunKru(request, bare, Primitive::kKruSp, {}, {0.0}, false),
+               std::logic_error);
 }
 
 // The engine takes lists of numbers as text. Here no fraction gets lost on the way: from 33.125 MHz,
