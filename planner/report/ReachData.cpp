@@ -1,4 +1,4 @@
-// Tested by reach.test.
+// Tested by reach_text_test.cpp and reach.test.
 #include "planner/report/ReachData.h"
 
 #include <cmath>

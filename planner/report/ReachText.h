@@ -3,7 +3,7 @@
 //
 // Lists can be longer than memory, so that text, JSON and rows are made piece by piece.
 //
-// Tested by reach.test.
+// Tested by reach_text_test.cpp and reach.test.
 #ifndef VORKEL_PLANNER_REPORT_REACHTEXT_H_
 #define VORKEL_PLANNER_REPORT_REACHTEXT_H_
 
@@ -28,8 +28,8 @@ struct ReachQuestion {
   enum class Kind { kList, kCount, kGaps, kNear };
   Kind kind = Kind::kList;
   int output = 0;
-  std::optional<Rational> from;  // MHz
-  std::optional<Rational> to;
+  std::optional<Rational> from = {};  // MHz
+  std::optional<Rational> to = {};
   Rational near = 0;      // kNear, MHz
   std::int64_t most = 0;  // of a list, gaps or nearest ones; 0: all of a list
 

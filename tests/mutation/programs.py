@@ -27,7 +27,9 @@ BINDING = (
 )
 PACKAGE_SCRIPTS = tuple(
     f"tests/package/{name}.test"
-    for name in ("package", "dispatch", "badinput", "device", "pll", "tsyn", "kru", "timing")
+    for name in (
+        "package", "dispatch", "badinput", "device", "pll", "tsyn", "kru", "timing", "trace",
+    )
 )
 
 TABLE = (
