@@ -19,6 +19,7 @@
 #include "bench/Contestants.h"
 #include "bench/DrawnRequests.h"
 #include "bench/Summary.h"
+#include "bench/TableFile.h"
 #include "bench/Timing.h"
 #include "bench/requests.h"
 #include "tests/compare/PllPair.h"
@@ -225,8 +226,7 @@ void RegisterTraced(Summary& summary) {
 
 int main(int argc, char** argv) {
   benchmark::Initialize(&argc, argv);
-  std::FILE* file = stdout;
-  if (argc == 2) file = std::fopen(argv[1], "w");
+  std::FILE* file = bench::TableFile(argc, argv);
   if (argc > 2 || file == nullptr) {
     std::fprintf(stderr, "usage: search_bench [TABLE] [--benchmark_filter=REGEX]\n");
     return 2;

@@ -16,6 +16,7 @@
 #include <vector>
 
 #include "bench/Contestants.h"
+#include "bench/TableFile.h"
 #include "bench/Timing.h"
 #include "bench/requests.h"
 #include "tests/compare/PllPair.h"
@@ -28,6 +29,7 @@ namespace {
 using compare::Random;
 
 constexpr int kRepetitions = 4;
+constexpr int kShown = 3;  // of the climbs on devices as they are built, and of the others
 
 // A request whose outputs can be changed one by one.
 struct Place {
@@ -63,7 +65,7 @@ void ChangeLimits(Random& random, plain::PllLimits* limits) {
 
 void Change(Random& random, Place* place) {
   plain::PllRequest& request = place->drawn.request;
-  switch (random.Int(0, place->ownLimits ? 6 : 5)) {
+  switch (random.Int(0, place->ownLimits ? 8 : 7)) {
     case 0: request.inFreq = random.Int(10'000, 100'000) / 1000.0; break;
     case 1: request.inFreq *= random.Real(0.98, 1.02); break;
     case 2:
@@ -81,11 +83,20 @@ void Change(Random& random, Place* place) {
       place->outFreqs[static_cast<std::size_t>(n)] = Frequency(random, *place);
       break;
     }
+    case 6: (random.OneIn(2) ? request.lowBandwidth : request.preferMaxVco) ^= true; break;
+    case 7: request.closest = random.OneIn(2); break;
     default: ChangeLimits(random, &place->drawn.limits);
   }
   request.count = static_cast<int>(place->outFreqs.size());
   request.outFreqs.clear();
-  for (const double f : place->outFreqs) request.outFreqs += compare::Number("%.10g ", f);
+  request.phases.clear();
+  request.dutyCycles.clear();
+  for (const double f : place->outFreqs) {
+    request.outFreqs += compare::Number("%.10g ", f);
+    if (!request.closest) continue;
+    request.phases += compare::Number("%g ", 45 * random.Int(0, 7));
+    request.dutyCycles += "50 ";
+  }
 }
 
 Place Begin(Random& random, bool ownLimits) {
@@ -133,14 +144,16 @@ void WriteClimbs(int climbs, int steps, std::uint64_t seed, std::FILE* file) {
             [](const Place& a, const Place& b) { return a.seconds > b.seconds; });
   std::fprintf(file, "%d climbs of %d steps; the slowest, beside the plain search:\n\n", climbs,
                steps);
-  for (std::size_t i = 0; i < found.size() && i < 4; ++i) {
-    const compare::Case& drawn = found[i].drawn;
+  int shown[2] = {0, 0};
+  for (const Place& place : found) {
+    if (++shown[place.ownLimits ? 1 : 0] > kShown) continue;
+    const compare::Case& drawn = place.drawn;
     Plain plain(compare::PublishLimits(drawn.limits, drawn.request.prim));
     const double start = WorkedSeconds();
     plain.Run(drawn.request);
-    std::fprintf(file, "- %.3f ms (plain %.0f ms), %s:\n  %s\n", 1e3 * found[i].seconds,
+    std::fprintf(file, "- %.3f ms (plain %.0f ms), %s:\n  %s\n", 1e3 * place.seconds,
                  1e3 * (WorkedSeconds() - start),
-                 found[i].ownLimits ? "with limits of its own" : "on a device as they are built",
+                 place.ownLimits ? "with limits of its own" : "on a device as they are built",
                  compare::Describe(drawn).c_str());
   }
 }
@@ -149,7 +162,7 @@ void WriteClimbs(int climbs, int steps, std::uint64_t seed, std::FILE* file) {
 }  // namespace bench
 
 int main(int argc, char** argv) {
-  std::FILE* file = argc > 1 ? std::fopen(argv[1], "w") : stdout;
+  std::FILE* file = bench::TableFile(argc, argv);
   if (argc > 5 || file == nullptr) {
     std::fprintf(stderr, "usage: search_climb [TABLE] [CLIMBS] [STEPS] [SEED]\n");
     return 2;

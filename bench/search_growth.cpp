@@ -13,6 +13,7 @@
 #include <vector>
 
 #include "bench/Contestants.h"
+#include "bench/TableFile.h"
 #include "bench/Timing.h"
 #include "bench/requests.h"
 #include "tests/compare/PllPair.h"
@@ -135,8 +136,7 @@ void WriteTable(std::FILE* file) {
 }  // namespace bench
 
 int main(int argc, char** argv) {
-  std::FILE* file = stdout;
-  if (argc == 2) file = std::fopen(argv[1], "w");
+  std::FILE* file = bench::TableFile(argc, argv);
   if (argc > 2 || file == nullptr) {
     std::fprintf(stderr, "usage: search_growth [TABLE]\n");
     return 2;

@@ -15,6 +15,7 @@
 #include <vector>
 
 #include "bench/Contestants.h"
+#include "bench/TableFile.h"
 #include "bench/Timing.h"
 #include "tests/compare/PllPair.h"
 #include "tests/compare/RequestGenerator.h"
@@ -114,8 +115,7 @@ void Hunt(std::FILE* file) {
 }  // namespace bench
 
 int main(int argc, char** argv) {
-  std::FILE* file = stdout;
-  if (argc == 2) file = std::fopen(argv[1], "w");
+  std::FILE* file = bench::TableFile(argc, argv);
   if (argc > 2 || file == nullptr) {
     std::fprintf(stderr, "usage: worst_case [TABLE]\n");
     return 2;

@@ -37,6 +37,11 @@ class Leading {
     }
   }
 
+  // The worst error of what ranks first so far; nothing where there is none.
+  std::optional<Rational> WorstError() const {
+    return firsts_.empty() ? std::nullopt : std::optional(key_.worst_error);
+  }
+
   // The lead of the one that ranks first.
   std::optional<Lead> First(const Device& device) {
     std::optional<Answer> best;
@@ -65,10 +70,11 @@ class Leading {
 };
 
 std::optional<Lead> FirstOf(const Request& request, const Device& device,
-                            const std::vector<Primitive>& primitives, search::Depth depth) {
+                            const std::vector<Primitive>& primitives, bool met_alone) {
   Leading leading(request);
   for (const Primitive primitive : primitives) {
-    leading.Take({primitive, search::Search(request, device, primitive, depth)});
+    const search::Aim aim{.met_alone = met_alone, .worst_error = leading.WorstError()};
+    leading.Take({primitive, search::Search(request, device, primitive, aim)});
   }
   return leading.First(device);
 }
@@ -79,8 +85,8 @@ std::optional<Lead> LeadOf(const Request& request, const Device& device,
                            const std::vector<Primitive>& primitives) {
   if (request.any_order || request.engine_only) return std::nullopt;
   if (request.rank != Rank::kJitter && request.rank != Rank::kError) return std::nullopt;
-  std::optional<Lead> met = FirstOf(request, device, primitives, search::Depth::kMet);
-  return met ? std::move(met) : FirstOf(request, device, primitives, search::Depth::kAll);
+  std::optional<Lead> met = FirstOf(request, device, primitives, true);
+  return met ? std::move(met) : FirstOf(request, device, primitives, false);
 }
 
 }  // namespace planner::plan

@@ -15,7 +15,8 @@ namespace planner::plan {
 
 struct Lead {
   Primitive primitive = Primitive::kPll;
-  // What the search has found of it. Where something meets all demands, that alone.
+  // What the search has found of it. Where something meets all demands, that alone; else what is
+  // no further off than what ranks first of the primitives before it.
   search::Found found;
 };
 

@@ -33,12 +33,11 @@ Span RangeOf(const KruTask& task, PinSource source) {
 
 }  // namespace
 
-KruReach::KruReach(const KruTask& task, KruPhases* phases, bool all_met, bool with_ties,
+KruReach::KruReach(const KruTask& task, KruPhases* phases, const Terms& terms,
                    std::span<const int> divides, int largest)
     : task_(task),
       phases_(*phases),
-      all_met_(all_met),
-      with_ties_(with_ties),
+      terms_(terms),
       divides_(divides),
       largest_(largest),
       whole_(RangeOf(task, PinSource::kSynthesiser)),
@@ -50,7 +49,7 @@ void KruReach::Start(const KruBase& line) {
   line_ = line;
   ++changes_;
   open_.clear();
-  open_.push_back(StepWith(hardware::kSmallestKruM, std::nullopt, nullptr));
+  open_.push_back(StepWith(hardware::kSmallestKruM, terms_.most, nullptr));
   steps_ = open_;
 }
 
@@ -120,17 +119,17 @@ int KruReach::LastOfJitter(const Step& step, int first, int last, int d) const {
 bool KruReach::IsBelow(const KruError& error, const std::optional<KruError>& bound) const {
   if (!bound) return true;
   const std::strong_ordering order = task_.Compare(error, *bound);
-  return with_ties_ ? order <= 0 : order < 0;
+  return terms_.with_ties ? order <= 0 : order < 0;
 }
 
 bool KruReach::IsNearOn(PinSource source, std::size_t place, const KruBase& base,
                         const KruRatio& ratio, const std::optional<KruError>& bound) const {
   const KruOutput& output = task_.Outputs()[place];
   if (!HasSource(task_, source, place, base.feedback)) return false;
-  if (all_met_ && !output.Frequency().IsMet(ratio.a, ratio.b)) return false;
+  if (terms_.all_met && !output.Frequency().IsMet(ratio.a, ratio.b)) return false;
   if (!IsBelow(task_.FrequencyError(place, ratio), bound)) return false;
   if (!IsDutyNearOn(source, place, base.divide_halves, bound)) return false;
-  if (all_met_ && !phases_.CanMeet(place, QuartersOn(source, task_.IsSp(), output.Index()))) {
+  if (terms_.all_met && !phases_.CanMeet(place, QuartersOn(source, task_.IsSp(), output.Index()))) {
     return false;
   }
   return !output.Jitter().IsAsked() || IsJitterNearOn(source, place, base, bound);
@@ -149,7 +148,7 @@ bool KruReach::IsDutyNearOn(PinSource source, std::size_t place, int divide_halv
                             const std::optional<KruError>& bound) const {
   const KruOutput& output = task_.Outputs()[place];
   if (!output.AsksForDuty()) return true;
-  if (all_met_ && !output.IsDutyMet(source, divide_halves)) return false;
+  if (terms_.all_met && !output.IsDutyMet(source, divide_halves)) return false;
   return IsBelow(task_.DutyError(place, source, divide_halves), bound);
 }
 
@@ -159,7 +158,7 @@ bool KruReach::IsJitterNearOn(PinSource source, std::size_t place, const KruBase
   for (const KruPin& pin : task_.Pins()) {
     if (pin.facts->source != source) continue;
     const double jitter = task_.JitterOf(base, pin.facts->pin, false);
-    if (all_met_ && !task_.Outputs()[place].Jitter().IsMet(jitter)) continue;
+    if (terms_.all_met && !task_.Outputs()[place].Jitter().IsMet(jitter)) continue;
     if (IsBelow(task_.JitterError(place, jitter), bound)) return true;
   }
   return false;
@@ -193,7 +192,7 @@ bool KruReach::ArePhasesNear(const Served& served, const std::optional<KruError>
     add(served.synthesiser, PinSource::kSynthesiser);
     quarters |= QuartersOf(i, own);
   }
-  return phases_.AreNear(quarters, &*bound, with_ties_);
+  return phases_.AreNear(quarters, &*bound, terms_.with_ties);
 }
 
 // Whether the jitter of the synthesiser is near enough with an M and a D, or not known.
@@ -205,7 +204,7 @@ bool KruReach::IsJitterNear(const Step& step, int m, int d) const {
   if (jitter == answer::kUnknownJitter) return true;
   for (std::size_t i = 0; i < task_.Outputs().size(); ++i) {
     if ((step.on_jitter >> i & 1) == 0) continue;
-    if (all_met_ && !task_.Outputs()[i].Jitter().IsMet(jitter)) return false;
+    if (terms_.all_met && !task_.Outputs()[i].Jitter().IsMet(jitter)) return false;
     if (!IsBelow(task_.JitterError(i, jitter), step.bound)) return false;
   }
   return true;
@@ -286,7 +285,7 @@ void KruReach::AddReachable(const Spans& all, Step* step) const {
 double KruReach::MostOf(std::size_t place, const std::optional<KruError>& bound) const {
   const double most = bound ? bound->near.value + bound->near.slack : HUGE_VAL;
   const double allowed = task_.Outputs()[place].Frequency().AllowedUnits() * (1 + kRounding);
-  return all_met_ ? std::min(most, allowed) : most;
+  return terms_.all_met ? std::min(most, allowed) : most;
 }
 
 Span KruReach::SpanOn(PinSource source, std::size_t place, int divide_halves, double most) const {

@@ -50,12 +50,16 @@ class KruReach {
  public:
   static constexpr std::size_t kMostDivides = hardware::kClkdvHalves.size();
 
-  // `all_met`: frequencies that do not meet their demands are never near enough. `with_ties`: what
-  // is as near as a bound is near enough.
-  KruReach(const KruTask& task, KruPhases* phases, bool all_met, bool with_ties,
+  // What is near enough.
+  struct Terms {
+    bool all_met;                  // what does not meet its demand never is
+    bool with_ties;                // what is as near as a bound is
+    std::optional<KruError> most;  // the bound to begin with, if any
+  };
+  KruReach(const KruTask& task, KruPhases* phases, const Terms& terms,
            std::span<const int> divides, int largest);
 
-  // Begins with a delay line, and no bounds: all errors are near enough.
+  // Begins with a delay line, and no bound but the first.
   void Start(const KruBase& line);
 
   // From an M on, only what is below an error is near enough; the D of what is asked for from now
@@ -67,7 +71,7 @@ class KruReach {
 
   // No D below has an M that is near enough; one above all when none has.
   int FirstD() const;
-  // The M that are near enough with a D; and those that would be without any bound.
+  // The M that are near enough with a D; and those that would be with the first bound alone.
   SmallSet MsFor(int d) const { return MsOf(steps_, d); }
   SmallSet AllMsFor(int d) const { return MsOf(open_, d); }
 
@@ -85,14 +89,14 @@ class KruReach {
   void ForEachNear(const KruBase& pair, const Take& take) const {
     ForEachOf([&]() -> const Step& { return StepOf(pair.m); }, pair, take);
   }
-  // The same without any bound.
+  // The same with the first bound alone.
   template <typename Take>
   void ForEach(const KruBase& pair, const Take& take) const {
     ForEachOf([&]() -> const Step& { return open_.front(); }, pair, take);
   }
 
   // The same without an M. With a divide, only what is below an error is near enough: that which
-  // `bound_of` tells at the moment; null for any.
+  // `bound_of` tells at the moment; null for the first bound.
   template <typename BoundOf, typename Take>
   void ForEachWithoutM(const BoundOf& bound_of, const Take& take) const {
     KruBase base = line_;
@@ -103,7 +107,7 @@ class KruReach {
     for (const int halves : divides_) {
       if (has_changed) {
         const KruError* const error = bound_of();
-        bound = error == nullptr ? std::nullopt : std::optional(*error);
+        bound = error == nullptr ? terms_.most : std::optional(*error);
         on_line = OnLine(bound);
         has_changed = false;
       }
@@ -206,15 +210,14 @@ class KruReach {
 
   const KruTask& task_;
   KruPhases& phases_;
-  bool all_met_;
-  bool with_ties_;
+  Terms terms_;
   std::span<const int> divides_;
   int largest_;
   Outputs all_ = 0;
   Span whole_;    // of CLKFX and CLKFX180 with any of their ranges, as a ratio to the input
   Span divided_;  // of CLKFXDV
   KruBase line_;
-  std::vector<Step> open_;   // one, without a bound
+  std::vector<Step> open_;   // one, with the first bound
   std::vector<Step> steps_;  // by their M
   std::size_t changes_ = 0;  // of the steps
 };

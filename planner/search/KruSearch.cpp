@@ -31,15 +31,16 @@ std::span<const int> DividesOf(const KruTask& task) {
   return hardware::kClkfxdvHalves;
 }
 
-// All settings, for what meets all demands or for anything.
+// All settings, for what meets all demands or for anything with an error up to `most`.
 class Walk {
  public:
-  Walk(const KruTask& task, KruPhases* phases, bool all_met)
+  Walk(const KruTask& task, KruPhases* phases, bool all_met, const std::optional<KruError>& most)
       : task_(task),
         largest_(hardware::LargestKruRatioPart(task.Which())),
         leaves_out_multiples_(task.Model().RisesWithSettings() && IsJitterAllKnown()),
         solver_(task, phases, all_met),
-        reach_(task, phases, all_met, !solver_.IsBestOnFront(), DividesOf(task), largest_) {
+        reach_(task, phases, {.all_met = all_met, .with_ties = !solver_.IsBestOnFront(), .most = most},
+               DividesOf(task), largest_) {
     for (const bool feedback : {false, true}) {
       if (task.IsSp() ? task.Asked().feedback && !feedback : feedback) continue;
       for (const bool divide_by_2 : {false, true}) {
@@ -177,12 +178,15 @@ Found ResultOf(const Walk& walk) {
 
 }  // namespace
 
-Found SearchKru(const Request& request, const Device& device, Primitive primitive, Depth depth) {
-  const KruTask task(request, device, primitive);
+Found SearchKru(const Request& request, const Device& device, Primitive primitive,
+                const Aim& aim) {
+  KruTask task(request, device, primitive);
   KruPhases phases(task);
-  Found found = ResultOf(Walk(task, &phases, true));
-  if (!found.best.empty() || depth == Depth::kMet) return found;
-  return ResultOf(Walk(task, &phases, false));
+  Found found = ResultOf(Walk(task, &phases, true, std::nullopt));
+  if (!found.best.empty() || aim.met_alone) return found;
+  std::optional<KruError> most;
+  if (aim.worst_error) most = task.JustAbove(*aim.worst_error);
+  return ResultOf(Walk(task, &phases, false, most));
 }
 
 }  // namespace planner::search

@@ -13,7 +13,7 @@
 
 namespace planner::search {
 
-Found SearchKru(const Request& request, const Device& device, Primitive primitive, Depth depth);
+Found SearchKru(const Request& request, const Device& device, Primitive primitive, const Aim& aim);
 
 }  // namespace planner::search
 

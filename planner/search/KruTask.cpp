@@ -151,12 +151,20 @@ KruError KruTask::JitterError(std::size_t place, double jitter) const {
           .jitter = jitter};
 }
 
+KruError KruTask::JustAbove(const Rational& error) {
+  constexpr std::int64_t kFine = 1 << 30;
+  given_ = error * Rational(kFine + 1, kFine) + Rational(1, kFine);
+  return {.near = Rounded(given_.ToDouble()), .demand = KruError::Demand::kGiven};
+}
+
 Rational KruTask::Exact(const KruError& error) const {
   const KruOutput& output = outputs_[error.output];
   const Output& asked = output.Asked();
   switch (error.demand) {
     case KruError::Demand::kNone:
       return 0;
+    case KruError::Demand::kGiven:
+      return given_;
     case KruError::Demand::kFrequency:
       return output.Frequency().Ppm(error.a, error.b) /
              answer::FrequencyUnit(request_.ToleranceOf(asked));

@@ -50,12 +50,12 @@ KruRatio RatioOf(PinSource source, const KruBase& base);
 
 // An error of an output, |error| / unit, with all that it takes to work it out again exactly.
 struct KruError {
-  enum class Demand : std::uint8_t { kNone, kFrequency, kPhase, kDuty, kJitter };
+  enum class Demand : std::uint8_t { kNone, kFrequency, kPhase, kDuty, kJitter, kGiven };
   Near near;
   Demand demand = Demand::kNone;
   std::uint8_t output = 0;  // the place among the used ones
   // kFrequency: the ratio to the input. kPhase: the quarter of the pin, and PHASE_SHIFT. kDuty:
-  // whether the pin is that of the divider, and its divide in halves.
+  // whether the pin is that of the divider, and its divide in halves. kGiven: KruTask has it.
   std::int32_t a = 0;
   std::int32_t b = 0;
   double jitter = 0;  // kJitter
@@ -152,6 +152,8 @@ class KruTask {
   KruError PhaseError(std::size_t place, int quarter, int shift) const;
   KruError DutyError(std::size_t place, PinSource source, int divide_halves) const;
   KruError JitterError(std::size_t place, double jitter) const;
+  // Something just above an error that comes from elsewhere. There is one at a time.
+  KruError JustAbove(const Rational& error);
 
   Rational Exact(const KruError& error) const;
   std::strong_ordering Compare(const KruError& a, const KruError& b) const;
@@ -172,6 +174,7 @@ class KruTask {
   bool asks_for_phase_ = false;
   bool is_jitter_all_known_ = false;
   answer::KruJitter jitter_;
+  Rational given_ = 0;
 };
 
 }  // namespace planner::search

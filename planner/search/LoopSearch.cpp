@@ -58,9 +58,10 @@ class LoopSearch {
     MakeGroups(primitive);
   }
 
-  Found Run(Depth depth) {
+  Found Run(const Aim& aim) {
     for (Group& group : groups_) TakeAllMet(&group);
-    if (depth == Depth::kMet) return Result();
+    if (aim.met_alone) return Result();
+    if (aim.worst_error) most_ = Rounded(aim.worst_error->ToDouble());
     bool some_met = false;
     for (const Best& best : bests_) some_met = some_met || best.is_met;
     for (Group& group : groups_) TakeNearest(&group, !some_met);
@@ -185,11 +186,10 @@ class LoopSearch {
     const double ratio = static_cast<double>(m) / d;
     const double key = ratio / d;
     const LoopError* const bound = bounds->BoundOf(key);
-    if (bound != nullptr) {
-      const double most = bound->near.value + bound->near.slack;
-      for (const LoopDividers& output : outputs_) {
-        if (output.LeastError(kind, ratio) > most) return;
-      }
+    double most = most_.value + most_.slack;
+    if (bound != nullptr) most = std::min(most, bound->near.value + bound->near.slack);
+    for (const LoopDividers& output : outputs_) {
+      if (output.LeastError(kind, ratio) > most) return;
     }
     LoopPoint point;
     ++counts_.judged;
@@ -264,6 +264,7 @@ class LoopSearch {
   std::vector<LoopDividers> outputs_;
   answer::LoopJitter jitter_;
   LoopRanking ranking_;
+  Near most_ = {HUGE_VAL, 0};  // the largest worst error that is of use
   std::vector<Best> bests_;
   std::vector<Group> groups_;
   TradeOffs<LoopEntry> front_;
@@ -272,8 +273,9 @@ class LoopSearch {
 
 }  // namespace
 
-Found SearchLoop(const Request& request, const Device& device, Primitive primitive, Depth depth) {
-  return LoopSearch(request, device, primitive).Run(depth);
+Found SearchLoop(const Request& request, const Device& device, Primitive primitive,
+                 const Aim& aim) {
+  return LoopSearch(request, device, primitive).Run(aim);
 }
 
 }  // namespace planner::search

@@ -14,7 +14,7 @@
 
 namespace planner::search {
 
-Found SearchLoop(const Request& request, const Device& device, Primitive primitive, Depth depth);
+Found SearchLoop(const Request& request, const Device& device, Primitive primitive, const Aim& aim);
 
 }  // namespace planner::search
 

@@ -8,11 +8,11 @@
 
 namespace planner::search {
 
-Found Search(const Request& request, const Device& device, Primitive primitive, Depth depth) {
+Found Search(const Request& request, const Device& device, Primitive primitive, const Aim& aim) {
   if (!device.Has(primitive) || !answer::Refusals(request, primitive).empty()) return {};
   const auto search = hardware::IsLoop(primitive) ? SearchLoop : SearchKru;
-  if (request.input_tolerance == 0) return search(request, device, primitive, depth);
-  return search(request, answer::Narrowed(device, request.input_tolerance), primitive, depth);
+  if (request.input_tolerance == 0) return search(request, device, primitive, aim);
+  return search(request, answer::Narrowed(device, request.input_tolerance), primitive, aim);
 }
 
 }  // namespace planner::search

@@ -68,17 +68,20 @@ struct Found {
   bool complete = true;
 };
 
-// Whether to look for what comes nearest, too, where nothing meets all demands.
-enum class Depth {
-  kAll,
-  kMet,  // no: `best` and `front` have only what meets all demands
+// What a search is for.
+struct Aim {
+  // Only what meets all demands: `best` and `front` have nothing else.
+  bool met_alone = false;
+  // Of what does not meet all demands, nothing with a larger worst error than this is of use: it
+  // may be found or not. Nothing: all is.
+  std::optional<Rational> worst_error = {};
 };
 
 // The best settings of a primitive of the device, and the trade-offs. Empty when no setting keeps
 // the limits, and when the request has more inputs or outputs than the primitive. The request is
 // as Request.h says; its `primitive`, `any_order` and `engine_only` change nothing here.
 Found Search(const Request& request, const Device& device, Primitive primitive,
-             Depth depth = Depth::kAll);
+             const Aim& aim = {});
 
 }  // namespace planner::search
 
