@@ -1,4 +1,4 @@
-// Tested by hdl.test.
+// Tested by instance_test.cpp and hdl.test.
 #include "planner/hdl/Instance.h"
 
 #include <limits>

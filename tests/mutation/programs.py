@@ -50,7 +50,8 @@ TABLE = (
     ("planner/device/", Programs(("planner_device_test",))),
     ("planner/engine/", Programs(("planner_engine_test", "planner_plan_test"))),
     ("planner/explain/", Programs(("planner_explain_test",))),
-    ("planner/hdl/", Programs((), ("tests/hdl/hdl.test", "tests/hdl/names.test"), ("vorkel",))),
+    ("planner/hdl/", Programs(
+        ("planner_hdl_test",), ("tests/hdl/hdl.test", "tests/hdl/names.test"), ("vorkel",))),
     ("planner/plan/", Programs(("planner_plan_test", "planner_explain_test"))),
     ("planner/reach/", Programs(("planner_reach_test",))),
     ("planner/read/", Programs(("planner_read_test",))),
