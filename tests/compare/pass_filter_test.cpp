@@ -7,9 +7,11 @@
 
 #include <gtest/gtest.h>
 
+#include <cstdio>
 #include <cstdlib>
 
 #include "engine/pll/Fudges.h"
+#include "engine/pll/OutputDividers.h"
 #include "tests/compare/PllPair.h"
 #include "tests/engine/EngineTest.h"
 #include "tests/plain/plain_lists.h"
@@ -112,13 +114,15 @@ TEST(PassFilter, FindsTheOnlyFudgesOfAnExample) {
   for (int pass = 981; pass <= 1019; ++pass) EXPECT_EQ(filter.NextFrom(pass), pass);
 }
 
-// Prepares a run for a TSYN with a VCO of 600 to 1440 MHz, a PFD of 10 to 500 MHz and outputs of
-// 4.6875 to 800 MHz.
-Ip::VorkelImp& PrepareTsyn(const char* outFreqs, double inFreq2, const Ip::Pll::Run& run) {
-  const plain::PllLimits limits = {.vcoMin = 600, .vcoMax = 1440, .clkoutMin = 4.6875,
-                                   .clkoutMax = 800, .pfdMin = 10, .pfdMax = 500,
-                                   .clkoutMaxIo = 1000, .maxHighLowCount = 64, .vcoTarget = 1000,
-                                   .maxPfdLowB = 300};
+// A VCO of 600 to 1440 MHz, a PFD of 10 to 500 MHz and outputs of 4.6875 to 800 MHz.
+constexpr plain::PllLimits kTsynLimits = {.vcoMin = 600, .vcoMax = 1440, .clkoutMin = 4.6875,
+                                          .clkoutMax = 800, .pfdMin = 10, .pfdMax = 500,
+                                          .clkoutMaxIo = 1000, .maxHighLowCount = 64,
+                                          .vcoTarget = 1000, .maxPfdLowB = 300};
+
+// Prepares a run for a TSYN.
+Ip::VorkelImp& PrepareTsyn(const char* outFreqs, double inFreq2, const Ip::Pll::Run& run,
+                           const plain::PllLimits& limits = kTsynLimits) {
   PublishLimits(limits, plain::kPrimTsyn);
   Ip::VorkelImp& imp = engine_test::NewImp();
   imp.SetDevice(kComparedPart);
@@ -144,21 +148,76 @@ TEST(PassFilter, IsNotTakenInByWhatIsNearlyAMultiple) {
   EXPECT_LT(failed, 10);
 }
 
+bool IsHopeless(const char* outFreqs, double inFreq,
+                const plain::PllLimits& limits = kTsynLimits) {
+  const Ip::Trace trace(false);
+  const Ip::Pll::Run run = {inFreq, 2, plain::kPrimTsyn, trace};
+  return IsHopelessAtOnce(PrepareTsyn(outFreqs, 0.0, run, limits), run);
+}
+
 // Below the PFD range an input has no D. For 1100 MHz, 800 MHz are 27 percent too little, and for
 // 3.5 MHz, 4.6875 are 34 too much; for 900 MHz, 800 are 11 too little.
 TEST(PassFilter, TellsAtOnceWhatIsOutOfReach) {
-  const Ip::Trace trace(false);
-  const auto isHopeless = [&](const char* outFreqs, double inFreq) {
-    const Ip::Pll::Run run = {inFreq, 2, plain::kPrimTsyn, trace};
-    return IsHopelessAtOnce(PrepareTsyn(outFreqs, 0.0, run), run);
+  EXPECT_FALSE(IsHopeless("100 50", 100.0));
+  EXPECT_FALSE(IsHopeless("100 900", 100.0));
+  EXPECT_TRUE(IsHopeless("100 1100", 100.0));
+  EXPECT_TRUE(IsHopeless("100 3.5", 100.0));
+  EXPECT_TRUE(IsHopeless("100 50", 9.0));
+  EXPECT_TRUE(IsHopeless("1460 50", 100.0));
+  EXPECT_FALSE(IsHopeless("1440 50", 100.0));
+}
+
+// Fudges go from -11 to 11 MHz: 1451 MHz becomes 1440, and -11 can become 0 at most.
+TEST(PassFilter, TellsAtOnceWhatNoFudgeBringsIntoTheRange) {
+  EXPECT_FALSE(IsHopeless("1451 50", 100.0));
+  EXPECT_TRUE(IsHopeless("1451.5 50", 100.0));
+  EXPECT_FALSE(IsHopeless("-10.5 50", 100.0));
+  EXPECT_TRUE(IsHopeless("-11.5 50", 100.0));
+}
+
+// Of a second output that is not above 0 nothing is told at once, and of a slow one the same as of
+// others: a VCO of 20 MHz divided by 128 is 0.15625 MHz, which is 56 percent more than 0.1 and 12
+// more than 0.14.
+TEST(PassFilter, TellsNothingAtOnceOfWhatIsNotAboveZero) {
+  EXPECT_FALSE(IsHopeless("100 0", 100.0));
+  EXPECT_FALSE(IsHopeless("100 -5", 100.0));
+  EXPECT_TRUE(IsHopeless("100 0.5", 100.0));
+  plain::PllLimits slow = kTsynLimits;
+  slow.vcoMin = 20;
+  slow.vcoMax = 60;
+  slow.clkoutMin = 0.1;
+  EXPECT_TRUE(IsHopeless("10 0.1", 10.0, slow));
+  EXPECT_FALSE(IsHopeless("10 0.14", 10.0, slow));
+}
+
+// An input and a VCO that are both below 0 can have an M and a D; else they cannot. Below 0 a range
+// of M is none but where it is a single one.
+TEST(PassFilter, TellsNothingAtOnceBelowZero) {
+  plain::PllLimits limits = kTsynLimits;
+  const auto isHopeless = [&](double vco, double inFreq) {
+    limits.vcoMin = limits.vcoMax = vco;
+    return IsHopeless("100 50", inFreq, limits);
   };
-  EXPECT_FALSE(isHopeless("100 50", 100.0));
-  EXPECT_FALSE(isHopeless("100 900", 100.0));
-  EXPECT_TRUE(isHopeless("100 1100", 100.0));
-  EXPECT_TRUE(isHopeless("100 3.5", 100.0));
-  EXPECT_TRUE(isHopeless("100 50", 9.0));
-  EXPECT_TRUE(isHopeless("1460 50", 100.0));
-  EXPECT_FALSE(isHopeless("1440 50", 100.0));
+  EXPECT_FALSE(isHopeless(-600, -100.0));
+  EXPECT_TRUE(isHopeless(600, -100.0));
+  EXPECT_TRUE(isHopeless(0, -100.0));
+  limits.vcoMin = -600;
+  limits.vcoMax = 1440;
+  EXPECT_FALSE(IsHopeless("100 50", 100.0, limits));
+  EXPECT_TRUE(IsHopeless("100 50", 0.5, limits));
+}
+
+// 800 MHz are the highest output. Beyond the widest tolerance of them, rounding may still bring
+// what is a billionth or two off.
+TEST(PassFilter, LeavesRoundingAMargin) {
+  const double highest = 800.0 / (1.0 - Ip::Pll::Tolerance(Ip::Pll::kTolerances - 1));
+  const auto isHopeless = [&](double beyond) {
+    char outFreqs[40];
+    std::snprintf(outFreqs, sizeof outFreqs, "100 %.17g", highest * (1.0 + beyond));
+    return IsHopeless(outFreqs, 100.0);
+  };
+  EXPECT_FALSE(isHopeless(1.5e-9));
+  EXPECT_TRUE(isHopeless(3e-9));
 }
 
 class PassFilterProperty : public testing::TestWithParam<Kind> {};
