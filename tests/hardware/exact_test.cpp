@@ -66,6 +66,7 @@ TEST(Rational, HasTheLeastWordToo) {
   EXPECT_EQ(-(-least), least);
   EXPECT_EQ((Rational(1) / least).DenominatorText(), "9223372036854775808");
   EXPECT_EQ(Rational(kLeast, kLeast), Rational(1));
+  EXPECT_EQ(Rational(1, kLeast), Rational(1) / least);
   EXPECT_EQ(least.Absolute() - 1, Rational(kMost));
 }
 
