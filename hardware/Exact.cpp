@@ -222,8 +222,12 @@ std::optional<Rational::Words> Rational::InWords() const {
   return Words{numerator_, denominator_};
 }
 
-std::string Rational::NumeratorText() const { return Widened().numerator.str(); }
-std::string Rational::DenominatorText() const { return Widened().denominator.str(); }
+std::string Rational::NumeratorText() const {
+  return large_ ? large_->numerator.str() : std::to_string(numerator_);
+}
+std::string Rational::DenominatorText() const {
+  return large_ ? large_->denominator.str() : std::to_string(denominator_);
+}
 
 Rational Rational::Floor() const {
   if (!large_) {
@@ -265,11 +269,28 @@ double Rational::ToDouble() const {
   return is_negative ? -result : result;
 }
 
+// The absolute value in units of the last of some decimals, rounded; nothing when it does not fit.
+std::optional<std::uint64_t> Rational::InUnits(int decimals) const {
+  constexpr int kMost = 18;  // so that 2 x 2^63 x 10^18 fits into Wide
+  if (decimals > kMost) return std::nullopt;
+  Wide scaled = numerator_ < 0 ? -Wide{numerator_} : Wide{numerator_};
+  for (int i = 0; i < decimals; ++i) scaled *= 10;
+  const Wide units = (scaled * 2 + denominator_) / (Wide{denominator_} * 2);
+  if (units > std::numeric_limits<std::uint64_t>::max()) return std::nullopt;
+  return static_cast<std::uint64_t>(units);
+}
+
 std::string Rational::Fixed(int decimals) const {
-  const Large value = Widened();
-  const bool is_negative = value.numerator < 0;
-  const Integer scaled = mp::abs(value.numerator) * Power(decimals) * 2 + value.denominator;
-  std::string digits = Integer(scaled / (value.denominator * 2)).str();
+  bool is_negative = numerator_ < 0;
+  std::string digits;
+  if (const std::optional<std::uint64_t> short_one = large_ ? std::nullopt : InUnits(decimals)) {
+    digits = std::to_string(*short_one);
+  } else {
+    const Large value = Widened();
+    is_negative = value.numerator < 0;
+    const Integer scaled = mp::abs(value.numerator) * Power(decimals) * 2 + value.denominator;
+    digits = Integer(scaled / (value.denominator * 2)).str();
+  }
   const auto places = static_cast<std::size_t>(decimals);
   if (digits.size() <= places) digits.insert(0, places + 1 - digits.size(), '0');
   const bool is_zero = digits.find_first_not_of('0') == std::string::npos;

@@ -84,6 +84,7 @@ class Rational {
   // Reduces, and keeps it small where it fits. Its denominator is not 0.
   explicit Rational(Large large);
   Large Widened() const;
+  std::optional<std::uint64_t> InUnits(int decimals) const;
 
   std::int64_t numerator_ = 0;
   std::int64_t denominator_ = 1;

@@ -128,7 +128,7 @@ void AddWritten(ordered_json* object, const char* name, const std::optional<Rati
 ordered_json RequestedOutput(const Output& output) {
   // As the readers of requests have it.
   if (!output.used) return "-";
-  ordered_json data = ordered_json::object();
+  ordered_json data = ObjectOf(8);
   data["frequency"] = WrittenNumber(output.frequency);
   if (!output.asked) data["asked"] = false;
   AddWritten(&data, "phase", output.phase);
@@ -149,7 +149,7 @@ void AddOfInputs(ordered_json* data, const Request& request, const char* name,
 }
 
 ordered_json LoopData(const Request& request, const Answer& answer, const LoopSettings& settings) {
-  ordered_json data = ordered_json::object();
+  ordered_json data = ObjectOf(12);
   AddOfInputs(&data, request, "vco", answer.vco);
   AddOfInputs(&data, request, "pfd", answer.pfd);
   if (settings.m % hardware::kEighths == 0) {
@@ -164,7 +164,7 @@ ordered_json LoopData(const Request& request, const Answer& answer, const LoopSe
 
 ordered_json KruData(const Request& request, const Answer& answer, const KruSettings& settings) {
   const bool is_sp = settings.primitive == Primitive::kKruSp;
-  ordered_json data = ordered_json::object();
+  ordered_json data = ObjectOf(9);
   if (is_sp) {
     data["feedback"] = settings.feedback;
     data["clkin_divide_by_2"] = settings.divide_by_2;
@@ -190,7 +190,7 @@ ordered_json LimitsData(const Device& device, const Answer& answer) {
   const auto* loop = std::get_if<LoopSettings>(&answer.settings);
   if (loop == nullptr) return nullptr;
   const LoopLimits& limits = device.Loop(loop->primitive);
-  ordered_json data = ordered_json::object();
+  ordered_json data = ObjectOf(8);
   data["vco"] = RangeData(limits.vco);
   AddExact(&data, "vco_margin", answer.vco_margin);
   data["pfd"] = RangeData(limits.PfdOf(loop->bandwidth));
@@ -226,7 +226,7 @@ void AddPlace(ordered_json* data, const Settings& settings, std::size_t index) {
 ordered_json OutputData(const Request& request, const Device& device, const Answer& answer,
                         std::size_t index) {
   const OutputAnswer& output = answer.outputs[index];
-  ordered_json data = ordered_json::object();
+  ordered_json data = ObjectOf(36);
   data["index"] = index;
   data["used"] = output.used;
   if (!output.used) return data;
@@ -260,7 +260,7 @@ ordered_json OutputData(const Request& request, const Device& device, const Answ
 
 // What the ranking goes by.
 ordered_json RankingData(const Answer& answer) {
-  ordered_json data = ordered_json::object();
+  ordered_json data = ObjectOf(8);
   data["class"] = answer.within ? "met" : answer.violations.empty() ? "missed" : "broken";
   AddExact(&data, "worst_error", answer.worst_error);
   data["max_jitter"] = OrNull(answer.max_jitter);
@@ -316,6 +316,12 @@ void AddSolved(ordered_json* data, const Request& request, const Device& device,
 
 }  // namespace
 
+ordered_json ObjectOf(std::size_t members) {
+  ordered_json data = ordered_json::object();
+  data.get_ref<ordered_json::object_t&>().reserve(members);
+  return data;
+}
+
 void AddExact(ordered_json* object, const string& name, const Rational& value) {
   (*object)[name] = value.ToDouble();
   (*object)[name + "_exact"] = Quotient(value);
@@ -333,14 +339,14 @@ ordered_json WrittenNumber(const Rational& value) {
 }
 
 ordered_json RangeData(const Range& range) {
-  ordered_json data = ordered_json::object();
+  ordered_json data = ObjectOf(4);
   AddExact(&data, "lowest", range.lowest);
   AddExact(&data, "highest", range.highest);
   return data;
 }
 
 ordered_json RequestData(const Request& request, const Device& device) {
-  ordered_json data = ordered_json::object();
+  ordered_json data = ObjectOf(16);
   data["device"] = device.part;
   if (request.primitive) data["primitive"] = Name(*request.primitive);
   data["inputs"] = ordered_json::array();
@@ -364,7 +370,7 @@ ordered_json RequestData(const Request& request, const Device& device) {
 }
 
 ordered_json FindingData(const Finding& finding, const Device& device, const Answer* answer) {
-  ordered_json data = ordered_json::object();
+  ordered_json data = ObjectOf(17);
   data["kind"] = KindName(finding.kind);
   data["primitive"] =
       finding.primitive ? ordered_json(Name(*finding.primitive)) : ordered_json(nullptr);
@@ -384,17 +390,16 @@ ordered_json FindingData(const Finding& finding, const Device& device, const Ans
   return data;
 }
 
-ordered_json AnswerData(const Request& request, const Device& device, const Answer& answer) {
-  ordered_json data = ordered_json::object();
-  data["primitive"] = Name(answer.primitive);
-  data["source"] = SourceName(answer);
-  data["variant"] = answer.source.variant;
-  data["solved"] = answer.solved;
-  data["within"] = answer.within;
-  data["reason"] = RefusalText(answer, device);
-  data["refusals"] = FindingsData(answer.refusals, device, answer);
-  if (answer.solved) AddSolved(&data, request, device, answer);
-  return data;
+void AddAnswer(ordered_json* data, const Request& request, const Device& device,
+               const Answer& answer) {
+  (*data)["primitive"] = Name(answer.primitive);
+  (*data)["source"] = SourceName(answer);
+  (*data)["variant"] = answer.source.variant;
+  (*data)["solved"] = answer.solved;
+  (*data)["within"] = answer.within;
+  (*data)["reason"] = RefusalText(answer, device);
+  (*data)["refusals"] = FindingsData(answer.refusals, device, answer);
+  if (answer.solved) AddSolved(data, request, device, answer);
 }
 
 }  // namespace planner::report

@@ -2,6 +2,7 @@
 #ifndef VORKEL_PLANNER_REPORT_DATA_H_
 #define VORKEL_PLANNER_REPORT_DATA_H_
 
+#include <cstddef>
 #include <nlohmann/json_fwd.hpp>
 #include <string>
 
@@ -11,6 +12,9 @@
 #include "planner/Request.h"
 
 namespace planner::report {
+
+// An empty object with room for so many members: where it grows beyond, all that is in it is copied.
+nlohmann::ordered_json ObjectOf(std::size_t members);
 
 // A number as a double, and exactly under the name with "_exact" behind it.
 void AddExact(nlohmann::ordered_json* object, const std::string& name, const Rational& value);
@@ -30,9 +34,10 @@ nlohmann::ordered_json RequestData(const Request& request, const Device& device)
 nlohmann::ordered_json FindingData(const Finding& finding, const Device& device,
                                    const Answer* answer = nullptr);
 
-// An answer, without what it is there for.
-nlohmann::ordered_json AnswerData(const Request& request, const Device& device,
-                                  const Answer& answer);
+// Adds the members of an answer to an object, without what it is there for.
+inline constexpr std::size_t kMembersOfAnswer = 27;  // at most
+void AddAnswer(nlohmann::ordered_json* data, const Request& request, const Device& device,
+               const Answer& answer);
 
 }  // namespace planner::report
 

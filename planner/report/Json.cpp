@@ -30,10 +30,10 @@ ordered_json UnitsData() {
 }
 
 ordered_json EntryData(const Request& request, const Device& device, const Entry& entry) {
-  ordered_json data = ordered_json::object();
+  ordered_json data = ObjectOf(kMembersOfAnswer + 2);
   data["number"] = entry.number > 0 ? ordered_json(entry.number) : ordered_json(nullptr);
   data["tradeoff"] = entry.is_tradeoff;
-  data.update(AnswerData(request, device, *entry.answer));
+  AddAnswer(&data, request, device, *entry.answer);
   return data;
 }
 

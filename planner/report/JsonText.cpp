@@ -16,7 +16,7 @@ using nlohmann::ordered_json;
 // Only texts have letters beyond ASCII, and no control letter of ASCII but that of the last number
 // passes the library as it is.
 std::string JsonText(const ordered_json& data, int indent) {
-  const std::string text = data.dump(indent, ' ', false, ordered_json::error_handler_t::replace);
+  std::string text = data.dump(indent, ' ', false, ordered_json::error_handler_t::replace);
   constexpr char kLastOfAscii = 0x7f;
   std::string shown;
   std::size_t taken = 0;
@@ -33,7 +33,8 @@ std::string JsonText(const ordered_json& data, int indent) {
     }
     place += letter.size;
   }
-  return taken == 0 ? text : shown.append(text, taken);
+  if (taken == 0) return text;
+  return shown.append(text, taken);
 }
 
 }  // namespace planner::report

@@ -114,7 +114,8 @@ ordered_json Document(const Request& request, const Device& device, const Answer
   data["version"] = kRelationsVersion;
   data["units"] = UnitsData();
   data["request"] = RequestData(request, device);
-  data["answer"] = AnswerData(request, device, answer);
+  data["answer"] = ObjectOf(kMembersOfAnswer);
+  AddAnswer(&data["answer"], request, device, answer);
   data["rule"] = ordered_json::object();
   AddExactOrNull(&data["rule"], "gap", rule.gap);
   AddExactOrNull(&data["rule"], "share",
