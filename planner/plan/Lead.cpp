@@ -70,10 +70,10 @@ class Leading {
 };
 
 std::optional<Lead> FirstOf(const Request& request, const Device& device,
-                            const std::vector<Primitive>& primitives, bool met_alone) {
+                            const std::vector<Primitive>& primitives, search::Aim::Part part) {
   Leading leading(request);
   for (const Primitive primitive : primitives) {
-    const search::Aim aim{.met_alone = met_alone, .worst_error = leading.WorstError()};
+    const search::Aim aim{.part = part, .worst_error = leading.WorstError()};
     leading.Take({primitive, search::Search(request, device, primitive, aim)});
   }
   return leading.First(device);
@@ -85,8 +85,9 @@ std::optional<Lead> LeadOf(const Request& request, const Device& device,
                            const std::vector<Primitive>& primitives) {
   if (request.any_order || request.engine_only) return std::nullopt;
   if (request.rank != Rank::kJitter && request.rank != Rank::kError) return std::nullopt;
-  std::optional<Lead> met = FirstOf(request, device, primitives, true);
-  return met ? std::move(met) : FirstOf(request, device, primitives, false);
+  std::optional<Lead> met = FirstOf(request, device, primitives, search::Aim::Part::kMet);
+  if (met) return met;
+  return FirstOf(request, device, primitives, search::Aim::Part::kNearest);
 }
 
 }  // namespace planner::plan

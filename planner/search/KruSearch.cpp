@@ -182,8 +182,10 @@ Found SearchKru(const Request& request, const Device& device, Primitive primitiv
                 const Aim& aim) {
   KruTask task(request, device, primitive);
   KruPhases phases(task);
-  Found found = ResultOf(Walk(task, &phases, true, std::nullopt));
-  if (!found.best.empty() || aim.met_alone) return found;
+  if (aim.part != Aim::Part::kNearest) {
+    Found found = ResultOf(Walk(task, &phases, true, std::nullopt));
+    if (!found.best.empty() || aim.part == Aim::Part::kMet) return found;
+  }
   std::optional<KruError> most;
   if (aim.worst_error) most = task.JustAbove(*aim.worst_error);
   return ResultOf(Walk(task, &phases, false, most));

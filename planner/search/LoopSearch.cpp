@@ -59,8 +59,10 @@ class LoopSearch {
   }
 
   Found Run(const Aim& aim) {
-    for (Group& group : groups_) TakeAllMet(&group);
-    if (aim.met_alone) return Result();
+    if (aim.part != Aim::Part::kNearest) {
+      for (Group& group : groups_) TakeAllMet(&group);
+    }
+    if (aim.part == Aim::Part::kMet) return Result();
     if (aim.worst_error) most_ = Rounded(aim.worst_error->ToDouble());
     bool some_met = false;
     for (const Best& best : bests_) some_met = some_met || best.is_met;

@@ -70,8 +70,12 @@ struct Found {
 
 // What a search is for.
 struct Aim {
-  // Only what meets all demands: `best` and `front` have nothing else.
-  bool met_alone = false;
+  enum class Part {
+    kAll,
+    kMet,     // only what meets all demands: `best` and `front` have nothing else
+    kNearest  // what comes nearest: it is known that nothing meets all demands
+  };
+  Part part = Part::kAll;
   // Of what does not meet all demands, nothing with a larger worst error than this is of use: it
   // may be found or not. Nothing: all is.
   std::optional<Rational> worst_error = {};
