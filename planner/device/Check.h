@@ -43,12 +43,14 @@ enum class DoubtKind {
                     // the least that settings make of `other`
   kNotWhole,        // `keyword` counts VCO periods and is not whole
   kFewDividers,     // `keyword` lets no divider be above `bound`
+  kLongSearch,      // `keyword`, an end of the range of VCOs, is so far beyond `bound` that calls
+                    // of the engine can take longer than usual
 };
 
 // The range that is empty, or has an end that nothing reaches.
 enum class RangeOf { kNone, kVco, kPfd, kPfdLow, kOutput, kOutput1, kPeriod };
 
-// Limits that cannot be meant. The same one of several grades is one.
+// Limits that cannot be meant, or that are odd. The same one of several grades is one.
 struct Doubt {
   DoubtKind kind;
   RangeOf range = RangeOf::kNone;

@@ -1,4 +1,4 @@
-// Limits that cannot be meant.
+// Limits that cannot be meant, or over which the engine searches long.
 //
 // Tested by check_test.cpp.
 #include <algorithm>
@@ -71,6 +71,15 @@ constexpr std::string_view kCount = "O_MAX_HT_LT";
 // A PFD or an output can well have a highest frequency above that of the VCO: what limits it is
 // something else. From so many times that on it cannot be meant.
 constexpr int kFarAbove = 10;
+
+// Between these, in MHz, no call of the engine takes longer than 10 ms (tests/work/work_test.cpp).
+//
+// A slow VCO has a slow output 0. Shifts of that, which are up to 11 MHz, then bring it to many of
+// its dividers, of which a TSYN has a thousand; a PLL has too few for it to matter. And on a fast
+// VCO the shifts are so small that all of them leave the same M and D: where what they make is
+// refused for its phases, it is refused for each of 22000.
+constexpr int kSlowTsynVco = 300;
+constexpr int kFastVco = 5000;
 
 // Works out what is doubtful about one grade.
 class Finder {
@@ -163,8 +172,19 @@ class Finder {
     const Limit& vco_min = *grade_.Find(loop.vco_min);
     const Limit& vco_max = *grade_.Find(loop.vco_max);
     if (vco_min.value > vco_max.value) return;
+    CheckSearch(loop, vco_min, vco_max);
     CompareVcoAndPfd(loop, vco_min, vco_max);
     CompareVcoAndOutputs(loop, vco_min, vco_max);
+  }
+
+  void CheckSearch(const LoopKeywords& loop, const Limit& vco_min, const Limit& vco_max) {
+    const Rational slow = loop.primitive == Primitive::kTsyn ? kSlowTsynVco : 0;
+    if (vco_min.value < slow) AddLongSearch(vco_min, slow);
+    if (vco_max.value > Rational(kFastVco)) AddLongSearch(vco_max, kFastVco);
+  }
+
+  void AddLongSearch(const Limit& limit, const Rational& bound) {
+    Add(DoubtKind::kLongSearch, RangeOf::kVco, limit, nullptr).bound = bound;
   }
 
   void CompareVcoAndPfd(const LoopKeywords& loop, const Limit& vco_min, const Limit& vco_max) {

@@ -57,6 +57,17 @@ string FewDividers(const device::Doubt& doubt) {
          std::to_string(hardware::kLargestDivider) + " all the same";
 }
 
+string LongSearch(const device::Doubt& doubt) {
+  const bool is_slow = doubt.value < doubt.bound;
+  string text = KeywordWords(doubt) + (is_slow ? ", is below " : ", is above ");
+  text += Short(doubt.bound, 0) + " MHz: ";
+  text += is_slow ? "so slow a VCO has many dividers for an output 0 that is shifted"
+                  : "so fast a VCO makes nothing else of an output 0 that is shifted, and no other "
+                    "phases";
+  return text + "; a call of the engine that finds nothing can take longer than 10 ms" +
+         (is_slow ? "" : ", and some seconds");
+}
+
 }  // namespace
 
 string NothingWords(const device::Doubt& doubt) {
@@ -79,9 +90,11 @@ string DoubtText(const device::Doubt& doubt) {
     case DoubtKind::kNotWhole:
       return KeywordWords(doubt) + ", is a count of VCO cycles and should be a whole number";
     case DoubtKind::kFewDividers:
+      return FewDividers(doubt);
+    case DoubtKind::kLongSearch:
       break;
   }
-  return FewDividers(doubt);
+  return LongSearch(doubt);
 }
 
 string GradesWords(const device::Doubt& doubt) {

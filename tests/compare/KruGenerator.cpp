@@ -32,6 +32,13 @@ std::string Frequency(double value, Random& random) {
   return Number(formats[random.Int(0, 2)], value);
 }
 
+// `frequency` times M / D, with an M from `low` to `high` and a D up to `largestD`. Two statements,
+// since compilers work out the operands of an expression in orders of their own.
+double TimesQuotient(double frequency, int low, int high, int largestD, Random& random) {
+  const double multiple = frequency * random.Int(low, high);
+  return multiple / random.Int(1, largestD);
+}
+
 // A frequency for which one of the cases of the pin assignment is made.
 double DrawFrequency(double inFreq, double fx, Random& random) {
   switch (random.Int(0, 9)) {
@@ -43,7 +50,7 @@ double DrawFrequency(double inFreq, double fx, Random& random) {
     case 5: return inFreq / 2 / (0.5 * random.Int(3, 36));  // CLKDV of the halved input
     case 6:
     case 7: return fx;
-    case 8: return inFreq * random.Int(2, 32) / random.Int(1, 32);
+    case 8: return TimesQuotient(inFreq, 2, 32, 32, random);
     default: return random.Real(1, 400);
   }
 }
@@ -56,7 +63,7 @@ double DrawPhase(double offset, Random& random) {
 void DrawOutputs(KruCase& drawn, Random& random) {
   plain::KruRequest& request = drawn.request;
   request.numOut = random.Int(1, 6);
-  const double fx = request.inFreq * random.Int(2, 12) / random.Int(1, 10);
+  const double fx = TimesQuotient(request.inFreq, 2, 12, 10, random);
   const std::vector<double> offsets = {0, 0, 0, 0, 45, 10, 22.5, 89, 88.5, -1, -30};
   const double offset = random.Pick(offsets);
   const bool onlyHalfTurns = random.OneIn(2);
@@ -85,7 +92,7 @@ void DrawLimits(KruCase& drawn, Random& random) {
     drawn.periods[i] = random.OneIn(3) ? usual[i] * random.Real(0.5, 2) : usual[i];
   }
   for (int k = random.Int(0, 3); k > 0; --k) {
-    const double at = drawn.request.inFreq * random.Int(1, 4) / random.Int(1, 4);
+    const double at = TimesQuotient(drawn.request.inFreq, 1, 4, 4, random);
     const int limit = random.Int(0, 12);
     drawn.periods[static_cast<std::size_t>(limit)] = 1000.0 / at;
   }

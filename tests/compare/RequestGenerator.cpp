@@ -194,7 +194,8 @@ Case DrawMeetingEnds(Random& random) {
   for (int k = random.Int(1, 200); k > 0; --k) fudge += 0.001;
   if (random.OneIn(2)) fudge = 0.0 - fudge;
   const double vco = (fudge + f0) * random.Int(2, 20);
-  request.inFreq = vco * random.Int(1, 8) / random.Int(5, 64);
+  request.inFreq = vco * random.Int(1, 8);
+  request.inFreq /= random.Int(5, 64);
   limits.pfdMin = 1;
   limits.pfdMax = limits.maxPfdLowB = limits.clkoutMaxIo = 10000;
   limits.vcoMin = random.OneIn(3) ? vco : std::min(limits.vcoMin, 0.8 * vco);
@@ -232,8 +233,9 @@ Case DrawRoundFigures(Random& random) {
   drawn.request.count = random.Int(2, 5);
   drawn.request.inFreq = random.Pick(kInputs);
   const double shift = 0.001 * random.Int(1, random.OneIn(2) ? 10 : 1500);
+  const double unshifted = random.Pick(round);
   std::vector<std::string> outputs = {
-      Number("%.3f", random.Pick(round) + (random.OneIn(2) ? shift : -shift))};
+      Number("%.3f", random.OneIn(2) ? unshifted + shift : unshifted - shift)};
   for (int n = 1; n < drawn.request.count; ++n) outputs.push_back(Number("%g", random.Pick(round)));
   drawn.request.outFreqs = Join(outputs);
   DrawPhasesAndDutyCycles(drawn.request, random);

@@ -20,6 +20,7 @@ constexpr const char* kPins[] = {"CLK0",     "CLK90", "CLK180", "CLK270",  "CLK2
 constexpr const char* kBandwidths[] = {"LOW", "OPTIMIZED", "HIGH"};
 constexpr double kDvs[] = {0, 2, 2.5, 3, 7.5, 9, 16};
 
+// Compilers work out the arguments of a call in orders of their own, so each draw is a statement.
 class Queries {
  public:
   Queries(const std::string& part, std::uint64_t seed) : random_(seed), imp_(nullptr) {
@@ -36,11 +37,14 @@ class Queries {
   // A TSYN or a PLL for two outputs, with what it has chosen.
   void Choose() {
     input_ = random_.Real(10, 300);
-    const std::string outputs = compare::Number("%.17g", random_.Real(5, 400)) + " " +
-                                compare::Number("%.17g", random_.Real(5, 400));
+    std::string outputs = compare::Number("%.17g", random_.Real(5, 400));
+    outputs += " ";
+    outputs += compare::Number("%.17g", random_.Real(5, 400));
     const int prim = random_.Int(0, 1);
+    const bool prefer_max_vco = random_.OneIn(2);
+    const bool whole_dividers = random_.OneIn(2);
     const int code = imp_.GetClosestSolution(outputs.c_str(), "45 90", "50 40", input_, 0, 2,
-                                             random_.OneIn(2), random_.OneIn(2), prim, false);
+                                             prefer_max_vco, whole_dividers, prim, false);
     std::printf("chosen");
     Print(prim);
     Print(code);
@@ -81,14 +85,15 @@ class Queries {
     PrintQuery("vco", answered, error, figure);
     double phase = 0;
     double duty = 0;
-    answered = imp_.GetPLLPeriodPhaseDutyCycle(input_, m, d, o, random_.Real(-360, 360),
-                                               random_.Real(0, 100), 0, &error, &figure, &phase,
-                                               &duty);
+    double asked_phase = random_.Real(-360, 360);
+    double asked_duty = random_.Real(0, 100);
+    answered = imp_.GetPLLPeriodPhaseDutyCycle(input_, m, d, o, asked_phase, asked_duty, 0, &error,
+                                               &figure, &phase, &duty);
     PrintQuery("period", answered, error, figure);
     Print(phase);
     Print(duty);
-    const double asked_phase = random_.Real(-360, 360);
-    const double asked_duty = random_.Real(0, 100);
+    asked_phase = random_.Real(-360, 360);
+    asked_duty = random_.Real(0, 100);
     Print(imp_.TSYNCalculateActualPhase(&asked_phase, &o, false));
     Print(imp_.TSYNCalculateActualDutyCycle(&asked_duty, &o));
     std::printf("\n");
@@ -100,16 +105,20 @@ class Queries {
     const double d = random_.Int(1, 32);
     double figure = 0;
     Port::StringBase error;
-    bool answered =
-        imp_.GetKruPkToPkJitter(input_, pin, random_.OneIn(4), random_.OneIn(4), random_.OneIn(2),
-                                random_.OneIn(4), m, d, &error, &figure);
+    const bool is_clkgen = random_.OneIn(4);
+    const bool first = random_.OneIn(4);
+    const bool second = random_.OneIn(2);
+    const bool third = random_.OneIn(4);
+    bool answered = imp_.GetKruPkToPkJitter(input_, pin, is_clkgen, first, second, third, m, d,
+                                            &error, &figure);
     PrintQuery("KRU jitter", answered, error, figure);
     answered = imp_.GetKRUPhaseError(&error, &figure);
     PrintQuery("KRU phase error", answered, error, figure);
     double phase = 0;
     double duty = 0;
-    answered = imp_.GetKRUPeriodPhaseDutyCycle(input_, pin, random_.OneIn(4), m, d,
-                                               kDvs[random_.Int(0, 6)], &error, &figure, &phase,
+    const bool flag = random_.OneIn(4);
+    const double dv = kDvs[random_.Int(0, 6)];
+    answered = imp_.GetKRUPeriodPhaseDutyCycle(input_, pin, flag, m, d, dv, &error, &figure, &phase,
                                                &duty);
     PrintQuery("KRU period", answered, error, figure);
     Print(phase);

@@ -80,7 +80,10 @@ TEST(Check, DoubtsNoGoodLimits) {
   EXPECT_THAT(CheckGrade(kClk0 + kClkgen).doubts, IsEmpty());
   // A range of one frequency is one, and so are limits that are just reached.
   EXPECT_THAT(CheckGrade(With(kPll, "MAX = 1000", "MAX = 400")).doubts, IsEmpty());
-  EXPECT_THAT(CheckGrade(With(kPll, "MAX = 1000", "MAX = 32000")).doubts, IsEmpty());
+  EXPECT_THAT(CheckGrade(With(With(kPll, "MAX = 1000", "MAX = 1280"), "PFD_FREQ_MAX = 500",
+                              "PFD_FREQ_MAX = 20"))
+                  .doubts,
+              IsEmpty());
   EXPECT_THAT(CheckGrade(With(kPll, "IOCLK = 1000", "IOCLK = 10000")).doubts, IsEmpty());
 }
 
@@ -155,7 +158,10 @@ TEST(Check, TellsATargetOutsideOfTheRange) {
 
 // M is at most 64: from a PFD of 500 MHz a VCO of 32000 MHz can be had.
 TEST(Check, TellsLimitsThatNothingReaches) {
-  Doubt doubt = TheDoubt(With(kPll, "MAX = 1000", "MAX = 1e300"));
+  const Checked endless = CheckGrade(With(kPll, "MAX = 1000", "MAX = 1e300"));
+  ASSERT_EQ(endless.doubts.size(), 2u);
+  EXPECT_EQ(endless.doubts[0].kind, DoubtKind::kLongSearch);
+  Doubt doubt = endless.doubts[1];
   EXPECT_EQ(doubt.kind, DoubtKind::kNeverReached);
   EXPECT_EQ(doubt.range, RangeOf::kVco);
   EXPECT_EQ(doubt.keyword, "VCOCLK_FREQ_MAX");
@@ -199,6 +205,28 @@ TEST(Check, TellsLimitsThatLeaveNothing) {
                         "CLKOUT_FREQ_MAX = 800", "CLKOUT_FREQ_MAX = 1400"));
   EXPECT_EQ(doubt.keyword, "TSYN_CLKOUT_FREQ_MIN");
   EXPECT_THAT(doubt.lost, ElementsAre(Primitive::kTsyn));
+}
+
+// A TSYN has eight times as many dividers for output 0 as a PLL, and a slow VCO makes use of them.
+TEST(Check, TellsVcosOverWhichSearchesAreLong) {
+  Doubt doubt = TheDoubt(With(kTsyn, "MIN = 600", "MIN = 299.9"));
+  EXPECT_EQ(doubt.kind, DoubtKind::kLongSearch);
+  EXPECT_EQ(doubt.keyword, "TSYN_VCOCLK_FREQ_MIN");
+  EXPECT_EQ(doubt.text, "299.9");
+  EXPECT_EQ(doubt.bound, Rational(300));
+  EXPECT_THAT(doubt.touched, ElementsAre(Primitive::kTsyn));
+  EXPECT_THAT(doubt.lost, IsEmpty());
+  EXPECT_THAT(CheckGrade(With(kTsyn, "MIN = 600", "MIN = 300")).doubts, IsEmpty());
+  EXPECT_THAT(CheckGrade(With(kPll, "MIN = 400", "MIN = 1")).doubts, IsEmpty());
+
+  for (const std::string& figures : {kPll, With(kTsyn, "MAX = 1200", "MAX = 1000")}) {
+    doubt = TheDoubt(With(figures, "VCOCLK_FREQ_MAX = 1000", "VCOCLK_FREQ_MAX = 5000.1"));
+    EXPECT_EQ(doubt.kind, DoubtKind::kLongSearch);
+    EXPECT_EQ(doubt.text, "5000.1");
+    EXPECT_EQ(doubt.bound, Rational(5000));
+    EXPECT_THAT(CheckGrade(With(figures, "VCOCLK_FREQ_MAX = 1000", "VCOCLK_FREQ_MAX = 5000"))
+                    .doubts, IsEmpty());
+  }
 }
 
 TEST(Check, TellsCountsThatAreNone) {

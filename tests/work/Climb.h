@@ -1,0 +1,28 @@
+// Looks for the requests that are most work for a device: climbs from drawn ones, and from some that
+// are known to be a lot of work, to ones that are more.
+#ifndef VORKEL_TESTS_WORK_CLIMB_H_
+#define VORKEL_TESTS_WORK_CLIMB_H_
+
+#include <cstdint>
+#include <string>
+
+#include "tests/compare/RequestGenerator.h"
+#include "tests/work/Device.h"
+
+namespace work {
+
+// The most that a climb has found, and the request for it.
+struct Summit {
+  std::uint64_t work = 0;
+  compare::Case drawn;
+};
+// Climbs are numbered; those with an even number begin at what is known.
+Summit Climb(const Device& device, int number, int steps);
+
+// The request with most work of those that ask for phases that nothing makes, so that whatever the
+// search finds is refused. All outputs are the same.
+Summit AskForNoPhase(const Device& device);
+
+}  // namespace work
+
+#endif  // VORKEL_TESTS_WORK_CLIMB_H_
