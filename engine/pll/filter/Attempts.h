@@ -43,37 +43,54 @@ class Attempts {
   double Slowest() const { return slowest_; }
   double Fastest() const { return fastest_; }
 
-  // The attempts with an output 0 from `low` to `high` MHz; those that may have it, and those that
-  // have it for certain. None when `first` is above `last`.
   struct Span {
     int first;
     int last;
     bool IsEmpty() const { return first > last; }
   };
-  struct Spans {
-    Span possible;
-    Span sure;
+  // The attempts with an output 0 from `low` to `high` MHz; those that may have it, and those that
+  // have it for certain. None when `first` is above `last`.
+  class Between {
+   public:
+    Between(const Attempts& attempts, double low, double high) : attempts_(attempts) {
+      const double a = (low - attempts.first_) * attempts.perMHz_;
+      const double b = (high - attempts.first_) * attempts.perMHz_;
+      begin_ = std::min(a, b);
+      end_ = std::max(a, b);
+    }
+    Span Possible() const {
+      return {attempts_.From(begin_ - attempts_.margin_), attempts_.UpTo(end_ + attempts_.margin_)};
+    }
+    Span Sure() const {
+      return {attempts_.From(begin_ + attempts_.margin_), attempts_.UpTo(end_ - attempts_.margin_)};
+    }
+
+   private:
+    const Attempts& attempts_;
+    double begin_;  // attempts
+    double end_;
   };
-  Spans Between(double low, double high) const {
-    const double a = (low - first_) * perMHz_;
-    const double b = (high - first_) * perMHz_;
-    const double begin = std::min(a, b);
-    const double end = std::max(a, b);
-    return {{From(begin - margin_), UpTo(end + margin_)},
-            {From(begin + margin_), UpTo(end - margin_)}};
+
+  // Whether the attempts that may have an output 0 of `frequency` MHz are any: as Between has them.
+  bool MayMeet(double frequency) const {
+    const double k = (frequency - first_) * perMHz_;
+    return UpTo(k + margin_) >= k - margin_;
   }
 
   // The first attempt for certain whose output 0 is below `frequency`, in downward attempts.
   int FirstBelow(double frequency) const { return From((frequency - first_) * perMHz_ + margin_); }
 
  private:
+  // The way down the ranking spends its time here: no jumps, and no call to round.
   int From(double k) const {
-    if (!(k > 0.0)) return 0;
-    return k < count_ ? static_cast<int>(std::ceil(k)) : count_;
+    const double most = count_;
+    const double inside = k > 0.0 ? (k < most ? k : most) : 0.0;
+    const int whole = static_cast<int>(inside);
+    return whole + (whole < inside ? 1 : 0);
   }
   int UpTo(double k) const {
-    if (!(k >= 0.0)) return -1;
-    return k < count_ ? static_cast<int>(k) : count_ - 1;
+    const double most = count_ - 1.0;
+    return static_cast<int>(k >= 0.0 ? (k < most ? k : most) : -1.0);
   }
 
   double requested_;

@@ -78,7 +78,14 @@ class PassFilter::Walk {
   void GoDown() {
     for (const RankedRange& range : filter_.ranking_) {
       if (!ComeTo(range.key)) return;
-      VisitSteps(range, [&](int step, const Attempts::Spans& spans) { Meet(range, step, spans); });
+      if (range.IsPoint()) {
+        // Most of the ranking are points, and hardly a step brings an attempt to one.
+        VisitSteps(range, [&](int step, double divider) {
+          if (attempts_.MayMeet(range.low / divider)) Meet(range, step, divider);
+        });
+      } else {
+        VisitSteps(range, [&](int step, double divider) { Meet(range, step, divider); });
+      }
     }
     ComeTo(kNothingLeft);
   }
@@ -101,23 +108,31 @@ class PassFilter::Walk {
     return !undecided_.IsEmpty();
   }
 
-  void Meet(const RankedRange& range, int step, const Attempts::Spans& spans) {
+  void Meet(const RankedRange& range, int step, double divider) {
+    const Attempts::Between met(attempts_, range.low / divider, range.high / divider);
+    const Attempts::Span possible = met.Possible();
+    if (possible.IsEmpty()) return;
     if (range.IsPoint()) {
-      LookAt(range, step, spans.possible);
-    } else if (range.kind == RankedRange::Kind::kAccepted) {
-      if (spans.sure.IsEmpty()) {
-        LookAt(range, step, spans.possible);
-      } else {
-        LookAt(range, step, {spans.possible.first, spans.sure.first - 1});
-        LookAt(range, step, {spans.sure.last + 1, spans.possible.last});
-        undecided_.EraseRange(spans.sure.first, spans.sure.last,
-                              [&](int attempt) { NoteMaybe(attempt, range.key); });
-      }
+      LookAt(range, step, possible);
     } else {
-      putOut_.InsertRange(spans.sure.first, spans.sure.last);
-      NoteWhatIsLeft(range, step, spans.sure);
+      MeetStretch(range, step, possible, met.Sure());
     }
-    if (next_ != nullptr) untouched_.EraseRange(spans.possible.first, spans.possible.last);
+    if (next_ != nullptr) untouched_.EraseRange(possible.first, possible.last);
+  }
+
+  void MeetStretch(const RankedRange& range, int step, const Attempts::Span& possible,
+                   const Attempts::Span& sure) {
+    if (range.kind != RankedRange::Kind::kAccepted) {
+      putOut_.InsertRange(sure.first, sure.last);
+      NoteWhatIsLeft(range, step, sure);
+    } else if (sure.IsEmpty()) {
+      LookAt(range, step, possible);
+    } else {
+      LookAt(range, step, {possible.first, sure.first - 1});
+      LookAt(range, step, {sure.last + 1, possible.last});
+      undecided_.EraseRange(sure.first, sure.last,
+                            [&](int attempt) { NoteMaybe(attempt, range.key); });
+    }
   }
 
   void NoteMaybe(int attempt, ToleranceKey key) {
@@ -172,16 +187,17 @@ class PassFilter::Walk {
     return first;
   }
 
-  // Visits the divider steps by which an attempt may come to the range, with the attempts that do.
+  // Visits the divider steps by which an attempt may come to the range.
   template <typename Visit>
   void VisitSteps(const RankedRange& range, Visit visit) const {
     const Div0Steps& steps = filter_.steps_;
     if (!(attempts_.Fastest() > 0.0)) return;  // no VCO frequency above 0
-    for (int step = steps.Below(range.low / attempts_.Fastest()); step < steps.Count(); ++step) {
-      const double divider = steps[step];
+    const int first = steps.Below(range.low / attempts_.Fastest());
+    double divider = steps[first];
+    for (int step = first; step < steps.Count(); ++step) {
       if (attempts_.Slowest() * divider > range.high) return;
-      const Attempts::Spans spans = attempts_.Between(range.low / divider, range.high / divider);
-      if (!spans.possible.IsEmpty()) visit(step, spans);
+      visit(step, divider);
+      divider = step == 0 ? 2.0 : divider + steps.Width();
     }
   }
 
