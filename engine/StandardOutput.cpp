@@ -58,10 +58,22 @@ int WhyNot(int descriptor) {
   return flags >= 0 && (flags & FD_CLOEXEC) != 0 ? kStandsForAnother : kWritten;
 }
 
-// A file that does not block takes what it can, and the rest when its reader has taken that.
+// How long a file that does not block may take nothing, ms. Its reader can be this very thread.
+constexpr int kPatience = 10'000;
+
+// A file that does not block takes what it can, and the rest when its reader has taken that. False
+// when nobody reads, or nobody can tell, with the reason in errno.
 bool WaitFor(int descriptor) {
   pollfd file = {descriptor, POLLOUT, 0};
-  return poll(&file, 1, -1) >= 0 || errno == EINTR;
+  const int ready = poll(&file, 1, kPatience);
+  if (ready == 0) errno = EAGAIN;
+  return ready > 0 || (ready < 0 && errno == EINTR);
+}
+
+// C gives up what such a file does not take at once.
+bool CanFlush(int descriptor) {
+  const int flags = fcntl(descriptor, F_GETFL);
+  return flags < 0 || (flags & O_NONBLOCK) == 0 || WaitFor(descriptor);
 }
 
 int WriteAll(int descriptor, std::string_view text) {
@@ -97,7 +109,7 @@ int WriteToStandardOutput(std::string_view text) {
   const int descriptor = fileno(stdout);
   if (descriptor >= 0) {
     if (const int why = WhyNot(descriptor); why != kWritten) return why;
-    if (std::fflush(stdout) != 0) return errno;
+    if (!CanFlush(descriptor) || std::fflush(stdout) != 0) return errno;
     return WriteAll(descriptor, text);
   }
   return WriteAsC(text);  // a stream in memory

@@ -19,7 +19,8 @@ inline constexpr int kWritten = 0;
 inline constexpr int kStandsForAnother = -1;  // the number is that of a file of somebody else's
 
 // Writes a text behind all that C has printed so far, and past its buffer, so that it is out when
-// this returns and no part of it stays behind to come out later. How it has got lost, or kWritten.
+// this returns and no part of it stays behind to come out later. How it has got lost, or kWritten:
+// a file that does not block and takes nothing for ten seconds gets no more.
 // Several threads can write: each text comes out whole.
 int WriteToStandardOutput(std::string_view text);
 

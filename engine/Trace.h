@@ -32,13 +32,15 @@ class Trace {
   // Prints a line; `format` and what follows are those of printf.
   [[gnu::format(printf, 2, 3)]] void Print(const char* format, ...) const;
 
+  // Writes the lines so far: before the host is asked for something, whose messages stand behind
+  // them.
+  void Write() const;
+
   // How lines of the last trace of this thread that was on have got lost; kWritten when none have.
   // See StandardOutput.h.
   static int LossOfLast();
 
  private:
-  void Write() const;
-
   mutable bool on_;
   mutable std::size_t used_ = 0;
   mutable std::array<char, 32768> block_;  // whole lines

@@ -22,6 +22,7 @@ ResultCode Solve(VorkelImp& imp, const Port::StringBase& outFreqs,
                  const Port::StringBase& phases, const Run& run) {
   if (!ParseRequest(imp, run.numOut, outFreqs, phases)) return kNoConfiguration;
   if (run.inFreq == 0.0) return kNoConfiguration;
+  run.trace.Write();
   if (!imp.LoadKruLimits()) return kNoSpeedData;
   TraceOutputRanges(imp.kruLimits, run.trace);
   if (!FindPhaseOffset(imp, run)) return kNoConfiguration;

@@ -1,17 +1,31 @@
 #include "engine/pll/VcoCandidate.h"
 
-#include <memory>
-
 namespace Ip::Pll {
+
+namespace {
+
+// Those of the thread. A plain pointer can be used until the thread is gone: a run may come at the
+// very end of the process, behind the end of all that has an end.
+constinit thread_local VcoCandidate* records = nullptr;
+
+// Frees them with the thread.
+struct Owner {
+  ~Owner() {
+    delete[] records;
+    records = nullptr;
+  }
+};
+
+}  // namespace
 
 // The records are left as they are until a slot is taken: those of slots that no run takes cost no
 // memory pages.
 VcoCandidate* VcoCandidateTable::RecordsOfThread() {
-  static constinit thread_local std::unique_ptr<VcoCandidate[]> records;
   if (records == nullptr) {
-    records.reset(new VcoCandidate[MAX_VCO_CANDIDATES]);  // libc++ 14 has no ..._for_overwrite
+    [[maybe_unused]] thread_local const Owner owner{};
+    records = new VcoCandidate[MAX_VCO_CANDIDATES];
   }
-  return records.get();
+  return records;
 }
 
 }  // namespace Ip::Pll

@@ -11,6 +11,7 @@ ResultCode PrepareVcoRange(VorkelImp& imp, const Port::StringBase& outFreqs, dou
                            const Run& run) {
   if (!imp.ParseOutFreqs(run.count, outFreqs)) return kBadRequest;
   if (run.inFreq == 0.0) return kBadRequest;
+  run.trace.Write();
   if (!imp.LoadPllLimits(run.prim)) return kNoSpeedData;
 
   PllState& pll = imp.pll;

@@ -562,6 +562,21 @@ TEST_F(PllDriverTest, TheAnswerStaysWhenItsThreadEnds) {
   EXPECT_EQ(imp_.GetChosenVCO(), 600.0);
 }
 
+// The object lives until the process ends, longer than what its thread has.
+TEST_F(PllDriverTest, RunsAtTheVeryEndOfTheProcess) {
+  static VorkelImp& imp = imp_;
+  static const auto runs = [](const char* outFreq, double vco) {
+    return imp.CalculateMinPowerOutFreqs(outFreq, 100, 0, 1, false, false, kPll, false) == 1 &&
+           imp.GetChosenVCO() == vco;
+  };
+  EXPECT_EXIT(
+      {
+        std::atexit([] { std::_Exit(runs("250", 500.0) ? 0 : 1); });
+        std::exit(runs("300", 600.0) ? 2 : 3);
+      },
+      testing::ExitedWithCode(0), "");
+}
+
 // What a script prints after a run must come after the trace of the run, so the trace is out
 // of the buffer of standard output when the call returns.
 TEST_F(PllDriverTest, TheTraceIsFlushedWhenTheCallReturns) {
