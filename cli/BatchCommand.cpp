@@ -139,7 +139,9 @@ class Input {
     struct stat status {};
     if (fstat(descriptor_, &status) != 0) return;
     if (S_ISDIR(status.st_mode)) Refuse("it is a directory");
-    if (S_ISREG(status.st_mode)) size_ = status.st_size;
+    if (!S_ISREG(status.st_mode)) return;
+    size_ = status.st_size;
+    file_ = {status.st_dev, status.st_ino};
   }
   ~Input() {
     if (descriptor_ != STDIN_FILENO) close(descriptor_);
@@ -148,6 +150,12 @@ class Input {
   Input& operator=(const Input&) = delete;
 
   int descriptor() const { return descriptor_; }
+  // Whether a name is that of the same file, perhaps by a link.
+  bool IsAt(const std::string& name) const {
+    struct stat status {};
+    return file_ && stat(name.c_str(), &status) == 0 &&
+           *file_ == std::pair(status.st_dev, status.st_ino);
+  }
   // The next piece, empty at the end. The bytes are there until the next one.
   std::string_view Read() {
     for (;;) {
@@ -172,6 +180,7 @@ class Input {
 
   std::string name_;
   int descriptor_ = -1;
+  std::optional<std::pair<dev_t, ino_t>> file_;
   long long size_ = 0;
   long long place_ = 0;
   char piece_[65536];
@@ -195,6 +204,12 @@ class Batch {
         lines_(kLongestLine, planner::batch::Digest(task_.options)),
         progress_(!task_.quiet && isatty(STDERR_FILENO) != 0 &&
                   !(WritesOut() && isatty(STDOUT_FILENO) != 0)) {
+    if (!WritesOut() && input_.IsAt(task_.output)) {
+      throw Failure::OfUsage(
+          fmt::format("-o: {} has the requests, which the answers would replace",
+                      planner::read::Shown(task_.output)),
+          false);
+    }
     if (task_.resume)
       earlier_ = std::make_unique<BatchEarlier>(task_.output);
     else

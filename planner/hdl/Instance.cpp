@@ -6,6 +6,7 @@
 #include <stdexcept>
 #include <string_view>
 
+#include "planner/hdl/Names.h"
 #include "planner/report/Numbers.h"
 
 namespace planner::hdl {
@@ -33,14 +34,6 @@ Parts Outwards(const Rational& value, bool is_lowest) {
   return is_lowest ? Parts{0, 1} : Parts{kLargest, 1};
 }
 
-string Lowered(std::string_view text) {
-  string lower(text);
-  for (char& c : lower) {
-    if (c >= 'A' && c <= 'Z') c = static_cast<char>(c - 'A' + 'a');
-  }
-  return lower;
-}
-
 class Builder {
  public:
   Builder(const Request& request, const Device& device, const Answer& answer)
@@ -49,7 +42,7 @@ class Builder {
   Instance Build() {
     const string primitive(Name(answer_.primitive));
     instance_.model = "VORKEL_" + primitive;
-    instance_.label = Lowered(primitive) + "_inst";
+    instance_.label = LabelOf(answer_.primitive);
     AddPorts();
     if (const auto* loop = std::get_if<LoopSettings>(&answer_.settings)) {
       AddLoop(*loop);

@@ -91,7 +91,18 @@ bool IsNumbered(std::string_view name, std::string_view stem) {
          std::all_of(name.begin() + static_cast<std::ptrdiff_t>(stem.size()), name.end(), IsDigit);
 }
 
+// Whether an instance is called so, which would hide the module.
+bool IsLabel(std::string_view name) {
+  return std::any_of(
+      hardware::kPrimitives.begin(), hardware::kPrimitives.end(),
+      [&](hardware::Primitive primitive) { return name == LabelOf(primitive); });
+}
+
 }  // namespace
+
+std::string LabelOf(hardware::Primitive primitive) {
+  return Lowered(hardware::Name(primitive)) + "_inst";
+}
 
 std::string NameProblem(std::string_view name) {
   if (name.empty()) return "is empty";
@@ -109,7 +120,7 @@ std::string NameProblem(std::string_view name) {
   const std::string lower = Lowered(name);
   if (Has(kVerilogKeywords, lower)) return "is a keyword of Verilog";
   if (Has(kVhdlKeywords, lower)) return "is a keyword of VHDL";
-  if (Has(kUsedNames, lower) || IsNumbered(lower, "clk_in") || IsNumbered(lower, "clk_out")) {
+  if (Has(kUsedNames, lower) || IsLabel(lower) || IsNumbered(lower, "clk_in") || IsNumbered(lower, "clk_out")) {
     return "has another meaning in what is written";
   }
   if (lower.rfind("vorkel_", 0) == 0) return "begins with vorkel_, as the models do";

@@ -8,10 +8,15 @@
 #include <string>
 #include <string_view>
 
+#include "hardware/Primitive.h"
+
 namespace planner::hdl {
 
 inline constexpr std::string_view kDefaultName = "clocks";
 inline constexpr std::size_t kLongestName = 200;
+
+// What the instance of a primitive is called: "tsyn_inst".
+std::string LabelOf(hardware::Primitive primitive);
 
 // Why a module or an entity cannot have a name, as the end of a sentence about it: "is a keyword of
 // VHDL". Nothing when it can.

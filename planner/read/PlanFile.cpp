@@ -24,7 +24,9 @@ class PlanReader {
 
   PlanFile Read(const Node& root, std::optional<int> number) {
     const Node* const answers = root.Find("answers");
-    if (answers == nullptr || answers->type != NodeType::kArray || answers->items.empty()) {
+    const Node* const format = root.Find("format");
+    const bool is_plan = format == nullptr || format->text == "vorkel-plan";
+    if (!is_plan || answers == nullptr || answers->type != NodeType::kArray || answers->items.empty()) {
       Add(MistakeKind::kNotAPlan, At(root, ""));
       return {};
     }

@@ -4,6 +4,7 @@
 #include <set>
 #include <vector>
 
+#include "planner/report/FindingText.h"
 #include "planner/report/Numbers.h"
 #include "planner/report/Relations.h"
 #include "planner/report/SettingsText.h"
@@ -253,7 +254,13 @@ string RelationsText(const Request& request, const Device& device, const Answer&
     text += texts.WithInput(static_cast<int>(input));
   }
   text += "\n" + texts.Meanings() + texts.Fifos();
-  return texts.HasTwoInputs() ? text + texts.TwoInputs() : text;
+  if (texts.HasTwoInputs()) text += texts.TwoInputs();
+  // What is off has its crossings all the same.
+  for (const std::vector<string>& off :
+       {MissTexts(answer), FindingTexts(answer.violations, device, answer)}) {
+    for (const string& one : off) text += Prose(style, "note: ", one);
+  }
+  return text;
 }
 
 }  // namespace planner::report
