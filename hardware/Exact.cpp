@@ -271,8 +271,8 @@ double Rational::ToDouble() const {
 
 // The absolute value in units of the last of some decimals, rounded; nothing when it does not fit.
 std::optional<std::uint64_t> Rational::InUnits(int decimals) const {
-  constexpr int kMost = 18;  // so that 2 x 2^63 x 10^18 fits into Wide
-  if (decimals > kMost) return std::nullopt;
+  constexpr int kMostDecimals = 18;  // so that 2 x 2^63 x 10^18 fits into Wide
+  if (decimals > kMostDecimals) return std::nullopt;
   Wide scaled = numerator_ < 0 ? -Wide{numerator_} : Wide{numerator_};
   for (int i = 0; i < decimals; ++i) scaled *= 10;
   const Wide units = (scaled * 2 + denominator_) / (Wide{denominator_} * 2);

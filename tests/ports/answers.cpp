@@ -20,7 +20,7 @@ using compare::Kind;
 using ports::Print;
 
 constexpr int kPllRequests = 400;  // of each kind
-constexpr int kFarRequests = 2;    // of those at most, which go through all fudges
+constexpr int kFarRequests = 10;   // of those at most, which go through all fudges, a second each
 constexpr int kKruRequests = 10000;
 
 // Whether all engines answered as the plain solvers.
@@ -49,7 +49,7 @@ void PrintAnswer(const compare::PllPair& pair) {
 void PrintPllAnswers(int percent) {
   compare::PllPair pair;
   for (int kind = 0; kind <= static_cast<int>(Kind::kSlowVco); ++kind) {
-    int far_left = kFarRequests;
+    int far_left = kFarRequests * percent / 100;
     for (int i = 0; i < kPllRequests * percent / 100; ++i) {
       compare::Random random(static_cast<unsigned>(kind * 1'000'003 + i));
       const compare::Case drawn = compare::DrawCase(static_cast<Kind>(kind), random);
