@@ -5,7 +5,9 @@
 //     VORKEL_DEVICES=FOLDER vorkel_figures QUERIES PART...
 #include <cstdio>
 #include <cstdlib>
+#include <memory>
 #include <string>
+#include <vector>
 
 #include "engine/Ip_VorkelImp.h"
 #include "tests/compare/Random.h"
@@ -20,10 +22,19 @@ constexpr const char* kPins[] = {"CLK0",     "CLK90", "CLK180", "CLK270",  "CLK2
 constexpr const char* kBandwidths[] = {"LOW", "OPTIMIZED", "HIGH"};
 constexpr double kDvs[] = {0, 2, 2.5, 3, 7.5, 9, 16};
 
+// An implementation object that lives as long as the process, as in the package: speed controllers
+// are shared by the address of the personality, so one at an address that was used before would meet
+// the controller of another device.
+Ip::VorkelImp& NewImp() {
+  static auto* const objects = new std::vector<std::unique_ptr<Ip::VorkelImp>>;
+  objects->push_back(std::make_unique<Ip::VorkelImp>(nullptr));
+  return *objects->back();
+}
+
 // Compilers work out the arguments of a call in orders of their own, so each draw is a statement.
 class Queries {
  public:
-  Queries(const std::string& part, std::uint64_t seed) : random_(seed), imp_(nullptr) {
+  Queries(const std::string& part, std::uint64_t seed) : random_(seed), imp_(NewImp()) {
     imp_.SetDevice(part.c_str());
   }
 
@@ -127,7 +138,7 @@ class Queries {
   }
 
   compare::Random random_;
-  Ip::VorkelImp imp_;
+  Ip::VorkelImp& imp_;
   double input_ = 0;
 };
 
