@@ -12,10 +12,11 @@ outputs, device and so on), and
 
 It leaves in the current folder NAME.v or NAME.vhd, NAME.sdc and NAME.core, and for the target "sim"
 NAME_tb and the models, in models/. The exit status is 0; 1 when nothing serves the request; 2 when
-that is wrong, or a file cannot be written; 3 when the best plan misses a demand. Only with 0 there
-are files.
+that is wrong, or a file cannot be written; 3 when the best plan misses a demand. Only with 0 files
+are left: else the folder is as it was before.
 """
 
+import errno
 import os
 import sys
 import tempfile
@@ -101,25 +102,67 @@ def generate(core, own, request):
     return plan, files
 
 
+class Exchange:
+    """Files that take their places together, or not at all."""
+
+    def __init__(self):
+        self._new = []  # of each file the temporary one and its name
+        self._earlier = []  # of files that made room: where they are, and their names
+        self._placed = []
+        self._folders = []
+
+    def add(self, name, text):
+        """Writes a file beside its place."""
+        if os.path.isdir(name):
+            raise IsADirectoryError(errno.EISDIR, os.strerror(errno.EISDIR), name)
+        folder, base = os.path.split(name)
+        if folder and not os.path.isdir(folder):
+            os.mkdir(folder)
+            self._folders.append(folder)
+        handle, path = tempfile.mkstemp(prefix=base + ".", dir=folder or ".")
+        self._new.append((path, name))
+        with os.fdopen(handle, "w", encoding="utf-8") as stream:
+            stream.write(text)
+        os.chmod(path, 0o644)
+
+    def place(self):
+        """Gives all files their names; what is there already makes room until all have theirs."""
+        for path, name in self._new:
+            if os.path.lexists(name):
+                earlier = path + ".earlier"
+                os.rename(name, earlier)
+                self._earlier.append((earlier, name))
+            os.rename(path, name)
+            self._placed.append(name)
+
+    def finish(self):
+        """Removes what was there before."""
+        for earlier, _ in self._earlier:
+            os.unlink(earlier)
+
+    def take_back(self):
+        """Leaves all as it was."""
+        for name in self._placed:
+            os.unlink(name)
+        for earlier, name in self._earlier:
+            os.rename(earlier, name)
+        for path, _ in self._new[len(self._placed) :]:
+            os.unlink(path)
+        for folder in self._folders:
+            os.rmdir(folder)
+
+
 def write_all(files):
     """Writes all files or, when one cannot be written, none."""
-    written = []
+    exchange = Exchange()
     try:
         for name, text in files.items():
-            folder, base = os.path.split(name)
-            os.makedirs(folder or ".", exist_ok=True)
-            handle, path = tempfile.mkstemp(prefix=base + ".", dir=folder or ".")
-            written.append((path, name))
-            with os.fdopen(handle, "w", encoding="utf-8") as stream:
-                stream.write(text)
-            os.chmod(path, 0o644)
-        for path, name in written:
-            os.replace(path, name)
-    except OSError:
-        for path, _ in written:
-            if os.path.exists(path):
-                os.unlink(path)
+            exchange.add(name, text)
+        exchange.place()
+    except BaseException:
+        exchange.take_back()
         raise
+    exchange.finish()
 
 
 def main(words):

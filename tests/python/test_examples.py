@@ -1,5 +1,6 @@
 """The examples for Python flows and for build tools with cores."""
 
+import importlib.util
 import os
 import pathlib
 import re
@@ -247,13 +248,73 @@ def test_a_file_that_is_no_request(tmp_path, text):
     assert list(folder.iterdir()) == []
 
 
-def test_a_folder_that_cannot_be_written(tmp_path):
+def content(folder):
+    """All that is in a folder: the text of each file, and None for a folder."""
+    return {
+        str(path.relative_to(folder)): path.read_text() if path.is_file() else None
+        for path in folder.rglob("*")
+    }
+
+
+FILES = ["video_clocks.v", "video_clocks.sdc", "video_clocks_tb.v", "video_clocks.core"]
+
+
+@pytest.mark.parametrize("name", [*FILES, "models/VORKEL_TSYN.v"])
+def test_a_folder_in_the_way_leaves_all_as_it_was(tmp_path, name):
+    folder = tmp_path / "core"
+    (folder / name).mkdir(parents=True)
+    for other in FILES:
+        if other != name:
+            (folder / other).write_text("earlier")
+    before = content(folder)
+    result = run(GENERATOR, str(VIDEO), cwd=folder)
+    assert result.returncode == 2
+    assert "Is a directory" in result.stderr and name in result.stderr
+    assert "Traceback" not in result.stderr
+    assert content(folder) == before
+
+
+def test_a_file_in_place_of_the_folder_of_the_models(tmp_path):
     folder = tmp_path / "core"
     folder.mkdir()
-    (folder / "video_clocks.sdc").mkdir()
+    (folder / "models").write_text("earlier")
     result = run(GENERATOR, str(VIDEO), cwd=folder)
     assert result.returncode == 2
     assert "Traceback" not in result.stderr
+    assert content(folder) == {"models": "earlier"}
+
+
+def test_files_of_an_earlier_run_are_replaced(tmp_path):
+    result, folder = generated(tmp_path)
+    assert result.returncode == 0
+    written = content(folder)
+    for name in FILES:
+        (folder / name).write_text("earlier")
+    assert run(GENERATOR, str(tmp_path / "request.yml"), cwd=folder).returncode == 0
+    assert content(folder) == written
+
+
+# Of the two files the first stands in place of an earlier one: that makes room, it takes its place,
+# and the second takes its own.
+@pytest.mark.parametrize("failing", [1, 2, 3])
+def test_a_name_that_cannot_be_given_takes_all_back(tmp_path, monkeypatch, failing):
+    spec = importlib.util.spec_from_file_location("vorkel_generator", GENERATOR)
+    generator = importlib.util.module_from_spec(spec)
+    spec.loader.exec_module(generator)
+    (tmp_path / "a.v").write_text("earlier")
+    monkeypatch.chdir(tmp_path)
+    rename, calls = os.rename, []
+
+    def rename_but_one(*paths):
+        calls.append(paths)
+        if len(calls) == failing:
+            raise OSError("no")
+        rename(*paths)
+
+    monkeypatch.setattr(generator.os, "rename", rename_but_one)
+    with pytest.raises(OSError, match="no"):
+        generator.write_all({"a.v": "new", "models/b.v": "new"})
+    assert content(tmp_path) == {"a.v": "earlier"}
 
 
 def test_models():
