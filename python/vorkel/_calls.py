@@ -7,7 +7,7 @@ from typing import Any, Iterable, Iterator, Mapping, Optional, Tuple, Union
 
 from . import _planner
 from ._answers import Answer, Refusal
-from ._document import Document, is_vhdl, whole
+from ._document import Document, form, is_vhdl, whole
 from ._errors import VorkelError, mistake
 from ._explanation import Explanation
 from ._relations import Relation, relations_of
@@ -87,11 +87,11 @@ class Plan(Document):
         """Timing constraints of the first answer, or of candidate `number`.
 
         plain: `create_clock` alone, for readers that know nothing else.
-        fifos: data between clocks whose crossing needs a FIFO all goes through one.
+        fifos: data between clocks whose crossing needs a FIFO all goes through one; not with plain.
         gap: from which gap between edges on a crossing is timed as it stands, such as "0.5ns" or
             "20%" of the shorter period.
         """
-        return self._made.sdc(self._chosen(number), bool(plain), bool(fifos), gap or "")
+        return self._made.sdc(self._chosen(number), *form(plain, fifos), gap or "")
 
     def relations(
         self, number: Optional[int] = None, *, gap: Optional[str] = None

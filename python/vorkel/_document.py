@@ -72,6 +72,14 @@ class Document:
         return self.answer.within
 
 
+def form(plain: bool, fifos: bool) -> Tuple[bool, bool]:
+    """Which timing constraints are written."""
+    if plain and fifos:
+        sentence = "fifos has no place in the plain form, which has create_clock alone"
+        raise mistake("contradiction", "True", sentence, "fifos")
+    return bool(plain), bool(fifos)
+
+
 def whole(name: str, value: int, lowest: int, highest: int = _LARGEST) -> int:
     """An argument that is a whole number."""
     if isinstance(value, bool) or not isinstance(value, int) or not lowest <= value <= highest:

@@ -6,7 +6,7 @@ import json
 from typing import Any, Iterable, Mapping, Optional, Tuple, Union
 
 from . import _planner
-from ._document import Document, is_vhdl, whole
+from ._document import Document, form, is_vhdl, whole
 from ._errors import mistake
 from ._relations import Relation, relations_of
 from ._request import AnyInputs, AnyOutput, Value, request_json, text_of
@@ -43,7 +43,7 @@ class Evaluation(Document):
         self, *, plain: bool = False, fifos: bool = False, gap: Optional[str] = None
     ) -> str:
         """Timing constraints; the arguments are those of `Plan.to_sdc`."""
-        return self._made.sdc(bool(plain), bool(fifos), gap or "")
+        return self._made.sdc(*form(plain, fifos), gap or "")
 
     def relations(self, *, gap: Optional[str] = None) -> Tuple[Relation, ...]:
         """How data crosses from each clock to each other."""

@@ -150,3 +150,13 @@ def test_gaps_that_there_are_not(video, gap):
         with pytest.raises(vorkel.RequestError) as caught:
             call(gap=gap)
         assert caught.value.mistakes[0].entry == "gap"
+
+
+def test_plain_constraints_know_no_fifos(video):
+    made = vorkel.evaluate(27, m=44, d=1, divide=[8])
+    for call in (video.to_sdc, made.to_sdc):
+        assert "create_clock" in call(plain=True)
+        with pytest.raises(vorkel.RequestError, match="plain form") as caught:
+            call(plain=True, fifos=True)
+        (found,) = caught.value.mistakes
+        assert (found.kind, found.entry) == ("contradiction", "fifos")
