@@ -64,7 +64,7 @@ const char* Call::Text(int argument) const {
   return Tcl::GetString(objv_[argument + kWordsBeforeArguments]->GetTclObj());
 }
 
-double Call::Number(int argument) const { return std::atof(Text(argument)); }
+double Call::Number(int argument) const { return std::strtod(Text(argument), nullptr); }
 
 int Call::Count(int argument) const {
   // What atoi does here, written out: of text that no int can hold C leaves its answer open, while

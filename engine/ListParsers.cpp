@@ -24,7 +24,8 @@ bool ParseList(int count, const Port::StringBase& text, RequestList& list) {
     if (!text.NextTokenRange(" ", &position, &begin, &end)) return false;
     Port::StringBase token = text.Substring(begin, end);
     token.Trim(Port::kWhiteSpace, Port::TrimMode::kBoth);
-    list[static_cast<std::size_t>(slot)] = std::atof(token.CStr());
+    // As atof does, but that one knows neither "inf" nor "0x64" on Windows.
+    list[static_cast<std::size_t>(slot)] = std::strtod(token.CStr(), nullptr);
   }
   return true;
 }

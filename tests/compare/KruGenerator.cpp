@@ -108,7 +108,7 @@ void MakeWild(KruCase& drawn, Random& random) {
   };
   odden(request.outFreqs);
   odden(request.phases);
-  if (random.OneIn(3)) request.inFreq = std::atof(random.Pick(odd).c_str());
+  if (random.OneIn(3)) request.inFreq = std::strtod(random.Pick(odd).c_str(), nullptr);
   if (random.OneIn(3)) request.numOut = random.Int(-1, 8);
   if (random.OneIn(5)) drawn.readable = false;
 }

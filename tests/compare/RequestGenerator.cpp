@@ -158,7 +158,7 @@ Case DrawConstructed(Random& random, double shift) {
 
 Case DrawRangeEnds(Random& random) {
   Case drawn = DrawConstructed(random, 0.0);
-  const double f0 = std::atof(drawn.request.outFreqs.c_str());
+  const double f0 = std::strtod(drawn.request.outFreqs.c_str(), nullptr);
   // The VCO of a step as the search computes it, at a fudge that the loop can reach.
   double fudge = 0.0;
   for (int k = random.OneIn(2) ? 0 : random.Int(0, 40); k > 0; --k) fudge += 0.001;
@@ -334,8 +334,8 @@ Case DrawWild(Random& random) {
   if (random.OneIn(2)) request.outFreqs = list({"100", "50", "148.5", "25", "400"});
   if (random.OneIn(3)) request.phases = list({"0", "90", "-45", "180"});
   if (random.OneIn(3)) request.dutyCycles = list({"0", "50", "25", "75"});
-  if (random.OneIn(3)) request.inFreq = std::atof(random.Pick(odd).c_str());
-  if (random.OneIn(4)) request.inFreq2 = std::atof(random.Pick(odd).c_str());
+  if (random.OneIn(3)) request.inFreq = std::strtod(random.Pick(odd).c_str(), nullptr);
+  if (random.OneIn(4)) request.inFreq2 = std::strtod(random.Pick(odd).c_str(), nullptr);
   if (random.OneIn(4)) request.count = random.Int(-2, 9);
   if (random.OneIn(10)) drawn.limits.readable = false;
   return drawn;

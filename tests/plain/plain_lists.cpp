@@ -35,7 +35,7 @@ bool ParseList(const std::string& text, int count, int slots, double* list) {
   for (int i = 0; i < count; ++i) {
     const std::optional<std::string> word = NextWord(text, position);
     if (!word) return false;
-    list[i] = std::atof(Trimmed(*word).c_str());
+    list[i] = std::strtod(Trimmed(*word).c_str(), nullptr);
   }
   return true;
 }
