@@ -50,7 +50,7 @@ constexpr Command kCommands[] = {
      "--in 27 --primitive PLL --near 148.5",
      "Without --primitive it asks all that the device has. The output stands alone: the others are "
      "not used. Each frequency has the settings that plan ranks first for it.",
-     false, RunReach},
+     true, RunReach},
     {"batch", "[FILE] [OPTION...]", "plan many requests, one on each line",
      "examples/batch/requests.jsonl",
      "FILE has a request in JSON on each line, as --request takes it, and maybe an \"id\"; without "
@@ -58,14 +58,14 @@ constexpr Command kCommands[] = {
      "line of JSON: its number, its id, a status (within, off, unsolved or wrong) and its plan. The "
      "exit status is that of the worst: 4 when the program failed, 2 with a line that is wrong, 1 "
      "with one that is unsolved, 3 with one that is off, else 0.",
-     false, RunBatch},
+     true, RunBatch},
     {"evaluate", "[FILE] [OPTION...]", "say what settings of your own make",
      "--in 27 --m 44 --d 1 --divide 8,16,44",
      "FILE is a plan as --format json writes it, perhaps edited: its settings and its request count, "
      "its figures do not; - is standard input. Options replace what it says. Without --out there is "
      "nothing to compare the frequencies with. Settings that the primitive cannot have are refused; "
      "those that break a limit of the device end with exit status 3.",
-     false, RunEvaluate},
+     true, RunEvaluate},
     {"devices", "[NAME]", "list the devices, or all limits of one", "vk40",
      "NAME is a device, or a part name with package and grade; the beginning is enough where only "
      "one goes on like it.",

@@ -141,7 +141,9 @@ const Lines& ExitStatuses() {
   static const Lines kStatuses = {
       {"0", "solved, or shown what was asked for; explain: also what is not possible"},
       {"1", "there is no configuration; the reason is on standard error"},
-      {"2", "wrong usage, or a file or standard output that cannot be read or written"},
+      {"2",
+       "wrong usage, or a file or standard output that cannot be read or written; check and verify: "
+       "also what is wrong in the file"},
       {"3", "solved, but something is outside its tolerance or range"},
       {"4", "the program itself failed"},
       {"5", "it could not be set up: packages cannot be installed, or the build fails"},
