@@ -45,7 +45,8 @@ KindText TextOf(ValueKind kind) {
       return {"a tolerance of a duty cycle", "0.5, 0.5% or 5", "%", "0 to 100 percent points",
               "percent"};
     case ValueKind::kGap:
-      return {"a gap", "0.5, 0.5ns or 500ps", "fs, ps, ns, us and ms", "0 to 1 ms", "ns"};
+      // Or a share of a period, which is a kind of its own.
+      return {"a gap", "0.5, 0.5ns, 500ps or 20%", "fs, ps, ns, us, ms and %", "0 to 1 ms", "ns"};
     case ValueKind::kShare:
       return {"a share", "25%", "%", "0 to 100 percent", "percent"};
     case ValueKind::kMaxJitter:

@@ -45,10 +45,10 @@ TEST(Rule, WhatIsWrongIsTold) {
   EXPECT_EQ(Wrong("2ms"), "--gap: 2ms must be at most 1 ms");
   EXPECT_EQ(Wrong("0%"), "--gap: 0% must be greater than 0");
   EXPECT_EQ(Wrong("101%"), "--gap: 101% must be between 0 and 100");
-  EXPECT_EQ(Wrong("wide"), "--gap: \"wide\" is not a gap, such as 0.5, 0.5ns or 500ps");
+  EXPECT_EQ(Wrong("wide"), "--gap: \"wide\" is not a gap, such as 0.5, 0.5ns, 500ps or 20%");
   EXPECT_EQ(Wrong("1MHz"),
-            "--gap: unknown unit \"MHz\" in \"1MHz\"; the units of a gap are fs, ps, ns, us and "
-            "ms");
+            "--gap: unknown unit \"MHz\" in \"1MHz\"; the units of a gap are fs, ps, ns, us, ms "
+            "and %");
   EXPECT_EQ(Wrong("x%"), "--gap: \"x%\" is not a share, such as 25%");
 }
 
