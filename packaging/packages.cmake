@@ -55,6 +55,8 @@ deb_package(common vorkel-common electronics ""
   "The device files that the vorkel program and its libraries read, models for
 simulation, documents and examples.")
 set(CPACK_DEBIAN_COMMON_PACKAGE_ARCHITECTURE all)
+# What runs the models.
+set(CPACK_DEBIAN_COMMON_PACKAGE_SUGGESTS "iverilog | verilator | ghdl")
 set(CPACK_DEBIAN_COMMON_PACKAGE_SHLIBDEPS OFF)
 
 deb_package(tcl tcl-vorkel interpreters "vorkel-common ${same}, tcl8.6"
