@@ -14,15 +14,11 @@ namespace {
 
 using Answers = std::vector<Answer>;
 
-// Adds an answer; to one with the same settings only where it comes from.
+// Adds an answer, those of the engine first; to one with the same settings only where it comes from.
 void Add(const Answer& answer, Answers* answers) {
   for (Answer& other : *answers) {
     if (!answer::SameSettings(answer, other)) continue;
     other.source.search = other.source.search || answer.source.search;
-    if (answer.source.engine && !other.source.engine) {
-      other.source.engine = true;
-      other.source.variant = answer.source.variant;
-    }
     return;
   }
   answers->push_back(answer);

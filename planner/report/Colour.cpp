@@ -31,8 +31,8 @@ std::string Sequence(Role role) {
 }  // namespace
 
 std::string Paint(const Style& style, Role role, const std::string& text) {
-  if (!style.colour || role == Role::kNone || text.empty()) return text;
-  return Sequence(role) + text + kReset;
+  const std::string sequence = style.colour && !text.empty() ? Sequence(role) : "";
+  return sequence.empty() ? text : sequence + text + kReset;
 }
 
 }  // namespace planner::report

@@ -1,6 +1,8 @@
 // Tested by devices_text_test.cpp.
 #include "planner/report/DoubtText.h"
 
+#include <cassert>
+
 #include "hardware/Loop.h"
 #include "planner/report/Numbers.h"
 #include "planner/report/Words.h"
@@ -24,8 +26,6 @@ string Compared(const device::Doubt& doubt) {
 
 string RangeWords(const device::Doubt& doubt) {
   switch (doubt.range) {
-    case RangeOf::kNone:
-      break;
     case RangeOf::kVco:
       return "VCO frequency";
     case RangeOf::kPfd:
@@ -38,8 +38,10 @@ string RangeWords(const device::Doubt& doubt) {
       return "frequency of output 1";
     case RangeOf::kPeriod:
       return "period of " + doubt.pin;
+    case RangeOf::kNone:  // not reached: it is a range that is empty or has an end
+      break;              // not reached: as above
   }
-  return "";
+  return (assert(false), "");  // not reached: as above
 }
 
 string NeverReached(const device::Doubt& doubt) {

@@ -49,8 +49,6 @@ Within::Within(const Request& request, const Device& device, Primitive primitive
           request, device, primitive, like != nullptr ? like->implementation_.get() : nullptr)) {}
 
 Within::~Within() = default;
-Within::Within(Within&&) noexcept = default;
-Within& Within::operator=(Within&&) noexcept = default;
 
 bool Within::Exists(const Relaxed& relaxed) const { return Find(relaxed).has_value(); }
 

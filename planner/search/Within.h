@@ -74,8 +74,6 @@ class Within {
   Within(const Request& request, const Device& device, Primitive primitive,
          const Within* like = nullptr);
   ~Within();
-  Within(Within&&) noexcept;
-  Within& operator=(Within&&) noexcept;
 
   // Whether settings meet all demands and keep all limits, but for those that do not count.
   bool Exists(const Relaxed& relaxed = {}) const;

@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <stdexcept>
 #include <string>
 #include <utility>
 
@@ -148,6 +149,27 @@ TEST_F(AnswererTest, OptionsReplaceWhatALineSays) {
   const Outcome outcome = answerer.Answer(line);
   EXPECT_EQ(outcome.Best(), Primitive::kPll);
   EXPECT_EQ(outcome.device->name, "vk10");
+}
+
+// What nobody has foreseen, as a file that cannot be read any more for want of memory.
+class Failing final : public device::Files {
+ public:
+  std::vector<std::string> Names() const override { return {"vk40"}; }
+  std::string PathOf(std::string_view) const override { return "vk40.toml"; }
+  std::string TextOf(std::string_view) const override { throw std::runtime_error("no memory"); }
+};
+
+TEST(Answerer, AFailureIsAnOutcome) {
+  const Failing files;
+  Answerer answerer({"some.jsonl", {}, "vk40"}, files);
+  Line line;
+  line.number = 3;
+  line.text = R"({"inputs": [27], "outputs": [27]})";
+  const Outcome outcome = answerer.Answer(line);
+  EXPECT_EQ(outcome.status, Status::kFailed);
+  EXPECT_EQ(outcome.failure, "no memory");
+  EXPECT_EQ(outcome.line, 3);
+  EXPECT_FALSE(outcome.plan);
 }
 
 TEST(Counts, AreByStatusAndPrimitive) {

@@ -230,4 +230,9 @@ TEST(HostFiles, AreThoseOfTheSearchPath) {
   EXPECT_THAT(planner::device::HostFiles()->Names(), testing::Contains("dev"));
 }
 
+// For who catches it as an exception; its sentence is in report/PartText.h.
+TEST(PartError, IsAnException) {
+  EXPECT_STREQ(PartError(Kind::kAmbiguous).what(), "a name that stands for no part");
+}
+
 }  // namespace

@@ -102,6 +102,11 @@ INSTANTIATE_TEST_SUITE_P(
         Wrong{"{\n\n", At("3:1", "a name in quotes must be here, not the end of the file")},
         Wrong{"", At("1:1", "a value must be here, not the end of the file")},
         Wrong{"[1\xff]", At("1:3", "the text is not UTF-8 here")},
+        // A blank in two and in three bytes, half of a pair, and one beyond the last letter.
+        Wrong{"\"\xc0\xa0\"", At("1:2", "the text is not UTF-8 here")},
+        Wrong{"\"\xe0\x80\xa0\"", At("1:2", "the text is not UTF-8 here")},
+        Wrong{"\"\xed\xa0\x80\"", At("1:2", "the text is not UTF-8 here")},
+        Wrong{"\"\xf4\x90\x80\x80\"", At("1:2", "the text is not UTF-8 here")},
         Wrong{"{\"a\": 1,\n\"\\u0061\": 2}", At("2:1", "the entry \"a\" is there twice")},
         Wrong{std::string(50000, '['), At("1:22", "it is nested too deeply")}));
 

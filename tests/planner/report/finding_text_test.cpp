@@ -102,6 +102,9 @@ TEST(FindingText, TheMissThatWeighsMost) {
   EXPECT_EQ(WorstMissText(answer),
             "output 2: the duty cycle is off by 11.00 percent points, with 0 allowed, and 2 more "
             "outputs are off");
+  // 115 ps are 23 times 5.
+  Miss(&answer, 0, Quantity::kJitter, 115, 5);
+  EXPECT_EQ(WorstMissText(answer).substr(0, 47), "output 0: the jitter is 115.000 ps, with 5 allo");
 }
 
 TEST(FindingText, NotesOnTheEngine) {

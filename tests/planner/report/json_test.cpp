@@ -22,6 +22,45 @@ ordered_json AnswerOf(const Request& request, const Answer& answer) {
   return Document(request, {{&answer, 1, true}})["answers"][0];
 }
 
+TEST(FindingData, EachKindHasItsName) {
+  const std::pair<FindingKind, const char*> names[] = {
+      {FindingKind::kOutsideLimit, "outside_limit"},
+      {FindingKind::kDividerTooLarge, "divider_too_large"},
+      {FindingKind::kOffTarget, "off_target"},
+      {FindingKind::kSearchedVco, "searched_vco"},
+      {FindingKind::kSearchedFrequencies, "searched_frequencies"},
+      {FindingKind::kNothingMoves, "nothing_moves"},
+      {FindingKind::kPreferMaxVcoUnused, "prefer_max_vco_unused"},
+      {FindingKind::kWholeDividerUnused, "whole_divider_unused"},
+      {FindingKind::kOutput0Phase, "output_0_phase"},
+      {FindingKind::kBandwidthUnused, "bandwidth_unused"},
+      {FindingKind::kInputJitterPasses, "input_jitter_passes"},
+      {FindingKind::kNoJitter, "no_jitter"},
+      {FindingKind::kNoPhaseError, "no_phase_error"},
+      {FindingKind::kTooManyInputs, "too_many_inputs"},
+      {FindingKind::kTooManyOutputs, "too_many_outputs"},
+      {FindingKind::kUnsolved, "unsolved"},
+      {FindingKind::kNoSettings, "no_settings"},
+  };
+  for (const auto& [kind, name] : names) {
+    const Finding finding = {.kind = kind, .primitive = Primitive::kPll, .value = 1, .range = {0, 1}};
+    EXPECT_EQ(FindingData(finding, MadeDevice())["kind"], name);
+  }
+}
+
+TEST(FindingData, EachQuantityHasItsName) {
+  const std::pair<Quantity, ordered_json> names[] = {
+      {Quantity::kNone, nullptr},           {Quantity::kVco, "vco"},
+      {Quantity::kPfd, "pfd"},              {Quantity::kFrequency, "frequency"},
+      {Quantity::kPhase, "phase"},          {Quantity::kDuty, "duty"},
+      {Quantity::kJitter, "jitter"},        {Quantity::kDivider, "divider"},
+  };
+  for (const auto& [quantity, name] : names) {
+    const Finding finding = {.kind = FindingKind::kOffTarget, .quantity = quantity, .output = 0};
+    EXPECT_EQ(FindingData(finding, MadeDevice())["quantity"], name);
+  }
+}
+
 // 100 x 10 / 3 is 1000 / 3 MHz. That is 1 / 3 of 333 more than it, 1000000 / 999 ppm.
 TEST(Json, AllOfAnAnswer) {
   const Request request = MadeRequest({100}, {333});

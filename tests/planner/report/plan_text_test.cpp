@@ -48,6 +48,32 @@ TEST(PlanText, TheWholeOfIt) {
                 "  of yours, which can make another bandwidth the best\n");
 }
 
+// Of a plan that is made without the engine nothing is known of why.
+TEST(PlanText, NothingOfTheEngine) {
+  plan::Plan plan = Made();
+  plan.ranked.resize(1);
+  plan.among_primitives.clear();
+  plan.ranked[0].source = {.engine = false, .search = true};
+  const std::string text = PlanText(plan, MadeDevice(), 1, {}, kCalls);
+  EXPECT_NE(text.find("\nengine: the design flow's own search has no answer to this.\n"),
+            std::string::npos)
+      << text;
+  plan.engine_refused = {Refused(Primitive::kTsyn, "No VCO.")};
+  const std::string why = PlanText(plan, MadeDevice(), 1, {}, kCalls);
+  EXPECT_NE(why.find("has no answer to this; of the TSYN"), std::string::npos) << why;
+  EXPECT_NE(why.find("No VCO.\n"), std::string::npos) << why;
+}
+
+TEST(BestText, SaysWhichTradeOffsAreLeftOut) {
+  plan::Plan plan = Made();
+  plan.front_cut = {Primitive::kTsyn};
+  const std::string text = BestText(plan, MadeDevice(), 1, 10, {}, kCalls);
+  EXPECT_NE(text.find("\nnote: the TSYN has more trade-offs than are kept; those with the larger "
+                      "errors\n  are not there\n"),
+            std::string::npos)
+      << text;
+}
+
 TEST(PlanText, WhatTheEngineTakesInstead) {
   plan::Plan plan = Made();
   plan.ranked[0].source = {.engine = false, .search = true};

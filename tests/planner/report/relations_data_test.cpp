@@ -88,6 +88,31 @@ TEST(RelationsJson, WhatIsNotRelatedHasNoFigures) {
   EXPECT_EQ(Between(data, "clk_out0_in1", "clk_out1_in2"), nullptr);
 }
 
+// 1 of 10 ns later is less than a quarter of the period, and 9 of 10 the other way is not; 200 MHz
+// are twice 100.
+TEST(RelationsJson, CrossingsHaveNames) {
+  const Request request = MadeRequest({100}, {100, 200});
+  Answer answer = MadeLoop(request, Primitive::kPll, Bandwidth::kHigh, 64, 1, {64, 32}, 100);
+  answer.outputs[0].phase = 36;
+  const ordered_json data = Made(request, answer);
+  EXPECT_EQ(Between(data, "clk_in1", "clk_out0")["crossing"], "relaxed");
+  EXPECT_EQ(Between(data, "clk_out0", "clk_in1")["crossing"], "phase");
+  EXPECT_EQ(Between(data, "clk_in1", "clk_out1")["crossing"], "multicycle");
+  const std::string text = RelationsText(request, MadeDevice(), answer, {}, {});
+  EXPECT_NE(text.find("\nmulticycle: one is a whole multiple of the other"), std::string::npos);
+}
+
+TEST(RelationsJson, WholeNumbersThatAreTooLongAreTexts) {
+  const Request request = MadeRequest({100}, {100, Rational(800, 9)});
+  Answer answer = MadeAnswer(request);
+  constexpr std::int64_t kMany = 1'000'000'000'000'000'000;
+  answer.outputs[0].ratio = Rational(1, kMany);
+  answer.outputs[1].ratio = 3 * kMany;
+  const ordered_json one = Between(Made(request, answer), "clk_out1", "clk_out0");
+  EXPECT_EQ(one["launches"], "3" + std::string(36, '0'));
+  EXPECT_EQ(one["captures"], 1);
+}
+
 TEST(RelationsTcl, HasTheSame) {
   const Request request = MadeRequest({100}, {100, Rational(800, 9)});
   const std::string text = RelationsTcl(request, MadeDevice(), MadeAnswer(request), {});

@@ -18,6 +18,7 @@ TEST(TclDict, WordsOfAList) {
   EXPECT_EQ(TclWord("#"), "{#}");
   EXPECT_EQ(TclWord("a{b"), "a\\{b");
   EXPECT_EQ(TclWord("}\\ \n"), "\\}\\\\\\ \\n");
+  EXPECT_EQ(TclWord("}\t\r"), "\\}\\t\\r");
   EXPECT_EQ(TclWord("line\nline"), "{line\nline}");
 }
 

@@ -73,6 +73,8 @@ TEST(Why, WhatDecidesIsNamed) {
             "TSYN has a jitter that is known, 128.815 ps.");
   EXPECT_EQ(why(Rank::kJitter, Criterion::kPrimitive),
             "TSYN comes first, with all that counts the same.");
+  EXPECT_EQ(why(Rank::kVco, Criterion::kJitter),
+            "TSYN with the same VCO has the least jitter, 128.815 ps; the PLL has 144.594 ps.");
   plan.request.prefer_max_vco = true;
   EXPECT_EQ(why(Rank::kMargin, Criterion::kVco),
             "TSYN with the same margin has the highest VCO, 1188 MHz.");
