@@ -6,9 +6,10 @@
 
 namespace bench {
 
-// The file that the first argument of a program names; standard output where there is none. Null
-// when it cannot be opened.
-inline std::FILE* TableFile(int argc, char** argv) {
+// The file that the first of a program's arguments names, of which it takes `most`; standard output
+// where there is none. Null when there are more, and when the file cannot be opened.
+inline std::FILE* TableFile(int argc, char** argv, int most) {
+  if (argc - 1 > most) return nullptr;
   return argc > 1 ? std::fopen(argv[1], "w") : stdout;
 }
 

@@ -226,8 +226,8 @@ void RegisterTraced(Summary& summary) {
 
 int main(int argc, char** argv) {
   benchmark::Initialize(&argc, argv);
-  std::FILE* file = bench::TableFile(argc, argv);
-  if (argc > 2 || file == nullptr) {
+  std::FILE* file = bench::TableFile(argc, argv, 1);
+  if (file == nullptr) {
     std::fprintf(stderr, "usage: search_bench [TABLE] [--benchmark_filter=REGEX]\n");
     return 2;
   }

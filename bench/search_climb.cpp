@@ -162,8 +162,8 @@ void WriteClimbs(int climbs, int steps, std::uint64_t seed, std::FILE* file) {
 }  // namespace bench
 
 int main(int argc, char** argv) {
-  std::FILE* file = bench::TableFile(argc, argv);
-  if (argc > 5 || file == nullptr) {
+  std::FILE* file = bench::TableFile(argc, argv, 4);
+  if (file == nullptr) {
     std::fprintf(stderr, "usage: search_climb [TABLE] [CLIMBS] [STEPS] [SEED]\n");
     return 2;
   }

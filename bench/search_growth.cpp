@@ -136,8 +136,8 @@ void WriteTable(std::FILE* file) {
 }  // namespace bench
 
 int main(int argc, char** argv) {
-  std::FILE* file = bench::TableFile(argc, argv);
-  if (argc > 2 || file == nullptr) {
+  std::FILE* file = bench::TableFile(argc, argv, 1);
+  if (file == nullptr) {
     std::fprintf(stderr, "usage: search_growth [TABLE]\n");
     return 2;
   }

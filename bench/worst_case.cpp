@@ -115,8 +115,8 @@ void Hunt(std::FILE* file) {
 }  // namespace bench
 
 int main(int argc, char** argv) {
-  std::FILE* file = bench::TableFile(argc, argv);
-  if (argc > 2 || file == nullptr) {
+  std::FILE* file = bench::TableFile(argc, argv, 1);
+  if (file == nullptr) {
     std::fprintf(stderr, "usage: worst_case [TABLE]\n");
     return 2;
   }

@@ -147,7 +147,7 @@ bool CalculateMAndD(VorkelImp& imp, bool integerStep, const Run& run, int enough
   return true;
 }
 
-bool FindFirstValidVcos(VorkelImp& imp, double outFreq0, const Div0Steps& steps, const Run& run,
+void FindFirstValidVcos(VorkelImp& imp, double outFreq0, const Div0Steps& steps, const Run& run,
                         int enough) {
   int found = 0;
   VisitVcos(imp.pll, steps, outFreq0, [&](int slot, double vco) {
@@ -155,7 +155,6 @@ bool FindFirstValidVcos(VorkelImp& imp, double outFreq0, const Div0Steps& steps,
     if (TakeOrDrop(imp, slot, true, run)) ++found;
     return found < enough;
   });
-  return found > 0;
 }
 
 }  // namespace Ip::Pll

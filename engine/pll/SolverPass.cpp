@@ -22,14 +22,19 @@ int CountValidVcos(const VcoCandidateTable& candidates) {
   return count;
 }
 
-// In the smallest-VCO mode two valid candidates tell what is chosen: the first one is when VCOs rise
-// with the slots, and whether it is the only one decides about its phases.
+// In the smallest-VCO mode two valid candidates tell what is chosen: the first one, when VCOs rise
+// with the slots; and whether it is the only one decides about its phases.
 constexpr int kEnoughRisingVcos = 2;
 
 // Whether the first valid candidate will be chosen. With a trace, all others have lines, too.
 bool FirstIsChosen(const VorkelImp& imp, double outFreq0, const Run& run) {
   return imp.pll._minPowerMode && !run.trace.On() && outFreq0 > 0.0 &&
          imp.pll._vcoCandidates.Occupied().IsEmpty();
+}
+
+// Finds all that the candidates still lack. False when an output or M and D leave none.
+bool ServeCandidates(VorkelImp& imp, int enough, const Run& run) {
+  return FindOutputDividers(imp, run) && CalculateMAndD(imp, true, run, enough);
 }
 
 // The valid candidate with the smallest VCO, the first of several.
@@ -89,11 +94,8 @@ bool SolverPass(VorkelImp& imp, double fudge, const Run& run) {
       if (enumerates) FindFirstValidVcos(imp, outFreq0 + shift, steps, run, kEnoughRisingVcos);
     } else {
       if (enumerates) created = EnumerateVcoCandidates(imp, outFreq0, shift, steps, run.trace);
-      if (created > 0) {
-        if (run.count > 1 && !FindOutputDividers(imp, run)) continue;
-        const int enough = firstIsChosen ? kEnoughRisingVcos : MAX_VCO_CANDIDATES;
-        if (!CalculateMAndD(imp, true, run, enough)) continue;
-      }
+      const int enough = firstIsChosen ? kEnoughRisingVcos : MAX_VCO_CANDIDATES;
+      if (created > 0 && !ServeCandidates(imp, enough, run)) continue;
     }
     pll.chosen = Choose(imp, run);
     if (pll.chosen != nullptr) {

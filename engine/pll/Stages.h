@@ -71,8 +71,8 @@ bool CalculateMAndD(VorkelImp& imp, bool integerStep, const Run& run,
 
 // EnumerateVcoCandidates and CalculateMAndD in one, for a single output without a trace: makes a
 // candidate of each VCO that has a whole M and a D, by rising dividers, until there are `enough`.
-// `outFreq0`, MHz, has the fudge in it. False when there is none.
-bool FindFirstValidVcos(VorkelImp& imp, double outFreq0, const Div0Steps& steps, const Run& run,
+// `outFreq0`, MHz, has the fudge in it.
+void FindFirstValidVcos(VorkelImp& imp, double outFreq0, const Div0Steps& steps, const Run& run,
                         int enough);
 
 // The M and D of one candidate: the smallest M with inFreq x M / D equal to the candidate's VCO

@@ -72,7 +72,7 @@ constexpr std::string_view kCount = "O_MAX_HT_LT";
 // something else. From so many times that on it cannot be meant.
 constexpr int kFarAbove = 10;
 
-// Between these, in MHz, no call of the engine takes longer than 10 ms (tests/work/work_test.cpp).
+// Between these, in MHz, no call of the engine takes longer than 10 ms (tests/cost/cost_test.cpp).
 //
 // A slow VCO has a slow output 0. Shifts of that, which are up to 11 MHz, then bring it to many of
 // its dividers, of which a TSYN has a thousand; a PLL has too few for it to matter. And on a fast

@@ -1,6 +1,6 @@
 """The examples for Python flows and for build tools with cores."""
 
-import importlib.util
+import importlib
 import os
 import pathlib
 import re
@@ -298,9 +298,8 @@ def test_files_of_an_earlier_run_are_replaced(tmp_path):
 # and the second takes its own.
 @pytest.mark.parametrize("failing", [1, 2, 3])
 def test_a_name_that_cannot_be_given_takes_all_back(tmp_path, monkeypatch, failing):
-    spec = importlib.util.spec_from_file_location("vorkel_generator", GENERATOR)
-    generator = importlib.util.module_from_spec(spec)
-    spec.loader.exec_module(generator)
+    monkeypatch.syspath_prepend(GENERATOR.parent)
+    generator = importlib.import_module("vorkel_generator")
     (tmp_path / "a.v").write_text("earlier")
     monkeypatch.chdir(tmp_path)
     rename, calls = os.rename, []

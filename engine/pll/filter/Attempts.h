@@ -5,7 +5,6 @@
 #define VORKEL_ENGINE_PLL_FILTER_ATTEMPTS_H_
 
 #include <algorithm>
-#include <cmath>
 
 #include "engine/pll/Fudges.h"
 #include "engine/pll/filter/Rounding.h"
@@ -43,13 +42,14 @@ class Attempts {
   double Slowest() const { return slowest_; }
   double Fastest() const { return fastest_; }
 
+  // None when `first` is above `last`.
   struct Span {
     int first;
     int last;
     bool IsEmpty() const { return first > last; }
   };
-  // The attempts with an output 0 from `low` to `high` MHz; those that may have it, and those that
-  // have it for certain. None when `first` is above `last`.
+  // The attempts with an output 0 from `low` to `high` MHz: those that may have it, and those that
+  // have it for certain.
   class Between {
    public:
     Between(const Attempts& attempts, double low, double high) : attempts_(attempts) {
@@ -71,7 +71,7 @@ class Attempts {
     double end_;
   };
 
-  // Whether the attempts that may have an output 0 of `frequency` MHz are any: as Between has them.
+  // Whether any attempt may have an output 0 of `frequency` MHz: whether Between has it as possible.
   bool MayMeet(double frequency) const {
     const double k = (frequency - first_) * perMHz_;
     return UpTo(k + margin_) >= k - margin_;

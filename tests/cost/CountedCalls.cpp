@@ -1,18 +1,18 @@
-#include "tests/work/Part.h"
+#include "tests/cost/CountedCalls.h"
 
+#include "tests/cost/Blocks.h"
+#include "tests/cost/Device.h"
 #include "tests/engine/EngineTest.h"
-#include "tests/work/Device.h"
-#include "tests/work/Work.h"
 
-namespace work {
+namespace cost {
 
-Part::Part(const std::string& deviceFile)
+CountedCalls::CountedCalls(const std::string& deviceFile)
     : path_(folder_.path()), imp_(engine_test::NewImp()) {
   folder_.Write(std::string(kName) + ".toml", deviceFile);
   imp_.SetDevice(kName);
 }
 
-std::uint64_t Part::WorkOf(const plain::PllRequest& r) {
+std::uint64_t CountedCalls::WorkOf(const plain::PllRequest& r) {
   imp_.SetLowBandwidth(r.lowBandwidth);
   const std::uint64_t before = Blocks();
   if (r.closest) {
@@ -25,7 +25,7 @@ std::uint64_t Part::WorkOf(const plain::PllRequest& r) {
   return Blocks() - before;
 }
 
-std::uint64_t Part::WorkOf(const compare::KruCase& drawn) {
+std::uint64_t CountedCalls::WorkOf(const compare::KruCase& drawn) {
   const plain::KruRequest& r = drawn.request;
   const std::uint64_t before = Blocks();
   if (drawn.clkgen) {
@@ -37,4 +37,4 @@ std::uint64_t Part::WorkOf(const compare::KruCase& drawn) {
   return Blocks() - before;
 }
 
-}  // namespace work
+}  // namespace cost

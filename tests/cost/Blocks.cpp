@@ -1,6 +1,6 @@
-#include "tests/work/Work.h"
+#include "tests/cost/Blocks.h"
 
-namespace work {
+namespace cost {
 namespace {
 
 std::uint64_t blocks = 0;
@@ -9,7 +9,7 @@ std::uint64_t blocks = 0;
 
 std::uint64_t Blocks() { return blocks; }
 
-}  // namespace work
+}  // namespace cost
 
 extern "C" void __sanitizer_cov_trace_pc();
-extern "C" void __sanitizer_cov_trace_pc() { ++work::blocks; }
+extern "C" void __sanitizer_cov_trace_pc() { ++cost::blocks; }

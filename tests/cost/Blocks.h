@@ -4,12 +4,12 @@
 // tests (CMakeLists.txt), with a call of __sanitizer_cov_trace_pc() in each block, which compilers
 // offer for such purposes. So the work of a call is the same number each time, however busy the
 // machine is. It depends on the compiler a little, which bounds have to leave room for.
-#ifndef VORKEL_TESTS_WORK_WORK_H_
-#define VORKEL_TESTS_WORK_WORK_H_
+#ifndef VORKEL_TESTS_COST_BLOCKS_H_
+#define VORKEL_TESTS_COST_BLOCKS_H_
 
 #include <cstdint>
 
-namespace work {
+namespace cost {
 
 // Blocks run through so far.
 std::uint64_t Blocks();
@@ -18,6 +18,6 @@ std::uint64_t Blocks();
 // block.
 inline constexpr std::uint64_t kUsual = 10'000'000;
 
-}  // namespace work
+}  // namespace cost
 
-#endif  // VORKEL_TESTS_WORK_WORK_H_
+#endif  // VORKEL_TESTS_COST_BLOCKS_H_

@@ -1,7 +1,7 @@
 // Devices for which work is counted: limits of a PLL or TSYN, as the engine and as `check` read
 // them.
-#ifndef VORKEL_TESTS_WORK_DEVICE_H_
-#define VORKEL_TESTS_WORK_DEVICE_H_
+#ifndef VORKEL_TESTS_COST_DEVICE_H_
+#define VORKEL_TESTS_COST_DEVICE_H_
 
 #include <string>
 #include <vector>
@@ -10,7 +10,7 @@
 #include "tests/compare/Random.h"
 #include "tests/plain/plain_pll.h"
 
-namespace work {
+namespace cost {
 
 inline constexpr const char* kName = "dev";
 
@@ -36,6 +36,6 @@ Device DrawDevice(double slowest, double fastest, compare::Random& random);
 std::string FileOf(const Device& device);
 std::string FileOf(const compare::KruCase& drawn);
 
-}  // namespace work
+}  // namespace cost
 
-#endif  // VORKEL_TESTS_WORK_DEVICE_H_
+#endif  // VORKEL_TESTS_COST_DEVICE_H_

@@ -1,12 +1,12 @@
-#include "tests/work/Climb.h"
+#include "tests/cost/Climb.h"
 
 #include <algorithm>
 #include <cmath>
 #include <vector>
 
-#include "tests/work/Part.h"
+#include "tests/cost/CountedCalls.h"
 
-namespace work {
+namespace cost {
 namespace {
 
 using compare::Number;
@@ -126,12 +126,12 @@ Place Begin(const Device& device, int number, Random& random) {
 Summit Climb(const Device& device, int number, int steps) {
   Random random(static_cast<std::uint64_t>(number));
   Place best = Begin(device, number, random);
-  Part part(FileOf(device));
-  std::uint64_t most = part.WorkOf(best.drawn.request);
+  CountedCalls calls(FileOf(device));
+  std::uint64_t most = calls.WorkOf(best.drawn.request);
   for (int step = 0; step < steps; ++step) {
     Place place = best;
     for (int changes = random.Int(1, 2); changes > 0; --changes) Change(place, random);
-    const std::uint64_t work = part.WorkOf(place.drawn.request);
+    const std::uint64_t work = calls.WorkOf(place.drawn.request);
     if (work < most) continue;
     most = work;
     best = place;
@@ -141,7 +141,7 @@ Summit Climb(const Device& device, int number, int steps) {
 
 Summit AskForNoPhase(const Device& device) {
   Summit most;
-  Part part(FileOf(device));
+  CountedCalls calls(FileOf(device));
   for (const int divider : {1, 2, 3, 4, 5, 8, 16, 64}) {
     for (const int slower : {1, 2, 4, 16}) {
       Place place;
@@ -155,11 +155,11 @@ Summit AskForNoPhase(const Device& device) {
       place.phases.assign(plain::kMaxOutputs, 2000);
       WriteOutputs(place);
       request.dutyCycles = "99 99 99 99 99 99 99";
-      const std::uint64_t work = part.WorkOf(request);
+      const std::uint64_t work = calls.WorkOf(request);
       if (work > most.work) most = {work, place.drawn};
     }
   }
   return most;
 }
 
-}  // namespace work
+}  // namespace cost

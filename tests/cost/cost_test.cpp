@@ -1,5 +1,5 @@
 // No call takes longer than usual on a device of which `check` warns nothing, and of those on which
-// calls do it warns. Work is counted (Work.h).
+// calls do it warns. Work is counted (Blocks.h).
 //
 // VORKEL_TEST_LONG in the environment asks for more devices and longer climbs.
 
@@ -13,12 +13,12 @@
 #include "engine/Ip_VorkelImp.h"
 #include "tests/compare/KruGenerator.h"
 #include "tests/engine/EngineTest.h"
-#include "tests/work/Climb.h"
-#include "tests/work/Device.h"
-#include "tests/work/Part.h"
-#include "tests/work/Work.h"
+#include "tests/cost/Blocks.h"
+#include "tests/cost/Climb.h"
+#include "tests/cost/CountedCalls.h"
+#include "tests/cost/Device.h"
 
-namespace work {
+namespace cost {
 namespace {
 
 int Times(int normal, int inLong) {
@@ -37,18 +37,18 @@ Summit MostOn(const Device& device, int firstNumber, int climbs, int steps) {
   return most;
 }
 
-TEST(Work, IsCountedAndTheSameEachTime) {
+TEST(Cost, IsCountedAndTheSameEachTime) {
   Device device;
   device.limits.vcoTarget = 1000;
   const plain::PllRequest request = Climb(device, 0, 0).drawn.request;
-  Part part(FileOf(device));
-  part.WorkOf(request);  // makes what is made once
-  const std::uint64_t once = part.WorkOf(request);
+  CountedCalls calls(FileOf(device));
+  calls.WorkOf(request);  // makes what is made once
+  const std::uint64_t once = calls.WorkOf(request);
   EXPECT_GT(once, 10'000u);
-  EXPECT_EQ(part.WorkOf(request), once);
+  EXPECT_EQ(calls.WorkOf(request), once);
 }
 
-TEST(Work, OfTheBundledDevicesIsAsUsual) {
+TEST(Cost, OfTheBundledDevicesIsAsUsual) {
   std::uint64_t most = 0;
   int devices = 0;
   for (const char* const name : {"vk10", "vk20", "vk40"}) {
@@ -68,7 +68,7 @@ TEST(Work, OfTheBundledDevicesIsAsUsual) {
 }
 
 // Limits as odd as they can be without a warning.
-TEST(Work, OfDevicesThatCheckAcceptsIsAsUsual) {
+TEST(Cost, OfDevicesThatCheckAcceptsIsAsUsual) {
   std::uint64_t most = 0;
   int accepted = 0;
   for (int i = 0; i < Times(60, 500); ++i) {
@@ -88,7 +88,7 @@ TEST(Work, OfDevicesThatCheckAcceptsIsAsUsual) {
 }
 
 // Limits of any size: where a call is longer, there is a warning of just that.
-TEST(Work, OfMoreThanUsualIsWarnedOf) {
+TEST(Cost, OfMoreThanUsualIsWarnedOf) {
   int longer = 0;
   for (int i = 0; i < Times(30, 300); ++i) {
     compare::Random random(static_cast<unsigned>(i) + 5000);
@@ -104,7 +104,7 @@ TEST(Work, OfMoreThanUsualIsWarnedOf) {
 }
 
 // The bounds of the warning leave what is usual on their one side, and the work grows beyond them.
-TEST(Work, GrowsBeyondTheBoundsOfTheWarning) {
+TEST(Cost, GrowsBeyondTheBoundsOfTheWarning) {
   const auto withVco = [](double vcoMin, double vcoMax) {
     Device device;
     plain::PllLimits& limits = device.limits;
@@ -130,12 +130,12 @@ TEST(Work, GrowsBeyondTheBoundsOfTheWarning) {
 }
 
 // The search of a KRU has at most 32 values of M and D, whatever the limits are.
-TEST(Work, OfAKruIsLittle) {
+TEST(Cost, OfAKruIsLittle) {
   std::uint64_t most = 0;
   for (int i = 0; i < 500; ++i) {
     compare::Random random(static_cast<unsigned>(i));
     const compare::KruCase drawn = compare::DrawKruCase(random);
-    most = std::max(most, Part(FileOf(drawn)).WorkOf(drawn));
+    most = std::max(most, CountedCalls(FileOf(drawn)).WorkOf(drawn));
   }
   EXPECT_GT(most, 100u);
   EXPECT_LT(most, kUsual / 100);
@@ -143,7 +143,7 @@ TEST(Work, OfAKruIsLittle) {
 
 // Steps of phases and duty cycles, of dividers and requests of all sizes, and of counts that a
 // device file can have.
-TEST(Work, OfStepsIsLittle) {
+TEST(Cost, OfStepsIsLittle) {
   Ip::VorkelImp& imp = engine_test::NewImp();
   std::uint64_t most = 0;
   for (int i = 0; i < 20'000; ++i) {
@@ -166,4 +166,4 @@ TEST(Work, OfStepsIsLittle) {
 }
 
 }  // namespace
-}  // namespace work
+}  // namespace cost

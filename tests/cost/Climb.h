@@ -1,15 +1,15 @@
-// Looks for the requests that are most work for a device: climbs from drawn ones, and from some that
-// are known to be a lot of work, to ones that are more.
-#ifndef VORKEL_TESTS_WORK_CLIMB_H_
-#define VORKEL_TESTS_WORK_CLIMB_H_
+// Looks for the requests that are most work for a device: climbs from drawn ones, and from some
+// that are known to be a lot of work, to ones that are more.
+#ifndef VORKEL_TESTS_COST_CLIMB_H_
+#define VORKEL_TESTS_COST_CLIMB_H_
 
 #include <cstdint>
 #include <string>
 
 #include "tests/compare/RequestGenerator.h"
-#include "tests/work/Device.h"
+#include "tests/cost/Device.h"
 
-namespace work {
+namespace cost {
 
 // The most that a climb has found, and the request for it.
 struct Summit {
@@ -23,6 +23,6 @@ Summit Climb(const Device& device, int number, int steps);
 // search finds is refused. All outputs are the same.
 Summit AskForNoPhase(const Device& device);
 
-}  // namespace work
+}  // namespace cost
 
-#endif  // VORKEL_TESTS_WORK_CLIMB_H_
+#endif  // VORKEL_TESTS_COST_CLIMB_H_

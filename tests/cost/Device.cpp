@@ -1,4 +1,4 @@
-#include "tests/work/Device.h"
+#include "tests/cost/Device.h"
 
 #include <algorithm>
 #include <cmath>
@@ -7,7 +7,7 @@
 
 #include "planner/device/Check.h"
 
-namespace work {
+namespace cost {
 namespace {
 
 using compare::Number;
@@ -122,4 +122,4 @@ std::string FileOf(const compare::KruCase& drawn) {
   return text;
 }
 
-}  // namespace work
+}  // namespace cost

@@ -1,6 +1,6 @@
-// A part of a device whose file is made for it, and calls of the engine for this part.
-#ifndef VORKEL_TESTS_WORK_PART_H_
-#define VORKEL_TESTS_WORK_PART_H_
+// Calls of the engine for a device whose file is made for them, and the work of each.
+#ifndef VORKEL_TESTS_COST_COUNTEDCALLS_H_
+#define VORKEL_TESTS_COST_COUNTEDCALLS_H_
 
 #include <cstdint>
 #include <string>
@@ -10,12 +10,12 @@
 #include "tests/host/device_folder.h"
 #include "tests/plain/plain_pll.h"
 
-namespace work {
+namespace cost {
 
-// Its device is found as long as the part is there.
-class Part {
+// The device is found as long as this is there.
+class CountedCalls {
  public:
-  explicit Part(const std::string& deviceFile);
+  explicit CountedCalls(const std::string& deviceFile);
 
   // The work of a call.
   std::uint64_t WorkOf(const plain::PllRequest& request);
@@ -27,6 +27,6 @@ class Part {
   Ip::VorkelImp& imp_;
 };
 
-}  // namespace work
+}  // namespace cost
 
-#endif  // VORKEL_TESTS_WORK_PART_H_
+#endif  // VORKEL_TESTS_COST_COUNTEDCALLS_H_
