@@ -36,13 +36,16 @@ module VORKEL_MODEL_INPUT #(
   endfunction
 
   localparam [63:0] FS_IN_US = 64'd1_000_000_000;
-  localparam [63:0] UNKNOWN_SPAN = 64'd1_000_000_000;
+  localparam [63:0] UNKNOWN_SPAN = FS_IN_US;
+  localparam [63:0] PIECES = 64'd64;
   localparam [63:0] LOCK_EDGES = wide(LOCK_CYCLES);
 
   wire [63:0] plan_num = wide(planned_num);
   wire [63:0] plan_den = wide(planned_den);
   wire has_plan = planned_num != 32'd0;
   wire [63:0] plan_whole = has_plan ? FS_IN_US * plan_den / plan_num : 64'd0;
+  // What may pass between the first edge and the second.
+  wire [63:0] span = 64'd2 * plan_whole > UNKNOWN_SPAN ? 64'd2 * plan_whole : UNKNOWN_SPAN;
   wire [63:0] plan_rest = has_plan ? FS_IN_US * plan_den % plan_num : 64'd0;
 
   reg selected;
@@ -53,6 +56,7 @@ module VORKEL_MODEL_INPUT #(
   reg [63:0] stopped;  // those that have been dealt with
   reg [63:0] measured;
   reg [63:0] seen;
+  reg [63:0] pieces;
 
   initial begin
     locked = 1'b0;
@@ -128,16 +132,19 @@ module VORKEL_MODEL_INPUT #(
     end
   end
 
-  // Looks every two periods whether there has been an edge.
+  // Looks every two periods whether there has been an edge. Before there is a period it waits for
+  // longer, since the clock may be slower than the planned one.
   initial forever begin
     wait (edges != 64'd0);
     seen = total;
-    if (whole != 64'd0) begin
+    if (edges > 64'd1) begin
       #(64'd2 * whole);
-    end else if (has_plan) begin
-      #(64'd2 * plan_whole);
     end else begin
-      #(UNKNOWN_SPAN);
+      pieces = 64'd0;
+      while (edges == 64'd1 && pieces < PIECES) begin
+        #(span / PIECES);
+        pieces = pieces + 64'd1;
+      end
     end
     if (total == seen && edges != 64'd0) stops = stops + 64'd1;
   end

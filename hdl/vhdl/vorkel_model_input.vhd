@@ -29,7 +29,7 @@ end entity;
 architecture simulation of vorkel_model_input is
   signal total : natural := 0;    -- edges, modulo COUNTS
   signal started : boolean := false;  -- there has been an edge since the start
-  signal period : time := 0 fs;
+  signal period : time := 0 fs;       -- the latest since the start; 0: there is none yet
   signal stops : natural := 0;    -- how often the input has stopped, modulo COUNTS
 begin
   process (clk, rst, second, stops)
@@ -38,7 +38,7 @@ begin
     variable is_started : boolean := false;
     variable good : natural := 0;     -- periods in a row that break no limit
     variable stopped : natural := 0;  -- those stops that have been dealt with
-    variable measured : time;
+    variable measured : time := 0 fs;
 
     procedure take_period is
       variable plan_whole : time := 0 fs;
@@ -70,8 +70,10 @@ begin
 
     procedure take_edge is
     begin
-      measured := now - now_state.stamp;
-      if is_started and measured > 0 fs then
+      if is_started then
+        measured := now - now_state.stamp;
+      end if;
+      if measured > 0 fs then
         take_period;
         if bad then
           good := 0;
@@ -96,6 +98,7 @@ begin
       now_state.num := 0;
       good := 0;
       is_started := false;
+      measured := 0 fs;
       selected := second;
       stopped := stops;
     elsif rising_edge(clk) then
@@ -103,13 +106,16 @@ begin
       total <= next_edge(total, 1);
     end if;
     started <= is_started;
-    period <= now_state.whole;
+    period <= measured;
     state <= now_state;
   end process;
 
-  -- Looks every two periods whether there has been an edge.
+  -- Looks every two periods whether there has been an edge. Before there is a period it waits for
+  -- longer, since the clock may be slower than the planned one.
   process
+    constant UNKNOWN_SPAN : time := 1 us;
     variable seen : natural;
+    variable span : time;
   begin
     if not started then
       wait until started;
@@ -117,10 +123,12 @@ begin
     seen := total;
     if period > 0 fs then
       wait for 2 * period;
-    elsif planned_num /= 0 then
-      wait for 2 * (planned_den * 1 us / planned_num);
     else
-      wait for 1 us;
+      span := UNKNOWN_SPAN;
+      if planned_num /= 0 and 2 * (planned_den * 1 us / planned_num) > span then
+        span := 2 * (planned_den * 1 us / planned_num);
+      end if;
+      wait until period > 0 fs or not started for span;
     end if;
     if total = seen and started then
       stops <= next_edge(stops, 1);

@@ -14,12 +14,13 @@ architecture simulation of course is
   signal fb, clk0, clk1, locked : std_logic;
   signal edges0, edges1 : natural := 0;
   signal clear : boolean := false;
+  signal is_through : boolean := false;
 begin
   pll : entity work.VORKEL_PLL
     generic map (
       CLKIN1_MHZ_NUM => 100, M_EIGHTHS => 64, CLKOUT0_DIVIDE_EIGHTHS => 32,
       CLKOUT1_DIVIDE_EIGHTHS => 64, CLKOUT1_PHASE_EIGHTHS => -16, CLKOUT1_HIGH_HALVES => 4,
-      VCO_MIN_NUM => 400, VCO_MAX_NUM => 1000
+      VCO_MIN_NUM => 380, VCO_MAX_NUM => 1000
     )
     port map (
       CLKIN1 => clk, CLKFBIN => fb, RST => rst, CLKFBOUT => fb, CLKOUT0 => clk0, CLKOUT1 => clk1,
@@ -53,6 +54,14 @@ begin
       clk <= '0';
       wait for half;
     end loop;
+  end process;
+
+  -- Where what is waited for does not come.
+  process
+  begin
+    wait for 1 ms;
+    assert is_through report "LATE" severity failure;
+    wait;
   end process;
 
   process
@@ -95,7 +104,27 @@ begin
     wait for 1 us;
     expect_that(edges0 = 0, "and no edges");
 
-    -- It comes back.
+    -- It comes back with less than half of the planned 100 MHz: 48, which are 384 of the VCO.
+    half <= 10416666 fs;
+    runs <= true;
+    wait for 375 ns;
+    expect_that(locked = '1', "lock below half of the planned clock");
+    wait until clk = '1';
+    wait for half / 2;
+    clear <= true;
+    wait for 1 fs;
+    clear <= false;
+    wait for 200 * half;
+    expect_that(locked = '1' and edges0 = 200, "twice its edges");
+
+    -- It stops again.
+    wait until clk = '1';
+    runs <= false;
+    wait for 84 ns;
+    expect_that(locked = '0', "no lock without it");
+    half <= 5 ns;
+
+    -- It comes back as it was.
     start := now;
     runs <= true;
     wait until locked = '1';
@@ -144,6 +173,7 @@ begin
     expect_that(locked = '1', "lock after it");
 
     runs <= false;
+    is_through <= true;
     if wrong = 0 then
       write(output, "PASS" & LF);
     else
