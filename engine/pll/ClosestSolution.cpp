@@ -32,7 +32,7 @@ constexpr double kNarrowingStart = 100.0;  // best value before a pass; degrees,
 
 // The tolerance of an attempt, given that of the attempt before: both schedules have these
 // four fixed entries and otherwise grow by steps.
-double NextTolerance(int attempt, double previous) {
+constexpr double NextTolerance(int attempt, double previous) {
   switch (attempt) {
     case 1: return 0.001;
     case 2: return 0.01;
@@ -41,6 +41,15 @@ double NextTolerance(int attempt, double previous) {
     default: return previous + kToleranceStep;
   }
 }
+
+constexpr double LastTolerance() {
+  double tolerance = 0.0;
+  for (int attempt = 1; attempt < kAttempts; ++attempt) {
+    tolerance = NextTolerance(attempt, tolerance);
+  }
+  return tolerance;
+}
+static_assert(LastTolerance() == kWidestTolerance);
 
 // The tolerance from which on a candidate is close on an output. A difference that is no number
 // counts as `ofNan`.

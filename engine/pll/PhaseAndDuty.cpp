@@ -30,33 +30,53 @@ double AchievablePhase(double requested, double divider) {
   return 0.0;
 }
 
+// One fractional divider fixes the phases and duty cycles of all outputs of a TSYN, those with
+// whole dividers included.
+bool IsFixed(const VorkelImp& imp, const Run& run, const VcoCandidate& candidate) {
+  return run.prim == kTsyn && !imp.pll._intDiv0Only &&
+         (IsFractional(candidate.m) || IsFractional(candidate.div0));
+}
+
+void TakeFixed(VcoCandidate& candidate, std::size_t output) {
+  candidate.phase[output] = 0.0;
+  candidate.phaseDiff[output] = 0.0;
+  candidate.dutyCycle[output] = 0.5;
+  candidate.dutyDiff[output] = 0.0;
+}
+
+void TakePhase(const VorkelImp& imp, VcoCandidate& candidate, int n) {
+  const auto output = static_cast<std::size_t>(n);
+  const double requested = imp.requests.reqPhase[output];
+  candidate.phase[output] = AchievablePhase(requested, candidate.Divider(n));
+  candidate.phaseDiff[output] = Difference(requested, candidate.phase[output]);
+}
+
+void TakeDutyCycle(const VorkelImp& imp, VcoCandidate& candidate, int n) {
+  const auto output = static_cast<std::size_t>(n);
+  const double requested = imp.requests.reqDutyCycle[output];
+  candidate.dutyCycle[output] =
+      NearestDutyCycleOfAny(requested, candidate.Divider(n), imp.pllLimits.maxHighLowCount);
+  candidate.dutyDiff[output] = Difference(requested / 100.0, candidate.dutyCycle[output]);
+}
+
 }  // namespace
 
 void GetPhasesAndDutyCycles(VorkelImp& imp, const Run& run) {
   TRACE(run.trace, "DLL ------ getting phases and duty cycles\n");
-  const bool fractionFixesAll = run.prim == kTsyn && !imp.pll._intDiv0Only;
   VcoCandidateTable& candidates = imp.pll._vcoCandidates;
-  for (int n = 0; n < run.count; ++n) {
-    const auto output = static_cast<std::size_t>(n);
-    const double reqPhase = imp.requests.reqPhase[output];
-    const double reqDutyCycle = imp.requests.reqDutyCycle[output];
-    for (const int slot : candidates.Occupied()) {
-      VcoCandidate& candidate = candidates[slot];
-      // One fractional divider fixes the phases and duty cycles of all outputs of a TSYN,
-      // those with whole dividers included.
-      if (fractionFixesAll && (IsFractional(candidate.m) || IsFractional(candidate.div0))) {
-        candidate.phase[output] = 0.0;
-        candidate.phaseDiff[output] = 0.0;
-        candidate.dutyCycle[output] = 0.5;
-        candidate.dutyDiff[output] = 0.0;
+  const bool isOnly = candidates.Occupied().Count() == 1;
+  for (const int slot : candidates.Occupied()) {
+    VcoCandidate& candidate = candidates[slot];
+    const bool isFixed = IsFixed(imp, run, candidate);
+    for (int n = 0; n < run.count; ++n) {
+      if (isFixed) {
+        TakeFixed(candidate, static_cast<std::size_t>(n));
         continue;
       }
-      const double divider = candidate.Divider(n);
-      candidate.phase[output] = AchievablePhase(reqPhase, divider);
-      candidate.phaseDiff[output] = Difference(reqPhase, candidate.phase[output]);
-      candidate.dutyCycle[output] =
-          NearestDutyCycleOfAny(reqDutyCycle, divider, imp.pllLimits.maxHighLowCount);
-      candidate.dutyDiff[output] = Difference(reqDutyCycle / 100.0, candidate.dutyCycle[output]);
+      TakePhase(imp, candidate, n);
+      if (!isOnly && candidate.phaseDiff[0] > kWidestTolerance) break;
+      TakeDutyCycle(imp, candidate, n);
+      if (!isOnly && candidate.dutyDiff[0] > kWidestTolerance) break;
     }
   }
 }

@@ -81,8 +81,12 @@ void FindFirstValidVcos(VorkelImp& imp, double outFreq0, const Div0Steps& steps,
 bool SearchMAndD(VcoCandidate& candidate, double pfdMin, double pfdMax, bool integerStep,
                  const Run& run);
 
+// The widest tolerance of the closest-solution mode: degrees of phase, or a fraction of duty cycle.
+inline constexpr double kWidestTolerance = 28.0;
+
 // PhaseAndDuty.cpp: works out the phase and duty cycle nearest to the request, and the
-// distances, of every candidate and output.
+// distances, of every candidate and output. Of several candidates none is chosen that is further
+// off on output 0 than the widest tolerance; of such a one the rest stays 0.
 void GetPhasesAndDutyCycles(VorkelImp& imp, const Run& run);
 
 // ClosestSolution.cpp: the candidate whose phases and duty cycles come closest, or null.

@@ -114,6 +114,32 @@ TEST_F(PhaseAndDutyTest, PhasesThatAreNoNumbers) {
   EXPECT_EQ(PhaseDiff(), kInfinity);
 }
 
+// 388 degrees are 28 from the nearest step, and 2900 % are 28 times the period from 100 %, of which
+// a divider of 128 comes to 127.5 / 128.
+TEST_F(PhaseAndDutyTest, OfSeveralOnlyThoseInReachOnOutput0HaveTheOtherOutputs) {
+  struct {
+    double phase;
+    double dutyCycle;
+    bool isInReach;
+  } const requests[] = {{388, 50, true},         {Above(388), 50, false},   {-388, 50, true},
+                        {Below(-388), 50, false}, {0, 2899, true},          {0, 2900, false},
+                        {0, -2799, true},         {0, -2801, false},         {kNan, 50, true}};
+  imp_.pllLimits.maxHighLowCount = 128;
+  for (const auto& request : requests) {
+    SCOPED_TRACE(testing::Message() << request.phase << ", " << request.dutyCycle);
+    imp_.requests.reqPhase[0] = request.phase;
+    imp_.requests.reqDutyCycle[0] = request.dutyCycle;
+    imp_.requests.reqPhase[1] = 90;
+    for (const bool isAlone : {false, true}) {
+      table_.EmptyAll();
+      Put(0, 128, 4);
+      if (!isAlone) Put(5, 128, 4);
+      Get(2);
+      EXPECT_EQ(table_[0].phase[1], isAlone || request.isInReach ? 90.0 : 0.0);
+    }
+  }
+}
+
 TEST_F(PhaseAndDutyTest, DutyCycleNearestToTheRequest) {
   EXPECT_EQ(DutyCycle(3, 50), 0.5);
   EXPECT_EQ(DutyDiff(), 0.0);
