@@ -21,11 +21,11 @@
 #include "cli/Stream.h"
 #include "cli/Words.h"
 #include "cli/Workers.h"
+#include "planner/PlanVersion.h"
 #include "planner/batch/Answerer.h"
 #include "planner/read/Options.h"
 #include "planner/read/Shown.h"
 #include "planner/report/BatchText.h"
-#include "planner/report/Json.h"
 
 namespace cli {
 
@@ -90,7 +90,7 @@ void ReadRequestOptions(const Given& given, Task* task) {
   planner::read::Mistakes mistakes;
   task->answers.options = ReadOptions(options, &mistakes);
   if (!mistakes.empty()) Refuse(mistakes);
-  task->options = fmt::format("{} {}\n", planner::report::kPlanVersion, task->form.all);
+  task->options = fmt::format("{} {}\n", planner::kPlanVersion, task->form.all);
   for (const Option& option : options) {
     task->options += option.name + "=" + option.value + "\n";
   }

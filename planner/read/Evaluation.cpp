@@ -38,6 +38,7 @@ class Finisher {
 
   std::optional<Evaluation> Finish() {
     const bool is_loop = hardware::IsLoop(primitive_);
+    if (!draft_.inputs) Missing("--in", "the input frequency, such as --in 100");
     RefuseOthers(is_loop);
     if (mistakes_.empty()) {
       Count(is_loop);
@@ -46,9 +47,6 @@ class Finisher {
       } else {
         Kru();
       }
-    }
-    if (!draft_.inputs && mistakes_.empty()) {
-      Missing("--in", "the input frequency, such as --in 100");
     }
     if (!mistakes_.empty()) return std::nullopt;
     return Compared();

@@ -6,6 +6,7 @@
 #include <initializer_list>
 #include <utility>
 
+#include "planner/PlanVersion.h"
 #include "planner/read/JsonTree.h"
 #include "planner/read/Names.h"
 #include "planner/read/RequestTree.h"
@@ -29,6 +30,10 @@ class PlanReader {
     if (!is_plan || answers == nullptr || answers->type != NodeType::kArray || answers->items.empty()) {
       Add(MistakeKind::kNotAPlan, At(root, ""));
       return {};
+    }
+    const Node* const version = root.Find("version");
+    if (version != nullptr && version->text != std::to_string(kPlanVersion)) {
+      Refuse(*version, "version", "version of plans that can be read", std::to_string(kPlanVersion));
     }
     if (const Node* const request = root.Find("request")) {
       plan_.request = WithoutChoices(ReadTree(*request, file_, Naming::kEntries, mistakes_));
@@ -59,6 +64,14 @@ class PlanReader {
     mistake.kind = kind;
     mistake.place = std::move(place);
     return mistakes_->emplace_back(std::move(mistake));
+  }
+
+  // What stands at `path` is no `what`, which would be `right`.
+  void Refuse(const Node& node, std::string path, std::string what, const std::string& right) {
+    Mistake& mistake = Add(MistakeKind::kNoSetting, At(node, std::move(path)));
+    mistake.text = node.text;
+    mistake.other = std::move(what);
+    mistake.hint = "it is " + right;
   }
 
   static bool IsMeant(const Node& answer, std::optional<int> number) {
@@ -175,10 +188,16 @@ class PlanReader {
     for (std::size_t i = 0; i < outputs.items.size(); ++i) {
       const Node& output = outputs.items[i];
       const std::string path = path_ + ".outputs[" + std::to_string(i) + "]";
-      const Node* const used = output.type == NodeType::kObject
-                                   ? EntryOf(output, path, "used", NodeType::kBoolean)
-                                   : nullptr;
-      act(output, path, output.type == NodeType::kObject && (used == nullptr || used->truth));
+      if (output.type != NodeType::kObject) {
+        act(output, path, false);
+        continue;
+      }
+      const Node* const index = EntryOf(output, path, "index", NodeType::kNumber);
+      if (index != nullptr && index->text != std::to_string(i)) {
+        Refuse(*index, path + ".index", "index of the output at this place", std::to_string(i));
+      }
+      const Node* const used = EntryOf(output, path, "used", NodeType::kBoolean);
+      act(output, path, used == nullptr || used->truth);
     }
   }
 

@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <nlohmann/json.hpp>
 
+#include "planner/PlanVersion.h"
 #include "planner/answer/Moved.h"
 #include "planner/answer/Rank.h"
 #include "planner/report/Data.h"

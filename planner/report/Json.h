@@ -15,9 +15,6 @@
 
 namespace planner::report {
 
-// Counts up when an entry goes, is added, or changes its meaning or type.
-inline constexpr int kPlanVersion = 4;
-
 // One answer of a document, and what it is there for.
 struct Entry {
   const Answer* answer;

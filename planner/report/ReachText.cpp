@@ -162,13 +162,19 @@ class TextWriter final : public Writer {
     const Settings settings = reach.SettingsOf(point);
     const auto* const loop = std::get_if<LoopSettings>(&settings);
     const double jitter = reach.JitterOf(point);
+    const int ratio_width = loop != nullptr ? 13 : 10;
     if (!std::exchange(has_heading_, true)) {
-      std::vector<Cell> heading = {{"MHz", 13}, {"x input", 13}};
+      std::vector<Cell> heading = {{"MHz", 13}, {"x input", ratio_width}};
       if (near != nullptr) heading.push_back({"error ppm", 11});
       if (loop != nullptr) {
         heading.insert(heading.end(), {{"M", 7}, {"D", 3}, {"divider", 8}, {"bandwidth", 10}});
       } else {
-        heading.insert(heading.end(), {{"pin", 9}, {"M", 4}, {"D", 4}, {"divide", 7}, {"/ 2", 4}});
+        heading.insert(heading.end(), {{"pin", 8},
+                                       {"M", 4},
+                                       {"D", 4},
+                                       {"divide", 7},
+                                       {"/ 2", 3},
+                                       {"feedback", 8}});
       }
       heading.push_back({"jitter ps", 10});
       Put(Row(heading));
@@ -177,7 +183,7 @@ class TextWriter final : public Writer {
         {Fixed(frequency, kFrequencyDecimals), 13},
         {point.divide == 1 ? std::to_string(point.multiply)
                            : std::to_string(point.multiply) + "/" + std::to_string(point.divide),
-         13}};
+         ratio_width}};
     if (near != nullptr) {
       cells.push_back({Fixed((frequency - *near) / *near * 1'000'000, 2), 11});
     }
@@ -190,11 +196,12 @@ class TextWriter final : public Writer {
       const auto& kru = std::get<KruSettings>(settings);
       const auto count = [](int number) { return number == 0 ? "-" : std::to_string(number); };
       cells.insert(cells.end(),
-                   {{string(hardware::FactsOf(kru.pins.back()).name), 9},
+                   {{string(hardware::FactsOf(kru.pins.back()).name), 8},
                     {count(kru.m), 4},
                     {count(kru.d), 4},
                     {kru.divide_halves == 0 ? "-" : Short(Rational(kru.divide_halves, 2), 1), 7},
-                    {kru.divide_by_2 ? "yes" : "-", 4}});
+                    {kru.divide_by_2 ? "yes" : "-", 3},
+                    {kru.feedback ? "yes" : "-", 8}});
     }
     cells.push_back({std::isfinite(jitter) ? Ps(jitter) : "-", 10});
     Put(Row(cells));

@@ -6,6 +6,7 @@
 #include <nlohmann/json.hpp>
 #include <utility>
 
+#include "planner/PlanVersion.h"
 #include "planner/read/JsonTree.h"
 #include "planner/verify/Claim.h"
 #include "planner/verify/Difference.h"
@@ -23,7 +24,6 @@ using read::Node;
 using read::NodeType;
 using std::string;
 
-constexpr int kVersion = 4;
 // The source of settings of the user's own.
 constexpr std::string_view kGiven = "given";
 
@@ -84,7 +84,7 @@ class Work {
   void DoHead() {
     ordered_json head = ordered_json::object();
     head["format"] = "vorkel-plan";
-    head["version"] = kVersion;
+    head["version"] = kPlanVersion;
     head["units"] = Units();
     head["tradeoffs_cut"] = ordered_json::array();
     for (const Primitive one : kept_->standing.cut) head["tradeoffs_cut"].push_back(Name(one));

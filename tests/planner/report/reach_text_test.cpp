@@ -167,8 +167,10 @@ TEST_F(ReachText, PinsOfAKru) {
   };
   const ReachQuestion question = {.kind = Kind::kNear, .near = 54, .most = 1};
   EXPECT_EQ(WriteReach(request_, device_, question, {Primitive::kKruSp}, ReachForm::kText, keep), 1);
-  EXPECT_NE(text.find("          MHz      x input  error ppm      pin   M   D divide / 2 jitter ps\n"
-                      "    54.000000            2       0.00    CLK2X   -   -      -   -         -\n"),
+  EXPECT_NE(text.find("          MHz   x input  error ppm     pin   M   D divide / 2 feedback "
+                      "jitter ps\n"
+                      "    54.000000         2       0.00   CLK2X   -   -      -  -     yes "
+                      "        -\n"),
             std::string::npos)
       << text;
 }
