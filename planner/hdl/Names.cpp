@@ -120,7 +120,8 @@ std::string NameProblem(std::string_view name) {
   const std::string lower = Lowered(name);
   if (Has(kVerilogKeywords, lower)) return "is a keyword of Verilog";
   if (Has(kVhdlKeywords, lower)) return "is a keyword of VHDL";
-  if (Has(kUsedNames, lower) || IsLabel(lower) || IsNumbered(lower, "clk_in") || IsNumbered(lower, "clk_out")) {
+  if (Has(kUsedNames, lower) || IsLabel(lower) || IsNumbered(lower, "clk_in") ||
+      IsNumbered(lower, "clk_out")) {
     return "has another meaning in what is written";
   }
   if (lower.rfind("vorkel_", 0) == 0) return "begins with vorkel_, as the models do";

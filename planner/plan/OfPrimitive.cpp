@@ -14,7 +14,7 @@ namespace {
 
 using Answers = std::vector<Answer>;
 
-// Adds an answer, those of the engine first; to one with the same settings only where it comes from.
+// Adds an answer, those of the engine first; to one with the same settings only where it is from.
 void Add(const Answer& answer, Answers* answers) {
   for (Answer& other : *answers) {
     if (!answer::SameSettings(answer, other)) continue;

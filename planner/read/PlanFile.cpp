@@ -27,13 +27,15 @@ class PlanReader {
     const Node* const answers = root.Find("answers");
     const Node* const format = root.Find("format");
     const bool is_plan = format == nullptr || format->text == "vorkel-plan";
-    if (!is_plan || answers == nullptr || answers->type != NodeType::kArray || answers->items.empty()) {
+    if (!is_plan || answers == nullptr || answers->type != NodeType::kArray ||
+        answers->items.empty()) {
       Add(MistakeKind::kNotAPlan, At(root, ""));
       return {};
     }
     const Node* const version = root.Find("version");
     if (version != nullptr && version->text != std::to_string(kPlanVersion)) {
-      Refuse(*version, "version", "version of plans that can be read", std::to_string(kPlanVersion));
+      Refuse(*version, "version", "version of plans that can be read",
+             std::to_string(kPlanVersion));
     }
     if (const Node* const request = root.Find("request")) {
       plan_.request = WithoutChoices(ReadTree(*request, file_, Naming::kEntries, mistakes_));

@@ -67,7 +67,7 @@ string LongSearch(const device::Doubt& doubt) {
                   : "so fast a VCO makes nothing else of an output 0 that is shifted, and no other "
                     "phases";
   return text + "; a call of the engine that finds nothing can take longer than 10 ms" +
-         (is_slow ? "" : ", and some seconds");
+         (is_slow ? "" : ", and up to a second");
 }
 
 }  // namespace

@@ -39,7 +39,8 @@ class Walk {
         largest_(hardware::LargestKruRatioPart(task.Which())),
         leaves_out_multiples_(task.Model().RisesWithSettings() && IsJitterAllKnown()),
         solver_(task, phases, all_met),
-        reach_(task, phases, {.all_met = all_met, .with_ties = !solver_.IsBestOnFront(), .most = most},
+        reach_(task, phases,
+               {.all_met = all_met, .with_ties = !solver_.IsBestOnFront(), .most = most},
                DividesOf(task), largest_) {
     for (const bool feedback : {false, true}) {
       if (task.IsSp() ? task.Asked().feedback && !feedback : feedback) continue;

@@ -73,7 +73,7 @@ TEST(Cost, OfDevicesThatCheckAcceptsIsAsUsual) {
   int accepted = 0;
   for (int i = 0; i < Times(60, 500); ++i) {
     compare::Random random(static_cast<unsigned>(i) + 1000);
-    const Device device = DrawDevice(random.OneIn(2) ? 300 : 1, 5000, random);
+    const Device device = DrawDevice(random.OneIn(2) ? 300 : 1, 10'000, random);
     if (!Check(device).isAccepted) continue;
     ++accepted;
     Summit summit = MostOn(device, i, 2, Times(10, 150));
@@ -93,7 +93,7 @@ TEST(Cost, OfMoreThanUsualIsWarnedOf) {
   for (int i = 0; i < Times(30, 300); ++i) {
     compare::Random random(static_cast<unsigned>(i) + 5000);
     const bool isSlow = random.OneIn(2);
-    const Device device = DrawDevice(isSlow ? 0.5 : 300, isSlow ? 500 : 30'000, random);
+    const Device device = DrawDevice(isSlow ? 0.5 : 300, isSlow ? 500 : 100'000, random);
     const Summit summit = isSlow ? MostOn(device, 4, 5, Times(1, 50)) : AskForNoPhase(device);
     if (summit.work < kUsual) continue;
     ++longer;
@@ -117,11 +117,11 @@ TEST(Cost, GrowsBeyondTheBoundsOfTheWarning) {
     limits.pfdMax = limits.maxPfdLowB = vcoMax;
     return device;
   };
-  const Device usual = withVco(300, 5000);
+  const Device usual = withVco(300, 10'000);
   EXPECT_TRUE(Check(usual).isAccepted);
   EXPECT_LT(AskForNoPhase(usual).work, kUsual);
   EXPECT_LT(MostOn(usual, 0, 8, 3).work, kUsual);
-  const Device fast = withVco(300, 12'000);
+  const Device fast = withVco(300, 30'000);
   EXPECT_TRUE(Check(fast).isLong);
   EXPECT_GT(AskForNoPhase(fast).work, kUsual);
   const Device slow = withVco(6, 14.4);

@@ -161,10 +161,10 @@ TEST(DoubtText, LimitsThatCannotBeMeant) {
   EXPECT_EQ(DoubtText(Made(DoubtKind::kLongSearch, 60, 0, 300)),
             "ONE, 60, is below 300 MHz: so slow a VCO has many dividers for an output 0 that is "
             "shifted; a call of the engine that finds nothing can take longer than 10 ms");
-  EXPECT_EQ(DoubtText(Made(DoubtKind::kLongSearch, 6000, 0, 5000)),
-            "ONE, 6000, is above 5000 MHz: so fast a VCO makes nothing else of an output 0 that is "
+  EXPECT_EQ(DoubtText(Made(DoubtKind::kLongSearch, 20000, 0, 10000)),
+            "ONE, 20000, is above 10000 MHz: so fast a VCO makes nothing else of an output 0 that is "
             "shifted, and no other phases; a call of the engine that finds nothing can take longer "
-            "than 10 ms, and some seconds");
+            "than 10 ms, and up to a second");
 }
 
 TEST(DoubtText, WhatThereIsNoneOf) {
