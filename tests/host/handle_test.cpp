@@ -59,6 +59,7 @@ TEST(HandleName, FollowsRename) {
   Tcl_IncrRefCount(kept);
   EXPECT_EQ(tcl.Eval("rename " + name + " k"), "");
   EXPECT_STREQ(handle->GetString(), "::k");
+  EXPECT_EQ(kept->refCount, 1);  // nobody else has it any more
   tcl.Eval("namespace eval a::b {}; rename k a::b::k2");
   EXPECT_STREQ(handle->GetString(), "::a::b::k2");
   // What a script has kept does not change under it.
