@@ -195,7 +195,8 @@ void Workers::Feed() {
 
 void Workers::Send(Worker* worker) {
   while (!worker->out.empty()) {
-    const ssize_t count = write(worker->socket, worker->out.data(), worker->out.size());
+    const ssize_t count =
+        send(worker->socket, worker->out.data(), worker->out.size(), MSG_NOSIGNAL);
     if (count >= 0) {
       worker->out.erase(0, static_cast<std::size_t>(count));
     } else if (errno != EINTR) {

@@ -151,6 +151,8 @@ INSTANTIATE_TEST_SUITE_P(
         Bad{"0", ValueKind::kMaxJitter, "0 must be greater than 0"},
         Bad{"361", ValueKind::kPhaseTolerance,
             "361 is out of range: a tolerance of a phase is from 0 to 360 degrees"},
+        Bad{"101", ValueKind::kDutyTolerance,
+            "101 is out of range: a tolerance of a duty cycle is from 0 to 100 percent points"},
         Bad{std::string(101, '7'), ValueKind::kPhase,
             std::string(60, '7') + "... has more than 100 digits"}));
 
