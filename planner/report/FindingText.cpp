@@ -222,29 +222,22 @@ std::vector<string> FindingTexts(const std::vector<Finding>& findings, const Dev
   for (std::size_t i = 0; i < findings.size(); ++i) {
     if (told[i]) continue;
     const Finding& first = findings[i];
-    if (!IsMissingFigure(first) && first.kind != FindingKind::kOffTarget) {
+    if (!IsMissingFigure(first)) {
       texts.push_back(FindingText(first, device, &answer));
       continue;
     }
     std::vector<Finding> same;
     for (std::size_t j = i; j < findings.size(); ++j) {
       const Finding& other = findings[j];
-      const bool belongs = IsMissingFigure(first)
-                               ? IsMissingFigure(other) && other.text == first.text
-                               : other.kind == first.kind && other.output == first.output;
-      if (!belongs) continue;
+      if (!IsMissingFigure(other) || other.text != first.text) continue;
       told[j] = true;
       same.push_back(other);
     }
-    if (IsMissingFigure(first)) {
-      // The jitter comes before the phase error.
-      std::stable_sort(same.begin(), same.end(), [](const Finding& a, const Finding& b) {
-        return a.kind == FindingKind::kNoJitter && b.kind != FindingKind::kNoJitter;
-      });
-      texts.push_back(MissingText(same, device));
-    } else {
-      texts.push_back(MissText(same));
-    }
+    // The jitter comes before the phase error.
+    std::stable_sort(same.begin(), same.end(), [](const Finding& a, const Finding& b) {
+      return a.kind == FindingKind::kNoJitter && b.kind != FindingKind::kNoJitter;
+    });
+    texts.push_back(MissingText(same, device));
   }
   return texts;
 }

@@ -16,8 +16,7 @@ namespace planner::report {
 std::string FindingText(const Finding& finding, const Device& device,
                         const Answer* answer = nullptr);
 
-// All of them in their order. What belongs together is one sentence: the misses of an output, and
-// the figures that there are not for the same reason.
+// All of them in their order; the figures that there are not for the same reason are one sentence.
 std::vector<std::string> FindingTexts(const std::vector<Finding>& findings, const Device& device,
                                       const Answer& answer);
 
