@@ -74,6 +74,7 @@ void GetPhasesAndDutyCycles(VorkelImp& imp, const Run& run) {
         continue;
       }
       TakePhase(imp, candidate, n);
+      // One that is too far off on output 0 is not chosen, whatever else it can do.
       if (!isOnly && candidate.phaseDiff[0] > kWidestTolerance) break;
       TakeDutyCycle(imp, candidate, n);
       if (!isOnly && candidate.dutyDiff[0] > kWidestTolerance) break;

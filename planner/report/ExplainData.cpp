@@ -1,4 +1,4 @@
-// Tested by explain_text_test.cpp.
+// Tested by explain_text_test.cpp and explain_data_test.cpp.
 #include <nlohmann/json.hpp>
 #include <string_view>
 

@@ -162,6 +162,7 @@ class TextWriter final : public Writer {
     const Settings settings = reach.SettingsOf(point);
     const auto* const loop = std::get_if<LoopSettings>(&settings);
     const double jitter = reach.JitterOf(point);
+    // Ratios of a KRU are short, which leaves its columns room in 80.
     const int ratio_width = loop != nullptr ? 13 : 10;
     if (!std::exchange(has_heading_, true)) {
       std::vector<Cell> heading = {{"MHz", 13}, {"x input", ratio_width}};
