@@ -105,6 +105,8 @@ bool WalkD(VcoCandidate& candidate, double pfdMin, double pfdMax, double step, c
 bool SearchMAndD(VcoCandidate& candidate, double pfdMin, double pfdMax, bool integerStep,
                  const Run& run) {
   TRACE(run.trace, "DLL - RK --> _prim = %d \n", VorkelImp::_prim);
+  // No D makes a VCO below 0 of an input above 0.
+  if (candidate.vco < 0.0 && run.inFreq > 0.0) return false;
   const double step = integerStep ? kIntegerStep : kFractionalStep;
   const bool isUsual = IsUsual(run.inFreq) && IsUsual(candidate.vco);
   return (isUsual ? WalkD : WalkM)(candidate, pfdMin, pfdMax, step, run);

@@ -78,7 +78,7 @@ constexpr int kFarAbove = 10;
 // its dividers, of which a TSYN has a thousand; a PLL has too few for it to matter. And on a fast
 // VCO the shifts are so small that all of them leave the same M and D: where what they make is
 // refused for its phases, it is refused for each of 22000.
-constexpr int kSlowTsynVco = 300;
+constexpr int kSlowTsynVco = 10;
 constexpr int kFastVco = 10'000;
 
 // Works out what is doubtful about one grade.

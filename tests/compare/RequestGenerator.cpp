@@ -316,6 +316,18 @@ Case DrawSlowVco(Random& random) {
   return drawn;
 }
 
+// Output 0 comes up from below 0 by a fudge, or down to it, and nearly all dividers make VCOs of it.
+Case DrawBelowZero(Random& random) {
+  Case drawn = random.OneIn(3) ? DrawSlowVco(random) : DrawConstructed(random, 0.0);
+  plain::PllRequest& request = drawn.request;
+  if (!random.OneIn(4)) request.inFreq2 = -std::pow(10.0, random.Real(-1, 3));
+  const std::size_t others = request.outFreqs.find(' ');
+  const double most = random.OneIn(2) ? 0.1 : 3.0;
+  const std::string first = Number(random.OneIn(2) ? "%.3f" : "%.6f", random.Real(-most, most));
+  request.outFreqs = others == std::string::npos ? first : first + request.outFreqs.substr(others);
+  return drawn;
+}
+
 Case DrawWild(Random& random) {
   static const std::vector<std::string> odd = {
       "0",   "-0",  "-100", "1e308", "1e-308", "inf",  "-inf", "nan",  "0x64", "abc",
@@ -354,6 +366,7 @@ const char* KindName(Kind kind) {
     case Kind::kInfeasible: return "Infeasible";
     case Kind::kLowOutput: return "LowOutput";
     case Kind::kSlowVco: return "SlowVco";
+    case Kind::kBelowZero: return "BelowZero";
     case Kind::kWild: return "Wild";
   }
   return "";
@@ -373,6 +386,7 @@ Case DrawCase(Kind kind, Random& random) {
     case Kind::kInfeasible: return DrawInfeasible(random);
     case Kind::kLowOutput: return DrawLowOutput(random);
     case Kind::kSlowVco: return DrawSlowVco(random);
+    case Kind::kBelowZero: return DrawBelowZero(random);
     case Kind::kWild: return DrawWild(random);
   }
   return {};

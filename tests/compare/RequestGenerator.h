@@ -24,6 +24,7 @@ enum class Kind {
   kLowOutput,    // an output so low that only the lower VCO frequencies serve it
   kWild,         // zero, negative, huge, inf, nan, text, short and long lists, odd counts
   kSlowVco,      // a VCO so slow that outputs are below 1 MHz
+  kBelowZero,    // a second input below 0, which leaves the VCO no lower limit; output 0 near 0
 };
 const char* KindName(Kind kind);
 

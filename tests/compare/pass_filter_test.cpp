@@ -247,7 +247,7 @@ INSTANTIATE_TEST_SUITE_P(Kinds, PassFilterProperty,
                          testing::Values(Kind::kCommon, Kind::kConstructed, Kind::kShifted,
                                          Kind::kRangeEnds, Kind::kMeetingEnds,
                                          Kind::kRoundFigures, Kind::kInfeasible, Kind::kLowOutput,
-                                         Kind::kSlowVco, Kind::kWild),
+                                         Kind::kSlowVco, Kind::kBelowZero, Kind::kWild),
                          [](const testing::TestParamInfo<Kind>& parameter) {
                            return KindName(parameter.param);
                          });

@@ -137,6 +137,7 @@ INSTANTIATE_TEST_SUITE_P(
                     Load{Kind::kInfeasible, 100, 8, 4000, 200, 6},
                     Load{Kind::kLowOutput, 60, 2, 5000, 150, 4},
                     Load{Kind::kSlowVco, 300, 5, 10000, 100, 3},
+                    Load{Kind::kBelowZero, 50, 3, 3000, 60, 5},
                     Load{Kind::kWild, 800, 3, 15000, 20, 3}),
     [](const testing::TestParamInfo<Load>& parameter) {
       return KindName(parameter.param.kind);

@@ -27,10 +27,14 @@ const std::vector<Known> kKnown = {
     {1440, 815.682, 0, {4.3564, 3.0293, 11.0163, 0.2797, 4.4406}},
     {1440, 591.559, 603.242, {1.2822, 4.0155, 4, 4.0309, 3.9574}},
     {1440, 699.648, 699.855, {4.3474, 4.2047, 4.4714, 4.0451, 4.2751}},
-    {360, 2.5202, 2.3752, {11.25, 2.8224, 2.805, 2.804, 5.3203}}};
+    {360, 2.5202, 2.3752, {11.25, 2.8224, 2.805, 2.804, 5.3203}},
+    {1440, 376.377, -297.117, {1.2659, 7.5431, 8.4367, 7.6734, 7.6834}},
+    {1440, 295.33, -0.02268, {-1.4362, 7.4964, 7.8701, 7.6399, 7.6834}},
+    {1.3521604449, 0.98631, 0, {0.01806, 0.01358, 0.009024, 0.01723, 0.02174}}};
 
 // A request whose outputs can be changed one by one.
 struct Place {
+  Clocks clocks;
   compare::Case drawn;
   std::vector<double> outFreqs;  // MHz
   std::vector<double> phases;    // degrees
@@ -47,6 +51,14 @@ double DrawFrequency(const Place& place, Random& random) {
     case 4: return other + 0.001 * random.Int(-500, 500);
     case 5: return other * random.Real(0.97, 1.03);
     default: return limits.clkoutMin * random.Real(0.8, 3);
+  }
+}
+
+void ChangeBelowZero(Place& place, Random& random) {
+  if (random.OneIn(2)) {
+    place.drawn.request.inFreq2 = -std::pow(10.0, random.Real(-2, 3));
+  } else {
+    place.outFreqs[0] = random.Real(-4, 4);
   }
 }
 
@@ -93,6 +105,11 @@ void WriteOutputs(Place& place) {
 }
 
 void Change(Place& place, Random& random) {
+  if (place.clocks == Clocks::kBelowZeroToo && random.OneIn(4)) {
+    ChangeBelowZero(place, random);
+    WriteOutputs(place);
+    return;
+  }
   switch (random.Int(0, 6)) {
     case 0:
     case 1: ChangeInputs(place.drawn.request, random); break;
@@ -102,8 +119,9 @@ void Change(Place& place, Random& random) {
   WriteOutputs(place);
 }
 
-Place Begin(const Device& device, int number, Random& random) {
+Place Begin(const Device& device, int number, Clocks clocks, Random& random) {
   Place place;
+  place.clocks = clocks;
   place.drawn.limits = device.limits;
   place.drawn.request.prim = device.prim;
   if (number % 2 == 0) {
@@ -123,9 +141,9 @@ Place Begin(const Device& device, int number, Random& random) {
 
 }  // namespace
 
-Summit Climb(const Device& device, int number, int steps) {
+Summit Climb(const Device& device, int number, int steps, Clocks clocks) {
   Random random(static_cast<std::uint64_t>(number));
-  Place best = Begin(device, number, random);
+  Place best = Begin(device, number, clocks, random);
   CountedCalls calls(FileOf(device));
   std::uint64_t most = calls.WorkOf(best.drawn.request);
   for (int step = 0; step < steps; ++step) {
@@ -144,7 +162,7 @@ Summit AskForNoPhase(const Device& device) {
   CountedCalls calls(FileOf(device));
   for (const int divider : {1, 2, 3, 4, 5, 8, 16, 64}) {
     for (const int slower : {1, 2, 4, 16}) {
-      Place place;
+      Place place{Clocks::kAboveZero, {}, {}, {}};
       place.drawn.limits = device.limits;
       plain::PllRequest& request = place.drawn.request;
       request.prim = device.prim;

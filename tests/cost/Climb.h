@@ -16,8 +16,11 @@ struct Summit {
   std::uint64_t work = 0;
   compare::Case drawn;
 };
+// With clocks below 0 a climb has such a second input, by which the VCO has no lower limit, and such
+// an output 0, which a shift brings above 0.
+enum class Clocks { kAboveZero, kBelowZeroToo };
 // Climbs are numbered; those with an even number begin at what is known.
-Summit Climb(const Device& device, int number, int steps);
+Summit Climb(const Device& device, int number, int steps, Clocks clocks = Clocks::kAboveZero);
 
 // The request with most work of those that ask for phases that nothing makes, so that whatever the
 // search finds is refused. All outputs are the same.

@@ -48,7 +48,7 @@ void PrintAnswer(const compare::PllPair& pair) {
 
 void PrintPllAnswers(int percent) {
   compare::PllPair pair;
-  for (int kind = 0; kind <= static_cast<int>(Kind::kSlowVco); ++kind) {
+  for (int kind = 0; kind <= static_cast<int>(Kind::kBelowZero); ++kind) {
     int far_left = kFarRequests * percent / 100;
     for (int i = 0; i < kPllRequests * percent / 100; ++i) {
       compare::Random random(static_cast<unsigned>(kind * 1'000'003 + i));

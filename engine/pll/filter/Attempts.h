@@ -23,24 +23,17 @@ class Attempts {
         count_(count),
         isUpward_(direction == Direction::kUpward),
         first_(OutFreq(0)),
-        perMHz_((isUpward_ ? 1.0 : -1.0) / kFudgeStep) {
-    const double last = first_ + (count - 1) / perMHz_;
-    slowest_ = std::min(first_, last) - kFudgeStep;
-    fastest_ = std::max(first_, last) + kFudgeStep;
-    margin_ = MarginInSteps(fastest_, kFudgeStep);
+        perMHz_((isUpward_ ? 1.0 : -1.0) / kFudgeStep),
+        aboveZero_{0, count - 1} {
+    while (!aboveZero_.IsEmpty() && !(OutFreq(SlowestAttempt()) > 0.0)) {
+      isUpward_ ? ++aboveZero_.first : --aboveZero_.last;
+    }
+    if (aboveZero_.IsEmpty()) return;
+    const double fastest = OutFreq(isUpward_ ? aboveZero_.last : aboveZero_.first);
+    margin_ = MarginInSteps(fastest, kFudgeStep);
+    slowest_ = std::max(OutFreq(SlowestAttempt()) - margin_ * kFudgeStep, 0.0);
+    fastest_ = fastest + margin_ * kFudgeStep;
   }
-
-  int Count() const { return count_; }
-
-  // Output 0 of an attempt, MHz: the very double of the search.
-  double OutFreq(int attempt) const {
-    const double fudge = FudgeOf(firstPass_ + attempt);
-    return (isUpward_ ? fudge : 0.0 - fudge) + requested_;
-  }
-
-  // Lower and upper bounds of output 0, MHz.
-  double Slowest() const { return slowest_; }
-  double Fastest() const { return fastest_; }
 
   // None when `first` is above `last`.
   struct Span {
@@ -48,6 +41,20 @@ class Attempts {
     int last;
     bool IsEmpty() const { return first > last; }
   };
+
+  // The attempts with an output 0 above 0. Others have no VCO above 0.
+  const Span& AboveZero() const { return aboveZero_; }
+
+  // Output 0 of an attempt, MHz: the very double of the search.
+  double OutFreq(int attempt) const {
+    const double fudge = FudgeOf(firstPass_ + attempt);
+    return (isUpward_ ? fudge : 0.0 - fudge) + requested_;
+  }
+
+  // Bounds of what output 0 comes to above 0, MHz; both are 0 where no attempt is.
+  double Slowest() const { return slowest_; }
+  double Fastest() const { return fastest_; }
+
   // The attempts with an output 0 from `low` to `high` MHz: those that may have it, and those that
   // have it for certain.
   class Between {
@@ -81,6 +88,8 @@ class Attempts {
   int FirstBelow(double frequency) const { return From((frequency - first_) * perMHz_ + margin_); }
 
  private:
+  int SlowestAttempt() const { return isUpward_ ? aboveZero_.first : aboveZero_.last; }
+
   // The way down the ranking spends its time here: no jumps, and no call to round.
   int From(double k) const {
     const double most = count_;
@@ -99,9 +108,10 @@ class Attempts {
   bool isUpward_;
   double first_;   // output 0 of attempt 0, MHz
   double perMHz_;  // attempts; negative in downward ones
-  double slowest_;
-  double fastest_;
-  double margin_;  // attempts
+  Span aboveZero_;
+  double slowest_ = 0.0;
+  double fastest_ = 0.0;
+  double margin_ = 0.0;  // attempts
 };
 
 }  // namespace Ip::Pll

@@ -13,8 +13,10 @@ namespace Ip::Pll {
 
 namespace {
 
-constexpr int kFirstChunk = 64;  // passes; small, since most fudges are
+// Passes. The first chunk is small, since most fudges are.
+constexpr int kFirstChunk = 64;
 constexpr int kChunkGrowth = 4;
+constexpr int kSmallestChunk = 16;  // where output 0 is near 0
 
 // An M and a D need a VCO and an input frequency on the same side of 0. Nobody has clocks below it;
 // the filter works above only.
@@ -69,7 +71,7 @@ class PassFilter::Walk {
  public:
   Walk(PassFilter& filter, const Attempts& attempts, const Attempts* next)
       : filter_(filter), attempts_(attempts), next_(next) {
-    undecided_.InsertRange(0, attempts.Count() - 1);
+    undecided_.InsertRange(attempts.AboveZero().first, attempts.AboveZero().last);
     undecided_.Remove(filter.maybe_);
     untouched_ = undecided_;
     filter_.later_.clear();
@@ -102,9 +104,8 @@ class PassFilter::Walk {
 
   // What is in the ranking before a key has put out what comes with it.
   bool Begin(ToleranceKey key) {
-    if (key == key_) return true;
+    if (key != key_) undecided_.Remove(putOut_);
     key_ = key;
-    undecided_.Remove(putOut_);
     return !undecided_.IsEmpty();
   }
 
@@ -191,7 +192,6 @@ class PassFilter::Walk {
   template <typename Visit>
   void VisitSteps(const RankedRange& range, Visit visit) const {
     const Div0Steps& steps = filter_.steps_;
-    if (!(attempts_.Fastest() > 0.0)) return;  // no VCO frequency above 0
     const int first = steps.Below(range.low / attempts_.Fastest());
     double divider = steps[first];
     for (int step = first; step < steps.Count(); ++step) {
@@ -223,7 +223,11 @@ int PassFilter::NextFrom(int pass) {
   if (hopeless_) return kPasses;
   if (!applies_) return pass;
   while (pass < kPasses) {
-    if (pass >= first_ + chunk_) WorkOutChunk(pass);
+    if (pass >= first_ + chunk_) {
+      const int longest = LongestChunk(pass);
+      if (longest == 0) return pass;
+      WorkOutChunk(pass, longest);
+    }
     const int next = maybe_.NextFrom(pass - first_);
     if (next < chunk_) return first_ + next;
     pass = first_ + chunk_;
@@ -231,10 +235,24 @@ int PassFilter::NextFrom(int pass) {
   return kPasses;
 }
 
-void PassFilter::WorkOutChunk(int firstPass) {
-  const int wanted = std::clamp(chunk_ * kChunkGrowth, kFirstChunk, kLargestChunk);
+// As many passes as leave output 0 on its side of 0 and within a factor of 2, in each direction that
+// comes into the VCO range: with more, many divider steps bring it to each range of the ranking. 0
+// where it is just above 0: there all steps may do so, and to run the pass is less.
+int PassFilter::LongestChunk(int firstPass) const {
+  const double fudge = FudgeOf(firstPass);
+  const double higher = (outFreq0_ + fudge) / kFudgeStep;
+  const double lower = (outFreq0_ - fudge) / kFudgeStep;
+  if (higher >= 0.0 && higher < kSmallestChunk) return 0;
+  const int smallest = higher < 0.0 ? 1 : kSmallestChunk;
+  const bool bothCount = lower > 0.0 && lower * kFudgeStep * kLargestDivider > imp_.pll.minAdjVco;
+  const double longest = bothCount ? std::min(higher, lower / 2.0) : std::fabs(higher);
+  return static_cast<int>(std::clamp<double>(longest, smallest, kLargestChunk));
+}
+
+void PassFilter::WorkOutChunk(int firstPass, int longest) {
+  const int wanted = std::max(chunk_ * kChunkGrowth, kFirstChunk);
   first_ = firstPass;
-  chunk_ = std::min(wanted, kPasses - firstPass);
+  chunk_ = std::min({wanted, longest, kPasses - firstPass});
   maybe_.Clear();
   left_.fill(kNothingLeft);
   const Attempts upward(outFreq0_, firstPass, chunk_, Direction::kUpward);

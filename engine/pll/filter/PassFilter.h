@@ -95,7 +95,8 @@ class PassFilter {
     bool mayHaveMAndD;
   };
 
-  void WorkOutChunk(int firstPass);
+  int LongestChunk(int firstPass) const;
+  void WorkOutChunk(int firstPass, int longest);
   bool HasMAndD(double vco) const;
 
   const VorkelImp& imp_;

@@ -158,8 +158,8 @@ TEST(DoubtText, LimitsThatCannotBeMeant) {
       DoubtText(Made(DoubtKind::kFewDividers, 16, 0, 32)),
       "ONE, 16, is so low that no divider can be above twice that, 32: its high and low times "
       "do not fit; the engine takes up to 128 all the same");
-  EXPECT_EQ(DoubtText(Made(DoubtKind::kLongSearch, 60, 0, 300)),
-            "ONE, 60, is below 300 MHz: so slow a VCO has many dividers for an output 0 that is "
+  EXPECT_EQ(DoubtText(Made(DoubtKind::kLongSearch, 6, 0, 10)),
+            "ONE, 6, is below 10 MHz: so slow a VCO has many dividers for an output 0 that is "
             "shifted; a call of the engine that finds nothing can take longer than 10 ms");
   EXPECT_EQ(DoubtText(Made(DoubtKind::kLongSearch, 20000, 0, 10000)),
             "ONE, 20000, is above 10000 MHz: so fast a VCO makes nothing else of an output 0 that is "
