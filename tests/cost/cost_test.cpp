@@ -60,7 +60,7 @@ TEST(Cost, OfTheBundledDevicesIsAsUsual) {
       const Summit summit = MostOn(device, 0, Times(4, 8), Times(25, 400));
       EXPECT_LT(summit.work, kUsual) << Describe(summit.drawn);
       EXPECT_LT(AskForNoPhase(device).work, kUsual) << FileOf(device);
-      const Summit odd = MostOn(device, 13, Times(5, 20), Times(25, 400), Clocks::kBelowZeroToo);
+      const Summit odd = MostOn(device, 16, Times(4, 8), Times(25, 400), Clocks::kBelowZeroToo);
       EXPECT_LT(odd.work, kUsual) << Describe(odd.drawn);
       most = std::max({most, summit.work, odd.work});
     }
