@@ -5,6 +5,7 @@
 #define VORKEL_ENGINE_PLL_FILTER_ATTEMPTS_H_
 
 #include <algorithm>
+#include <cmath>
 
 #include "engine/pll/Fudges.h"
 #include "engine/pll/filter/Rounding.h"
@@ -24,15 +25,11 @@ class Attempts {
         isUpward_(direction == Direction::kUpward),
         first_(OutFreq(0)),
         perMHz_((isUpward_ ? 1.0 : -1.0) / kFudgeStep),
-        aboveZero_{0, count - 1} {
-    while (!aboveZero_.IsEmpty() && !(OutFreq(SlowestAttempt()) > 0.0)) {
-      isUpward_ ? ++aboveZero_.first : --aboveZero_.last;
-    }
+        margin_(MarginInSteps(std::fabs(OutFreq(FastestAttempt())), kFudgeStep)),
+        aboveZero_(FindAboveZero()) {
     if (aboveZero_.IsEmpty()) return;
-    const double fastest = OutFreq(isUpward_ ? aboveZero_.last : aboveZero_.first);
-    margin_ = MarginInSteps(fastest, kFudgeStep);
     slowest_ = std::max(OutFreq(SlowestAttempt()) - margin_ * kFudgeStep, 0.0);
-    fastest_ = fastest + margin_ * kFudgeStep;
+    fastest_ = OutFreq(FastestAttempt()) + margin_ * kFudgeStep;
   }
 
   // None when `first` is above `last`.
@@ -88,7 +85,18 @@ class Attempts {
   int FirstBelow(double frequency) const { return From((frequency - first_) * perMHz_ + margin_); }
 
  private:
+  // Of those that are above 0, if any is.
+  int FastestAttempt() const { return isUpward_ ? count_ - 1 : 0; }
   int SlowestAttempt() const { return isUpward_ ? aboveZero_.first : aboveZero_.last; }
+
+  Span FindAboveZero() const {
+    Span span = {0, count_ - 1};
+    if (!(OutFreq(FastestAttempt()) > 0.0)) return {0, -1};
+    while (!(OutFreq(isUpward_ ? span.first : span.last) > 0.0)) {
+      isUpward_ ? ++span.first : --span.last;
+    }
+    return span;
+  }
 
   // The way down the ranking spends its time here: no jumps, and no call to round.
   int From(double k) const {
@@ -108,10 +116,10 @@ class Attempts {
   bool isUpward_;
   double first_;   // output 0 of attempt 0, MHz
   double perMHz_;  // attempts; negative in downward ones
+  double margin_;  // attempts
   Span aboveZero_;
-  double slowest_ = 0.0;
+  double slowest_ = 0.0;  // MHz
   double fastest_ = 0.0;
-  double margin_ = 0.0;  // attempts
 };
 
 }  // namespace Ip::Pll
