@@ -323,7 +323,8 @@ Case DrawBelowZero(Random& random) {
   if (!random.OneIn(4)) request.inFreq2 = -std::pow(10.0, random.Real(-1, 3));
   const std::size_t others = request.outFreqs.find(' ');
   const double most = random.OneIn(2) ? 0.1 : 3.0;
-  const std::string first = Number(random.OneIn(2) ? "%.3f" : "%.6f", random.Real(-most, most));
+  const char* const format = random.OneIn(2) ? "%.3f" : "%.6f";
+  const std::string first = Number(format, random.Real(-most, most));
   request.outFreqs = others == std::string::npos ? first : first + request.outFreqs.substr(others);
   return drawn;
 }
