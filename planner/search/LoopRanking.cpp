@@ -204,10 +204,10 @@ LoopSettings LoopRanking::SettingsOf(const LoopEntry& entry) const {
 }
 
 Candidate LoopRanking::CandidateOf(const LoopEntry& entry) const {
-  Candidate candidate{.settings = SettingsOf(entry),
-                      .within = IsMet(entry),
-                      .worst_error = Exact(entry.error),
-                      .max_jitter = std::nullopt};
+  Candidate candidate;
+  candidate.settings = SettingsOf(entry);
+  candidate.within = IsMet(entry);
+  candidate.worst_error = Exact(entry.error);
   if (entry.jitter != answer::kUnknownJitter) candidate.max_jitter = entry.jitter;
   return candidate;
 }

@@ -1,4 +1,6 @@
 // The spans of the VCO that an output leaves, kept for many questions.
+//
+// Tested by span_store_test.cpp.
 #ifndef VORKEL_PLANNER_SEARCH_SPANSTORE_H_
 #define VORKEL_PLANNER_SEARCH_SPANSTORE_H_
 

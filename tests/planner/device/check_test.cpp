@@ -201,6 +201,16 @@ TEST(Check, TellsLimitsThatLeaveNothing) {
   EXPECT_EQ(doubt.bound, Rational(25, 8));
   EXPECT_THAT(doubt.lost, ElementsAre(Primitive::kPll));
 
+  // No VCO is below its PFD.
+  doubt = TheDoubt(With(With(With(kTsyn, "CLKPFD_FREQ_MIN = 10", "CLKPFD_FREQ_MIN = 1300"),
+                             "CLKPFD_FREQ_MAX = 450", "CLKPFD_FREQ_MAX = 1400"),
+                        "MAX_LBW = 300", "MAX_LBW = 1350"));
+  EXPECT_EQ(doubt.kind, DoubtKind::kNeverReached);
+  EXPECT_EQ(doubt.keyword, "TSYN_VCOCLK_FREQ_MAX");
+  EXPECT_EQ(doubt.other, "TSYN_CLKPFD_FREQ_MIN");
+  EXPECT_EQ(doubt.bound, Rational(1300));
+  EXPECT_THAT(doubt.lost, ElementsAre(Primitive::kTsyn));
+
   doubt = TheDoubt(With(With(kTsyn, "CLKOUT_FREQ_MIN = 5", "CLKOUT_FREQ_MIN = 1300"),
                         "CLKOUT_FREQ_MAX = 800", "CLKOUT_FREQ_MAX = 1400"));
   EXPECT_EQ(doubt.keyword, "TSYN_CLKOUT_FREQ_MIN");

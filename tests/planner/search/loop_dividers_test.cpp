@@ -205,6 +205,27 @@ TEST(LoopDividers, HaveTheNextOneOfAKindOnEitherSide) {
   }
 }
 
+// A VCO of 48 MHz, and an output of 14 that may be from 10 to 20: 12 MHz is a fifth above the one end
+// and 16 a fifth below the other. Both are as far from 14, and the smaller divider is taken.
+TEST(LoopDividers, CompareMarginsExactly) {
+  const Rational little(1, 1'000'000'000'000'000);
+  for (const auto& [lowest, divider] :
+       {std::pair{Rational(10), 3}, {10 + little, 3}, {10 - little, 4}}) {
+    Case one;
+    one.m = kEighths;
+    one.d = 1;
+    one.limits.max_count = 64;
+    one.limits.output = {lowest, 20};
+    one.request.inputs = {48};
+    one.request.rank = Rank::kMargin;
+    one.request.tolerance = 200'000;
+    one.request.outputs.resize(1);
+    one.request.outputs[0].frequency = 14;
+    ExpectBest(one, AllThatKeepTheRange(one));
+    EXPECT_EQ(DividersOf(one).Choose(one.kind, one.m, one.d).divider, divider * kEighths);
+  }
+}
+
 TEST(LoopDividers, AreTheBestOfAll) {
   compare::Random random(1);
   int met = 0;

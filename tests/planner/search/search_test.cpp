@@ -14,6 +14,7 @@
 #include "hardware/Primitive.h"
 #include "plain_enumeration.h"
 #include "planner/answer/Evaluate.h"
+#include "planner/search/KruTask.h"
 #include "tests/planner/primitive_names.h"
 
 namespace planner::search {
@@ -192,6 +193,23 @@ TEST(Search, AnUnknownJitterIsNoError) {
   EXPECT_FALSE(found.best[0].within);
   EXPECT_EQ(found.best[0].worst_error, Rational(0));
   EXPECT_EQ(found.best[0].max_jitter, std::nullopt);
+}
+
+// 80 from 100 MHz is a fifth off 100, which are 2,000 of the usual 100 ppm.
+TEST(KruTask, IsExactAboutAnErrorFromElsewhere) {
+  const Device device = drawn::Bundled("vk40", "2");
+  Request request;
+  request.inputs = {100};
+  request.outputs.resize(1);
+  request.outputs[0].frequency = 100;
+  KruTask task(request, device, Primitive::kKruSp);
+  const KruError off = task.FrequencyError(0, {4, 5});
+  EXPECT_EQ(task.Exact(off), Rational(2000));
+  constexpr std::int64_t kFine = 1 << 30;
+  const KruError above = task.JustAbove(2000);
+  EXPECT_EQ(task.Exact(above), Rational(2000) + Rational(2001, kFine));
+  EXPECT_TRUE(task.Compare(above, off) > 0);
+  EXPECT_TRUE(task.Compare(above, above) == 0);
 }
 
 TEST(Search, AgreesOnSmallPlls) { CompareOnSmallDevices(Primitive::kPll, 150, 4); }

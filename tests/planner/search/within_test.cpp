@@ -490,6 +490,19 @@ void CompareRelaxedKrus(Primitive primitive) {
   EXPECT_GT(no, 3);
 }
 
+// A KRU has one input.
+TEST(Within, FindsNothingOfAPrimitiveThatCannotBeAsked) {
+  const Device device = drawn::Bundled("vk40", "2");
+  Request request;
+  request.inputs = {100, 101};
+  request.outputs.resize(1);
+  request.outputs[0].frequency = 200;
+  request.tolerance = 20'000;
+  EXPECT_TRUE(Within(request, device, Primitive::kPll).Find());
+  EXPECT_FALSE(Within(request, device, Primitive::kKruSp).Find());
+  EXPECT_FALSE(Within(request, drawn::Bundled("vk20", "2"), Primitive::kPll).Find());
+}
+
 TEST(Within, FindsWhatIsBeyondTheHardwareOfAKruSp) { CompareRelaxedKrus(Primitive::kKruSp); }
 TEST(Within, FindsWhatIsBeyondTheHardwareOfAKruClkgen) {
   CompareRelaxedKrus(Primitive::kKruClkgen);
