@@ -315,6 +315,20 @@ TEST_F(MultiplierSearchTest, OddFrequenciesHaveNoMAndD) {
   EXPECT_FALSE(Search(600, 100, kNoMinimum, kNan));
 }
 
+// The VCO is twice the input: M = 1 has a D of 0.5, which is none, M = 2 has 1.
+TEST_F(MultiplierSearchTest, FrequenciesOfAnySizeBeginWithTheSameM) {
+  for (const double inFreq : {1e-110, 1.0, 1e110}) {
+    ASSERT_TRUE(Search(2.0 * inFreq, inFreq, kNoMinimum, kInfinity)) << inFreq;
+    EXPECT_EQ(candidate_.m, 2.0);
+    EXPECT_EQ(candidate_.d, 1u);
+  }
+}
+
+TEST_F(MultiplierSearchTest, AVcoBelow0OfAnInputAbove0HasNone) {
+  EXPECT_FALSE(Search(-200.0, 100.0, -kInfinity, kInfinity));
+  EXPECT_EQ(trace_, "DLL - RK --> _prim = 1 \n");
+}
+
 TEST_F(MultiplierSearchTest, TwoNegativeFrequenciesMakeAPositiveD) {
   // inFreq / D is negative then, and below any minimum but a negative one.
   EXPECT_FALSE(Search(-600, -100));
