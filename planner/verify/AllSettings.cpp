@@ -62,11 +62,6 @@ bool BestSettings::IsBehind(std::size_t kind, const Ranked& bound) const {
 
 BestSettings BestOf(const Request& request, const Device& device, Primitive primitive) {
   BestSettings best(request);
-  const auto inputs = static_cast<int>(request.inputs.size());
-  const auto outputs = static_cast<int>(request.outputs.size());
-  if (inputs > hardware::MostInputs(primitive) || outputs > hardware::MostOutputs(primitive)) {
-    return best;
-  }
   if (hardware::IsLoop(primitive)) {
     TryLoops(request, device, primitive, &best);
   } else {

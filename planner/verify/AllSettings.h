@@ -44,7 +44,8 @@ class BestSettings {
   Tradeoffs tradeoffs_;
 };
 
-// Of the request with its outputs in this order. Empty when no settings keep the device's limits.
+// Of the request with its outputs in this order, of which the primitive has that many, and that
+// many inputs. Empty when no settings keep the device's limits.
 BestSettings BestOf(const Request& request, const Device& device, Primitive primitive);
 
 void TryLoops(const Request& request, const Device& device, Primitive primitive,

@@ -157,7 +157,9 @@ class ClaimReader {
       return false;
     }
     claim_.primitive = *primitive;
-    const std::size_t outputs = request_.outputs.size();
+    // A loop has an output for each place; the pins of a KRU go to those that are used.
+    const std::size_t outputs =
+        hardware::IsLoop(*primitive) ? request_.outputs.size() : request_.CountOfUsed();
     const std::size_t inputs = request_.inputs.size();
     if (claim_.solved && (outputs > static_cast<std::size_t>(hardware::MostOutputs(*primitive)) ||
                           inputs > static_cast<std::size_t>(hardware::MostInputs(*primitive)))) {

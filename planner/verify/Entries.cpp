@@ -1,6 +1,7 @@
 // Tested by verify_test.cpp.
 #include "planner/verify/Entries.h"
 
+#include <cassert>
 #include <nlohmann/json.hpp>
 #include <utility>
 #include <vector>
@@ -340,7 +341,7 @@ string WordOf(FindingKind kind) {
     case FindingKind::kNoSettings:
       return "no_settings";
   }
-  return "";
+  return (assert(false), "");  // not reached: those are all kinds
 }
 
 string WordOf(const Source& source) {

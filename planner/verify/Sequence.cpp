@@ -36,7 +36,8 @@ class Sequence {
       if (i < claims_.size() && claims_[i].number == number) ++i;
     }
     i = BehindTradeoffs(i);
-    if (i < claims_.size() && claims_[i].number == FirstOfEngine()) ++i;
+    const std::optional<std::size_t> of_engine = FirstOfEngine();
+    if (of_engine && i < claims_.size() && claims_[i].number == of_engine) ++i;
     return i;
   }
 

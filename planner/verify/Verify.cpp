@@ -167,26 +167,23 @@ class Work {
     return {{claim.settings, {}}, claim.order, {.source = {.search = true}}};
   }
 
-  // Whether an answer is one of a command that asks the engine for nothing else.
-  bool IsAsRequested(const Claim& claim) const {
-    if (document_.Find("answers")->items.size() != 1) return false;
-    if (claim.number || !claim.is_engine || !claim.variant.empty()) return false;
-    return std::any_of(kept_->standing.as_requested.begin(), kept_->standing.as_requested.end(),
-                       [&](const Candidate& one) {
-                         return one.ranked.settings == claim.settings && one.order == claim.order;
-                       });
+  // The answer of a command that asks the engine for nothing else; null when it is not one.
+  const Candidate* AsRequested(const Claim& claim) const {
+    if (document_.Find("answers")->items.size() != 1) return nullptr;
+    if (claim.number || !claim.is_engine || !claim.variant.empty()) return nullptr;
+    for (const Candidate& one : kept_->standing.as_requested) {
+      if (one.ranked.settings == claim.settings && one.order == claim.order) return &one;
+    }
+    return nullptr;
   }
 
   ordered_json Solved(const Claim& claim) const {
-    if (!IsAsRequested(claim)) return EntriesOfCandidate(CandidateOf(claim));
-    for (const Candidate& one : kept_->standing.as_requested) {
-      if (!(one.ranked.settings == claim.settings)) continue;
-      ordered_json entries = EntriesOfCandidate(one);
-      entries["number"] = nullptr;
-      entries["tradeoff"] = false;
-      return entries;
-    }
-    return {};
+    const Candidate* const as_requested = AsRequested(claim);
+    if (as_requested == nullptr) return EntriesOfCandidate(CandidateOf(claim));
+    ordered_json entries = EntriesOfCandidate(*as_requested);
+    entries["number"] = nullptr;
+    entries["tradeoff"] = false;
+    return entries;
   }
 
   ordered_json Unsolved(const Claim& claim) const {

@@ -45,6 +45,62 @@ TEST_P(AllSettings, OfDrawnDevices) {
   }
 }
 
+// --- What is left out early -------------------------------------------------------------------
+
+Ranked RankedWith(int rank_class, const Rational& error, double jitter, const Rational& margin) {
+  KruSettings set{.pins = {hardware::Pin::kClk0}};
+  return {set, {.rank_class = rank_class, .worst_error = error, .jitter = jitter,
+                .margin = margin, .vco = 0}};
+}
+
+// Both have a larger error than the one that is there and no less jitter; but it is the jitter
+// that is ranked by, and another kind has made the trade-off with 80 ps.
+TEST(BestSettings, BehindByJitter) {
+  for (const Rank rank : {Rank::kJitter, Rank::kVco}) {
+    Request request;
+    request.rank = rank;
+    BestSettings best(request);
+    best.Add(0, RankedWith(0, 2, 100, 0));
+    EXPECT_TRUE(best.IsBehind(0, 0, 3, 101, 0));
+    EXPECT_TRUE(best.IsBehind(0, 0, 3, 100, 0));
+    EXPECT_FALSE(best.IsBehind(0, 0, 2, 100, 0));
+    EXPECT_FALSE(best.IsBehind(0, 0, 3, 99, 0));
+    EXPECT_FALSE(best.IsBehind(1, 0, 3, 101, 0));
+    best.Add(1, RankedWith(0, 1, 80, 0));
+    EXPECT_FALSE(best.IsBehind(0, 0, 3, 99, 0));
+    // Behind the trade-off; of the kind it is the best jitter's equal, and no larger error.
+    EXPECT_FALSE(best.IsBehind(0, 0, 2, 100, 0));
+    EXPECT_TRUE(best.IsBehind(0, 0, 2, 101, 0));
+  }
+}
+
+TEST(BestSettings, BehindByMargin) {
+  Request request;
+  request.rank = Rank::kMargin;
+  BestSettings best(request);
+  best.Add(0, RankedWith(0, 2, 100, Rational(1, 2)));
+  EXPECT_TRUE(best.IsBehind(0, 0, 3, 100, 0.4));
+  EXPECT_FALSE(best.IsBehind(0, 0, 3, 100, 0.5));
+  EXPECT_FALSE(best.IsBehind(0, 0, 3, 100, 0.6));
+  // With no larger error, or less jitter, it could be a trade-off.
+  EXPECT_FALSE(best.IsBehind(0, 0, 2, 100, 0.4));
+  EXPECT_FALSE(best.IsBehind(0, 0, 3, 99, 0.4));
+}
+
+TEST(BestSettings, BehindByClassExactly) {
+  const Request request;
+  BestSettings best(request);
+  best.Add(0, RankedWith(1, 2, 100, 0));
+  // One that meets all could be the best; one that does not is compared.
+  EXPECT_FALSE(best.IsBehind(0, RankedWith(0, 3, 200, 0)));
+  EXPECT_FALSE(best.IsBehind(0, RankedWith(1, 1, 200, 0)));
+  EXPECT_TRUE(best.IsBehind(0, RankedWith(1, 3, 200, 0)));
+  best.Add(0, RankedWith(0, 5, 300, 0));
+  // Behind in the class, with whatever error and jitter.
+  EXPECT_TRUE(best.IsBehind(0, RankedWith(1, 1, 10, 9)));
+  EXPECT_FALSE(best.IsBehind(1, RankedWith(1, 1, 10, 9)));
+}
+
 INSTANTIATE_TEST_SUITE_P(Of, AllSettings, testing::ValuesIn(hardware::kPrimitives),
                          [](const auto& one) { return std::string(Name(one.param)); });
 

@@ -88,6 +88,37 @@ TEST(Recompute, AKru) {
   EXPECT_TRUE(answer.violations.empty());
 }
 
+// High and low times up to 60 make dividers up to 120: 121 is too large, 120 is not.
+TEST(Recompute, ADividerThatTheCountersCannotMake) {
+  const Request request = Ask({100}, {Rational(1000, 120), Rational(1000, 121)});
+  const Answer answer = Of(request, Loop(Primitive::kPll, 10, 1, {120, 121}));
+  ASSERT_EQ(answer.violations.size(), 1u);
+  const Finding& finding = answer.violations[0];
+  EXPECT_EQ(finding.kind, FindingKind::kDividerTooLarge);
+  EXPECT_EQ(finding.primitive, Primitive::kPll);
+  EXPECT_EQ(finding.quantity, Quantity::kDivider);
+  EXPECT_EQ(finding.output, 1);
+  EXPECT_EQ(finding.value, Rational(121));
+  EXPECT_EQ(finding.range, (Range{1, 60}));
+  EXPECT_FALSE(answer.within);
+}
+
+// Output 0 of a KRU_CLKGEN is on CLKFX whatever its phase. None, and one of 0, is not told.
+TEST(Recompute, PhaseOfOutput0OfAKruClkgen) {
+  const KruSettings set{.primitive = Primitive::kKruClkgen, .m = 5, .d = 3, .pins = {Pin::kClkfx}};
+  Request request = Ask({60}, {100});
+  EXPECT_NE(Of(request, set).notes.front().kind, FindingKind::kOutput0Phase);
+  request.outputs[0].phase = 0;
+  EXPECT_NE(Of(request, set).notes.front().kind, FindingKind::kOutput0Phase);
+  request.outputs[0].phase = -45;
+  const Finding note = Of(request, set).notes.front();
+  EXPECT_EQ(note.kind, FindingKind::kOutput0Phase);
+  EXPECT_EQ(note.primitive, Primitive::kKruClkgen);
+  EXPECT_EQ(note.quantity, Quantity::kPhase);
+  EXPECT_EQ(note.output, 0);
+  EXPECT_EQ(note.value, Rational(-45));
+}
+
 TEST(Recompute, OutputsThatHaveMoved) {
   const Request request = Ask({100}, {250, 125});
   const Answer answer = Recompute(request, HandMade(), Loop(Primitive::kPll, 10, 1, {8, 4}),

@@ -4,8 +4,11 @@
 #include <gtest/gtest.h>
 
 #include <string>
+#include <utility>
 #include <vector>
 
+#include "planner/answer/Evaluate.h"
+#include "planner/engine/Ask.h"
 #include "verify_support.h"
 
 namespace planner::verify_test {
@@ -233,6 +236,146 @@ TEST(Verify, HugeNumbersAreNamed) {
   ASSERT_EQ(wrong.size(), 1u);
   EXPECT_EQ(wrong[0].kind, DiscrepancyKind::kAbsurd);
   EXPECT_EQ(wrong[0].path, "answers[0].settings.m_eighths");
+}
+
+TEST(Verify, AnswersMustBeObjects) {
+  const string text = ByHand();
+  const std::size_t begin = text.find("\"answers\": [") + 12;
+  const auto wrong = Wrong(text.substr(0, begin) + "7], \"tradeoffs_cut\": []}");
+  ASSERT_EQ(wrong.size(), 1u) << Text(wrong);
+  EXPECT_EQ(wrong[0].kind, DiscrepancyKind::kWrongType);
+  EXPECT_EQ(wrong[0].path, "answers[0]");
+  EXPECT_EQ(wrong[0].found, "7");
+  EXPECT_EQ(wrong[0].expected, "object");
+}
+
+TEST(Verify, APrimitiveThatTheDeviceDoesNotHave) {
+  const string pll = With(ByHand(), R"("small-1",)", R"("small-1", "primitive": "PLL",)");
+  EXPECT_EQ(Text(Wrong(pll)), Text({}));
+  const auto wrong = Wrong(With(pll, R"("primitive": "PLL",)", R"("primitive": "TSYN",)"));
+  ASSERT_EQ(wrong.size(), 1u) << Text(wrong);
+  EXPECT_EQ(wrong[0].kind, DiscrepancyKind::kNoSetting);
+  EXPECT_EQ(wrong[0].path, "request.primitive");
+  EXPECT_EQ(wrong[0].found, "\"TSYN\"");
+  EXPECT_EQ(wrong[0].line, 9);
+}
+
+// The only one wrong, as nothing of settings that there are not is compared. CLKFX goes without.
+TEST(Verify, FeedbackThatIsAskedFor) {
+  const auto device = DeviceOf(NarrowKrus());
+  const string json = Compared(RequestOf({{"--in", "50"}, {"--out", "83.3"}, {"--feedback", "1"},
+                                          {"--primitive", "kru_sp"}}),
+                               device);
+  EXPECT_EQ(Text(verify::Verify(json, device)), Text({}));
+  // Behind the answers' begin, as the request has it as well.
+  string without = json;
+  const std::size_t place = json.find(R"("feedback": true)", json.find("\"answers\""));
+  ASSERT_NE(place, string::npos);
+  const auto wrong =
+      verify::Verify(without.replace(place, 16, R"("feedback": false)"), device);
+  ASSERT_EQ(wrong.size(), 1u) << Text(wrong);
+  EXPECT_EQ(wrong[0].kind, DiscrepancyKind::kNoSetting);
+  EXPECT_EQ(wrong[0].path, "answers[0].settings.feedback");
+  EXPECT_EQ(wrong[0].found, "false");
+  EXPECT_EQ(wrong[0].expected, "true");
+}
+
+// --- Findings ---------------------------------------------------------------------------------
+
+// A right plan that is wrong in that place when `word`, which it has once, is another one.
+void ExpectHeld(const string& json, const planner::Device& device, const string& name,
+                const string& word, const string& other) {
+  verify::Verifier verifier(device, &report::JsonSentences());
+  EXPECT_EQ(Text(verifier.Verify(json)), Text({}));
+  const string right = "\"" + name + "\": " + word;
+  EXPECT_EQ(json.find(right), json.rfind(right)) << right;
+  const auto wrong = verifier.Verify(With(json, right, "\"" + name + "\": " + other));
+  ASSERT_EQ(wrong.size(), 1u) << right << ": " << Text(wrong);
+  EXPECT_TRUE(wrong[0].path.ends_with("." + name)) << wrong[0].path;
+  EXPECT_EQ(wrong[0].found, other);
+  EXPECT_EQ(wrong[0].expected, word);
+}
+
+// High and low times up to 16 make dividers up to 32.
+TEST(Verify, ADividerTooLarge) {
+  const auto device = DeviceOf(With(kOnePll, "O_MAX_HT_LT = 64", "O_MAX_HT_LT = 16"));
+  const Request request = RequestOf({{"--in", "100"}, {"--out", "20"}, {"--device", "small"}});
+  LoopSettings set{.primitive = Primitive::kPll, .m = 64, .d = 1, .outputs = {{.divider = 320}}};
+  const Answer answer = answer::Evaluate(request, device, set, Source{});
+  const string json = report::Json(request, device, {{&answer}});
+  ExpectHeld(json, device, "kind", R"("divider_too_large")", R"("outside_limit")");
+  ExpectHeld(json, device, "quantity", R"("divider")", R"("frequency")");
+  ExpectHeld(json, device, "value_exact", R"("40")", R"("39")");
+  ExpectHeld(json, device, "highest_exact", R"("16")", R"("32")");
+}
+
+// Without a shape to choose by, the engine does not look at the VCO.
+TEST(Verify, PreferMaxVcoUnused) {
+  const auto device = DeviceOf(kOnePll);
+  const Request request = RequestOf({{"--in", "100"}, {"--out", "200"}, {"--prefer-max-vco", "1"},
+                                     {"--device", "small"}});
+  const Answer answer =
+      engine::AskOne(request, device, Primitive::kPll, engine::AsRequested(request));
+  const string json = report::Json(request, device, {{&answer}});
+  ExpectHeld(json, device, "kind", R"("prefer_max_vco_unused")", R"("whole_divider_unused")");
+}
+
+// CLKFX of 50 MHz: 5/3 make 83.3.
+TEST(Verify, WhatAKruDoesNotUse) {
+  const auto device = DeviceOf(NarrowKrus());
+  const plan::Plan plan =
+      plan::Make(RequestOf({{"--in", "50"}, {"--out", "83.3"}, {"--phase", "30"},
+                            {"--bandwidth", "low"}, {"--primitive", "kru_clkgen"}}),
+                 device);
+  const string json =
+      report::Json(plan.request, device, report::PlanEntries(plan, 1), plan.front_cut);
+  ExpectHeld(json, device, "kind", R"("output_0_phase")", R"("off_target")");
+  ExpectHeld(json, device, "kind", R"("bandwidth_unused")", R"("output_0_phase")");
+}
+
+// The pins of a KRU are six, and go to the outputs that are used.
+TEST(Verify, OutputsTooManyForAKru) {
+  const auto device = DeviceOf(NarrowKrus());
+  const auto json = [&](const char* out) {
+    return Compared(RequestOf({{"--in", "50"}, {"--out", out}}), device);
+  };
+  const string six = json("83.3,83.3,83.3,-,83.3,83.3,83.3");
+  EXPECT_NE(six.find("\"solved\": true"), string::npos);
+  EXPECT_EQ(Text(verify::Verify(six, device)), Text({}));
+  // Without a range of CLKFXDV there is no KRU_CLKGEN.
+  string kru_sp = NarrowKrus();
+  for (const char* const line : {"D_KRU_CLKFXDV_CLKIN_DIVIDE_BY_2_FALSE_MINPERIOD = 23\n",
+                                 "D_KRU_CLKFXDV_CLKIN_DIVIDE_BY_2_FALSE_MAXPERIOD = 25\n"}) {
+    kru_sp = With(kru_sp, line, "");
+  }
+  const auto with_pll = DeviceOf(kOnePll + kru_sp);
+  const plan::Plan plan = plan::Make(
+      RequestOf({{"--in", "100"}, {"--out", "200,200,200,200,200,200,200"}}), with_pll);
+  ASSERT_TRUE(plan.IsSolved());
+  ASSERT_EQ(plan.refused.size(), 1u);
+  const string seven = report::Json(plan.request, with_pll, report::CompareEntries(plan));
+  ExpectHeld(seven, with_pll, "kind", R"("too_many_outputs")", R"("too_many_inputs")");
+  ExpectHeld(seven, with_pll, "value_exact", R"("7")", R"("8")");
+  ExpectHeld(seven, with_pll, "highest_exact", R"("6")", R"("7")");
+}
+
+// None is solved, and they stand in the order of the primitives.
+TEST(Verify, UnsolvedPrimitivesInTheirOrder) {
+  for (const string& limits : {NarrowKrus(), string(kOnePll) + NarrowKrus()}) {
+    const auto device = DeviceOf(limits);
+    const plan::Plan plan = plan::Make(RequestOf({{"--in", "100,200"}, {"--out", "200"}}), device);
+    auto entries = report::CompareEntries(plan);
+    ASSERT_GE(entries.size(), 2u);
+    const auto verified = [&] {
+      return verify::Verify(report::Json(plan.request, device, entries, plan.front_cut), device);
+    };
+    EXPECT_EQ(Text(verified()), Text({}));
+    std::swap(entries[entries.size() - 1], entries[entries.size() - 2]);
+    const auto wrong = verified();
+    ASSERT_EQ(wrong.size(), 1u) << Text(wrong);
+    EXPECT_EQ(wrong[0].kind, DiscrepancyKind::kMisplaced);
+    EXPECT_EQ(wrong[0].path, "answers[" + std::to_string(entries.size() - 1) + "]");
+  }
 }
 
 // What the planner makes of some requests, for all that its three documents have.
