@@ -2,6 +2,7 @@
 #include "planner/read/JsonTree.h"
 
 #include <algorithm>
+#include <cassert>
 #include <cstddef>
 #include <utility>
 
@@ -55,12 +56,10 @@ class Reader {
     return node;
   }
 
-  // Line and column of a place; places are asked for in rising order but for a few.
+  // Line and column of a place. Places are asked for in rising order: those of values and names as
+  // they are read, and at the end that of a fault, which stands behind the last one of them.
   Position PositionOf(std::size_t place) {
-    if (place < counted_) {
-      counted_ = 0;
-      position_ = {};
-    }
+    assert(place >= counted_);
     while (counted_ < place) {
       const Letter letter = LetterAt(text_, counted_);
       if (letter.code == U'\n') {

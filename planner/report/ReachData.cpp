@@ -194,11 +194,12 @@ std::vector<string> PointCells(const Reach& reach, const Request& request, const
 std::vector<string> GapCells(const Reach& reach, const reach::Gap& gap) {
   const Rational below = reach.FrequencyOf(gap.below);
   const Rational above = reach.FrequencyOf(gap.above);
+  const Rational width = above - below;
   return {string(Name(reach.primitive())),
           CsvNumber(below.ToDouble()),
           CsvNumber(above.ToDouble()),
-          CsvNumber((above - below).ToDouble()),
-          CsvNumber(Ppm(above - below, below).ToDouble()),
+          CsvNumber(width.ToDouble()),
+          CsvNumber(Ppm(width, below).ToDouble()),
           Quotient(below),
           Quotient(above)};
 }

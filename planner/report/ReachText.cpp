@@ -210,13 +210,14 @@ class TextWriter final : public Writer {
   void AddGap(const Reach& reach, const reach::Gap& gap) override {
     const Rational below = reach.FrequencyOf(gap.below);
     const Rational above = reach.FrequencyOf(gap.above);
+    const Rational width = above - below;
     if (!std::exchange(has_heading_, true)) {
       Put(Row({{"above MHz", 13}, {"and below MHz", 15}, {"wide MHz", 13}, {"ppm", 13}}));
     }
     Put(Row({{Fixed(below, kFrequencyDecimals), 13},
              {Fixed(above, kFrequencyDecimals), 15},
-             {Fixed(above - below, kFrequencyDecimals), 13},
-             {Fixed((above - below) / below * 1'000'000, 2), 13}}));
+             {Fixed(width, kFrequencyDecimals), 13},
+             {Fixed(width / below * 1'000'000, 2), 13}}));
   }
   void AddCount(const Reach& reach, const reach::Counted& counted) override {
     const auto cell = [&](const std::optional<Point>& point) {

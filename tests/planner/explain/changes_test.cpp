@@ -7,6 +7,8 @@
 #include <cmath>
 #include <optional>
 #include <random>
+#include <string>
+#include <vector>
 
 #include "tests/planner/answer/bundled_device.h"
 #include "tests/planner/explain/ExplainTest.h"
@@ -130,6 +132,41 @@ TEST(Changes, ThereAreNoneWhereNothingHelps) {
   // The other output is beyond its range, whatever this one is.
   Question question = QuestionOf({100}, {100, 1000});
   EXPECT_THAT(ChangesOf(question, {Kind::kFrequency, 0}), IsEmpty());
+}
+
+// A KRU_SP from 100 MHz. Nothing can be on CLKFX or CLK90. CLK2X has a range only with feedback
+// from it, and no room there for 100 MHz, twice half of the input: these are on CLK0.
+Question KruQuestion(const std::vector<Rational>& outputs) {
+  Question question = QuestionOf({100}, outputs);
+  PinLimits pins;
+  for (const hardware::PinFacts& facts : hardware::kPins) {
+    pins.usual[std::string(facts.limits)] = {1, 2};
+    pins.doubled[std::string(facts.limits)] = {1, 2};
+  }
+  pins.usual["CLK0"] = {5, 105};
+  pins.doubled["CLK0"] = {99, 400};
+  pins.doubled["CLK2X"] = {190, 204};
+  question.device.primitives = {Primitive::kKruSp};
+  question.device.kru_sp = pins;
+  question.primitive = Primitive::kKruSp;
+  question.request.input_tolerance = 80000;
+  return question;
+}
+
+// 100 MHz are 5 percent below 105. 200 MHz on output 0 need feedback from CLK2X, with which they
+// are 2 percent below 204; 100 MHz beside them are 1 percent above 99.
+TEST(Changes, TheToleranceOfTheInputKeepsTheRangesOfThePins) {
+  const auto tolerance = [](const std::vector<Rational>& outputs) {
+    const std::vector<Change> changes = ChangesOf(KruQuestion(outputs), {Kind::kInputTolerance});
+    EXPECT_EQ(changes.size(), 1u);
+    if (changes.empty()) return Rational(-1);
+    EXPECT_EQ(changes[0].kind, ChangeKind::kInputTolerance);
+    EXPECT_EQ(changes[0].before, Rational(80000));
+    return changes[0].value;
+  };
+  EXPECT_EQ(tolerance({100}), Rational(50000));
+  EXPECT_EQ(tolerance({200}), Rational(20000));
+  EXPECT_EQ(tolerance({200, 100}), Rational(10000));
 }
 
 // The smallest common tolerance, by trying every M, D and the two dividers around each output.

@@ -3,6 +3,9 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <utility>
+#include <vector>
+
 namespace planner::explain {
 namespace {
 
@@ -81,6 +84,43 @@ TEST(Demands, WhatIsNotKeptIsLeftOut) {
   expected.vco = true;
   EXPECT_EQ(OnlyWith(demands, 0b010), expected);
   EXPECT_EQ(OnlyWith(demands, 0b111), search::Relaxed{});
+}
+
+// Each kind has one member of its own, and those of an output are of that one.
+TEST(Demands, EachIsLeftOutByItself) {
+  using search::Relaxed;
+  const std::vector<std::pair<Kind, bool Relaxed::OfOutput::*>> of_outputs = {
+      {Kind::kFrequency, &Relaxed::OfOutput::frequency},
+      {Kind::kPhase, &Relaxed::OfOutput::phase},
+      {Kind::kDuty, &Relaxed::OfOutput::duty},
+      {Kind::kJitter, &Relaxed::OfOutput::jitter},
+      {Kind::kOutputRange, &Relaxed::OfOutput::range}};
+  for (const auto& [kind, member] : of_outputs) {
+    Relaxed expected;
+    expected.outputs[2].*member = true;
+    Relaxed relaxed;
+    Relax({kind, 2}, &relaxed);
+    EXPECT_EQ(relaxed, expected) << static_cast<int>(kind);
+  }
+  const std::vector<std::pair<Kind, bool Relaxed::*>> of_all = {
+      {Kind::kVco, &Relaxed::vco},
+      {Kind::kPfd, &Relaxed::pfd},
+      {Kind::kM, &Relaxed::m},
+      {Kind::kD, &Relaxed::d},
+      {Kind::kDividers, &Relaxed::dividers},
+      {Kind::kWhole, &Relaxed::whole},
+      {Kind::kNothingMoves, &Relaxed::nothing_moves},
+      {Kind::kBandwidth, &Relaxed::bandwidth},
+      {Kind::kFeedback, &Relaxed::feedback},
+      {Kind::kSecondInput, &Relaxed::second_input},
+      {Kind::kInputTolerance, &Relaxed::input_tolerance}};
+  for (const auto& [kind, member] : of_all) {
+    Relaxed expected;
+    expected.*member = true;
+    Relaxed relaxed;
+    Relax({kind}, &relaxed);
+    EXPECT_EQ(relaxed, expected) << static_cast<int>(kind);
+  }
 }
 
 }  // namespace

@@ -241,6 +241,25 @@ TEST(OptionsOfARequest, LeaveOutWhatIsUsual) {
             "--in 100/3 --out 148.5,- --prefer-max-vco --tolerance 5,20");
 }
 
+TEST(OptionsOfADraft, AToleranceOfTheInputIsInTheWordsOfTheUser) {
+  Mistakes mistakes;
+  const std::vector<Option> options = {
+      {"--input-tolerance", "50.0"}, {"--in", "100"}, {"--out", "50"}};
+  EXPECT_EQ(Words(OptionsOf(ReadOptions(options, &mistakes))),
+            "--in 100 --out 50 --input-tolerance 50.0");
+}
+
+// 50.5 ppm are more than none, which is usual; the one of the outputs is another.
+TEST(OptionsOfARequest, SayTheToleranceOfTheInput) {
+  Request request;
+  request.inputs = {100};
+  request.outputs.resize(1);
+  request.outputs[0].frequency = 50;
+  request.input_tolerance = Rational(101, 2);
+  request.tolerance = 20;
+  EXPECT_EQ(Words(OptionsOf(request)), "--in 100 --out 50 --input-tolerance 50.5 --tolerance 20");
+}
+
 // What is written is read as the same request: drawn requests, there and back.
 TEST(OptionsOfARequest, AreReadAsTheSame) {
   std::mt19937 random(1);
@@ -269,6 +288,7 @@ TEST(OptionsOfARequest, AreReadAsTheSame) {
       request.outputs.push_back(output);
     }
     request.input_jitter = draw(500);
+    if (draw(2) == 0) request.input_tolerance = Rational(draw(1000), 7);
     if (draw(2) == 0) request.tolerance = draw(300);
     if (draw(2) == 0) request.phase_tolerance = draw(10);
     request.max_jitter = maybe(0, 500);
@@ -301,6 +321,7 @@ TEST(OptionsOfARequest, AreReadAsTheSame) {
       ASSERT_EQ(Shape(request.MaxJitterOf(one)), Shape(again.MaxJitterOf(other)));
     }
     ASSERT_EQ(again.input_jitter, request.input_jitter);
+    ASSERT_EQ(again.input_tolerance, request.input_tolerance) << Words(options);
     ASSERT_EQ(again.bandwidth, request.bandwidth);
     ASSERT_EQ(again.primitive, request.primitive);
     ASSERT_EQ(again.feedback, request.feedback);

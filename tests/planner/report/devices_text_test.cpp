@@ -78,6 +78,16 @@ TEST(DeviceText, AllLimitsOfADevice) {
             "  the nearer to 50 % are the duty cycles that it has.\n");
 }
 
+TEST(DeviceText, WhatAKruClkgenCanBeSetTo) {
+  Description description = Round();
+  description.grades[1].primitives = {Primitive::kKruClkgen};
+  const std::string text = DeviceText(description, {"b"}, Style{false, 200});
+  EXPECT_NE(text.find("\nnote: M of CLKFX is 2 to 256, D 1 to 256. CLKFXDV divides CLKFX by 2, 4, "
+                      "8, 16 or 32.\n"),
+            std::string::npos)
+      << text;
+}
+
 TEST(DeviceText, OneGrade) {
   const std::string text = DeviceText(Round(), {"a"}, {});
   EXPECT_NE(text.find("\nPLL                     unit   grade a\n"), std::string::npos) << text;

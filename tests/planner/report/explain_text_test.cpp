@@ -184,6 +184,28 @@ TEST_F(ExplainTextTest, WithoutOutputsAndInAnotherOrder) {
                                 "--any-order\n"));
 }
 
+// Where a primitive cannot be asked, nothing else of it is told.
+TEST_F(ExplainTextTest, APrimitiveThatCannotBeAsked) {
+  Tsyn().primitive = Primitive::kKruSp;
+  Tsyn().refusals = {{.kind = FindingKind::kTooManyInputs,
+                      .primitive = Primitive::kKruSp,
+                      .value = 2,
+                      .range = {0, 1}},
+                     {.kind = FindingKind::kTooManyOutputs,
+                      .primitive = Primitive::kKruSp,
+                      .value = 7,
+                      .range = {0, 6}}};
+  Tsyn().conflicts = {Between({{DemandKind::kFrequency, 0}}, {Frequency(0, 201, 200)}, true)};
+  EXPECT_EQ(Text(),
+            "Not possible as it stands with any primitive of vk40b484-2.\n"
+            "\n"
+            "KRU_SP\n"
+            "              A KRU_SP has 1 input clock, not 2.\n"
+            "              A KRU_SP has at most 6 outputs, not 7.\n"
+            "\n"
+            "None of the stock oscillators makes every frequency exact.\n");
+}
+
 TEST_F(ExplainTextTest, QuestionsThatCameToTheirEnd) {
   Tsyn().is_complete = false;
   Tsyn().questions = 4096;
@@ -214,6 +236,19 @@ TEST(ChangeWordsTest, ANumberThatHasToBeAllowedIsRoundedUp) {
   EXPECT_EQ(ChangeWords(To(ChangeKind::kJitter, {DemandKind::kJitter, -1}, Rational(1234561, 10000)),
                         Primitive::kPll),
             "all jitter limits at 123.457 ps");
+}
+
+// Two decimals, and where these would be 0, so many that there is one digit.
+TEST(ChangeWordsTest, AToleranceOfTheInputIsRoundedDown) {
+  const auto words = [](const Rational& value) {
+    return ChangeWords(To(ChangeKind::kInputTolerance, {DemandKind::kInputTolerance}, value),
+                       Primitive::kPll);
+  };
+  EXPECT_EQ(words(Rational(12349, 1000)), "an input that is off by at most 12.34 ppm");
+  EXPECT_EQ(words(Rational(1, 100)), "an input that is off by at most 0.01 ppm");
+  EXPECT_EQ(words(Rational(99, 10000)), "an input that is off by at most 0.009 ppm");
+  EXPECT_EQ(words(Rational(129, 1000000)), "an input that is off by at most 0.0001 ppm");
+  EXPECT_EQ(words(0), "an input without a tolerance");
 }
 
 TEST(ChangeWordsTest, BeyondTheRangesOfTheDevice) {

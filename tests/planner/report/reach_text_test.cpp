@@ -108,6 +108,26 @@ TEST_F(ReachText, Counts) {
             "primitive,count,lowest,highest\r\nPLL,0,,\r\n");
 }
 
+// A TSYN whose M is 44.125, so that the VCO is at 27 x 353 / 8 MHz; divided by 65 / 8 that is
+// 27 x 353 / 65. One eighth more or less is out of the ranges.
+TEST_F(ReachText, EighthsAreFractionsAsData) {
+  device_.primitives = {Primitive::kTsyn};
+  device_.tsyn = LoopLimits{{1190, 1192}, {27, 27}, {27, 27}, {146, 147}, {146, 147}, 64, 0};
+  std::string text;
+  const auto keep = [&](const std::string& piece) {
+    text += piece;
+    return true;
+  };
+  EXPECT_EQ(WriteReach(request_, device_, {}, {Primitive::kTsyn}, ReachForm::kJson, keep), 1);
+  const ordered_json point = ordered_json::parse(text)["primitives"][0]["frequencies"][0];
+  EXPECT_EQ(point["frequency_exact"], "9531/65");
+  EXPECT_EQ(point["vco_exact"], "9531/8");
+  EXPECT_EQ(point["m"], ordered_json(44.125));
+  EXPECT_EQ(point["m_eighths"], 353);
+  EXPECT_EQ(point["divider"], ordered_json(8.125));
+  EXPECT_EQ(point["divider_eighths"], 65);
+}
+
 // From 1188 / 7 to 1188 / 6 is a sixth of the lower one, and from 1188 / 8 to 1188 / 7 a seventh.
 TEST_F(ReachText, Gaps) {
   EXPECT_EQ(Written({.kind = Kind::kGaps, .most = 5}, ReachForm::kText),
@@ -127,7 +147,9 @@ TEST_F(ReachText, Gaps) {
   EXPECT_EQ(gap["below"]["divider"], 7);
   EXPECT_EQ(gap["above"]["divider"], 6);
   const std::string rows = Written({.kind = Kind::kGaps, .most = 1}, ReachForm::kCsv);
-  EXPECT_EQ(rows.substr(rows.rfind(",1188/7")), ",1188/7,198\r\n");
+  EXPECT_EQ(rows,
+            "primitive,below,above,width,width_ppm,below_exact,above_exact\r\n"
+            "PLL,169.71428571428572,198,28.285714285714285,166666.66666666666,1188/7,198\r\n");
 }
 
 // 148.5 MHz are 1 percent less than 150.
