@@ -8,6 +8,7 @@
 #include <cstdlib>
 #include <optional>
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include "drawn.h"
@@ -193,6 +194,28 @@ TEST(Search, AnUnknownJitterIsNoError) {
   EXPECT_FALSE(found.best[0].within);
   EXPECT_EQ(found.best[0].worst_error, Rational(0));
   EXPECT_EQ(found.best[0].max_jitter, std::nullopt);
+}
+
+// CLKFX goes from 5 to 400 MHz, so of the frequencies around 77 MHz the slowest has the largest
+// margin. Within 5 percent that is the smallest M / D from 3.6575 on: with M and D up to 32 it is 11 / 3,
+// with both up to 256 139 / 38. Settings with smaller errors come first in the search.
+TEST(Search, TheWidestMarginOfAKruIsNotTheFirst) {
+  const Device device = drawn::Bundled("vk40", "2");
+  Request request;
+  request.inputs = {20};
+  request.outputs.resize(1);
+  request.outputs[0].frequency = 77;
+  request.tolerance = 50'000;
+  request.rank = Rank::kMargin;
+  for (const auto& [primitive, m, d] : {std::tuple{Primitive::kKruSp, 11, 3},
+                                        std::tuple{Primitive::kKruClkgen, 139, 38}}) {
+    const Found found = Search(request, device, primitive);
+    ASSERT_EQ(found.best.size(), 1u);
+    EXPECT_TRUE(found.best[0].within);
+    const auto& settings = std::get<KruSettings>(found.best[0].settings);
+    EXPECT_EQ(settings.m, m);
+    EXPECT_EQ(settings.d, d);
+  }
 }
 
 // 80 from 100 MHz is a fifth off 100, which are 2,000 of the usual 100 ppm.
