@@ -149,8 +149,9 @@ string SettingsNote(Primitive primitive) {
     case Primitive::kKruClkgen:
       break;
   }
-  std::vector<string> divides;
-  for (const int halves : hardware::kClkfxdvHalves) divides.push_back(number(halves / 2));
+  std::vector<string> divides(hardware::kClkfxdvHalves.size());
+  std::transform(hardware::kClkfxdvHalves.begin(), hardware::kClkfxdvHalves.end(), divides.begin(),
+                 [&number](int halves) { return number(halves / 2); });
   return kru + "CLKFXDV divides CLKFX by " + Enumerated(divides, "or") + ".";
 }
 

@@ -110,8 +110,8 @@ class Krus {
     set_.pins.assign(request.outputs.size(), Pin::kNone);
     for (const Output& output : request.outputs) {
       has_phase_ = has_phase_ || (output.used && output.phase);
-      rough_.push_back(
-          {output.frequency.ToDouble(), output.tolerance.value_or(request.tolerance).ToDouble()});
+      const Rational tolerance = output.tolerance.value_or(request.tolerance);
+      rough_.push_back({output.frequency.ToDouble(), tolerance.ToDouble()});
     }
   }
 

@@ -146,8 +146,8 @@ class ClaimReader {
     claim_.is_tradeoff = read_.Flag(node_, claim_.path, "tradeoff");
     if (const Node* const number = node_.Find("number");
         number && number->type != NodeType::kNull) {
-      claim_.number =
-          static_cast<std::size_t>(read_.Count(node_, claim_.path, "number", 1, 1'000'000));
+      const auto place = read_.Count(node_, claim_.path, "number", 1, 1'000'000);
+      claim_.number = static_cast<std::size_t>(place);
     }
     if (!read_.IsRight()) return false;
     const auto primitive = Named<Primitive>(hardware::kPrimitives, name);

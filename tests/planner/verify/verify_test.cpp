@@ -320,6 +320,19 @@ TEST(Verify, PreferMaxVcoUnused) {
   ExpectHeld(json, device, "kind", R"("prefer_max_vco_unused")", R"("whole_divider_unused")");
 }
 
+// 800 MHz are divided by 4 to make 200. By 5 they make 160, which the engine does not answer.
+TEST(Verify, WhatTheEngineDoesNotAnswer) {
+  const auto device = DeviceOf(kOnePll);
+  const Request request = RequestOf({{"--in", "100"}, {"--out", "200"}, {"--device", "small"}});
+  LoopSettings set{.primitive = Primitive::kPll, .m = 64, .d = 1, .outputs = {{.divider = 40}}};
+  const Answer answer = answer::Evaluate(request, device, set, Source{.engine = true});
+  const string json = report::Json(request, device, {{&answer}});
+  const auto wrong = verify::Verify(json, device);
+  ASSERT_EQ(wrong.size(), 1u) << Text(wrong);
+  EXPECT_EQ(wrong[0].path, "answers[0].source");
+  EXPECT_NE(Text(wrong).find(R"(is "engine", should be "search")"), string::npos) << Text(wrong);
+}
+
 // CLKFX of 50 MHz: 5/3 make 83.3.
 TEST(Verify, WhatAKruDoesNotUse) {
   const auto device = DeviceOf(NarrowKrus());
