@@ -34,7 +34,7 @@ const std::vector<Known> kKnown = {
 
 // A request whose outputs can be changed one by one.
 struct Place {
-  Clocks clocks;
+  Clocks clocks = Clocks::kAboveZero;
   compare::Case drawn;
   std::vector<double> outFreqs;  // MHz
   std::vector<double> phases;    // degrees
@@ -162,7 +162,7 @@ Summit AskForNoPhase(const Device& device) {
   CountedCalls calls(FileOf(device));
   for (const int divider : {1, 2, 3, 4, 5, 8, 16, 64}) {
     for (const int slower : {1, 2, 4, 16}) {
-      Place place{Clocks::kAboveZero, {}, {}, {}};
+      Place place;
       place.drawn.limits = device.limits;
       plain::PllRequest& request = place.drawn.request;
       request.prim = device.prim;
